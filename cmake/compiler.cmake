@@ -1,0 +1,44 @@
+# Flags that every target shares.
+set(CMAKE_CXX_STANDARD 20)
+set(CMAKE_CXX_STANDARD_REQUIRED ON)
+set(CMAKE_CXX_EXTENSIONS OFF)
+set(CMAKE_POSITION_INDEPENDENT_CODE ON)
+set(CMAKE_CXX_VISIBILITY_PRESET hidden)
+set(CMAKE_VISIBILITY_INLINES_HIDDEN ON)
+set(CMAKE_RUNTIME_OUTPUT_DIRECTORY "${CMAKE_BINARY_DIR}/bin")
+set(CMAKE_LIBRARY_OUTPUT_DIRECTORY "${CMAKE_BINARY_DIR}/lib")
+# Programs find the shared library beside them in the build tree and in an installed tree alike.
+set(CMAKE_BUILD_RPATH_USE_ORIGIN ON)
+
+if(NOT CMAKE_BUILD_TYPE)
+    set(CMAKE_BUILD_TYPE Release)
+endif()
+
+add_compile_options(-Wall -Wextra -Werror)
+# Line tables are enough for sanitizer reports and gdb backtraces, and halve what the linker has to move.
+string(REPLACE "-g" "-gline-tables-only" _clang_debug "${CMAKE_CXX_FLAGS_DEBUG}")
+if(CMAKE_CXX_COMPILER_ID MATCHES "Clang")
+    set(CMAKE_CXX_FLAGS_DEBUG "${_clang_debug}")
+else()
+    set(CMAKE_CXX_FLAGS_DEBUG "-g1")
+endif()
+
+if(CMAKE_CXX_COMPILER_ID MATCHES "Clang")
+    # Lets ccache serve objects that were built with a precompiled header.
+    add_compile_options("SHELL:-Xclang -fno-pch-timestamp")
+endif()
+
+if(QORVEX_SANITIZE)
+    add_compile_options(-fsanitize=${QORVEX_SANITIZE} -fno-omit-frame-pointer -O1)
+    add_link_options(-fsanitize=${QORVEX_SANITIZE})
+    if(QORVEX_SANITIZE MATCHES "undefined")
+        add_compile_options(-fno-sanitize-recover=undefined -fno-sanitize=vptr)
+    endif()
+endif()
+
+find_program(QORVEX_MOLD mold)
+if(QORVEX_MOLD)
+    add_link_options(-fuse-ld=mold)
+endif()
+
+find_package(Threads REQUIRED)

@@ -1,0 +1,41 @@
+# Outside libraries, each behind one deps:: target. tools/setup installs them.
+find_package(PkgConfig REQUIRED)
+
+# deps::NAME from pkg-config modules; their headers count as system headers.
+function(qorvex_dependency name)
+    pkg_check_modules(${name} REQUIRED IMPORTED_TARGET ${ARGN})
+    add_library(deps::${name} ALIAS PkgConfig::${name})
+endfunction()
+
+qorvex_dependency(javascriptcore javascriptcoregtk-4.1 glib-2.0)
+qorvex_dependency(gumbo gumbo)
+qorvex_dependency(uriparser liburiparser)
+qorvex_dependency(fonts freetype2 harfbuzz libwoff2dec libbrotlidec)
+qorvex_dependency(icu icu-uc icu-i18n)
+qorvex_dependency(sdl2 sdl2)
+
+pkg_check_modules(_images REQUIRED IMPORTED_TARGET libpng libjpeg libwebp libwebpdemux)
+add_library(deps_images INTERFACE)
+target_link_libraries(deps_images INTERFACE PkgConfig::_images gif)
+add_library(deps::images ALIAS deps_images)
+
+# Yoga: sources fetched by tools/setup, built as they are.
+set(QORVEX_YOGA_DIR "" CACHE PATH "Folder that holds yoga/Yoga.h")
+if(NOT QORVEX_YOGA_DIR)
+    if(DEFINED ENV{QORVEX_DEPS_DIR})
+        set(_deps "$ENV{QORVEX_DEPS_DIR}")
+    elseif(DEFINED ENV{XDG_CACHE_HOME})
+        set(_deps "$ENV{XDG_CACHE_HOME}/qorvex")
+    else()
+        set(_deps "$ENV{HOME}/.cache/qorvex")
+    endif()
+    set(QORVEX_YOGA_DIR "${_deps}/yoga-0.88.1")
+endif()
+if(NOT EXISTS "${QORVEX_YOGA_DIR}/yoga/Yoga.h")
+    message(FATAL_ERROR "Yoga is not in ${QORVEX_YOGA_DIR}: run tools/setup")
+endif()
+file(GLOB_RECURSE _yoga_sources "${QORVEX_YOGA_DIR}/yoga/*.cpp")
+add_library(deps_yoga STATIC ${_yoga_sources})
+target_include_directories(deps_yoga SYSTEM PUBLIC "${QORVEX_YOGA_DIR}")
+target_compile_options(deps_yoga PRIVATE -w)
+add_library(deps::yoga ALIAS deps_yoga)

@@ -1,0 +1,1 @@
+# Filled by the installation rules of this project; see README.md.
