@@ -1,0 +1,57 @@
+// The script side of one loaded document. Owned by the view; the document keeps a pointer so that any node
+// reaches it. Created and destroyed by script/bindings/context_lifecycle.h.
+//
+// Invariant: one thread, the view's script thread, touches a context; two contexts of one view are never
+// alive together.
+#pragma once
+
+#include <JavaScriptCore/JSBase.h>
+
+#include <string_view>
+
+namespace qorvex::dom {
+class Window;
+}
+
+namespace qorvex::script {
+
+struct ScriptingContext {
+    // Error raised by native code that has no exception out-parameter at hand; protected while it stands
+    // here. Set by RaiseError, moved out by HandOverPendingException.
+    JSValueRef pending_exception = nullptr;
+    dom::Window* window = nullptr;
+    JSGlobalContextRef context = nullptr;
+};
+
+// While true nobody issues a JSValueUnprotect: the heap is on its way out. Process-wide and plain, as the
+// views of a system share one thread.
+[[nodiscard]] bool IsScriptContextTeardown();
+
+class ScriptContextTeardownScope {
+  public:
+    ScriptContextTeardownScope();
+    ~ScriptContextTeardownScope();
+    ScriptContextTeardownScope(const ScriptContextTeardownScope&) = delete;
+    ScriptContextTeardownScope& operator=(const ScriptContextTeardownScope&) = delete;
+};
+
+// JSValueUnprotect, or nothing during a teardown. Null values are fine.
+void UnprotectUnlessTeardown(JSContextRef context, JSValueRef value);
+
+// An `Error` with this message, as all errors that native code raises are: no TypeError, no DOMException.
+[[nodiscard]] JSValueRef MakeError(JSContextRef context, std::string_view message);
+
+// For a binding callback, which has the exception out-parameter.
+void RaiseError(JSContextRef context, std::string_view message, JSValueRef* exception);
+
+// For native code deeper down: the error waits in the context and the code goes on. The first error wins. A
+// null context drops the message into the log.
+void RaiseError(ScriptingContext* context, std::string_view message);
+
+// The end of each binding callback that such code can be reached from.
+void HandOverPendingException(ScriptingContext& context, JSValueRef* exception);
+
+// The context of the page that `context` belongs to; null in a foreign global.
+[[nodiscard]] ScriptingContext* GetScriptingContext(JSContextRef context);
+
+}  // namespace qorvex::script
