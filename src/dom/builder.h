@@ -1,0 +1,60 @@
+// Walks a parsed tree and makes nodes of it, one Step at a time. The walk keeps its own stack, so it can stop
+// in front of any element while a script or sheet has to come first, and go on from there.
+//
+// Invariant: between two steps every element below `stack_` has its parent already in the document, except
+// for the one held back in `pending_child_`.
+#pragma once
+
+#include "core/memory/containers.h"
+#include "dom/parsed_html.h"
+#include "qsl/ref_ptr.h"
+
+namespace qorvex::dom {
+
+class Document;
+class Element;
+class Node;
+
+enum class BuildResult { Finished = 0, Paused = 1, Failed = 2 };
+
+class Builder {
+  public:
+    // Makes the html element below `document` and a builder for its content; null when the parsed root is no
+    // html element.
+    static UniquePtr<Builder, MemoryTag::DOM> BuildRoot(RefPtr<ParsedHTML> parsed, Document& document);
+    // A builder for the content of the parsed body below `target`; null when there is nothing to walk.
+    static UniquePtr<Builder, MemoryTag::DOM> BuildFragment(RefPtr<ParsedHTML> parsed, Document& document,
+                                                            Node& target);
+
+    Builder(RefPtr<ParsedHTML> parsed, Document& document);
+    ~Builder();
+
+    BuildResult Step();
+
+  private:
+    struct StackEntry {
+        RefPtr<Node> parent;
+        GumboInternalNode* node;
+        uint32_t depth;  // of the parent, counted from the root
+    };
+
+    void PushChildren(const GumboInternalNode& node, Node& parent, uint32_t depth);
+    BuildResult BuildElement(const StackEntry& entry);
+    void AppendText(const StackEntry& entry);
+    bool FlushText();
+
+    RefPtr<ParsedHTML> parsed_;
+    Document& document_;
+    Vector<StackEntry, MemoryTag::DOM> stack_;
+    RefPtr<Node> pending_child_;
+    RefPtr<Node> pending_parent_;
+    bool text_active_ = false;
+    bool depth_reported_ = false;
+    TaggedString<MemoryTag::DOM> text_run_;
+    RefPtr<Node> text_parent_;
+};
+
+// Parses `text` as HTML and builds its content below `target` at once.
+void ParseFragment(std::string_view text, Document& document, Node& target);
+
+}  // namespace qorvex::dom

@@ -1,0 +1,60 @@
+// What a document asks of the view that shows it. Implemented by the view; a plain double serves the tests.
+// Every operation runs on the view's script thread. The host outlives its documents.
+#pragma once
+
+#include <cstdint>
+#include <string_view>
+
+#include "core/memory/string_pool.h"
+#include "core/tasks/task_system.h"
+
+namespace qorvex {
+class URL;
+class ILocalizationManager;
+class ITextTransformationManager;
+}  // namespace qorvex
+
+namespace qorvex::layout {
+class FontManager;
+struct Rect;
+}  // namespace qorvex::layout
+
+namespace qorvex::dom {
+
+class Document;
+
+struct HostSize {
+    uint32_t width = 0;
+    uint32_t height = 0;
+};
+
+class IDocumentHost {
+  public:
+    virtual ~IDocumentHost() = default;
+
+    virtual StringPool& GetStringPool() = 0;
+    virtual TaskFamilyHandle GetTaskFamily() = 0;
+    virtual uint32_t GetViewId() const = 0;
+    virtual HostSize GetViewSize() const = 0;
+    virtual bool AreComplexSelectorsEnabled() const = 0;
+    // Null without fonts (server pages, some tests): text is then measured on the layout side only.
+    virtual layout::FontManager* GetFontManager() { return nullptr; }
+    virtual ILocalizationManager* GetLocalizationManager() { return nullptr; }
+    virtual ITextTransformationManager* GetTextTransformationManager() { return nullptr; }
+
+    // The area that a removed node covered has to be painted anew.
+    virtual void AddDirtyRect(float x, float y, float width, float height) = 0;
+    // Paint at least this many more frames although nothing else may ask for them.
+    virtual void RequestFrames(uint32_t count) = 0;
+
+    virtual void OnDOMBuilt(Document& document) = 0;
+    // A load of another document of this view is on its way; "load" then waits.
+    virtual bool HasOtherLoadsPending() const { return false; }
+    virtual void OnFinishLoad(Document& document) = 0;
+    // Evaluates a classic script; `source_url` names it in exceptions. An exception is reported, not
+    // returned.
+    virtual void EvaluateScript(Document& document, std::string_view source, std::string_view source_url) = 0;
+    virtual void NavigateTo(const URL& url) = 0;
+};
+
+}  // namespace qorvex::dom

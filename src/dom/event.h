@@ -1,0 +1,60 @@
+// Events that need no payload. The richer classes derive from these.
+#pragma once
+
+#include "core/memory/string_pool.h"
+#include "script/scripting_handle.h"
+
+namespace qorvex::dom {
+
+class Document;
+class EventTarget;
+
+enum class EventPhase : uint32_t { None = 0, Capture = 1, AtTarget = 2, Bubble = 3 };
+
+class Event : public script::ScriptingHandleEnabledRefCounted {
+  public:
+    Event(Document* document, Atom type, bool bubbles, bool cancelable);
+
+    Atom GetType() const { return type_; }
+    bool GetBubbles() const { return bubbles_; }
+    bool GetCancelable() const { return cancelable_; }
+    bool GetDefaultPrevented() const { return default_prevented_; }
+    EventPhase GetPhase() const { return phase_; }
+    EventTarget* GetTarget() const { return target_; }
+    EventTarget* GetCurrentTarget() const { return current_target_; }
+    Document* GetDocument() const { return document_; }
+    void* GetUserData() const { return user_data_; }
+    void SetUserData(void* data) { user_data_ = data; }
+
+    void InitEvent(Atom type, bool bubbles, bool cancelable);
+    void StopPropagation() { propagation_stopped_ = true; }
+    void StopImmediatePropagation();
+    void PreventDefault() { default_prevented_ = default_prevented_ || cancelable_; }
+
+    // Runs the destructor and gives the memory back to where it came from.
+    virtual void ReleaseMemory();
+
+  private:
+    friend class EventDispatcher;
+    friend class Element;
+
+    Atom type_;
+    bool bubbles_ = false;
+    bool cancelable_ = false;
+    bool propagation_stopped_ = false;
+    bool immediate_propagation_stopped_ = false;
+    bool default_prevented_ = false;
+    bool script_constructed_ = false;  // such an event never reaches the client's callbacks
+    EventPhase phase_ = EventPhase::None;
+    EventTarget* target_ = nullptr;
+    EventTarget* current_target_ = nullptr;
+    Document* document_ = nullptr;
+    void* user_data_ = nullptr;
+};
+
+class UIEvent : public Event {
+  public:
+    using Event::Event;
+};
+
+}  // namespace qorvex::dom
