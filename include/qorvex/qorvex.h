@@ -1,0 +1,30 @@
+// Everything a client needs, in one include.
+#pragma once
+
+#include <qorvex/allocator.h>
+#include <qorvex/binder.h>
+#include <qorvex/cache_stats.h>
+#include <qorvex/cursor_types.h>
+#include <qorvex/data_storage.h>
+#include <qorvex/debug_dump.h>
+#include <qorvex/export.h>
+#include <qorvex/feature_interfaces.h>
+#include <qorvex/file_system.h>
+#include <qorvex/fonts.h>
+#include <qorvex/frame_capture.h>
+#include <qorvex/images_list.h>
+#include <qorvex/input_events.h>
+#include <qorvex/library.h>
+#include <qorvex/logging.h>
+#include <qorvex/node_proxy.h>
+#include <qorvex/renderers.h>
+#include <qorvex/resource_handler.h>
+#include <qorvex/system.h>
+#include <qorvex/text_input.h>
+#include <qorvex/text_services.h>
+#include <qorvex/user_image.h>
+#include <qorvex/view.h>
+#include <qorvex/view_listener.h>
+#include <qorvex/view_settings.h>
+#include <qorvex/web_socket.h>
+#include <qorvex/work.h>
