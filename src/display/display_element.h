@@ -1,0 +1,71 @@
+// What a layout node carries to measure and paint its own content.
+//
+// Made by the DOM element, shared by count with both halves of its layout handle. Read and changed on the
+// layout thread; by the DOM thread only at the commit. Whatever else the DOM wants changed travels as a
+// scheduled layout task.
+#pragma once
+
+#include "layout/geometry.h"
+#include "qsl/ref_ptr.h"
+
+#include <atomic>
+#include <cstdint>
+
+namespace fresco {
+class CommandBuffer;
+}
+
+namespace qorvex::layout {
+class LayoutHandle;
+struct LayoutNode;
+}  // namespace qorvex::layout
+
+namespace qorvex::dsp {
+
+class PaintContext;
+
+enum class MeasureMode : uint8_t { Undefined, Exactly, AtMost };
+
+class IDisplayElement {
+  public:
+    enum Flag : uint32_t {
+        kPaintsBox = 1u << 0,  // paints backgrounds and borders
+        kMeasures = 1u << 1,   // its size comes from Measure; it is a leaf of the box layout
+        kHasMask = 1u << 2,
+    };
+
+    IDisplayElement(const IDisplayElement&) = delete;
+    IDisplayElement& operator=(const IDisplayElement&) = delete;
+
+    void AddRef() noexcept { count_.fetch_add(1, std::memory_order_relaxed); }
+    void Release() noexcept;
+
+    uint32_t Flags() const { return flags_; }
+    bool Has(Flag flag) const { return (flags_ & flag) != 0; }
+
+    virtual ~IDisplayElement() = default;
+    // Records the element's own commands, without its children.
+    virtual void Paint(PaintContext& context, bool dirty, const layout::LayoutNode& node,
+                       fresco::CommandBuffer& buffer) = 0;
+    // NaN stands for an available size that is not known.
+    virtual void Measure(layout::LayoutHandle& handle, float availableWidth, float availableHeight,
+                         MeasureMode widthMode, MeasureMode heightMode, layout::Size& out);
+    // Moves one text line; used by the inline flow of a paragraph.
+    virtual void OffsetLine(uint32_t lineIndex, float offset, uint8_t alignment);
+    virtual void GrowLastLine(float amount);
+    // Bytes of text of this element.
+    virtual uint32_t TextLength() const;
+
+  protected:
+    explicit IDisplayElement(uint32_t flags) : flags_(flags) {}
+    void SetFlag(Flag flag, bool on) { flags_ = on ? flags_ | flag : flags_ & ~flag; }
+
+  private:
+    std::atomic<uint32_t> count_{0};
+    uint32_t flags_;
+};
+
+using DisplayElementPtr = qsl::RefPtr<IDisplayElement>;
+
+// The display class as text in dumps; also what tells <body> and <html> apart on the layout side.
+}  // namespace qorvex::dsp

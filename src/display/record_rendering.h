@@ -1,0 +1,26 @@
+// Turns the laid-out tree into command buffers. Layout thread; nothing is drawn here.
+#pragma once
+
+#include "display/frame_record.h"
+#include "display/render_caches.h"
+#include "layout/perform_layout.h"
+
+namespace qorvex::dsp {
+
+struct RecordRequest {
+    fresco::Library* library = nullptr;  // makes buffers, surfaces, images and paths
+    RenderCaches& caches;                // of the view, used on the layout thread only
+    float scale_x = 1;                   // virtual resolution
+    float scale_y = 1;
+    bool partial_redraw = true;
+    bool show_paint_rectangles = false;
+    bool record = true;  // false: rendering is off; pending resources still travel
+    uint32_t frame_number = 0;
+    // Buffers queued by other tasks (uploads, releases): they go first. Taken over.
+    BufferList resource_buffers;
+};
+
+// Body of the task RecordRendering; takes the pass's dirty region and leaves it empty.
+FrameRecord RecordRendering(layout::LayoutPass& pass, RecordRequest&& request);
+
+}  // namespace qorvex::dsp
