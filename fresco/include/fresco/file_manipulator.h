@@ -1,0 +1,14 @@
+// The client's file access. The library opens no file of its own.
+#pragma once
+#include <fresco/stream_reader.h>
+
+namespace fresco {
+
+class IFileManipulator {
+  public:
+    virtual ~IFileManipulator() = default;
+    // Null when the file cannot be read. The reader is given back with `Close`.
+    virtual IStreamReader* OpenFile(const char* /*path*/) { return nullptr; }
+};
+
+}  // namespace fresco
