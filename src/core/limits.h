@@ -1,0 +1,32 @@
+// Every limit that bounds work or memory which a page, a file or a peer could otherwise drive. Each constant
+// says what it counts and why it has its value. This header includes nothing but standard types and may be
+// included from every floor.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+
+namespace qorvex::limits {
+
+/// Bytes of one log line with its terminator; longer lines are cut.
+inline constexpr size_t kLogLineBytes = 1024;
+
+/// Streams that format log lines: so many threads write at once, others wait for one to come back.
+inline constexpr size_t kLogStreams = 2;
+
+/// Bytes of the default handler's stream: a whole line with thread id and time in front of it.
+inline constexpr size_t kDefaultLogBytes = 2048;
+
+/// Bytes of a block of temporary memory: enough that a usual frame stays within its first block.
+inline constexpr size_t kTempBlockBytes = 512 * 1024;
+
+/// Bytes of all font family names of a process; a page cannot make more of them than this holds.
+inline constexpr size_t kFamilyNameBytes = 1024;
+
+/// Smallest block of the string pool.
+inline constexpr size_t kStringPoolBlockBytes = 512;
+
+/// Object pools of a process; a thread's cache has one list for each.
+inline constexpr size_t kObjectPools = 32;
+
+}  // namespace qorvex::limits

@@ -1,0 +1,48 @@
+#include "core/logging/default_log_handler.h"
+
+#include <sys/syscall.h>
+#include <unistd.h>
+
+#include <ctime>
+
+namespace qorvex {
+namespace {
+
+constexpr char kSeverityLetters[] = "TDIWAE";
+
+long CurrentThreadId() {
+    return static_cast<long>(syscall(SYS_gettid));
+}
+
+}  // namespace
+
+DefaultLogHandler::DefaultLogHandler() : file_(std::fopen("qorvex_default.log", "w")) {
+    if (!file_) std::fputs("Unable to create log file in supposedly writable folder!\n", stderr);
+}
+
+DefaultLogHandler::~DefaultLogHandler() {
+    if (file_) std::fclose(file_);
+}
+
+void DefaultLogHandler::WriteLog(Logging::Severity severity, const char* text, unsigned length) {
+    std::lock_guard lock(mutex_);
+    stream_.Reset();
+    stream_.WriteNumber(CurrentThreadId());
+    stream_ << " Time: ";
+    stream_.WriteNumber(static_cast<int64_t>(std::time(nullptr)));
+    stream_ << ' ' << kSeverityLetters[severity < 6 ? severity : 5] << " | ";
+    stream_ << std::string_view(text, length ? length - 1 : 0) << '\n';
+
+    const std::string_view line = stream_.view();
+    if (file_) {
+        std::fwrite(line.data(), 1, line.size(), file_);
+        std::fflush(file_);
+    }
+    if (standard_streams_) {
+        std::FILE* out = severity < Logging::Error ? stdout : stderr;
+        std::fwrite(line.data(), 1, line.size(), out);
+        std::fflush(out);
+    }
+}
+
+}  // namespace qorvex
