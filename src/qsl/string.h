@@ -6,6 +6,8 @@
 #include <bit>
 #include <compare>
 #include <cstdint>
+#include <cstring>
+#include <functional>
 #include <iterator>
 #include <string_view>
 

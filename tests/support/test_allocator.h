@@ -99,7 +99,7 @@ class TestAllocator final : public IAllocator {
             faults_.push_back("allocation with an unknown tag");
         blocks_[ptr] = {size, alignment != 0, tag};
         live_bytes_ += size;
-        if (live_bytes_ > peak_bytes_) peak_bytes_ = live_bytes_;
+        if (live_bytes_ > peak_bytes_) peak_bytes_ = live_bytes_.load();
         return ptr;
     }
 
