@@ -11,12 +11,8 @@
 #include <array>
 #include <cstddef>
 #include <cstdint>
-#include <string_view>
 
 namespace qorvex::script {
-
-class ScriptingHandleEnabled;
-struct ScriptingContext;
 
 // X(class, parent class or None, finaliser kind)
 #define QORVEX_SCRIPT_CLASSES(X)                       \
@@ -143,12 +139,44 @@ enum class Finaliser : uint8_t {
 };
 
 struct ScriptClassRow {
-    std::string_view name;
+    const char* name;
     ScriptClass parent;
     Finaliser finaliser;
 };
 
-[[nodiscard]] const ScriptClassRow& GetScriptClassRow(ScriptClass script_class);
+inline constexpr std::array<ScriptClassRow, kScriptClassCount> kScriptClassRows = {{
+#define X(name, parent, finaliser) {#name, ScriptClass::parent, Finaliser::finaliser},
+    QORVEX_SCRIPT_CLASSES(X)
+#undef X
+}};
+
+[[nodiscard]] constexpr const ScriptClassRow& GetScriptClassRow(ScriptClass script_class) {
+    return kScriptClassRows[static_cast<size_t>(script_class)];
+}
+
+namespace internal {
+
+// Row c, bit b: b is c or one of its ancestors. 1.5 KB turn a walk up the parents into one load.
+struct AncestorTable {
+    uint64_t words[kScriptClassCount][2] = {};
+    constexpr AncestorTable() {
+        for (size_t c = 0; c < kScriptClassCount; ++c) {
+            for (auto a = static_cast<ScriptClass>(c); a != ScriptClass::None;
+                 a = GetScriptClassRow(a).parent) {
+                words[c][static_cast<size_t>(a) / 64] |= uint64_t{1} << (static_cast<size_t>(a) % 64);
+            }
+        }
+    }
+};
+inline constexpr AncestorTable kAncestors;
+
+}  // namespace internal
+
+// Whether `script_class` is `base` or derives from it.
+[[nodiscard]] constexpr bool IsScriptClassOrDerived(ScriptClass script_class, ScriptClass base) {
+    const auto b = static_cast<size_t>(base);
+    return (internal::kAncestors.words[static_cast<size_t>(script_class)][b / 64] >> (b % 64)) & 1;
+}
 
 // One entry a class; null before library start and after library end.
 class ScriptClassTable {
@@ -159,10 +187,6 @@ class ScriptClassTable {
     void Set(ScriptClass script_class, JSClassRef value) {
         classes_[static_cast<size_t>(script_class)] = value;
     }
-
-    // From the private of a global object (its Window) to the script context of the page. Windows live on a
-    // higher floor, which fills this in together with the classes.
-    ScriptingContext* (*context_of_global)(ScriptingHandleEnabled* global) = nullptr;
 
   private:
     std::array<JSClassRef, kScriptClassCount> classes_{};

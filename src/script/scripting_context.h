@@ -1,13 +1,16 @@
 // The script side of one loaded document. Owned by the view; the document keeps a pointer so that any node
 // reaches it. Created and destroyed by script/bindings/context_lifecycle.h.
 //
-// Invariant: one thread, the view's script thread, touches a context; two contexts of one view are never
-// alive together.
+// Invariant: one thread, the view's script thread, touches a context; two contexts of one view are never alive
+// together.
 #pragma once
 
 #include <JavaScriptCore/JSBase.h>
 
+#include <array>
 #include <string_view>
+
+#include "script/class_table.h"
 
 namespace qorvex::dom {
 class Window;
@@ -15,16 +18,35 @@ class Window;
 
 namespace qorvex::script {
 
+class ScriptingHandleEnabled;
+
 struct ScriptingContext {
-    // Error raised by native code that has no exception out-parameter at hand; protected while it stands
-    // here. Set by RaiseError, moved out by HandOverPendingException.
+    // Error raised by native code that has no exception out-parameter at hand; protected while it stands here.
+    // Set by RaiseError, moved out by HandOverPendingException.
     JSValueRef pending_exception = nullptr;
     dom::Window* window = nullptr;
     JSGlobalContextRef context = nullptr;
+
+    // The window as the handle that calls on the global object act on.
+    ScriptingHandleEnabled* global_handle = nullptr;
+    // The prototype of each class in this context, all held by `prototype_keeper`.
+    std::array<JSObjectRef, kScriptClassCount> prototypes{};
+    JSObjectRef prototype_keeper = nullptr;
+    // Chain of the thread's contexts, see GetScriptingContext.
+    ScriptingContext* next = nullptr;
 };
 
-// While true nobody issues a JSValueUnprotect: the heap is on its way out. Process-wide and plain, as the
-// views of a system share one thread.
+// Puts a context whose `context` field is set among those that GetScriptingContext finds, or takes it out.
+// To be called on the context's own thread.
+void RegisterScriptingContext(ScriptingContext& context);
+void UnregisterScriptingContext(ScriptingContext& context);
+
+// The context of the page that `context` belongs to; null for a context that no page owns. A short walk: a
+// thread has as many contexts as it has views.
+[[nodiscard]] ScriptingContext* GetScriptingContext(JSContextRef context);
+
+// While true nobody issues a JSValueUnprotect: the heap is on its way out. Process-wide and plain, as the views
+// of a system share one thread.
 [[nodiscard]] bool IsScriptContextTeardown();
 
 class ScriptContextTeardownScope {
@@ -48,10 +70,8 @@ void RaiseError(JSContextRef context, std::string_view message, JSValueRef* exce
 // null context drops the message into the log.
 void RaiseError(ScriptingContext* context, std::string_view message);
 
-// The end of each binding callback that such code can be reached from.
-void HandOverPendingException(ScriptingContext& context, JSValueRef* exception);
-
-// The context of the page that `context` belongs to; null in a foreign global.
-[[nodiscard]] ScriptingContext* GetScriptingContext(JSContextRef context);
+// The end of each binding callback: moves a waiting error to the out-parameter. Costs one load when no context
+// of the process has one.
+void HandOverPendingException(JSContextRef context, JSValueRef* exception);
 
 }  // namespace qorvex::script

@@ -53,7 +53,7 @@ class ScriptingHandleEnabled {
   protected:
     void ProtectWrapper();
     // Makes the wrapper unless there is one; true when it was made by this call.
-    bool MakeWrapper(ScriptClass script_class, JSContextRef context);
+    bool MakeWrapper(ScriptClass script_class, bool has_weak, JSContextRef context);
 
     JSObjectRef wrapper_ = nullptr;
     // The global context in which the wrapper was made; null until the first wrapping.
@@ -85,6 +85,8 @@ void DropWeakHandleBlock(WeakHandleBlock* block);
 template <class T, class Count>
 class HasWeakPtr {
   public:
+    static constexpr bool kHasWeak = true;
+
     // The block, made on first use, with one more count for the caller.
     [[nodiscard]] WeakHandleBlock* AcquireWeakBlock(T* self) {
         if (!block_) block_ = MakeWeakHandleBlock(self);
@@ -102,6 +104,7 @@ class HasWeakPtr {
 };
 
 struct NoWeakPtr {
+    static constexpr bool kHasWeak = false;
     void ClearWeakBlock() {}
 };
 
@@ -169,7 +172,7 @@ class ReferenceCounted : public ScriptingHandleEnabled, protected WeakPolicy, pr
 
   protected:
     void WrapAs(ScriptClass script_class, JSContextRef context, JSValueRef* out) {
-        if (!wrapper_ && !Counter::IsDying() && MakeWrapper(script_class, context)) {
+        if (!wrapper_ && !Counter::IsDying() && MakeWrapper(script_class, WeakPolicy::kHasWeak, context)) {
             Counter::AddWrapper();
             ProtectWrapper();
         }

@@ -1,0 +1,77 @@
+#include "script/class_description.h"
+
+#include <array>
+
+#include "core/logging/log.h"
+#include "script/native_private.h"
+#include "script/scripting_handle_enabled.h"
+
+namespace qorvex::script {
+
+namespace {
+
+std::array<const ClassDescription*, kScriptClassCount> g_descriptions{};
+
+JSClassRef CreateClass(ScriptClass script_class, const ClassDescription* description) {
+    const ScriptClassRow& row = GetScriptClassRow(script_class);
+    JSClassDefinition definition = kJSClassDefinitionEmpty;
+    definition.className = row.name;
+    // Neither a parent class nor the automatic prototype: the engine searches the tables of every class of a
+    // chain on every access (463 ns for a method of the fifth class, 167 with plain prototype objects), and
+    // would run a finaliser once for each of them.
+    definition.attributes = kJSClassAttributeNoAutomaticPrototype;
+    if (row.finaliser != Finaliser::None) definition.finalize = FinaliseHandle;
+    if (description) {
+        definition.hasProperty = description->properties.has;
+        definition.getProperty = description->properties.get;
+        definition.setProperty = description->properties.set;
+        definition.deleteProperty = description->properties.remove;
+        definition.getPropertyNames = description->properties.names;
+        if (description->finalise) definition.finalize = description->finalise;
+    }
+    return JSClassCreate(&definition);
+}
+
+}  // namespace
+
+void CreateScriptClasses(std::span<const ClassDescription* const> descriptions) {
+    LogInfo("Initializing scripting...");
+    g_descriptions = {};
+    for (const ClassDescription* description : descriptions) {
+        g_descriptions[static_cast<size_t>(description->script_class)] = description;
+    }
+    ScriptClassTable& table = GetScriptClassTable();
+    for (size_t i = 0; i < kScriptClassCount; ++i) {
+        const auto script_class = static_cast<ScriptClass>(i);
+        if (!table[script_class]) table.Set(script_class, CreateClass(script_class, g_descriptions[i]));
+    }
+}
+
+void ReleaseScriptClasses() {
+    LogInfo("Uninitializing scripting...");
+    ScriptClassTable& table = GetScriptClassTable();
+    for (size_t i = 0; i < kScriptClassCount; ++i) {
+        const auto script_class = static_cast<ScriptClass>(i);
+        if (table[script_class]) JSClassRelease(table[script_class]);
+        table.Set(script_class, nullptr);
+    }
+    g_descriptions = {};
+}
+
+const ClassDescription* GetClassDescription(ScriptClass script_class) {
+    return g_descriptions[static_cast<size_t>(script_class)];
+}
+
+void FinaliseHandle(JSObjectRef object) {
+    const NativePrivate found = UnpackPrivate(JSObjectGetPrivate(object));
+    if (!found.object) return;
+    JSObjectSetPrivate(object, nullptr);
+    auto* handle = static_cast<ScriptingHandleEnabled*>(found.object);
+    if (found.has_weak) {
+        static_cast<ScriptingHandleEnabledRefCountedWithWeak*>(handle)->FinaliseWrapper();
+    } else {
+        static_cast<ScriptingHandleEnabledRefCounted*>(handle)->FinaliseWrapper();
+    }
+}
+
+}  // namespace qorvex::script

@@ -1,0 +1,158 @@
+// What script sees of a class that is declared as data.
+#include "script/script_fixture.h"
+
+namespace qorvex::script::test {
+namespace {
+
+class BoundClass : public ScriptTest {
+  protected:
+    BoundClass() {
+        SetGlobal("node", MakeHandle<TestNode>(counts_).get());
+        SetGlobal("element", MakeHandle<TestElement>(counts_).get());
+        SetGlobal("list", MakeHandle<TestList>(counts_).get());
+    }
+};
+
+TEST_F(BoundClass, ConvertsArgumentsAndResultsByType) {
+    EXPECT_EQ(Run("node.sum('2', 3.9)"), "5");
+    EXPECT_EQ(Run("node.sum(-1, -1)"), "-2");
+    EXPECT_EQ(Run("node.sum(NaN, Infinity)"), "0");
+    EXPECT_EQ(Run("node.sum(4294967297, 0)"), "1");
+    EXPECT_EQ(Run("node.number = '0x10'; node.number"), "16");
+    EXPECT_EQ(Run("node.name = 'gr\\u00fc\\u00df\\u{1F600}'; node.name"), "gr\u00fc\u00df\U0001F600");
+    EXPECT_EQ(Run("node.join()"), "undefined,none");
+    EXPECT_EQ(Run("node.join(null, null)"), "null,null");
+    EXPECT_EQ(Run("node.join('x'.repeat(5000), 1).length"), "5002");
+    EXPECT_EQ(Run("String(node.held) + node.absent + node.hold(null)"), "nullnullundefined");
+    EXPECT_EQ(Run("node.hold(element); node.held === element"), "true");
+    EXPECT_EQ(Run("node.contains(node)"), "true");
+}
+
+TEST_F(BoundClass, CountsArgumentsBeforeAnythingElse) {
+    EXPECT_EQ(Run("node.sum(1)"),
+              "throws Error: Failed to execute 'sum' on 'Node': 2 arguments required, but only 1 present");
+    EXPECT_EQ(Run("node.sum.call(5)"),
+              "throws Error: Failed to execute 'sum' on 'Node': 2 arguments required, but only 0 present");
+    EXPECT_EQ(Run("element.sum()"),
+              "throws Error: Failed to execute 'sum' on 'Node': 2 arguments required, but only 0 present");
+}
+
+TEST_F(BoundClass, ConvertsFromTheLastArgumentToTheFirst) {
+    EXPECT_EQ(Run("let seen = ''; const say = (name, v) => ({ valueOf() { seen += name; return v; } });"
+                  "node.sum(say('a', 1), say('b', 2)) + seen"),
+              "3ba");
+}
+
+TEST_F(BoundClass, AConversionThatThrowsEndsTheCall) {
+    EXPECT_EQ(Run("node.sum({ valueOf() { throw new RangeError('no'); } }, 1)"), "throws RangeError: no");
+    EXPECT_EQ(Run("node.name = 'before'; try { node.name = Symbol('x'); } catch (e) { } node.name"),
+              "before");
+}
+
+TEST_F(BoundClass, AForeignThisGetsUndefinedAndNothingCrashes) {
+    for (const char* self : {"{}", "null", "undefined", "5", "list", "globalThis", "Math", "node.sum",
+                             "Node.prototype", "new Proxy(node, {})", "Object.create(node)"}) {
+        EXPECT_EQ(Run((std::string("String(node.sum.call(") + self + ", 1, 2))").c_str()), "undefined")
+            << self;
+        EXPECT_EQ(Run((std::string("Object.getOwnPropertyDescriptor(Node.prototype, 'number').get.call(") +
+                       self + ")")
+                          .c_str()),
+                  "undefined")
+            << self;
+    }
+    EXPECT_EQ(Run("element.fail.call(node, 'x')"), "undefined");
+    EXPECT_EQ(Run("node.contains(list) || node.contains({}) || node.contains(7)"), "false");
+}
+
+TEST_F(BoundClass, ObjectsOfTheClientsOwnClassesAreForeignToo) {
+    JSClassDefinition definition = kJSClassDefinitionEmpty;
+    definition.className = "Client";
+    JSClassRef client = JSClassCreate(&definition);
+    int data = 0;
+    void* privates[] = {nullptr, &data, reinterpret_cast<void*>(uintptr_t{42}),
+                        reinterpret_cast<void*>(~uintptr_t{0})};
+    for (void* value : privates) {
+        SetProperty(page_.context, JSContextGetGlobalObject(page_.context), "client",
+                    JSObjectMake(page_.context, client, value), kJSPropertyAttributeNone);
+        EXPECT_EQ(Run("node.sum.call(client, 1, 2)"), "undefined");
+        EXPECT_EQ(Run("node.contains(client)"), "false");
+    }
+    JSClassRelease(client);
+}
+
+TEST_F(BoundClass, AWaitingErrorOfNativeCodeBecomesTheCallsException) {
+    EXPECT_EQ(Run("element.fail('deep trouble')"), "throws Error: deep trouble");
+    EXPECT_EQ(Run("try { element.fail('x'); } catch (e) { (e instanceof Error) + e.constructor.name }"),
+              "trueError");
+    EXPECT_EQ(page_.pending_exception, nullptr);
+    EXPECT_EQ(Run("element.sum(1, 1)"), "2");
+}
+
+TEST_F(BoundClass, PrototypesChainAsTheClassesDo) {
+    EXPECT_EQ(Run("Object.getPrototypeOf(element) === Element.prototype"), "true");
+    EXPECT_EQ(Run("Object.getPrototypeOf(Element.prototype) === Node.prototype"), "true");
+    EXPECT_EQ(Run("Object.getPrototypeOf(HTMLVideoElement.prototype) === HTMLMediaElement.prototype"),
+              "true");
+    EXPECT_EQ(Run("[element instanceof Element, element instanceof EventTarget, node instanceof Element]"),
+              "true,true,false");
+    EXPECT_EQ(Run("typeof Element + Element.name + Element.prototype.constructor.name"),
+              "functionElementElement");
+    EXPECT_EQ(Run("Object.prototype.toString.call(element)"), "[object Element]");
+    EXPECT_EQ(Run("Object.prototype.toString.call(globalThis) + (globalThis instanceof Window) +"
+                  " (globalThis instanceof EventTarget) + ({} instanceof Window)"),
+              "[object Window]truetruefalse");
+    EXPECT_EQ(Run("Node.prototype.twice = function() { return this.number * 2; };"
+                  "element.number = 4; element.twice()"),
+              "8");
+}
+
+TEST_F(BoundClass, ConstructorsWithoutAConstructorRefuse) {
+    EXPECT_EQ(Run("new Node()"), "throws Error: Invalid constructor!");
+    EXPECT_EQ(Run("Element()"), "throws Error: Invalid constructor!");
+    EXPECT_EQ(Run("class Mine extends Node {} new Mine()"), "throws Error: Invalid constructor!");
+}
+
+TEST_F(BoundClass, ConstantsStandOnConstructorAndPrototype) {
+    EXPECT_EQ(Run("[Node.ELEMENT_NODE, node.TEXT_NODE, Element.ELEMENT_NODE]"), "1,3,1");
+    EXPECT_EQ(Run("Node.ELEMENT_NODE = 9; Node.ELEMENT_NODE"), "1");
+}
+
+TEST_F(BoundClass, ReadOnlyAttributesIgnoreWrites) {
+    EXPECT_EQ(Run("list.length = 9; list.length"), "3");
+}
+
+TEST_F(BoundClass, All95SlotsExistAndEveryClassHasItsConstructor) {
+    for (const ScriptClassRow& row : kScriptClassRows) {
+        EXPECT_EQ(Run((std::string("typeof ") + row.name).c_str()), "function") << row.name;
+    }
+    for (size_t i = 0; i < kScriptClassCount; ++i) {
+        EXPECT_NE(GetScriptClassTable()[static_cast<ScriptClass>(i)], nullptr);
+    }
+    EXPECT_STREQ(GetScriptClassRow(static_cast<ScriptClass>(0)).name, "CSSRuleList");
+    EXPECT_STREQ(GetScriptClassRow(static_cast<ScriptClass>(94)).name, "TimeRanges");
+}
+
+TEST_F(BoundClass, TwoContextsShareClassesButNotPrototypes) {
+    Run("Node.prototype.onlyHere = 1; 0");
+    ScriptingContext other;
+    JSContextGroupRef group = JSContextGroupCreate();
+    other.context = JSGlobalContextCreateInGroup(group, nullptr);
+    RegisterScriptingContext(other);
+    InstallClasses(other);
+    auto foreign = MakeHandle<TestNode>(counts_);
+    JSValueRef value = nullptr;
+    foreign->GetOrCreateWrapper(other.context, &value);
+    EXPECT_TRUE(JSValueIsUndefined(other.context,
+                                   GetProperty(other.context, const_cast<JSObjectRef>(value), "onlyHere")));
+    EXPECT_EQ(GetScriptingContext(other.context), &other);
+    EXPECT_EQ(GetScriptingContext(page_.context), &page_);
+    ScriptContextTeardownScope teardown;
+    UninstallClasses(other);
+    UnregisterScriptingContext(other);
+    JSGlobalContextRelease(other.context);
+    JSContextGroupRelease(group);
+    EXPECT_EQ(GetScriptingContext(page_.context), &page_);
+}
+
+}  // namespace
+}  // namespace qorvex::script::test

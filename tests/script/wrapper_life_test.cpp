@@ -1,0 +1,138 @@
+// The count protocol of native objects and their wrappers, with the collector called by hand.
+#include "script/script_fixture.h"
+
+namespace qorvex::script::test {
+namespace {
+
+class WrapperLife : public ScriptTest {};
+
+TEST_F(WrapperLife, AnObjectWithoutScriptLivesByItsHolders) {
+    auto node = MakeHandle<TestNode>(counts_);
+    EXPECT_EQ(node->reference_count(), 2u);
+    auto second = node;
+    EXPECT_EQ(node->reference_count(), 4u);
+    node.reset();
+    EXPECT_EQ(counts_.destroyed, 0);
+    second.reset();
+    EXPECT_EQ(counts_.destroyed, 1);
+    EXPECT_EQ(counts_.notified, 1);
+}
+
+TEST_F(WrapperLife, IdentityAndScriptPropertiesStayWhileHeld) {
+    auto node = MakeHandle<TestNode>(counts_);
+    SetGlobal("a", node.get());
+    SetGlobal("b", node.get());
+    EXPECT_EQ(node->reference_count(), 3u);
+    EXPECT_EQ(Run("a.mine = 7; a === b"), "true");
+    Run("delete globalThis.a; delete globalThis.b; 0");
+    Collect();
+    SetGlobal("c", node.get());
+    EXPECT_EQ(Run("c.mine"), "7");
+}
+
+TEST_F(WrapperLife, AnUnheldObjectLivesAsLongAsScriptReachesIt) {
+    auto node = MakeHandle<TestNode>(counts_);
+    SetGlobal("kept", node.get());
+    WeakHandle<TestNode> weak(node.get());
+    node.reset();
+    EXPECT_EQ(weak->reference_count(), 1u);
+    Run("kept.mine = 1; 0");
+    Collect();
+    EXPECT_EQ(counts_.destroyed, 0);
+    EXPECT_EQ(Run("kept.mine"), "1");
+
+    // From 1 to 3: protected again.
+    node = qsl::RefPtr<TestNode>(weak.get());
+    EXPECT_EQ(node->reference_count(), 3u);
+    Run("delete globalThis.kept; 0");
+    Collect();
+    EXPECT_EQ(counts_.destroyed, 0);
+    SetGlobal("kept", node.get());
+    EXPECT_EQ(Run("kept.mine"), "1");
+
+    node.reset();
+    Run("delete globalThis.kept; 0");
+    Collect();
+    EXPECT_EQ(counts_.destroyed, 1);
+    EXPECT_EQ(counts_.notified, 1);
+    EXPECT_EQ(weak.get(), nullptr);
+}
+
+TEST_F(WrapperLife, CollectionOfOneWrapperReleasesWhatItsObjectHeld) {
+    auto outer = MakeHandle<TestNode>(counts_);
+    SetGlobal("outer", outer.get());
+    outer.reset();
+    Run("(function() { for (let i = 0; i < 50; ++i) outer.hold(outer.make()); })()");
+    Collect();
+    EXPECT_GE(counts_.destroyed, 45);  // the stack may still hold the last ones
+    Run("outer.held.hold(outer.make()); outer = null");
+    Collect();
+    Collect();
+    EXPECT_GE(counts_.destroyed, 50);
+    DestroyContext();
+    EXPECT_EQ(counts_.destroyed, 52);
+    EXPECT_EQ(counts_.notified, 52);
+}
+
+TEST_F(WrapperLife, TeardownEndsWrappersAndLeavesHeldObjects) {
+    std::vector<qsl::RefPtr<TestNode>> held;
+    for (int i = 0; i < 3000; ++i) {
+        held.push_back(MakeHandle<TestNode>(counts_));
+        SetGlobal("last", held.back().get());
+    }
+    for (int i = 0; i < 1000; ++i)
+        SetGlobal("free", MakeHandle<TestNode>(counts_).get());
+    SetGlobal("list", MakeHandle<TestList>(counts_).get());
+    DestroyContext();
+    EXPECT_EQ(counts_.destroyed, 1001);
+    for (const auto& node : held) {
+        ASSERT_EQ(node->reference_count(), 2u);
+        ASSERT_EQ(node->wrapper(), nullptr);
+        ASSERT_EQ(node->wrapper_context(), nullptr);
+    }
+    held.clear();
+    EXPECT_EQ(counts_.destroyed, 4001);
+}
+
+// References that a destructor takes and drops must not end the object twice, nor make it a wrapper.
+class SelfTouching final : public ScriptingHandleEnabledRefCountedWithWeak {
+    QORVEX_SCRIPT_CLASS(Node)
+
+  public:
+    SelfTouching(JSContextRef context, int& destroyed) : context_(context), destroyed_(destroyed) {}
+    ~SelfTouching() override {
+        ++destroyed_;
+        qsl::RefPtr<SelfTouching> self(this);
+        WeakHandle<SelfTouching> weak(this);
+        EXPECT_EQ(weak.get(), nullptr);
+        JSValueRef value = nullptr;
+        GetOrCreateWrapper(context_, &value);
+        EXPECT_EQ(value, nullptr);
+    }
+
+  private:
+    JSContextRef context_;
+    int& destroyed_;
+};
+
+TEST_F(WrapperLife, ADestructorMayTouchItsOwnCount) {
+    int destroyed = 0;
+    MakeHandle<SelfTouching>(page_.context, destroyed).reset();
+    EXPECT_EQ(destroyed, 1);
+}
+
+TEST_F(WrapperLife, WeakHandlesCopyMoveAndOutlive) {
+    auto node = MakeHandle<TestNode>(counts_);
+    WeakHandle<TestNode> first(node.get());
+    WeakHandle<TestNode> second = first;
+    WeakHandle<TestNode> third = std::move(first);
+    EXPECT_EQ(second.get(), node.get());
+    EXPECT_EQ(third.get(), node.get());
+    node.reset();
+    EXPECT_FALSE(second);
+    EXPECT_FALSE(third);
+    second = WeakHandle<TestNode>();
+}
+
+}  // namespace
+}  // namespace qorvex::script::test
