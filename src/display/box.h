@@ -13,14 +13,14 @@ struct ImageSlot {
     uint32_t gradient = 0;  // 1-based index in the style's image list, 0 for none
     layout::Size intrinsic;
     layout::Edges slices;
-    uint32_t used_in_frame = 0;
+    uint32_t usedInFrame = 0;
 };
 
-using ImageSlots = SmallVector<ImageSlot, 1, MemoryTag::Display>;
+using ImageSlots = SmallVector<ImageSlot, 1, MemoryTag::Rendering>;
 
 class Box : public IDisplayElement {
   public:
-    static qsl::RefPtr<Box> Create();
+    Box() : Box(0) {}
 
     void Paint(PaintContext& context, bool dirty, const layout::LayoutNode& node,
                fresco::CommandBuffer& buffer) override;
@@ -32,19 +32,17 @@ class Box : public IDisplayElement {
     void SetHasMask(bool on);
 
   protected:
-    explicit Box(uint32_t extraFlags = 0) : IDisplayElement(kPaintsBox | extraFlags) {}
+    explicit Box(uint32_t extraFlags) : IDisplayElement(kPaintsBox | extraFlags) {}
 
     // What a subclass shows between its background and its border.
     virtual void PaintContent(PaintContext& context, bool dirty, const layout::LayoutNode& node,
                               fresco::CommandBuffer& buffer);
 
   private:
-    template <typename T, typename... Args>
-    friend T* qorvex::New(MemoryTag, Args&&...);
 
     ImageSlots background_;
     ImageSlots border_image_;
-    UniquePtr<ImageSlots, MemoryTag::Display> mask_;
+    UniquePtr<ImageSlots, MemoryTag::Rendering> mask_;
 };
 
 }  // namespace qorvex::dsp

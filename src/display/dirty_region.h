@@ -17,7 +17,7 @@ class DirtyRegion {
     // What a recording gets as its scissor list.
     static constexpr uint32_t kScissorCount = 8;
 
-    void Add(const layout::Rect& rect);
+    void Add(const layout::Rect& area);
     void Add(const DirtyRegion& other);
     bool Empty() const { return count_ == 0; }
     // Area of the bounds above the tolerance, the frame's test for "something to paint".

@@ -5,10 +5,9 @@
 // scheduled layout task.
 #pragma once
 
+#include "core/memory/ref_counted.h"
 #include "layout/geometry.h"
-#include "qsl/ref_ptr.h"
 
-#include <atomic>
 #include <cstdint>
 
 namespace fresco {
@@ -26,7 +25,7 @@ class PaintContext;
 
 enum class MeasureMode : uint8_t { Undefined, Exactly, AtMost };
 
-class IDisplayElement {
+class IDisplayElement : public AtomicRefCounted<IDisplayElement, MemoryTag::Rendering> {
   public:
     enum Flag : uint32_t {
         kPaintsBox = 1u << 0,  // paints backgrounds and borders
@@ -37,11 +36,11 @@ class IDisplayElement {
     IDisplayElement(const IDisplayElement&) = delete;
     IDisplayElement& operator=(const IDisplayElement&) = delete;
 
-    void AddRef() noexcept { count_.fetch_add(1, std::memory_order_relaxed); }
-    void Release() noexcept;
-
     uint32_t Flags() const { return flags_; }
     bool Has(Flag flag) const { return (flags_ & flag) != 0; }
+
+    // How far the painted content reaches beyond the box, in pixels: overhanging glyphs.
+    float InkOverflow() const { return inkOverflow_; }
 
     virtual ~IDisplayElement() = default;
     // Records the element's own commands, without its children.
@@ -58,14 +57,13 @@ class IDisplayElement {
 
   protected:
     explicit IDisplayElement(uint32_t flags) : flags_(flags) {}
+    void SetInkOverflow(float pixels) { inkOverflow_ = pixels; }
     void SetFlag(Flag flag, bool on) { flags_ = on ? flags_ | flag : flags_ & ~flag; }
 
   private:
-    std::atomic<uint32_t> count_{0};
     uint32_t flags_;
+    float inkOverflow_ = 0;
 };
 
 using DisplayElementPtr = qsl::RefPtr<IDisplayElement>;
-
-// The display class as text in dumps; also what tells <body> and <html> apart on the layout side.
 }  // namespace qorvex::dsp

@@ -10,7 +10,7 @@ namespace qorvex::dsp {
 
 class DisplayText final : public IDisplayElement {
   public:
-    static qsl::RefPtr<DisplayText> Create();
+    DisplayText() : IDisplayElement(kMeasures) {}
 
     // Already transformed (text-transform) UTF-8. On the layout thread, or at the commit.
     void SetText(std::string_view text);
@@ -23,11 +23,7 @@ class DisplayText final : public IDisplayElement {
     uint32_t TextLength() const override;
 
   private:
-    DisplayText() : IDisplayElement(kMeasures) {}
-    template <typename T, typename... Args>
-    friend T* qorvex::New(MemoryTag, Args&&...);
-
-    TaggedString<MemoryTag::Display> text_;
+    TaggedString<MemoryTag::Rendering> text_;
 };
 
 }  // namespace qorvex::dsp

@@ -11,7 +11,7 @@
 
 namespace qorvex::dsp {
 
-using BufferList = Vector<fresco::CommandBuffer*, MemoryTag::Display>;
+using BufferList = Vector<fresco::CommandBuffer*, MemoryTag::Rendering>;
 
 struct FrameRecord {
     FrameRecord() = default;
@@ -22,18 +22,18 @@ struct FrameRecord {
     ~FrameRecord() { ReleaseBuffers(); }
 
     // Executed in order, resource buffers first.
-    BufferList resource_buffers;
+    BufferList resourceBuffers;
     BufferList buffers;
-    Vector<fresco::SurfaceId, MemoryTag::Display> surfaces_to_free;
-    Vector<fresco::ImageId, MemoryTag::Display> images_to_free;
-    Vector<layout::Rect, MemoryTag::Display> dirty_rects;
-    uint32_t frame_number = 0;
-    bool is_partial = false;
+    Vector<fresco::SurfaceId, MemoryTag::Rendering> surfacesToFree;
+    Vector<fresco::ImageId, MemoryTag::Rendering> imagesToFree;
+    Vector<layout::Rect, MemoryTag::Rendering> dirtyRects;
+    uint32_t frameNumber = 0;
+    bool isPartial = false;
 
     // Nothing to paint and nothing pending: the frame completes without a paint task.
     bool Empty() const {
-        return buffers.empty() && resource_buffers.empty() && surfaces_to_free.empty() &&
-               images_to_free.empty();
+        return buffers.empty() && resourceBuffers.empty() && surfacesToFree.empty() &&
+               imagesToFree.empty();
     }
     void ReleaseBuffers();
 };

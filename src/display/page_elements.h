@@ -8,24 +8,11 @@ namespace qorvex::dsp {
 // Paints the page's base background over the whole view.
 class DisplayHTML final : public IDisplayElement {
   public:
-    static qsl::RefPtr<DisplayHTML> Create();
+    DisplayHTML() : IDisplayElement(0) {}
     void Paint(PaintContext& context, bool dirty, const layout::LayoutNode& node,
                fresco::CommandBuffer& buffer) override;
-
-  private:
-    DisplayHTML() : IDisplayElement(0) {}
-    template <typename T, typename... Args>
-    friend T* qorvex::New(MemoryTag, Args&&...);
 };
 
-class DisplayBody final : public Box {
-  public:
-    static qsl::RefPtr<DisplayBody> Create();
-
-  private:
-    DisplayBody() = default;
-    template <typename T, typename... Args>
-    friend T* qorvex::New(MemoryTag, Args&&...);
-};
+class DisplayBody final : public Box {};
 
 }  // namespace qorvex::dsp

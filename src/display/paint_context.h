@@ -28,12 +28,12 @@ class PaintContext {
     ScratchSurfaces& scratch;
     layout::WorkCounters& counters;
     css::LengthContext lengths;  // em is that of the node being painted
-    layout::Size view_size;
-    float scale_x = 1;
-    float scale_y = 1;
-    bool snap_to_pixels = true;
-    bool partial_redraw = false;
-    bool show_dirty_rects = false;
+    layout::Size viewSize;
+    float scaleX = 1;
+    float scaleY = 1;
+    bool snapToPixels = true;
+    bool partialRedraw = false;
+    bool showDirtyRects = false;
     // Areas to paint in view coordinates; everything outside may be left out.
     std::span<const layout::Rect> dirty;
 

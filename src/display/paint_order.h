@@ -14,7 +14,7 @@ namespace qorvex::dsp {
 
 struct PaintEntry {
     const layout::LayoutNode* node = nullptr;
-    int32_t z_index = 0;
+    int32_t zIndex = 0;
     uint32_t layer = 0;  // 0 for in-flow content, 1 for positioned content and contexts
     uint32_t order = 0;  // tree order
 };
@@ -28,7 +28,7 @@ void CollectPaintOrder(const layout::LayoutNode& context, std::span<const layout
 
 // A plain node paints by itself; a context or clip recurses.
 inline bool PaintsAsUnit(const layout::LayoutNode& node) {
-    return node.establishes_stacking_context || node.flags.should_overflow_clip;
+    return node.establishesStackingContext || node.flags.shouldOverflowClip;
 }
 
 }  // namespace qorvex::dsp

@@ -10,14 +10,14 @@ namespace qorvex::dsp {
 struct RecordRequest {
     fresco::Library* library = nullptr;  // makes buffers, surfaces, images and paths
     RenderCaches& caches;                // of the view, used on the layout thread only
-    float scale_x = 1;                   // virtual resolution
-    float scale_y = 1;
-    bool partial_redraw = true;
-    bool show_paint_rectangles = false;
+    float scaleX = 1;                   // virtual resolution
+    float scaleY = 1;
+    bool partialRedraw = true;
+    bool showPaintRectangles = false;
     bool record = true;  // false: rendering is off; pending resources still travel
-    uint32_t frame_number = 0;
+    uint32_t frameNumber = 0;
     // Buffers queued by other tasks (uploads, releases): they go first. Taken over.
-    BufferList resource_buffers;
+    BufferList resourceBuffers;
 };
 
 // Body of the task RecordRendering; takes the pass's dirty region and leaves it empty.

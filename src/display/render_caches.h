@@ -12,7 +12,7 @@ struct RenderCaches {
     PathCache paths;
     ScratchSurfaces scratch;
     // Dirty lists of the last frames, for the paint-rectangles highlight.
-    Vector<layout::Rect, MemoryTag::Display> highlighted;
+    Vector<layout::Rect, MemoryTag::Rendering> highlighted;
 
     // The rendering resources were freed on the render thread: ids kept here mean nothing any more.
     void ForgetResources();

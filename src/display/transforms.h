@@ -1,4 +1,7 @@
 // World transforms, bounds and scroll extents of laid-out nodes, and what of them must be painted again.
+//
+// One recursive pass from the root serves all changes: it enters only subtrees that hold a marked node or whose
+// matrices moved, and gives the same result as visiting everything. Depth is bounded by kMaxLayoutDepth.
 #pragma once
 
 #include "layout/layout_handle.h"
@@ -6,18 +9,18 @@
 
 namespace qorvex::dsp {
 
-// Runs the transform pass below the root, visiting only what is marked by MarkForTransform and the ancestors
-// of it. With `everything`, visits the whole tree; both give the same result.
-void RunTransformPass(layout::LayoutPass& pass, bool everything);
+void RunTransformPass(layout::LayoutPass& pass);
 
-// The node's box, style transform, scroll position or stacking inputs changed: the next pass visits it.
+// The node's box, style, scroll position or paint changed: the next pass visits it.
 void MarkForTransform(layout::LayoutHandle& handle);
 
-// z-index, opacity, transforms and the like decide whether a node paints its subtree as one unit.
-bool ComputeEstablishesStackingContext(const layout::LayoutNode& node);
+// The part of a node's visual bounds that its ancestors let through, as of the last pass; the whole bounds of an
+// ancestor whose filter spreads what changes below it.
+layout::Rect ClipToAncestors(const layout::LayoutNode& node);
 
-// Takes `area` of the node's children from their document coordinates to the view: world transform and clips
-// of all ancestors. Used at the commit for the area that a node covered before it changed.
-layout::Rect ClipToAncestors(const layout::LayoutNode& node, layout::Rect area);
+// The box as it is painted and transformed.
+layout::Rect PaintBox(const layout::LayoutNode& node, bool snapToPixels);
+// Where a clipping node cuts its children, before its transform.
+layout::Rect ClipBox(const layout::LayoutNode& node, bool snapToPixels);
 
 }  // namespace qorvex::dsp

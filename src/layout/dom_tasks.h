@@ -4,9 +4,8 @@
 // measure) delivers at once instead of through the channel.
 #pragma once
 
+#include "core/memory/ref_counted.h"
 #include "layout/node_link.h"
-
-#include <atomic>
 
 namespace qorvex {
 struct TaskFamilyHandle;
@@ -27,24 +26,9 @@ enum class DOMTaskKind : uint8_t {
 const char* DOMTaskName(DOMTaskKind kind);
 
 // Base of every data block; the receiver knows the concrete type from the kind.
-class DOMTaskData {
+class DOMTaskData : public AtomicRefCounted<DOMTaskData, MemoryTag::LayoutData> {
   public:
-    DOMTaskData() = default;
-    DOMTaskData(const DOMTaskData&) = delete;
-    DOMTaskData& operator=(const DOMTaskData&) = delete;
-
-    void AddRef() noexcept { count_.fetch_add(1, std::memory_order_relaxed); }
-    void Release() noexcept {
-        if (count_.fetch_sub(1, std::memory_order_acq_rel) == 1) Destroy();
-    }
-
-  protected:
     virtual ~DOMTaskData() = default;
-    // Runs the destructor and gives the memory back under the tag it came from.
-    virtual void Destroy() noexcept = 0;
-
-  private:
-    std::atomic<uint32_t> count_{0};
 };
 
 using DOMTaskDataPtr = qsl::RefPtr<DOMTaskData>;

@@ -5,27 +5,18 @@
 #include <fresco/geometry.h>
 
 #include <cmath>
-#include <cstdint>
 
 namespace qorvex::layout {
 
 using Rect = fresco::Rect;
-using Matrix = fresco::Matrix4x4;
+using Matrix = fresco::Matrix4;
+using Point = fresco::Point;
+using Size = fresco::Size;
 
 // Two lengths, opacities or rates closer than this are the same.
 inline constexpr float kLengthTolerance = 0.001f;
 // The same for matrix entries.
 inline constexpr float kMatrixTolerance = 1e-5f;
-
-struct Size {
-    float width = 0;
-    float height = 0;
-};
-
-struct Point {
-    float x = 0;
-    float y = 0;
-};
 
 struct Edges {
     float left = 0;
@@ -50,7 +41,9 @@ inline bool IsScrolled(const ScrollPosition& s) {
     return !Near(s.x, 0) || !Near(s.y, 0);
 }
 
-Rect MakeRect(float x, float y, float width, float height);
+inline Rect MakeRect(float x, float y, float width, float height) { return {x, y, 0, width, height}; }
+inline float Right(const Rect& rect) { return rect.x + rect.width; }
+inline float Bottom(const Rect& rect) { return rect.y + rect.height; }
 bool IsEmpty(const Rect& rect);
 bool Intersects(const Rect& a, const Rect& b);
 bool Contains(const Rect& outer, const Rect& inner);
@@ -63,15 +56,14 @@ Rect SnapToPixels(const Rect& rect);
 // Outward to whole pixels.
 Rect RoundOut(const Rect& rect);
 
-bool IsIdentity(const Matrix& m);
 bool Near(const Matrix& a, const Matrix& b);
-// Drops depth: the z row and the z column become those of the identity.
-void Flatten(Matrix& m);
-Matrix Translation(float x, float y, float z = 0);
-Matrix Multiply(const Matrix& a, const Matrix& b);
-// The axis-aligned bounds of a mapped rectangle. Empty when the matrix is singular or not finite, or when the
-// rectangle lies wholly behind the eye.
+// Neither depth nor perspective: what maps the plane to the plane.
+bool IsFlat(const Matrix& m);
+bool IsFinite(const Rect& rect);
+// The axis-aligned bounds of a mapped rectangle. Empty when a corner is not finite or when all of it lies behind the
+// eye; a rectangle that is cut by the plane of the eye counts as unbounded on that side.
 Rect MapBounds(const Matrix& m, const Rect& rect);
+// False for a singular matrix.
 bool Invert(const Matrix& m, Matrix& out);
 
 }  // namespace qorvex::layout

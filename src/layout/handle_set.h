@@ -3,7 +3,6 @@
 
 #include "core/memory/containers.h"
 #include "layout/layout_handle.h"
-#include "qsl/node_set.h"
 
 namespace qorvex::layout {
 
@@ -31,7 +30,7 @@ class HandleSet {
     }
 
   private:
-    qsl::NodeSet<LayoutHandle*, TaggedAllocator<MemoryTag::Layout>> set_;
+    NodeSet<LayoutHandle*, MemoryTag::LayoutNodes> set_;
 };
 
 }  // namespace qorvex::layout

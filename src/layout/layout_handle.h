@@ -9,6 +9,7 @@
 // halves return to the pools of the tree's store in one step with the handle.
 #pragma once
 
+#include "core/limits.h"
 #include "core/memory/containers.h"
 #include "css/values/layout_style_refs.h"
 #include "display/display_element.h"
@@ -31,17 +32,17 @@ class LayoutHandle;
 class LayoutStore;
 class LayoutTree;
 using HandlePtr = qsl::RefPtr<LayoutHandle>;
-using HandleVector = Vector<HandlePtr, MemoryTag::Layout>;
+using HandleVector = Vector<HandlePtr, MemoryTag::LayoutNodes>;
 
 // Facts that follow from a node's style alone. Computed on the layout side, mirrored to the DOM side.
 struct NodeFlags {
-    bool is_positioned = false;  // position is not static
-    bool is_fixed = false;
-    bool is_absolute = false;
-    bool should_overflow_clip = false;        // either overflow axis is not visible
-    bool contains_fixed_descendants = false;  // has a transform, a perspective or a filter
-    bool preserves_3d = false;
-    bool measured_by_display_element = false;
+    bool isPositioned = false;  // position is not static
+    bool isFixed = false;
+    bool isAbsolute = false;
+    bool shouldOverflowClip = false;        // either overflow axis is not visible
+    bool containsFixedDescendants = false;  // has a transform, a perspective or a filter
+    bool preserves3d = false;
+    bool measuredByDisplayElement = false;
 };
 
 // The geometry that scripts read. Left and Top are in document coordinates, before transforms and scrolling.
@@ -54,8 +55,8 @@ struct LayoutResult {
     Edges padding;
     Edges margin;
     Rect aabb{};
-    Rect visual_aabb{};
-    Size scroll_size;
+    Rect visualAabb{};
+    Size scrollSize;
 };
 
 struct LayoutData {
@@ -64,16 +65,25 @@ struct LayoutData {
     css::LayoutStyleRefs style;
     dsp::DisplayElementPtr display;
     ScrollPosition scroll;
-    Size measured_size;
+    Size measuredSize;
     NodeFlags flags;
-    bool establishes_stacking_context = false;
-    bool is_image = false;
-    int32_t z_index = 0;
+    bool establishesStackingContext = false;
+    bool isImage = false;
+    int32_t zIndex = 0;
     bool changed = false;  // an edit that the next commit must carry over
     LayoutResult result;
     NodeLinkPtr node;
-    bool in_tree = false;
+    bool inTree = false;
 };
+
+// Union of the bounds of some neighbouring children, so that one changed child of ten thousand costs the look at its
+// group and not at all its siblings.
+struct ChildGroup {
+    Rect content{};
+    Rect visual{};
+    bool dirty = true;
+};
+inline constexpr uint32_t kChildGroup = 64;
 
 struct LayoutNode {
     LayoutHandle* parent = nullptr;
@@ -82,42 +92,50 @@ struct LayoutNode {
     css::LayoutStyleRefs style;
     dsp::DisplayElementPtr display;
     ScrollPosition scroll;
+    ScrollPosition appliedScroll;  // under which the children's matrices were made
     NodeFlags flags;
-    bool transform_dirty = false;
-    bool establishes_stacking_context = false;
-    int32_t z_index = 0;
-    bool previous_stacking = false;  // as of the last SyncTrees
-    int32_t previous_z_index = 0;
+    bool transformDirty = false;
+    bool establishesStackingContext = false;
+    int32_t zIndex = 0;
+    bool previousStacking = false;  // as of the last SyncTrees
+    int32_t previousZIndex = 0;
 
     Rect box{};  // document coordinates; z and the pixel grid play no part yet
     Edges border;
     Edges padding;
     Edges margin;
-    Size scroll_size;
-    Rect aabb{};         // snapped box and in-flow overflow, document coordinates
-    Rect visual_aabb{};  // what the node and its subtree can touch, view coordinates
-    Matrix world = Matrix::Identity();
+    Size scrollSize;
+    Rect aabb{};          // snapped box and in-flow overflow, document coordinates
+    Rect paintBounds{};   // what the node's own content can touch, view coordinates
+    Rect visualAabb{};    // the same with its subtree
+    Rect contentBounds{}; // of the children: their aabb, document coordinates
+    // Bounds of kChildGroup children each, kept only by nodes with more children than that.
+    Vector<ChildGroup, MemoryTag::LayoutNodes> groups;
+    Matrix world;
     // Present only where the style needs them.
-    UniquePtr<Matrix, MemoryTag::Layout> local;
-    UniquePtr<Matrix, MemoryTag::Layout> perspective;
-    UniquePtr<dsp::ResolvedVisuals, MemoryTag::Layout> visuals;
+    UniquePtr<Matrix, MemoryTag::LayoutNodes> local;
+    UniquePtr<Matrix, MemoryTag::LayoutNodes> perspective;
+    UniquePtr<dsp::ResolvedVisuals, MemoryTag::LayoutNodes> visuals;
 
     // One frame long; SyncTrees clears them.
-    bool visual_changed = false;
-    bool rect_changed = false;
-    bool box_metrics_changed = false;
+    bool visualChanged = false;
+    bool rectChanged = false;
+    bool boxMetricsChanged = false;
 
+    // Place among the parent's children, for the bounds that the parent keeps by groups of children.
+    uint32_t index = 0;
     // Depth below the root, which is 0. Nodes at kMaxLayoutDepth and deeper keep zero boxes.
     uint32_t depth = 0;
-    // Sticky and conservative: some absolute or fixed box below has its containing block above this node.
-    bool absolute_below = false;
+    // Sticky and conservative: there is an absolute or fixed box below, whose containing block may lie above this
+    // node. When it is set here, it is set on all ancestors.
+    bool absoluteBelow = false;
     // The transform pass must look at this node, or somewhere below it.
-    bool needs_transform = true;
-    bool descendant_needs_transform = false;
-    // Recalculation of VisualAABB alone, for nodes whose paint changed but whose box did not.
-    bool needs_visual_bounds = false;
-
-    dsp::IDisplayElement* Display() const { return display.get(); }
+    bool needsTransform = true;
+    bool descendantNeedsTransform = false;
+    // The commit gave the node other children, so what their bounds add up to is not known.
+    bool childrenChanged = false;
+    // Beyond the depth limit a node takes no part in layout, transforms and painting.
+    bool IsBeyondLimit() const { return depth >= limits::kMaxLayoutDepth; }
 };
 
 class LayoutHandle {
@@ -141,7 +159,7 @@ class LayoutHandle {
     friend class LayoutStore;
     LayoutHandle() = default;
 
-    std::atomic<uint32_t> count_{0};
+    std::atomic<uint32_t> count_{1};
     LayoutStore* store_ = nullptr;
     LayoutData* data_ = nullptr;
     LayoutNode* node_ = nullptr;

@@ -19,7 +19,7 @@ struct NewNode {
     dsp::DisplayElementPtr display;
     NodeLinkPtr link;
     ScrollPosition scroll;
-    bool is_image = false;
+    bool isImage = false;
 };
 
 // Names of nodes by handle, for diagnostics and metadata; kept by the view.

@@ -1,6 +1,7 @@
 // The bodies of a frame's layout tasks. Layout thread, one task of a view at a time.
 #pragma once
 
+#include "css/values/length_context.h"
 #include "layout/layout_handle.h"
 #include "layout/layout_update.h"
 
@@ -16,25 +17,26 @@ enum class FlexAlgorithm : uint8_t {
 struct LayoutPass {
     LayoutUpdateData& update;
     LayoutHandle* root = nullptr;  // null: the document has no tree, every task does nothing
-    uint32_t view_width = 0;
-    uint32_t view_height = 0;
+    uint32_t viewWidth = 0;
+    uint32_t viewHeight = 0;
     dsp::DirtyRegion& dirty;
     FlexAlgorithm algorithm = FlexAlgorithm::Yoga;
-    bool disable_flex_basis_units = false;
+    bool disableFlexBasisUnits = false;
     // False under --dont-snap-to-integer-coords-before-transform.
-    bool snap_to_pixels = true;
+    bool snapToPixels = true;
+    // Visit the whole tree instead of what changed: after a resize, and in tests as the slow path that the fast one
+    // is compared with. PerformLayout sets it when the view or the root font changed.
+    bool everything = false;
 };
+
+// em and rem are the root's font size; em is then set per node.
+css::LengthContext MakeLengthContext(const LayoutPass& pass);
 
 // Body of the task Layout.
 void PerformLayout(LayoutPass& pass);
 // Body of the task UpdateNodeTransforms.
 void UpdateNodeTransforms(LayoutPass& pass);
-// Body of the task UpdateNodeFlags.
+// Body of the task UpdateNodeFlags. RecalculateVisualStyle (display/visual_style.h) always follows.
 void UpdateNodeFlags(LayoutPass& pass);
-// Body of the task RecalculateVisualStyle.
-void RecalculateVisualStyle(LayoutPass& pass);
-
-// Facts that follow from style alone, refreshed at the start of every pass.
-NodeFlags ComputeNodeFlags(const LayoutNode& node);
 
 }  // namespace qorvex::layout

@@ -1,0 +1,287 @@
+#include "display/transforms.h"
+
+#include "display/dirty_region.h"
+#include "display/local_transform.h"
+#include "display/resolved_visuals.h"
+#include "layout/scroll.h"
+
+#include <algorithm>
+
+namespace qorvex::dsp {
+
+using layout::ChildGroup;
+using layout::Edges;
+using layout::HandlePtr;
+using layout::kChildGroup;
+using layout::LayoutHandle;
+using layout::LayoutNode;
+using layout::LayoutPass;
+using layout::Matrix;
+using layout::Rect;
+
+namespace {
+
+Rect Outset(const Rect& rect, const Edges& by) {
+    return {rect.x - by.left, rect.y - by.top, rect.z, rect.width + by.left + by.right,
+            rect.height + by.top + by.bottom};
+}
+
+// Antialiased edges reach into the next pixel.
+Rect ToVisual(const Rect& bounds) {
+    if (layout::IsEmpty(bounds)) return {};
+    return layout::RoundOut(Outset(bounds, {1, 1, 1, 1}));
+}
+
+bool Same(const Rect& a, const Rect& b) {
+    return a.x == b.x && a.y == b.y && a.width == b.width && a.height == b.height;
+}
+bool Same(const Matrix& a, const Matrix& b) { return std::equal(a.m, a.m + 16, b.m); }
+bool Same(const layout::ScrollPosition& a, const layout::ScrollPosition& b) { return a.x == b.x && a.y == b.y; }
+
+// What a parent hands down.
+struct Above {
+    const Matrix& children;
+    layout::ScrollPosition scroll;
+    Rect clip;     // view coordinates
+    bool moved;    // the matrix or the scroll position differs from the last pass
+};
+
+struct Bounds {
+    Rect content{};  // document coordinates
+    Rect visual{};   // view coordinates
+
+    void Add(const LayoutNode& child) {
+        content = layout::Union(content, child.local ? layout::MapBounds(*child.local, child.aabb) : child.aabb);
+        visual = layout::Union(visual, child.visualAabb);
+    }
+    void Add(const ChildGroup& group) {
+        content = layout::Union(content, group.content);
+        visual = layout::Union(visual, group.visual);
+    }
+};
+
+class TransformPass {
+  public:
+    explicit TransformPass(LayoutPass& pass) : pass_(pass), lengths_(layout::MakeLengthContext(pass)) {}
+
+    // True when something of the subtree has to be painted again.
+    bool Visit(LayoutHandle& handle, const Above& above) {
+        LayoutNode& node = handle.node();
+        if (node.IsBeyondLimit()) return false;
+        const bool self = pass_.everything || above.moved || node.needsTransform;
+        if (!self && !node.descendantNeedsTransform) return false;
+        ++pass_.update.counters.transformed;
+
+        const Before before(node);
+        const Rect box = PaintBox(node, pass_.snapToPixels);
+        bool ownMatricesChanged = false;
+        if (self) {
+            UpdateStacking(node);
+            lengths_.em = node.style.text->computedFontSize;
+            ownMatricesChanged = UpdateLocalMatrices(node, box, lengths_) ||
+                                 (node.needsTransform && (node.local || node.perspective));
+            node.world = WorldOf(node, above);
+        }
+        const bool worldChanged = !Same(before.world, node.world);
+        bool dirtyBelow = UpdateChildren(node, above, worldChanged || ownMatricesChanged);
+        UpdateBounds(node, box);
+        const layout::ScrollPosition clamped = layout::ClampScroll(node.scroll, node);
+        if (!Same(clamped, node.scroll)) {
+            node.scroll = clamped;
+            dirtyBelow = UpdateChildren(node, above, true) || dirtyBelow;
+            UpdateBounds(node, box);
+        }
+        node.needsTransform = node.descendantNeedsTransform = node.childrenChanged = false;
+        UpdatePaintBounds(node, box);
+        return NoteChanges(handle, before, above, self && (above.moved || worldChanged), dirtyBelow) || dirtyBelow;
+    }
+
+  private:
+    struct Before {
+        Matrix world;
+        Rect aabb, paint, visual;
+        layout::Size scrollSize;
+        layout::ScrollPosition scroll;
+        explicit Before(const LayoutNode& node)
+            : world(node.world),
+              aabb(node.aabb),
+              paint(node.paintBounds),
+              visual(node.visualAabb),
+              scrollSize(node.scrollSize),
+              scroll(node.appliedScroll) {}
+    };
+
+    static Matrix WorldOf(const LayoutNode& node, const Above& above) {
+        Matrix world = above.children;
+        if (layout::IsScrolled(above.scroll)) {
+            world = world * fresco::TranslationMatrix(-above.scroll.x, -above.scroll.y);
+        }
+        return node.local ? world * *node.local : world;
+    }
+
+    static Matrix ChildrenMatrix(const LayoutNode& node) {
+        Matrix children = node.world;
+        if (!node.flags.preserves3d && !layout::IsFlat(children)) children = fresco::Flattened(children);
+        return node.perspective ? children * *node.perspective : children;
+    }
+
+    bool UpdateChildren(LayoutNode& node, const Above& above, bool matricesChanged) {
+        if (node.children.empty()) {
+            node.contentBounds = {};
+            childrenVisual_ = {};
+            return false;
+        }
+        const bool scrolled = !Same(node.scroll, node.appliedScroll);
+        node.appliedScroll = node.scroll;
+        const Matrix children = ChildrenMatrix(node);
+        Above below{children, node.scroll, above.clip, above.moved || matricesChanged || scrolled};
+        if (node.flags.shouldOverflowClip) {
+            const Rect clip = layout::RoundOut(layout::MapBounds(node.world, ClipBox(node, pass_.snapToPixels)));
+            below.clip = layout::Intersection(below.clip, clip);
+        }
+        Bounds bounds;
+        const bool dirty = node.children.size() <= kChildGroup ? UpdateFewChildren(node, below, bounds)
+                                                               : UpdateChildGroups(node, below, bounds);
+        node.contentBounds = bounds.content;
+        childrenVisual_ = bounds.visual;
+        return dirty;
+    }
+
+    bool UpdateFewChildren(LayoutNode& node, const Above& below, Bounds& bounds) {
+        bool dirty = false;
+        for (const HandlePtr& child : node.children) {
+            dirty = Visit(*child, below) || dirty;
+            bounds.Add(child->node());
+        }
+        return dirty;
+    }
+
+    bool UpdateChildGroups(LayoutNode& node, const Above& below, Bounds& bounds) {
+        const uint32_t count = node.children.size();
+        const uint32_t groups = (count + kChildGroup - 1) / kChildGroup;
+        const bool all = below.moved || pass_.everything || node.groups.size() != groups;
+        node.groups.resize(groups);
+        bool dirty = false;
+        for (uint32_t g = 0; g < groups; ++g) {
+            if (all || node.groups[g].dirty) {
+                Bounds group;
+                const uint32_t end = std::min((g + 1) * kChildGroup, count);
+                for (uint32_t i = g * kChildGroup; i < end; ++i) {
+                    dirty = Visit(*node.children[i], below) || dirty;
+                    group.Add(node.children[i]->node());
+                }
+                node.groups[g] = {group.content, group.visual, false};
+            }
+            bounds.Add(node.groups[g]);
+        }
+        return dirty;
+    }
+
+    static void UpdateBounds(LayoutNode& node, const Rect& box) {
+        const bool overflows = !node.flags.shouldOverflowClip && !layout::IsEmpty(node.contentBounds);
+        node.aabb = overflows ? layout::Union(box, node.contentBounds) : box;
+        node.scrollSize = {node.contentBounds.width, node.contentBounds.height};
+    }
+
+    void UpdatePaintBounds(LayoutNode& node, const Rect& box) {
+        Rect reach = box;
+        Rect subtree = childrenVisual_;
+        if (node.flags.shouldOverflowClip && !layout::IsEmpty(subtree)) {
+            const Rect clip = layout::MapBounds(node.world, ClipBox(node, pass_.snapToPixels));
+            subtree = layout::Intersection(subtree, layout::RoundOut(clip));
+        }
+        if (node.display) {
+            const float ink = node.display->InkOverflow();
+            reach = Outset(reach, {ink, ink, ink, ink});
+        }
+        if (node.visuals) reach = Outset(reach, PaintOutset(*node.visuals));
+        node.paintBounds = ToVisual(layout::MapBounds(node.world, reach));
+        node.visualAabb = layout::Union(node.paintBounds, subtree);
+        if (node.visuals && !node.visuals->filters.empty() && !layout::IsEmpty(node.visualAabb)) {
+            node.visualAabb = layout::RoundOut(Outset(node.visualAabb, FilterReach(node)));
+        }
+    }
+
+    // The filter's reach under the node's transform; the largest scale stands for all directions.
+    static Edges FilterReach(const LayoutNode& node) {
+        const float* m = node.world.m;
+        const float scale = std::max({std::hypot(m[0], m[1]), std::hypot(m[4], m[5]), 1e-3f});
+        const Edges reach = FilterOutset(*node.visuals);
+        const float largest = scale * std::max({reach.left, reach.right, reach.top, reach.bottom});
+        return {largest, largest, largest, largest};
+    }
+
+    bool NoteChanges(LayoutHandle& handle, const Before& before, const Above& above, bool moved, bool dirtyBelow) {
+        LayoutNode& node = handle.node();
+        const bool stacking = node.establishesStackingContext != node.previousStacking ||
+                              node.zIndex != node.previousZIndex;
+        const bool scrolls = !layout::Near(before.scrollSize.width, node.scrollSize.width) ||
+                             !layout::Near(before.scrollSize.height, node.scrollSize.height) ||
+                             !Same(before.scroll, node.scroll);
+        const bool paints = node.visualChanged || stacking || moved || node.rectChanged || node.boxMetricsChanged ||
+                            !Same(before.paint, node.paintBounds);
+        const bool bounds = !Same(before.visual, node.visualAabb) || !Same(before.aabb, node.aabb);
+        if (paints) node.visualChanged = true;
+        if (paints || bounds || scrolls) pass_.update.updated.Insert(&handle);
+
+        const bool spreads = node.visuals && !node.visuals->filters.empty();
+        if (!paints && !(spreads && dirtyBelow)) return false;
+        // A node that paints as a unit may show any change of its own on all of its subtree.
+        const bool unit = spreads || node.establishesStackingContext || node.previousStacking ||
+                          node.flags.shouldOverflowClip;
+        pass_.dirty.Add(layout::Intersection(unit ? before.visual : before.paint, above.clip));
+        pass_.dirty.Add(layout::Intersection(unit ? node.visualAabb : node.paintBounds, above.clip));
+        return true;
+    }
+
+    LayoutPass& pass_;
+    css::LengthContext lengths_;
+    // Of the children of the node that was updated last.
+    Rect childrenVisual_{};
+};
+
+}  // namespace
+
+void RunTransformPass(LayoutPass& pass) {
+    if (pass.root == nullptr) return;
+    const Matrix identity;
+    const Rect view{0, 0, 0, static_cast<float>(pass.viewWidth), static_cast<float>(pass.viewHeight)};
+    TransformPass(pass).Visit(*pass.root, {identity, {}, view, false});
+}
+
+void MarkForTransform(LayoutHandle& handle) {
+    handle.node().needsTransform = true;
+    uint32_t index = handle.node().index;
+    for (LayoutHandle* parent = handle.node().parent; parent != nullptr; parent = parent->node().parent) {
+        LayoutNode& node = parent->node();
+        const uint32_t group = index / kChildGroup;
+        const bool groupKnown = group >= node.groups.size() || node.groups[group].dirty;
+        if (group < node.groups.size()) node.groups[group].dirty = true;
+        if (node.descendantNeedsTransform && groupKnown) break;
+        node.descendantNeedsTransform = true;
+        index = node.index;
+    }
+}
+
+Rect PaintBox(const LayoutNode& node, bool snapToPixels) {
+    return snapToPixels ? layout::SnapToPixels(node.box) : node.box;
+}
+
+Rect ClipBox(const LayoutNode& node, bool snapToPixels) {
+    return layout::Inset(PaintBox(node, snapToPixels), node.border);
+}
+
+Rect ClipToAncestors(const LayoutNode& node) {
+    Rect area = node.visualAabb;
+    for (const LayoutHandle* above = node.parent; above != nullptr; above = above->node().parent) {
+        const LayoutNode& parent = above->node();
+        if (parent.flags.shouldOverflowClip) {
+            area = layout::Intersection(area, layout::RoundOut(layout::MapBounds(parent.world, ClipBox(parent, true))));
+        }
+        const bool spreads = parent.visuals && !parent.visuals->filters.empty();
+        if (spreads && !layout::IsEmpty(area)) area = parent.visualAabb;
+    }
+    return area;
+}
+
+}  // namespace qorvex::dsp

@@ -1,0 +1,100 @@
+// The crossing from the DOM side to the layout side: runs on the DOM thread while no layout task of the view runs.
+#include "css/values/style_groups.h"
+#include "display/dirty_region.h"
+#include "display/transforms.h"
+#include "layout/debug_names.h"
+#include "layout/flex_children.h"
+#include "layout/layout_store.h"
+#include "layout/layout_tree.h"
+
+#include <yoga/Yoga.h>
+
+#include <algorithm>
+
+namespace qorvex::layout {
+
+namespace {
+
+bool Written(const css::LayoutStyleRefs& style, css::StyleGroup group) {
+    return style.written[static_cast<size_t>(group)] != 0;
+}
+
+bool SameChildren(const HandleVector& a, const HandleVector& b) {
+    return a.size() == b.size() && std::equal(a.begin(), a.end(), b.begin());
+}
+
+// A handle that left the tree keeps nothing of it, so that it may be attached anywhere or die alone.
+void Sever(LayoutHandle& handle) {
+    LayoutNode& node = handle.node();
+    node.parent = nullptr;
+    node.children.clear();
+    node.groups.clear();
+    node.depth = 0;
+    node.absoluteBelow = false;
+    node.paintBounds = node.visualAabb = {};
+    if (YGNode* owner = YGNodeGetOwner(node.flex)) YGNodeRemoveChild(owner, node.flex);
+    YGNodeRemoveAllChildren(node.flex);
+}
+
+void CopyToLayoutSide(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
+    LayoutData& data = handle.data();
+    LayoutNode& node = handle.node();
+    data.changed = data.changed || Written(data.style, css::StyleGroup::Visual) ||
+                   Written(data.style, css::StyleGroup::TextLayout);
+    if (data.changed && data.inTree && dirty != nullptr) {
+        dirty->Add(dsp::ClipToAncestors(node));
+    }
+    node.style = data.style;
+    node.display = data.display;
+    node.scroll = data.scroll;
+    node.flags = data.flags;
+    node.zIndex = data.zIndex;
+    node.parent = data.parent;
+    // A layout or transform value may change paint order and stacking although every box stays.
+    node.visualChanged = node.visualChanged || data.changed || Written(data.style, css::StyleGroup::Layout) ||
+                         Written(data.style, css::StyleGroup::Transform);
+    // Text, its font or its element changed: the cached size may be wrong.
+    if (data.changed && YGNodeHasMeasureFunc(node.flex)) YGNodeMarkDirty(node.flex);
+    data.changed = false;
+    data.style.written.fill(0);
+    if (!SameChildren(node.children, data.children)) {
+        node.children = data.children;
+        // The bounds by groups are made anew: any child may have moved to another one.
+        node.groups.clear();
+        node.childrenChanged = true;
+    }
+}
+
+}  // namespace
+
+void LayoutTree::Commit(LayoutUpdateData& update, dsp::DirtyRegion* dirty, DebugNames* names) {
+    removed_.ForEach([&](LayoutHandle& handle) {
+        if (names != nullptr) names->Erase(&handle);
+        changed_.Erase(&handle);
+        // The bounds of a subtree's root cover the subtree.
+        LayoutHandle* parent = handle.node().parent;
+        if (parent == nullptr || parent->data().inTree) update.vanished.Add(dsp::ClipToAncestors(handle.node()));
+    });
+    changed_.ForEach([&](LayoutHandle& handle) {
+        CopyToLayoutSide(handle, dirty);
+        if (names != nullptr && handle.data().node) names->Set(&handle, handle.data().node->DebugName());
+        ++update.counters.committed;
+    });
+    // Child lists and depths need the parents of all handles in place.
+    changed_.ForEach([](LayoutHandle& handle) {
+        UpdateDepths(handle);
+        SyncFlexChildren(handle);
+    });
+    removed_.ForEach([](LayoutHandle& handle) { Sever(handle); });
+    changed_.ForEach([](LayoutHandle& handle) { dsp::MarkForTransform(handle); });
+    // Two commits may meet before one layout ran; nothing of the first may be lost.
+    if (update.changed.Empty()) {
+        update.changed.Swap(changed_);
+    } else {
+        changed_.ForEach([&](LayoutHandle& handle) { update.changed.Insert(&handle); });
+    }
+    changed_.Clear();
+    removed_.Clear();
+}
+
+}  // namespace qorvex::layout

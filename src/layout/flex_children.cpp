@@ -1,0 +1,82 @@
+#include "layout/flex_children.h"
+
+#include "core/logging/log.h"
+#include "core/memory/temp_vector.h"
+#include "layout/flex_measure.h"
+#include "layout/layout_store.h"
+
+#include <yoga/Yoga.h>
+
+#include <algorithm>
+
+namespace qorvex::layout {
+
+namespace {
+
+// Measured nodes are leaves to Yoga, and so is the last level that takes part in layout.
+uint32_t FlexChildCount(const LayoutNode& node) {
+    const bool leaf = node.flags.measuredByDisplayElement || node.depth + 1 >= limits::kMaxLayoutDepth;
+    return leaf ? 0 : static_cast<uint32_t>(node.children.size());
+}
+
+void ReportDepth(LayoutHandle& handle) {
+    if (handle.store().reportedDepth) return;
+    handle.store().reportedDepth = true;
+    LogWarning("Elements are nested deeper than ", limits::kMaxLayoutDepth,
+               " levels; deeper ones are not laid out.");
+}
+
+}  // namespace
+
+void SyncFlexChildren(LayoutHandle& handle) {
+    LayoutNode& node = handle.node();
+    YGNode* owner = node.flex;
+    if (!node.flags.measuredByDisplayElement) YGNodeSetMeasureFunc(owner, nullptr);
+    const uint32_t wanted = FlexChildCount(node);
+    if (wanted == 0 && !node.children.empty() && !node.flags.measuredByDisplayElement) ReportDepth(handle);
+    uint32_t present = static_cast<uint32_t>(YGNodeGetChildCount(owner));
+    uint32_t prefix = 0;
+    while (prefix < wanted && prefix < present &&
+           YGNodeGetChild(owner, prefix) == node.children[prefix]->node().flex)
+        ++prefix;
+    uint32_t suffix = 0;
+    while (suffix < wanted - prefix && suffix < present - prefix &&
+           YGNodeGetChild(owner, present - 1 - suffix) == node.children[wanted - 1 - suffix]->node().flex)
+        ++suffix;
+    if (prefix == 0 && suffix == 0 && present > 0) {
+        // One pass instead of one search a child.
+        YGNodeRemoveAllChildren(owner);
+        present = 0;
+    }
+    for (uint32_t i = present - suffix; i-- > prefix;)
+        YGNodeRemoveChild(owner, YGNodeGetChild(owner, i));
+    for (uint32_t i = prefix; i < wanted - suffix; ++i) {
+        YGNode* child = node.children[i]->node().flex;
+        // A child that moved here may still stand in its former parent's list, whose turn comes later.
+        if (YGNode* former = YGNodeGetOwner(child)) YGNodeRemoveChild(former, child);
+        YGNodeInsertChild(owner, child, i);
+    }
+    if (node.flags.measuredByDisplayElement && !YGNodeHasMeasureFunc(owner))
+        YGNodeSetMeasureFunc(owner, MeasureFlexNode);
+}
+
+void UpdateDepths(LayoutHandle& handle) {
+    const TempMark mark;
+    TempVector<LayoutHandle*> stack;
+    stack.push_back(&handle);
+    while (!stack.empty()) {
+        LayoutHandle* parent = stack.back();
+        stack.pop_back();
+        LayoutNode& node = parent->node();
+        for (uint32_t i = 0; i < node.children.size(); ++i) {
+            LayoutNode& child = node.children[i]->node();
+            child.index = i;
+            if (child.depth == node.depth + 1) continue;
+            child.depth = node.depth + 1;
+            stack.push_back(node.children[i].get());
+        }
+        if (parent != &handle) SyncFlexChildren(*parent);
+    }
+}
+
+}  // namespace qorvex::layout

@@ -1,0 +1,125 @@
+#include "layout/flex_results.h"
+
+#include "core/memory/temp_vector.h"
+#include "display/transforms.h"
+
+#include <yoga/Yoga.h>
+
+namespace qorvex::layout {
+
+namespace {
+
+float Finite(float value) { return std::isfinite(value) ? value : 0; }
+
+struct Entry {
+    LayoutHandle* handle;
+    LayoutHandle* fixedContainer;
+    Point origin;           // of the parent's box, in the document
+    bool containerChanged;  // a containing block above was laid out anew or moved
+};
+
+void CopyEdges(YGNodeConstRef flex, float (*get)(YGNodeConstRef, YGEdge), Edges& out) {
+    out.left = Finite(get(flex, YGEdgeLeft));
+    out.right = Finite(get(flex, YGEdgeRight));
+    out.top = Finite(get(flex, YGEdgeTop));
+    out.bottom = Finite(get(flex, YGEdgeBottom));
+}
+
+void CopyMetrics(LayoutNode& node) {
+    node.box.width = Finite(YGNodeLayoutGetWidth(node.flex));
+    node.box.height = Finite(YGNodeLayoutGetHeight(node.flex));
+    CopyEdges(node.flex, YGNodeLayoutGetBorder, node.border);
+    CopyEdges(node.flex, YGNodeLayoutGetPadding, node.padding);
+    CopyEdges(node.flex, YGNodeLayoutGetMargin, node.margin);
+}
+
+// The box that a fixed node is placed in: the padding box of its container, or the view.
+Rect FixedContainingBox(const Entry& entry, const LayoutPass& pass) {
+    if (entry.fixedContainer == nullptr)
+        return {0, 0, 0, static_cast<float>(pass.viewWidth), static_cast<float>(pass.viewHeight)};
+    const LayoutNode& container = entry.fixedContainer->node();
+    return Inset(container.box, container.border);
+}
+
+bool IsInset(YGNodeConstRef flex, YGEdge edge) { return !std::isnan(YGNodeStyleGetPosition(flex, edge).value); }
+
+// Yoga has no fixed position: it placed the box as an absolute one, in a box that is not the one meant. Insets are in
+// pixels by now (flex_style.cpp), so the place follows from them; without insets the static place stands.
+void PlaceFixed(LayoutNode& node, const Rect& in, Point origin) {
+    const YGNodeConstRef flex = node.flex;
+    node.box.x = origin.x + Finite(YGNodeLayoutGetLeft(flex));
+    node.box.y = origin.y + Finite(YGNodeLayoutGetTop(flex));
+    if (IsInset(flex, YGEdgeLeft)) {
+        node.box.x = in.x + YGNodeStyleGetPosition(flex, YGEdgeLeft).value + node.margin.left;
+    } else if (IsInset(flex, YGEdgeRight)) {
+        node.box.x = Right(in) - YGNodeStyleGetPosition(flex, YGEdgeRight).value - node.margin.right - node.box.width;
+    }
+    if (IsInset(flex, YGEdgeTop)) {
+        node.box.y = in.y + YGNodeStyleGetPosition(flex, YGEdgeTop).value + node.margin.top;
+    } else if (IsInset(flex, YGEdgeBottom)) {
+        node.box.y =
+            Bottom(in) - YGNodeStyleGetPosition(flex, YGEdgeBottom).value - node.margin.bottom - node.box.height;
+    }
+}
+
+void Place(const Entry& entry, LayoutPass& pass) {
+    LayoutNode& node = entry.handle->node();
+    if (node.flags.isFixed) {
+        PlaceFixed(node, FixedContainingBox(entry, pass), entry.origin);
+        return;
+    }
+    // Yoga gives every other box relative to its parent, absolute ones too: it knows their containing block, since
+    // static boxes are static to it.
+    node.box.x = entry.origin.x + Finite(YGNodeLayoutGetLeft(node.flex));
+    node.box.y = entry.origin.y + Finite(YGNodeLayoutGetTop(node.flex));
+}
+
+}  // namespace
+
+void NoteBoxChange(LayoutHandle& handle, const OldBox& old, LayoutPass& pass) {
+    LayoutNode& node = handle.node();
+    ++pass.update.counters.laidOut;
+    const bool metrics = !Near(old.box.width, node.box.width) || !Near(old.box.height, node.box.height) ||
+                         !Near(old.border, node.border) || !Near(old.padding, node.padding);
+    if (metrics) node.boxMetricsChanged = true;
+    const bool moved = !Near(SnapToPixels(old.box), SnapToPixels(node.box));
+    if (moved) node.rectChanged = true;
+    const bool shifted = old.box.x != node.box.x || old.box.y != node.box.y;
+    if (!metrics && !moved && !shifted) return;
+    pass.update.updated.Insert(&handle);
+    dsp::MarkForTransform(handle);
+}
+
+void ReadYogaResults(const FlexReadRoot& root, LayoutPass& pass) {
+    const TempMark mark;
+    TempVector<Entry> queue;
+    queue.push_back({root.handle, root.fixedContainer, root.origin, root.everything});
+    for (uint32_t next = 0; next < queue.size(); ++next) {
+        const Entry entry = queue[next];
+        LayoutNode& node = entry.handle->node();
+        const OldBox old(node);
+        const bool isNew = YGNodeGetHasNewLayout(node.flex);
+        if (isNew) {
+            CopyMetrics(node);
+            YGNodeSetHasNewLayout(node.flex, false);
+        }
+        Place(entry, pass);
+        const bool moved = node.box.x != old.box.x || node.box.y != old.box.y;
+        if (isNew || moved) NoteBoxChange(*entry.handle, old, pass);
+
+        const bool descend =
+            root.everything || isNew || moved || (entry.containerChanged && node.absoluteBelow);
+        if (!descend || YGNodeGetChildCount(node.flex) == 0) continue;
+        Entry child = entry;
+        child.origin = {node.box.x, node.box.y};
+        if (node.flags.containsFixedDescendants) child.fixedContainer = entry.handle;
+        // Sticky: a nearer container that stayed does not tell what a farther one, of a fixed box, did.
+        child.containerChanged = entry.containerChanged || isNew || moved;
+        for (const HandlePtr& handle : node.children) {
+            child.handle = handle.get();
+            queue.push_back(child);
+        }
+    }
+}
+
+}  // namespace qorvex::layout

@@ -1,0 +1,272 @@
+#include "layout/flex_style.h"
+
+#include "core/logging/log.h"
+#include "layout/node_flags.h"
+
+#include <yoga/Yoga.h>
+
+#include <array>
+#include <cmath>
+
+namespace qorvex::layout {
+
+using css::Extent;
+using css::LayoutStyle;
+using css::Length;
+using css::LengthContext;
+using css::LengthUnit;
+
+namespace {
+
+constexpr std::array kFlexDirections = {YGFlexDirectionRow, YGFlexDirectionRowReverse, YGFlexDirectionColumn,
+                                        YGFlexDirectionColumnReverse};
+constexpr std::array kJustifyContent = {YGJustifyFlexStart, YGJustifyFlexEnd, YGJustifyCenter,
+                                        YGJustifySpaceBetween, YGJustifySpaceAround};
+constexpr std::array kAlignItems = {YGAlignFlexStart, YGAlignCenter, YGAlignFlexEnd, YGAlignStretch};
+constexpr std::array kAlignSelf = {YGAlignAuto, YGAlignFlexStart, YGAlignCenter, YGAlignFlexEnd, YGAlignStretch};
+constexpr std::array kFlexWraps = {YGWrapNoWrap, YGWrapWrap, YGWrapWrapReverse};
+
+template <typename Values, typename Code>
+auto Pick(const Values& values, Code code) {
+    const auto index = static_cast<size_t>(code);
+    return values[index < values.size() ? index : 0];
+}
+
+// Yoga computes in floats and tests for "undefined" by NaN; what a page may write is kept where neither breaks.
+float Sane(float value) {
+    constexpr float kLargest = 1e7f;
+    return std::isnan(value) ? value : std::fmin(std::fmax(value, -kLargest), kLargest);
+}
+
+// The three forms of a Yoga length setter.
+struct LengthSetter {
+    void (*points)(YGNodeRef, float);
+    void (*percent)(YGNodeRef, float);
+    void (*unset)(YGNodeRef);
+};
+
+void SetLength(YGNodeRef node, const LengthSetter& setter, const Extent& extent, const LengthContext& lengths) {
+    if (extent.IsLength() && extent.unit == LengthUnit::Percent) {
+        setter.percent(node, Sane(extent.value));
+        return;
+    }
+    const float value = ResolveExtent(extent, lengths, css::kNoPercentBase, YGUndefined);
+    if (std::isnan(value)) {
+        setter.unset(node);
+    } else {
+        setter.points(node, Sane(value));
+    }
+}
+
+constexpr LengthSetter kWidth = {YGNodeStyleSetWidth, YGNodeStyleSetWidthPercent, YGNodeStyleSetWidthAuto};
+constexpr LengthSetter kHeight = {YGNodeStyleSetHeight, YGNodeStyleSetHeightPercent, YGNodeStyleSetHeightAuto};
+#define QORVEX_LIMIT_SETTER(Name)                                    \
+    constexpr LengthSetter k##Name = {YGNodeStyleSet##Name, YGNodeStyleSet##Name##Percent, \
+                                      [](YGNodeRef node) { YGNodeStyleSet##Name(node, YGUndefined); }};
+QORVEX_LIMIT_SETTER(MinWidth)
+QORVEX_LIMIT_SETTER(MinHeight)
+QORVEX_LIMIT_SETTER(MaxWidth)
+QORVEX_LIMIT_SETTER(MaxHeight)
+#undef QORVEX_LIMIT_SETTER
+
+void SyncContainer(YGNodeRef node, const LayoutStyle& style, css::TextAlignType align) {
+    YGFlexDirection direction = YGFlexDirectionColumn;
+    YGJustify justify = YGJustifyFlexStart;
+    YGAlign items = YGAlignStretch;
+    switch (style.display) {
+        case css::CSSDisplay::Flex:
+            direction = Pick(kFlexDirections, style.flexDirection);
+            justify = Pick(kJustifyContent, style.justifyContent);
+            items = Pick(kAlignItems, style.alignItems);
+            break;
+        case css::CSSDisplay::Inline:
+            direction = YGFlexDirectionRow;
+            if (align == css::TextAlignType::Right) justify = YGJustifyFlexEnd;
+            if (align == css::TextAlignType::Center) justify = YGJustifyCenter;
+            break;
+        default:
+            if (align == css::TextAlignType::Right) items = YGAlignFlexEnd;
+            if (align == css::TextAlignType::Center) items = YGAlignCenter;
+            break;
+    }
+    YGNodeStyleSetFlexDirection(node, direction);
+    YGNodeStyleSetJustifyContent(node, justify);
+    YGNodeStyleSetAlignItems(node, items);
+    YGNodeStyleSetAlignSelf(node, Pick(kAlignSelf, style.alignSelf));
+    YGNodeStyleSetAlignContent(node, Pick(kAlignItems, style.alignContent));
+    YGNodeStyleSetFlexWrap(node, Pick(kFlexWraps, style.flexWrap));
+}
+
+void SyncFlex(YGNodeRef node, const css::CSSFlexValue& flex, const FlexStyleContext& context) {
+    float grow = 0;
+    float shrink = 0;
+    const bool hasBasis = flex.basisKind == css::FlexBasisKind::Length;
+    if (flex.hasGrow) {
+        grow = flex.grow;
+        shrink = flex.hasShrink ? flex.shrink : 1;
+    } else if (hasBasis) {
+        grow = shrink = 1;
+    }
+    YGNodeStyleSetFlexGrow(node, Sane(grow));
+    YGNodeStyleSetFlexShrink(node, Sane(shrink));
+    if (!hasBasis) {
+        // A factor without a basis has the basis 0 (CSS Flexible Box Layout, section 7.1.1).
+        const bool omitted = flex.hasGrow && flex.basisKind == css::FlexBasisKind::Initial;
+        omitted ? YGNodeStyleSetFlexBasis(node, 0) : YGNodeStyleSetFlexBasisAuto(node);
+    } else if (context.disableFlexBasisUnits) {
+        YGNodeStyleSetFlexBasis(node, Sane(flex.basis.value));
+    } else if (flex.basis.unit == LengthUnit::Percent) {
+        YGNodeStyleSetFlexBasisPercent(node, Sane(flex.basis.value));
+    } else {
+        YGNodeStyleSetFlexBasis(node, Sane(ResolveLength(flex.basis, context.lengths)));
+    }
+}
+
+using EdgeSetter = void (*)(YGNodeRef, YGEdge, float);
+
+void SetEdge(YGNodeRef node, EdgeSetter points, EdgeSetter percent, YGEdge edge, const Extent& extent,
+             const LengthContext& lengths) {
+    if (extent.IsLength() && extent.unit == LengthUnit::Percent) {
+        percent(node, edge, Sane(extent.value));
+    } else {
+        // There are no auto margins in this layout.
+        points(node, edge, Sane(ResolveExtent(extent, lengths, css::kNoPercentBase, 0)));
+    }
+}
+
+void SyncEdges(YGNodeRef node, const LayoutStyle& style, const LengthContext& lengths) {
+    const Edges border = ResolveBorders(style, lengths);
+    YGNodeStyleSetBorder(node, YGEdgeLeft, Sane(border.left));
+    YGNodeStyleSetBorder(node, YGEdgeTop, Sane(border.top));
+    YGNodeStyleSetBorder(node, YGEdgeRight, Sane(border.right));
+    YGNodeStyleSetBorder(node, YGEdgeBottom, Sane(border.bottom));
+
+    auto margin = [&](YGEdge edge, const Extent& value) {
+        SetEdge(node, YGNodeStyleSetMargin, YGNodeStyleSetMarginPercent, edge, value, lengths);
+    };
+    margin(YGEdgeLeft, style.marginLeft);
+    margin(YGEdgeTop, style.marginTop);
+    margin(YGEdgeRight, style.marginRight);
+    margin(YGEdgeBottom, style.marginBottom);
+    auto padding = [&](YGEdge edge, const Length& value) {
+        SetEdge(node, YGNodeStyleSetPadding, YGNodeStyleSetPaddingPercent, edge, Extent::Of(value), lengths);
+    };
+    padding(YGEdgeLeft, style.paddingLeft);
+    padding(YGEdgeTop, style.paddingTop);
+    padding(YGEdgeRight, style.paddingRight);
+    padding(YGEdgeBottom, style.paddingBottom);
+}
+
+// A fixed box is laid out against the view, which Yoga does not know as its containing block: percentages become
+// pixels here, and ReadYogaResults places the box.
+Extent AgainstView(const Extent& extent, float viewSize) {
+    if (!extent.IsLength() || extent.unit != LengthUnit::Percent) return extent;
+    return Extent::Pixels(extent.value / 100 * viewSize);
+}
+
+void SyncInset(YGNodeRef node, YGEdge edge, const Extent& extent, const LayoutNode& layoutNode, float viewSize,
+               const LengthContext& lengths) {
+    if (!layoutNode.flags.isPositioned) {
+        YGNodeStyleSetPosition(node, edge, YGUndefined);
+        return;
+    }
+    const bool isPercent = extent.IsLength() && extent.unit == LengthUnit::Percent;
+    if (isPercent && !layoutNode.flags.isFixed) {
+        YGNodeStyleSetPositionPercent(node, edge, Sane(extent.value));
+        return;
+    }
+    if (isPercent) {
+        LogWarning(
+            "Using % values with position:fixed is not supported. Percents will be calculated against viewport.");
+    }
+    YGNodeStyleSetPosition(node, edge, Sane(ResolveExtent(extent, lengths, viewSize, YGUndefined)));
+}
+
+void SyncPosition(YGNodeRef node, const LayoutNode& layoutNode, const LayoutStyle& style, const FlexStyleContext& c) {
+    const float viewWidth = c.lengths.vw * 100;
+    const float viewHeight = c.lengths.vh * 100;
+    SyncInset(node, YGEdgeLeft, style.left, layoutNode, viewWidth, c.lengths);
+    SyncInset(node, YGEdgeRight, style.right, layoutNode, viewWidth, c.lengths);
+    SyncInset(node, YGEdgeTop, style.top, layoutNode, viewHeight, c.lengths);
+    SyncInset(node, YGEdgeBottom, style.bottom, layoutNode, viewHeight, c.lengths);
+}
+
+// Opposite insets of a fixed box with an auto size give its size, as they do for an absolute one.
+Extent FixedSize(const Extent& size, const Extent& start, const Extent& end, float viewSize,
+                 const LengthContext& lengths) {
+    if (size.IsLength() || !start.IsLength() || !end.IsLength()) return AgainstView(size, viewSize);
+    const float taken = ResolveExtent(start, lengths, viewSize, 0) + ResolveExtent(end, lengths, viewSize, 0);
+    return Extent::Pixels(std::fmax(viewSize - taken, 0.0f));
+}
+
+void SyncSizes(YGNodeRef node, const LayoutNode& layoutNode, const LayoutStyle& style, const LengthContext& lengths) {
+    if (layoutNode.flags.isFixed) {
+        const float viewWidth = lengths.vw * 100;
+        const float viewHeight = lengths.vh * 100;
+        SetLength(node, kWidth, FixedSize(style.width, style.left, style.right, viewWidth, lengths), lengths);
+        SetLength(node, kHeight, FixedSize(style.height, style.top, style.bottom, viewHeight, lengths), lengths);
+        SetLength(node, kMinWidth, AgainstView(style.minWidth, viewWidth), lengths);
+        SetLength(node, kMinHeight, AgainstView(style.minHeight, viewHeight), lengths);
+        SetLength(node, kMaxWidth, AgainstView(style.maxWidth, viewWidth), lengths);
+        SetLength(node, kMaxHeight, AgainstView(style.maxHeight, viewHeight), lengths);
+        return;
+    }
+    SetLength(node, kWidth, style.width, lengths);
+    SetLength(node, kHeight, style.height, lengths);
+    SetLength(node, kMinWidth, style.minWidth, lengths);
+    SetLength(node, kMinHeight, style.minHeight, lengths);
+    SetLength(node, kMaxWidth, style.maxWidth, lengths);
+    SetLength(node, kMaxHeight, style.maxHeight, lengths);
+}
+
+// Static boxes are static in Yoga too: an absolute box is then laid out against its nearest ancestor that is not.
+// The root always is one.
+YGPositionType PositionType(const LayoutNode& node, bool isRoot) {
+    if (isRoot) return YGPositionTypeRelative;
+    if (node.flags.isFixed || node.flags.isAbsolute) return YGPositionTypeAbsolute;
+    return node.flags.isPositioned ? YGPositionTypeRelative : YGPositionTypeStatic;
+}
+
+// See LayoutNode::absoluteBelow.
+void MarkAbsoluteBelow(const LayoutNode& node) {
+    if (!node.flags.isFixed && !node.flags.isAbsolute && !node.absoluteBelow) return;
+    for (LayoutHandle* parent = node.parent; parent != nullptr; parent = parent->node().parent) {
+        LayoutNode& above = parent->node();
+        if (above.absoluteBelow) break;
+        above.absoluteBelow = true;
+    }
+}
+
+}  // namespace
+
+Edges ResolveBorders(const LayoutStyle& style, const LengthContext& lengths) {
+    auto width = [&](const css::BorderWidth& border, css::BorderStyleType type) {
+        return type >= css::BorderStyleType::Dotted ? ResolveBorderWidth(border, lengths) : 0.0f;
+    };
+    return {width(style.borderLeftWidth, style.borderLeftStyle),
+            width(style.borderRightWidth, style.borderRightStyle),
+            width(style.borderTopWidth, style.borderTopStyle),
+            width(style.borderBottomWidth, style.borderBottomStyle)};
+}
+
+void SyncStyleToYoga(LayoutHandle& handle, FlexStyleContext& context) {
+    LayoutNode& layoutNode = handle.node();
+    YGNodeRef node = layoutNode.flex;
+    const LayoutStyle& style = *layoutNode.style.layout;
+    RefreshNodeFlags(layoutNode);
+    if (style.display == css::CSSDisplay::None) {
+        YGNodeStyleSetDisplay(node, YGDisplayNone);
+        return;
+    }
+    context.lengths.em = layoutNode.style.text->computedFontSize;
+    YGNodeStyleSetDisplay(node, YGDisplayFlex);
+    YGNodeStyleSetPositionType(node, PositionType(layoutNode, &handle == context.root));
+    SyncContainer(node, style, layoutNode.style.text->textAlign);
+    SyncFlex(node, style.flex, context);
+    SyncEdges(node, style, context.lengths);
+    SyncSizes(node, layoutNode, style, context.lengths);
+    SyncPosition(node, layoutNode, style, context);
+    MarkAbsoluteBelow(layoutNode);
+}
+
+}  // namespace qorvex::layout

@@ -1,0 +1,148 @@
+#include "layout/geometry.h"
+
+#include <algorithm>
+#include <limits>
+
+namespace qorvex::layout {
+
+bool Near(const Rect& a, const Rect& b) {
+    return Near(a.x, b.x) && Near(a.y, b.y) && Near(a.width, b.width) && Near(a.height, b.height);
+}
+
+bool IsEmpty(const Rect& rect) { return !(rect.width > 0 && rect.height > 0); }
+
+bool IsFinite(const Rect& rect) {
+    return std::isfinite(rect.x) && std::isfinite(rect.y) && std::isfinite(rect.width) &&
+           std::isfinite(rect.height);
+}
+
+bool Intersects(const Rect& a, const Rect& b) {
+    return a.x < Right(b) && b.x < Right(a) && a.y < Bottom(b) && b.y < Bottom(a);
+}
+
+bool Contains(const Rect& outer, const Rect& inner) {
+    return outer.x <= inner.x && outer.y <= inner.y && Right(outer) >= Right(inner) &&
+           Bottom(outer) >= Bottom(inner);
+}
+
+Rect Union(const Rect& a, const Rect& b) {
+    if (IsEmpty(a)) return b;
+    if (IsEmpty(b)) return a;
+    const float x = std::min(a.x, b.x);
+    const float y = std::min(a.y, b.y);
+    return {x, y, 0, std::max(Right(a), Right(b)) - x, std::max(Bottom(a), Bottom(b)) - y};
+}
+
+Rect Intersection(const Rect& a, const Rect& b) {
+    const float x = std::max(a.x, b.x);
+    const float y = std::max(a.y, b.y);
+    const float width = std::min(Right(a), Right(b)) - x;
+    const float height = std::min(Bottom(a), Bottom(b)) - y;
+    if (!(width > 0 && height > 0)) return {};
+    return {x, y, 0, width, height};
+}
+
+Rect Inset(const Rect& rect, const Edges& edges) {
+    return {rect.x + edges.left, rect.y + edges.top, rect.z, std::max(rect.width - edges.left - edges.right, 0.0f),
+            std::max(rect.height - edges.top - edges.bottom, 0.0f)};
+}
+
+Rect SnapToPixels(const Rect& rect) {
+    const float fractionX = rect.x - std::trunc(rect.x);
+    const float fractionY = rect.y - std::trunc(rect.y);
+    return {std::round(rect.x), std::round(rect.y), rect.z,
+            std::round(fractionX + rect.width) - std::round(fractionX),
+            std::round(fractionY + rect.height) - std::round(fractionY)};
+}
+
+Rect RoundOut(const Rect& rect) {
+    const float x = std::floor(rect.x);
+    const float y = std::floor(rect.y);
+    return {x, y, rect.z, std::ceil(Right(rect)) - x, std::ceil(Bottom(rect)) - y};
+}
+
+bool Near(const Matrix& a, const Matrix& b) {
+    for (int i = 0; i < 16; ++i) {
+        if (!(std::fabs(a.m[i] - b.m[i]) <= kMatrixTolerance)) return false;
+    }
+    return true;
+}
+
+bool IsFlat(const Matrix& m) {
+    return m.m[2] == 0 && m.m[3] == 0 && m.m[6] == 0 && m.m[7] == 0 && m.m[8] == 0 && m.m[9] == 0 &&
+           m.m[10] == 1 && m.m[11] == 0 && m.m[14] == 0 && m.m[15] == 1;
+}
+
+Rect MapBounds(const Matrix& m, const Rect& rect) {
+    const float corners[4][2] = {{rect.x, rect.y},
+                                 {Right(rect), rect.y},
+                                 {Right(rect), Bottom(rect)},
+                                 {rect.x, Bottom(rect)}};
+    constexpr float kHuge = 1e9f;
+    // Points nearer to the eye than this project so far away that only the direction counts.
+    constexpr float kNearEye = 1e-4f;
+    float low[2] = {kHuge, kHuge};
+    float high[2] = {-kHuge, -kHuge};
+    float mapped[4][3];
+    bool any = false;
+    for (int i = 0; i < 4; ++i) {
+        const float x = corners[i][0], y = corners[i][1];
+        mapped[i][0] = m.m[0] * x + m.m[4] * y + m.m[8] * rect.z + m.m[12];
+        mapped[i][1] = m.m[1] * x + m.m[5] * y + m.m[9] * rect.z + m.m[13];
+        mapped[i][2] = m.m[3] * x + m.m[7] * y + m.m[11] * rect.z + m.m[15];
+    }
+    auto take = [&](float x, float y, float w) {
+        const float point[2] = {x / w, y / w};
+        for (int axis = 0; axis < 2; ++axis) {
+            low[axis] = std::min(low[axis], point[axis]);
+            high[axis] = std::max(high[axis], point[axis]);
+        }
+        any = any || (std::isfinite(point[0]) && std::isfinite(point[1]));
+    };
+    for (int i = 0; i < 4; ++i) {
+        const float* a = mapped[i];
+        const float* b = mapped[(i + 1) % 4];
+        if (a[2] > kNearEye) take(a[0], a[1], a[2]);
+        // An edge through the plane of the eye: take the point just in front of it.
+        if ((a[2] > kNearEye) != (b[2] > kNearEye)) {
+            const float t = (kNearEye - a[2]) / (b[2] - a[2]);
+            take(a[0] + t * (b[0] - a[0]), a[1] + t * (b[1] - a[1]), kNearEye);
+        }
+    }
+    if (!any) return {};
+    const Rect bounds{low[0], low[1], 0, high[0] - low[0], high[1] - low[1]};
+    return IsFinite(bounds) ? bounds : Rect{};
+}
+
+bool Invert(const Matrix& m, Matrix& out) {
+    // Gauss-Jordan with partial pivoting; only used where a pointer or a surface goes back through a transform.
+    double a[4][8] = {};
+    for (int row = 0; row < 4; ++row) {
+        for (int column = 0; column < 4; ++column)
+            a[row][column] = m.m[column * 4 + row];
+        a[row][4 + row] = 1;
+    }
+    for (int column = 0; column < 4; ++column) {
+        int pivot = column;
+        for (int row = column + 1; row < 4; ++row) {
+            if (std::fabs(a[row][column]) > std::fabs(a[pivot][column])) pivot = row;
+        }
+        if (!(std::fabs(a[pivot][column]) > 1e-12)) return false;
+        std::swap(a[pivot], a[column]);
+        const double scale = 1 / a[column][column];
+        for (double& value : a[column])
+            value *= scale;
+        for (int row = 0; row < 4; ++row) {
+            const double factor = row == column ? 0 : a[row][column];
+            for (int k = 0; k < 8 && factor != 0; ++k)
+                a[row][k] -= factor * a[column][k];
+        }
+    }
+    for (int row = 0; row < 4; ++row) {
+        for (int column = 0; column < 4; ++column)
+            out.m[column * 4 + row] = static_cast<float>(a[row][4 + column]);
+    }
+    return true;
+}
+
+}  // namespace qorvex::layout

@@ -1,0 +1,124 @@
+#include "layout/layout_tree.h"
+
+#include "core/memory/temp_vector.h"
+#include "display/dirty_region.h"
+#include "layout/layout_store.h"
+
+#include <algorithm>
+
+namespace qorvex::layout {
+
+LayoutTree::LayoutTree() : store_(MakeRef<LayoutStore>()) {}
+
+LayoutTree::~LayoutTree() { Clear(nullptr); }
+
+HandlePtr LayoutTree::Create(NewNode&& node) {
+    HandlePtr handle = store_->MakeHandle();
+    LayoutData& data = handle->data();
+    data.style = node.style;
+    // The first commit carries everything.
+    data.style.written.fill(1);
+    data.display = std::move(node.display);
+    data.node = std::move(node.link);
+    data.scroll = node.scroll;
+    data.isImage = node.isImage;
+    data.flags.measuredByDisplayElement = data.display && data.display->Has(dsp::IDisplayElement::kMeasures);
+    data.changed = true;
+    changed_.Insert(handle.get());
+    return handle;
+}
+
+HandlePtr LayoutTree::CreateRoot(NewNode&& node) {
+    Clear(nullptr);
+    root_ = Create(std::move(node));
+    root_->data().inTree = true;
+    if (root_->data().node) root_->data().node->SetInLayoutTree(true);
+    return root_;
+}
+
+HandlePtr LayoutTree::AddChild(LayoutHandle& parent, uint32_t index, NewNode&& node) {
+    HandlePtr handle = Create(std::move(node));
+    Attach(*handle, parent, index);
+    return handle;
+}
+
+void LayoutTree::Attach(LayoutHandle& handle, LayoutHandle& parent, uint32_t index) {
+    LayoutData& data = handle.data();
+    if (data.inTree) Remove(handle, nullptr);
+    HandleVector& siblings = parent.data().children;
+    siblings.insert(siblings.begin() + std::min<uint32_t>(index, siblings.size()), HandlePtr(&handle));
+    data.parent = &parent;
+    data.inTree = true;
+    data.changed = true;
+    if (data.node) data.node->SetInLayoutTree(true);
+    removed_.Erase(&handle);
+    changed_.Insert(&handle);
+    changed_.Insert(&parent);
+}
+
+// The whole subtree falls apart into single handles: each of its nodes is attached again, if at all, by itself, and
+// no handle is left that points at a parent which may die before it.
+void LayoutTree::Remove(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
+    if (!handle.data().inTree) return;
+    if (LayoutHandle* parent = handle.data().parent) {
+        HandleVector& siblings = parent->data().children;
+        for (uint32_t i = siblings.size(); i-- > 0;) {
+            if (siblings[i].get() != &handle) continue;
+            removed_.Insert(&handle);
+            siblings.erase(siblings.begin() + i);
+            break;
+        }
+        changed_.Insert(parent);
+    }
+    const TempMark mark;
+    TempVector<LayoutHandle*> queue;
+    removed_.Insert(&handle);
+    queue.push_back(&handle);
+    for (uint32_t next = 0; next < queue.size(); ++next) {
+        LayoutData& data = queue[next]->data();
+        if (dirty != nullptr) dirty->Add(data.result.visualAabb);
+        data.inTree = false;
+        data.parent = nullptr;
+        if (data.node) data.node->SetInLayoutTree(false);
+        for (HandlePtr& child : data.children) {
+            removed_.Insert(child.get());
+            queue.push_back(child.get());
+        }
+        data.children.clear();
+    }
+    if (root_ == &handle) root_.reset();
+}
+
+void LayoutTree::Clear(dsp::DirtyRegion* dirty) {
+    if (root_) Remove(*root_, dirty);
+    root_.reset();
+    changed_.Clear();
+}
+
+void LayoutTree::MarkChanged(LayoutHandle& handle) {
+    handle.data().changed = true;
+    changed_.Insert(&handle);
+}
+
+void LayoutTree::UpdateStyle(LayoutHandle& handle, const css::LayoutStyleRefs& style) {
+    LayoutData& data = handle.data();
+    const auto pending = data.style.written;
+    data.style = style;
+    for (size_t i = 0; i < pending.size(); ++i)
+        data.style.written[i] |= pending[i] | style.written[i];
+    changed_.Insert(&handle);
+}
+
+void LayoutTree::SetScroll(LayoutHandle& handle, ScrollPosition scroll) {
+    handle.data().scroll = scroll;
+    MarkChanged(handle);
+}
+
+void LayoutTree::SetDisplayElement(LayoutHandle& handle, dsp::DisplayElementPtr display) {
+    LayoutData& data = handle.data();
+    data.display = std::move(display);
+    data.flags.measuredByDisplayElement = data.display && data.display->Has(dsp::IDisplayElement::kMeasures);
+    MarkChanged(handle);
+}
+
+}  // namespace qorvex::layout

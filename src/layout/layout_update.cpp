@@ -1,0 +1,37 @@
+#include "layout/layout_update.h"
+
+#include "core/logging/log.h"
+#include "layout/scroll.h"
+
+namespace qorvex::layout {
+
+void SyncTrees(LayoutUpdateData& update) {
+    LogTrace("Synchronizing layout tree to main");
+    update.updated.ForEach([](LayoutHandle& handle) {
+        LayoutNode& node = handle.node();
+        LayoutData& data = handle.data();
+        LayoutResult& result = data.result;
+        result.left = node.box.x;
+        result.top = node.box.y;
+        result.width = node.box.width;
+        result.height = node.box.height;
+        result.border = node.border;
+        result.padding = node.padding;
+        result.margin = node.margin;
+        result.scrollSize = node.scrollSize;
+        result.aabb = node.aabb;
+        result.visualAabb = node.visualAabb;
+        data.scroll = ClampScroll(data.scroll, node);
+        data.flags = node.flags;
+        data.establishesStackingContext = node.establishesStackingContext;
+        data.zIndex = node.zIndex;
+        node.visualChanged = false;
+        node.rectChanged = false;
+        node.boxMetricsChanged = false;
+        node.transformDirty = false;
+        node.previousStacking = node.establishesStackingContext;
+        node.previousZIndex = node.zIndex;
+    });
+}
+
+}  // namespace qorvex::layout

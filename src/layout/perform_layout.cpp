@@ -1,0 +1,99 @@
+#include "layout/perform_layout.h"
+
+#include "core/logging/log.h"
+#include "core/memory/temp_vector.h"
+#include "css/values/length_context.h"
+#include "display/transforms.h"
+#include "layout/flex_measure.h"
+#include "layout/flex_results.h"
+#include "layout/flex_style.h"
+#include "layout/layout_store.h"
+#include "layout/node_flags.h"
+#include "layout/simple_layout.h"
+
+#include <yoga/Yoga.h>
+
+namespace qorvex::layout {
+
+namespace {
+
+// Everything that a style resolves against besides itself; when it differs from the last layout's, no style that was
+// written then holds any more.
+bool TakeMetrics(LayoutPass& pass, LayoutStore::Engine engine) {
+    LayoutStore& store = pass.root->store();
+    const LayoutStore::Metrics now{pass.viewWidth, pass.viewHeight,
+                                   pass.root->node().style.text->computedFontSize};
+    const bool same = store.metrics == now && store.engine == engine;
+    store.metrics = now;
+    store.engine = engine;
+    return !same;
+}
+
+void SyncAllStyles(LayoutPass& pass, FlexStyleContext& context) {
+    const TempMark mark;
+    TempVector<LayoutHandle*> stack;
+    stack.push_back(pass.root);
+    while (!stack.empty()) {
+        LayoutHandle* handle = stack.back();
+        stack.pop_back();
+        SyncStyleToYoga(*handle, context);
+        ++pass.update.counters.synced;
+        if (YGNodeGetChildCount(handle->node().flex) == 0) continue;
+        for (const HandlePtr& child : handle->node().children)
+            stack.push_back(child.get());
+    }
+}
+
+void PerformFlexLayout(LayoutPass& pass, const css::LengthContext& lengths) {
+    FlexStyleContext context{lengths, pass.disableFlexBasisUnits, pass.root};
+    if (pass.everything) {
+        SyncAllStyles(pass, context);
+    } else {
+        pass.update.changed.ForEach([&](LayoutHandle& handle) {
+            SyncStyleToYoga(handle, context);
+            ++pass.update.counters.synced;
+        });
+    }
+    YGNodeCalculateLayout(pass.root->node().flex, static_cast<float>(pass.viewWidth),
+                          static_cast<float>(pass.viewHeight), YGDirectionLTR);
+    pass.update.counters.measured += TakeMeasureCount();
+    ReadYogaResults({pass.root, nullptr, {}, pass.everything}, pass);
+}
+
+}  // namespace
+
+css::LengthContext MakeLengthContext(const LayoutPass& pass) {
+    const float rem = pass.root->node().style.text->computedFontSize;
+    return {static_cast<float>(pass.viewWidth) / 100, static_cast<float>(pass.viewHeight) / 100, rem, rem, 0};
+}
+
+void PerformLayout(LayoutPass& pass) {
+    LogTrace("Performing layout");
+    if (pass.root == nullptr) return;
+    const css::LengthContext lengths = MakeLengthContext(pass);
+    const bool simple = pass.update.bodyDisplay == css::CSSDisplay::Simple;
+    using Engine = LayoutStore::Engine;
+    if (TakeMetrics(pass, simple ? Engine::Simple : Engine::Flex)) pass.everything = true;
+    if (simple) {
+        PerformSimpleLayout(pass, lengths, pass.everything);
+    } else if (pass.algorithm != FlexAlgorithm::Internal) {
+        PerformFlexLayout(pass, lengths);
+    } else {
+        // The styles of this frame were not written; the next run of Yoga has to catch up.
+        pass.root->store().engine = Engine::None;
+    }
+    dsp::RunTransformPass(pass);
+}
+
+void UpdateNodeTransforms(LayoutPass& pass) {
+    LogTrace("Performing node transforms update");
+    if (pass.root == nullptr) return;
+    pass.update.changed.ForEach([](LayoutHandle& handle) { RefreshNodeFlags(handle.node()); });
+    dsp::RunTransformPass(pass);
+}
+
+void UpdateNodeFlags(LayoutPass& pass) {
+    pass.update.changed.ForEach([](LayoutHandle& handle) { RefreshNodeFlags(handle.node()); });
+}
+
+}  // namespace qorvex::layout

@@ -1,0 +1,25 @@
+#include "layout/scroll.h"
+
+#include <cmath>
+
+namespace qorvex::layout {
+
+namespace {
+
+float ClampAxis(float position, float scrollSize, float clientSize) {
+    const float room = scrollSize - clientSize;
+    const float limit = scrollSize > 0 && std::fabs(room) > kLengthTolerance ? room : 0;
+    if (position > limit) position = limit;
+    return position > 0 ? position : 0;
+}
+
+}  // namespace
+
+ScrollPosition ClampScroll(ScrollPosition position, const LayoutNode& node) {
+    if (!node.flags.shouldOverflowClip) return {};
+    const Rect client = Inset(node.box, node.border);
+    return {ClampAxis(position.x, node.scrollSize.width, client.width),
+            ClampAxis(position.y, node.scrollSize.height, client.height)};
+}
+
+}  // namespace qorvex::layout

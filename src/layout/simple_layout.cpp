@@ -1,0 +1,197 @@
+#include "layout/simple_layout.h"
+
+#include "core/memory/temp_vector.h"
+#include "layout/flex_measure.h"
+#include "layout/flex_results.h"
+#include "layout/flex_style.h"
+#include "layout/node_flags.h"
+
+#include <yoga/Yoga.h>
+
+#include <limits>
+
+namespace qorvex::layout {
+
+using css::LayoutStyle;
+using css::LengthContext;
+using css::ResolveExtent;
+using css::ResolveLength;
+
+namespace {
+
+constexpr float kUnknown = std::numeric_limits<float>::quiet_NaN();
+
+struct Containers {
+    const LayoutNode* positioned;  // null only for the root
+    LayoutHandle* fixed;           // null: the view
+};
+
+Rect ContainingBox(const LayoutNode& node, const Containers& in, const LengthContext& lengths) {
+    if (node.flags.isFixed) {
+        if (in.fixed != nullptr) return Inset(in.fixed->node().box, in.fixed->node().border);
+        return {0, 0, 0, lengths.vw * 100, lengths.vh * 100};
+    }
+    if (node.flags.isAbsolute && in.positioned != nullptr) return Inset(in.positioned->box, in.positioned->border);
+    if (node.parent == nullptr) return {0, 0, 0, lengths.vw * 100, lengths.vh * 100};
+    const LayoutNode& parent = node.parent->node();
+    return Inset(Inset(parent.box, parent.border), parent.padding);
+}
+
+void ResolveEdges(LayoutNode& node, const LayoutStyle& style, const LengthContext& lengths, float base) {
+    node.border = ResolveBorders(style, lengths);
+    // Stored for scripts; in this engine margins move nothing.
+    node.margin = {ResolveExtent(style.marginLeft, lengths, base, 0),
+                   ResolveExtent(style.marginRight, lengths, base, 0),
+                   ResolveExtent(style.marginTop, lengths, base, 0),
+                   ResolveExtent(style.marginBottom, lengths, base, 0)};
+    node.padding = {ResolveLength(style.paddingLeft, lengths, base), ResolveLength(style.paddingRight, lengths, base),
+                    ResolveLength(style.paddingTop, lengths, base),
+                    ResolveLength(style.paddingBottom, lengths, base)};
+}
+
+Point PlaceIn(const Rect& in, const LayoutNode& node, const LayoutStyle& style, const LengthContext& lengths) {
+    Point place{in.x, in.y};
+    if (!node.flags.isPositioned) return place;
+    place.x += ResolveExtent(style.left, lengths, in.width, 0);
+    place.y += ResolveExtent(style.top, lengths, in.height, 0);
+    return place;
+}
+
+float AtLeastZero(float value) { return value > 0 ? value : 0; }
+
+// Extents of the in-flow children add up, although the children overlap.
+void FitAutoSizes(LayoutNode& node, const LayoutStyle& style) {
+    if (node.flags.measuredByDisplayElement) return;
+    if (style.width.IsLength() && style.height.IsLength()) return;
+    Size sum{node.padding.left + node.padding.right + node.border.left + node.border.right,
+             node.padding.top + node.padding.bottom + node.border.top + node.border.bottom};
+    for (const HandlePtr& child : node.children) {
+        const LayoutNode& flow = child->node();
+        if (flow.flags.isAbsolute || flow.flags.isFixed) continue;
+        sum.width += flow.box.width;
+        sum.height += flow.box.height;
+    }
+    if (!style.width.IsLength()) node.box.width = sum.width;
+    if (!style.height.IsLength()) node.box.height = sum.height;
+}
+
+void LayoutSimpleSubtree(LayoutHandle& handle, LayoutPass& pass, LengthContext lengths, Containers in) {
+    LayoutNode& node = handle.node();
+    if (node.IsBeyondLimit()) return;
+    RefreshNodeFlags(node);
+    const LayoutStyle& style = *node.style.layout;
+    const OldBox old(node);
+    lengths.em = node.style.text->computedFontSize;
+    const Rect containing = ContainingBox(node, in, lengths);
+    ResolveEdges(node, style, lengths, containing.width);
+    const Point place = PlaceIn(containing, node, style, lengths);
+    node.box.x = place.x;
+    node.box.y = place.y;
+    if (node.flags.measuredByDisplayElement) {
+        Size size;
+        node.display->Measure(handle, kUnknown, kUnknown, dsp::MeasureMode::Undefined, dsp::MeasureMode::Undefined,
+                              size);
+        ++pass.update.counters.measured;
+        node.box.width = AtLeastZero(size.width);
+        node.box.height = AtLeastZero(size.height);
+    } else {
+        node.box.width = AtLeastZero(ResolveExtent(style.width, lengths, containing.width, 0));
+        node.box.height = AtLeastZero(ResolveExtent(style.height, lengths, containing.height, 0));
+    }
+    const Containers below{node.flags.isPositioned || in.positioned == nullptr ? &node : in.positioned,
+                           node.flags.containsFixedDescendants ? &handle : in.fixed};
+    for (const HandlePtr& child : node.children) {
+        LayoutNode& childNode = child->node();
+        if (childNode.style.layout->display != css::CSSDisplay::Flex) {
+            LayoutSimpleSubtree(*child, pass, lengths, below);
+            continue;
+        }
+        RefreshNodeFlags(childNode);
+        LengthContext own = lengths;
+        own.em = childNode.style.text->computedFontSize;
+        const Rect box = ContainingBox(childNode, below, own);
+        LayoutFlexInSimple(lengths, pass, *child, PlaceIn(box, childNode, *childNode.style.layout, own), below.fixed);
+    }
+    FitAutoSizes(node, style);
+    NoteBoxChange(handle, old, pass);
+}
+
+// The top-most changed handle on the way from `handle` to the root, and the containers above it.
+LayoutHandle* TopMostChanged(LayoutHandle& handle, const LayoutPass& pass) {
+    LayoutHandle* top = &handle;
+    for (LayoutHandle* parent = handle.node().parent; parent != nullptr; parent = parent->node().parent) {
+        const LayoutNode& node = parent->node();
+        // Inside a flex element the run of Yoga begins at that element.
+        if (pass.update.changed.Contains(parent) || node.style.layout->display == css::CSSDisplay::Flex) top = parent;
+    }
+    return top;
+}
+
+Containers ContainersAbove(const LayoutHandle& handle, const LayoutPass& pass) {
+    Containers found{nullptr, nullptr};
+    for (LayoutHandle* parent = handle.node().parent; parent != nullptr; parent = parent->node().parent) {
+        const LayoutNode& node = parent->node();
+        if (found.positioned == nullptr && node.flags.isPositioned) found.positioned = &node;
+        if (found.fixed == nullptr && node.flags.containsFixedDescendants) found.fixed = parent;
+    }
+    if (found.positioned == nullptr && &handle != pass.root) found.positioned = &pass.root->node();
+    return found;
+}
+
+void LayoutFrom(LayoutHandle& handle, LayoutPass& pass, const LengthContext& lengths) {
+    const Containers above = ContainersAbove(handle, pass);
+    LayoutNode& node = handle.node();
+    if (node.style.layout->display != css::CSSDisplay::Flex) {
+        LayoutSimpleSubtree(handle, pass, lengths, above);
+        return;
+    }
+    RefreshNodeFlags(node);
+    LengthContext own = lengths;
+    own.em = node.style.text->computedFontSize;
+    const Point place = PlaceIn(ContainingBox(node, above, own), node, *node.style.layout, own);
+    LayoutFlexInSimple(lengths, pass, handle, place, above.fixed);
+}
+
+}  // namespace
+
+void PerformSimpleLayout(LayoutPass& pass, const LengthContext& lengths, bool everything) {
+    pass.update.changed.ForEach([](LayoutHandle& handle) { RefreshNodeFlags(handle.node()); });
+    if (everything) {
+        LayoutFrom(*pass.root, pass, lengths);
+        return;
+    }
+    HandleSet done;
+    pass.update.changed.ForEach([&](LayoutHandle& handle) {
+        LayoutHandle* top = TopMostChanged(handle, pass);
+        if (done.Contains(pass.root) || !done.Insert(top)) return;
+        LayoutFrom(*top, pass, lengths);
+    });
+}
+
+void LayoutFlexInSimple(const LengthContext& lengths, LayoutPass& pass, LayoutHandle& handle, Point place,
+                        LayoutHandle* fixedContainer) {
+    FlexStyleContext context{lengths, false, pass.root};
+    const bool everything = pass.everything;
+    const TempMark mark;
+    TempVector<LayoutHandle*> queue;
+    queue.push_back(&handle);
+    for (uint32_t next = 0; next < queue.size(); ++next) {
+        LayoutHandle* current = queue[next];
+        if (everything || pass.update.changed.Contains(current)) {
+            SyncStyleToYoga(*current, context);
+            ++pass.update.counters.synced;
+        }
+        if (YGNodeGetChildCount(current->node().flex) == 0) continue;
+        for (const HandlePtr& child : current->node().children)
+            queue.push_back(child.get());
+    }
+    YGNodeRef flex = handle.node().flex;
+    YGNodeCalculateLayout(flex, YGUndefined, YGUndefined, YGDirectionLTR);
+    pass.update.counters.measured += TakeMeasureCount();
+    // The element itself stands where the simple engine puts it; the rest follows relative to it.
+    FlexReadRoot root{&handle, fixedContainer, {}, everything};
+    root.origin = {place.x - YGNodeLayoutGetLeft(flex), place.y - YGNodeLayoutGetTop(flex)};
+    ReadYogaResults(root, pass);
+}
+
+}  // namespace qorvex::layout
