@@ -29,4 +29,9 @@ inline constexpr size_t kStringPoolBlockBytes = 512;
 /// Object pools of a process; a thread's cache has one list for each.
 inline constexpr size_t kObjectPools = 32;
 
+/// Levels of nesting that take part in layout and painting, whose passes recurse; deeper content keeps empty boxes.
+/// The flex engine takes up to 10 KB of stack a level in a checked build, so this fits the 8 MB of a usual thread; web
+/// browsers cut documents at the same depth.
+inline constexpr uint32_t kMaxLayoutDepth = 512;
+
 }  // namespace qorvex::limits
