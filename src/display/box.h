@@ -39,7 +39,6 @@ class Box : public IDisplayElement {
                               fresco::CommandBuffer& buffer);
 
   private:
-
     ImageSlots background_;
     ImageSlots border_image_;
     UniquePtr<ImageSlots, MemoryTag::Rendering> mask_;

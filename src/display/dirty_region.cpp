@@ -46,7 +46,9 @@ void DirtyRegion::Add(const DirtyRegion& other) {
         Add(rect);
 }
 
-bool DirtyRegion::HasArea() const { return count_ > 0 && bounds_.width * bounds_.height > kMinArea; }
+bool DirtyRegion::HasArea() const {
+    return count_ > 0 && bounds_.width * bounds_.height > kMinArea;
+}
 
 void DirtyRegion::Clear() {
     count_ = 0;

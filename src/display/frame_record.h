@@ -32,8 +32,7 @@ struct FrameRecord {
 
     // Nothing to paint and nothing pending: the frame completes without a paint task.
     bool Empty() const {
-        return buffers.empty() && resourceBuffers.empty() && surfacesToFree.empty() &&
-               imagesToFree.empty();
+        return buffers.empty() && resourceBuffers.empty() && surfacesToFree.empty() && imagesToFree.empty();
     }
     void ReleaseBuffers();
 };

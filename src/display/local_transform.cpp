@@ -45,18 +45,33 @@ Matrix StepMatrix(const TransformOperation& step, const Rect& box, const LengthC
     auto z = [&](int i) { return ResolveLength(step.lengths[i], lengths); };
     Matrix result;
     switch (step.kind) {
-        case TransformKind::TranslateX: return TranslationMatrix(x(0), 0);
-        case TransformKind::TranslateY: return TranslationMatrix(0, y(0));
-        case TransformKind::TranslateZ: return TranslationMatrix(0, 0, z(0));
-        case TransformKind::Translate3d: return TranslationMatrix(x(0), y(1), z(2));
-        case TransformKind::RotateX: return RotationAround(1, 0, 0, n[0]);
-        case TransformKind::RotateY: return RotationAround(0, 1, 0, n[0]);
-        case TransformKind::RotateZ: return RotationAround(0, 0, 1, n[0]);
-        case TransformKind::Rotate3d: return RotationAround(n[0], n[1], n[2], n[3]);
-        case TransformKind::Scale3d: return fresco::ScaleMatrix(n[0], n[1], n[2]);
-        case TransformKind::SkewX: result.m[4] = std::tan(n[0] * kRadiansPerDegree); return result;
-        case TransformKind::SkewY: result.m[1] = std::tan(n[0] * kRadiansPerDegree); return result;
-        case TransformKind::Matrix: std::copy(n, n + 16, result.m); return result;
+        case TransformKind::TranslateX:
+            return TranslationMatrix(x(0), 0);
+        case TransformKind::TranslateY:
+            return TranslationMatrix(0, y(0));
+        case TransformKind::TranslateZ:
+            return TranslationMatrix(0, 0, z(0));
+        case TransformKind::Translate3d:
+            return TranslationMatrix(x(0), y(1), z(2));
+        case TransformKind::RotateX:
+            return RotationAround(1, 0, 0, n[0]);
+        case TransformKind::RotateY:
+            return RotationAround(0, 1, 0, n[0]);
+        case TransformKind::RotateZ:
+            return RotationAround(0, 0, 1, n[0]);
+        case TransformKind::Rotate3d:
+            return RotationAround(n[0], n[1], n[2], n[3]);
+        case TransformKind::Scale3d:
+            return fresco::ScaleMatrix(n[0], n[1], n[2]);
+        case TransformKind::SkewX:
+            result.m[4] = std::tan(n[0] * kRadiansPerDegree);
+            return result;
+        case TransformKind::SkewY:
+            result.m[1] = std::tan(n[0] * kRadiansPerDegree);
+            return result;
+        case TransformKind::Matrix:
+            std::copy(n, n + 16, result.m);
+            return result;
     }
     return result;
 }
@@ -119,14 +134,15 @@ bool UpdateLocalMatrices(LayoutNode& node, const Rect& box, const LengthContext&
 void UpdateStacking(LayoutNode& node) {
     const css::VisualStyle& visual = *node.style.visual;
     const css::TransformStyle& transform = *node.style.transform;
-    const bool flexItem = node.parent != nullptr &&
-                          node.parent->node().style.layout->display == css::CSSDisplay::Flex;
+    const bool flexItem =
+        node.parent != nullptr && node.parent->node().style.layout->display == css::CSSDisplay::Flex;
     const bool hasZIndex =
         transform.zIndex.kind == css::ZIndexKind::Value && (node.flags.isPositioned || flexItem);
     node.zIndex = hasZIndex ? transform.zIndex.value : 0;
     node.establishesStackingContext =
-        hasZIndex || !transform.transform.empty() || transform.perspective.kind != css::PerspectiveKind::None ||
-        visual.opacity.value < 1 || visual.maskImage.kind > css::ImageKind::Initial || !visual.clipPath.IsNone() ||
+        hasZIndex || !transform.transform.empty() ||
+        transform.perspective.kind != css::PerspectiveKind::None || visual.opacity.value < 1 ||
+        visual.maskImage.kind > css::ImageKind::Initial || !visual.clipPath.IsNone() ||
         !visual.filter.empty() || visual.isolation == css::IsolationType::Isolate ||
         visual.mixBlendMode != css::BlendModeType::Normal || !visual.compositionId.empty() ||
         !visual.customEffectName.empty();

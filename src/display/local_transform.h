@@ -8,7 +8,8 @@ namespace qorvex::dsp {
 
 // Both matrices work in document coordinates. They are absent where the style asks for none.
 // True when either changed, appeared or went.
-bool UpdateLocalMatrices(layout::LayoutNode& node, const layout::Rect& box, const css::LengthContext& lengths);
+bool UpdateLocalMatrices(layout::LayoutNode& node, const layout::Rect& box,
+                         const css::LengthContext& lengths);
 
 // z-index where it applies, and whether the node paints its subtree as one unit.
 void UpdateStacking(layout::LayoutNode& node);

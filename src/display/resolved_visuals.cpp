@@ -19,10 +19,13 @@ bool NearItem(const ResolvedShadow& a, const ResolvedShadow& b) {
 bool NearItem(const FilterExtent& a, const FilterExtent& b) {
     return Near(a.x, b.x) && Near(a.y, b.y) && Near(a.blurX, b.blurX) && Near(a.blurY, b.blurY);
 }
-bool NearPoint(layout::Point a, layout::Point b) { return Near(a.x, b.x) && Near(a.y, b.y); }
+bool NearPoint(layout::Point a, layout::Point b) {
+    return Near(a.x, b.x) && Near(a.y, b.y);
+}
 bool NearItem(const ResolvedImageLayer& a, const ResolvedImageLayer& b) {
     return Near(a.tile, b.tile) && Near(a.spacingX, b.spacingX) && Near(a.spacingY, b.spacingY) &&
-           a.repeatX == b.repeatX && a.repeatY == b.repeatY && NearPoint(a.start, b.start) && NearPoint(a.end, b.end);
+           a.repeatX == b.repeatX && a.repeatY == b.repeatY && NearPoint(a.start, b.start) &&
+           NearPoint(a.end, b.end);
 }
 template <typename T>
 bool NearList(const ResolvedVisuals::List<T>& a, const ResolvedVisuals::List<T>& b) {

@@ -1,5 +1,5 @@
-// Paint values of one node in pixels, resolved from its visual style against its box. Only nodes that need any of
-// them have the record.
+// Paint values of one node in pixels, resolved from its visual style against its box. Only nodes that need
+// any of them have the record.
 #pragma once
 
 #include "core/memory/containers.h"
@@ -24,16 +24,16 @@ struct FilterExtent {
     float blurY = 0;
 };
 
-// One layer of a background: where its first tile lies, relative to the border box, and how it repeats. The size is
-// 0 while an image has not told its own.
+// One layer of a background: where its first tile lies, relative to the border box, and how it repeats. The
+// size is 0 while an image has not told its own.
 struct ResolvedImageLayer {
     layout::Rect tile{};
     float spacingX = 0;
     float spacingY = 0;
     bool repeatX = false;
     bool repeatY = false;
-    // Of a gradient: start and end of a linear one, centre and half axes of a radial one, in units of the larger side
-    // of the tile.
+    // Of a gradient: start and end of a linear one, centre and half axes of a radial one, in units of the
+    // larger side of the tile.
     layout::Point start{};
     layout::Point end{};
 };

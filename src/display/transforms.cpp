@@ -35,15 +35,19 @@ Rect ToVisual(const Rect& bounds) {
 bool Same(const Rect& a, const Rect& b) {
     return a.x == b.x && a.y == b.y && a.width == b.width && a.height == b.height;
 }
-bool Same(const Matrix& a, const Matrix& b) { return std::equal(a.m, a.m + 16, b.m); }
-bool Same(const layout::ScrollPosition& a, const layout::ScrollPosition& b) { return a.x == b.x && a.y == b.y; }
+bool Same(const Matrix& a, const Matrix& b) {
+    return std::equal(a.m, a.m + 16, b.m);
+}
+bool Same(const layout::ScrollPosition& a, const layout::ScrollPosition& b) {
+    return a.x == b.x && a.y == b.y;
+}
 
 // What a parent hands down.
 struct Above {
     const Matrix& children;
     layout::ScrollPosition scroll;
-    Rect clip;     // view coordinates
-    bool moved;    // the matrix or the scroll position differs from the last pass
+    Rect clip;   // view coordinates
+    bool moved;  // the matrix or the scroll position differs from the last pass
 };
 
 struct Bounds {
@@ -51,7 +55,8 @@ struct Bounds {
     Rect visual{};   // view coordinates
 
     void Add(const LayoutNode& child) {
-        content = layout::Union(content, child.local ? layout::MapBounds(*child.local, child.aabb) : child.aabb);
+        content =
+            layout::Union(content, child.local ? layout::MapBounds(*child.local, child.aabb) : child.aabb);
         visual = layout::Union(visual, child.visualAabb);
     }
     void Add(const ChildGroup& group) {
@@ -93,7 +98,8 @@ class TransformPass {
         }
         node.needsTransform = node.descendantNeedsTransform = node.childrenChanged = false;
         UpdatePaintBounds(node, box);
-        return NoteChanges(handle, before, above, self && (above.moved || worldChanged), dirtyBelow) || dirtyBelow;
+        return NoteChanges(handle, before, above, self && (above.moved || worldChanged), dirtyBelow) ||
+               dirtyBelow;
     }
 
   private:
@@ -136,7 +142,8 @@ class TransformPass {
         const Matrix children = ChildrenMatrix(node);
         Above below{children, node.scroll, above.clip, above.moved || matricesChanged || scrolled};
         if (node.flags.shouldOverflowClip) {
-            const Rect clip = layout::RoundOut(layout::MapBounds(node.world, ClipBox(node, pass_.snapToPixels)));
+            const Rect clip =
+                layout::RoundOut(layout::MapBounds(node.world, ClipBox(node, pass_.snapToPixels)));
             below.clip = layout::Intersection(below.clip, clip);
         }
         Bounds bounds;
@@ -211,15 +218,16 @@ class TransformPass {
         return {largest, largest, largest, largest};
     }
 
-    bool NoteChanges(LayoutHandle& handle, const Before& before, const Above& above, bool moved, bool dirtyBelow) {
+    bool NoteChanges(LayoutHandle& handle, const Before& before, const Above& above, bool moved,
+                     bool dirtyBelow) {
         LayoutNode& node = handle.node();
-        const bool stacking = node.establishesStackingContext != node.previousStacking ||
-                              node.zIndex != node.previousZIndex;
+        const bool stacking =
+            node.establishesStackingContext != node.previousStacking || node.zIndex != node.previousZIndex;
         const bool scrolls = !layout::Near(before.scrollSize.width, node.scrollSize.width) ||
                              !layout::Near(before.scrollSize.height, node.scrollSize.height) ||
                              !Same(before.scroll, node.scroll);
-        const bool paints = node.visualChanged || stacking || moved || node.rectChanged || node.boxMetricsChanged ||
-                            !Same(before.paint, node.paintBounds);
+        const bool paints = node.visualChanged || stacking || moved || node.rectChanged ||
+                            node.boxMetricsChanged || !Same(before.paint, node.paintBounds);
         const bool bounds = !Same(before.visual, node.visualAabb) || !Same(before.aabb, node.aabb);
         if (paints) node.visualChanged = true;
         if (paints || bounds || scrolls) pass_.update.updated.Insert(&handle);
@@ -276,7 +284,8 @@ Rect ClipToAncestors(const LayoutNode& node) {
     for (const LayoutHandle* above = node.parent; above != nullptr; above = above->node().parent) {
         const LayoutNode& parent = above->node();
         if (parent.flags.shouldOverflowClip) {
-            area = layout::Intersection(area, layout::RoundOut(layout::MapBounds(parent.world, ClipBox(parent, true))));
+            area = layout::Intersection(
+                area, layout::RoundOut(layout::MapBounds(parent.world, ClipBox(parent, true))));
         }
         const bool spreads = parent.visuals && !parent.visuals->filters.empty();
         if (spreads && !layout::IsEmpty(area)) area = parent.visualAabb;

@@ -1,7 +1,8 @@
 // World transforms, bounds and scroll extents of laid-out nodes, and what of them must be painted again.
 //
-// One recursive pass from the root serves all changes: it enters only subtrees that hold a marked node or whose
-// matrices moved, and gives the same result as visiting everything. Depth is bounded by kMaxLayoutDepth.
+// One recursive pass from the root serves all changes: it enters only subtrees that hold a marked node or
+// whose matrices moved, and gives the same result as visiting everything. Depth is bounded by
+// kMaxLayoutDepth.
 #pragma once
 
 #include "layout/layout_handle.h"
@@ -14,8 +15,8 @@ void RunTransformPass(layout::LayoutPass& pass);
 // The node's box, style, scroll position or paint changed: the next pass visits it.
 void MarkForTransform(layout::LayoutHandle& handle);
 
-// The part of a node's visual bounds that its ancestors let through, as of the last pass; the whole bounds of an
-// ancestor whose filter spreads what changes below it.
+// The part of a node's visual bounds that its ancestors let through, as of the last pass; the whole bounds of
+// an ancestor whose filter spreads what changes below it.
 layout::Rect ClipToAncestors(const layout::LayoutNode& node);
 
 // The box as it is painted and transformed.

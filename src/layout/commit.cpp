@@ -1,4 +1,5 @@
-// The crossing from the DOM side to the layout side: runs on the DOM thread while no layout task of the view runs.
+// The crossing from the DOM side to the layout side: runs on the DOM thread while no layout task of the view
+// runs.
 #include "css/values/style_groups.h"
 #include "display/dirty_region.h"
 #include "display/transforms.h"
@@ -73,7 +74,8 @@ void LayoutTree::Commit(LayoutUpdateData& update, dsp::DirtyRegion* dirty, Debug
         changed_.Erase(&handle);
         // The bounds of a subtree's root cover the subtree.
         LayoutHandle* parent = handle.node().parent;
-        if (parent == nullptr || parent->data().inTree) update.vanished.Add(dsp::ClipToAncestors(handle.node()));
+        if (parent == nullptr || parent->data().inTree)
+            update.vanished.Add(dsp::ClipToAncestors(handle.node()));
     });
     changed_.ForEach([&](LayoutHandle& handle) {
         CopyToLayoutSide(handle, dirty);

@@ -12,12 +12,17 @@ thread_local uint32_t g_measureCount = 0;
 
 dsp::MeasureMode ModeOf(YGMeasureMode mode) {
     switch (mode) {
-        case YGMeasureModeExactly: return dsp::MeasureMode::Exactly;
-        case YGMeasureModeAtMost: return dsp::MeasureMode::AtMost;
-        default: return dsp::MeasureMode::Undefined;
+        case YGMeasureModeExactly:
+            return dsp::MeasureMode::Exactly;
+        case YGMeasureModeAtMost:
+            return dsp::MeasureMode::AtMost;
+        default:
+            return dsp::MeasureMode::Undefined;
     }
 }
-float Finite(float value) { return std::isfinite(value) ? value : 0; }
+float Finite(float value) {
+    return std::isfinite(value) ? value : 0;
+}
 }  // namespace
 
 YGSize MeasureFlexNode(YGNodeConstRef node, float width, YGMeasureMode widthMode, float height,
@@ -31,6 +36,8 @@ YGSize MeasureFlexNode(YGNodeConstRef node, float width, YGMeasureMode widthMode
     return {Finite(size.width), Finite(size.height)};
 }
 
-uint32_t TakeMeasureCount() { return std::exchange(g_measureCount, 0); }
+uint32_t TakeMeasureCount() {
+    return std::exchange(g_measureCount, 0);
+}
 
 }  // namespace qorvex::layout

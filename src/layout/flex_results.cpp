@@ -9,7 +9,9 @@ namespace qorvex::layout {
 
 namespace {
 
-float Finite(float value) { return std::isfinite(value) ? value : 0; }
+float Finite(float value) {
+    return std::isfinite(value) ? value : 0;
+}
 
 struct Entry {
     LayoutHandle* handle;
@@ -41,10 +43,13 @@ Rect FixedContainingBox(const Entry& entry, const LayoutPass& pass) {
     return Inset(container.box, container.border);
 }
 
-bool IsInset(YGNodeConstRef flex, YGEdge edge) { return !std::isnan(YGNodeStyleGetPosition(flex, edge).value); }
+bool IsInset(YGNodeConstRef flex, YGEdge edge) {
+    return !std::isnan(YGNodeStyleGetPosition(flex, edge).value);
+}
 
-// Yoga has no fixed position: it placed the box as an absolute one, in a box that is not the one meant. Insets are in
-// pixels by now (flex_style.cpp), so the place follows from them; without insets the static place stands.
+// Yoga has no fixed position: it placed the box as an absolute one, in a box that is not the one meant.
+// Insets are in pixels by now (flex_style.cpp), so the place follows from them; without insets the static
+// place stands.
 void PlaceFixed(LayoutNode& node, const Rect& in, Point origin) {
     const YGNodeConstRef flex = node.flex;
     node.box.x = origin.x + Finite(YGNodeLayoutGetLeft(flex));
@@ -52,13 +57,14 @@ void PlaceFixed(LayoutNode& node, const Rect& in, Point origin) {
     if (IsInset(flex, YGEdgeLeft)) {
         node.box.x = in.x + YGNodeStyleGetPosition(flex, YGEdgeLeft).value + node.margin.left;
     } else if (IsInset(flex, YGEdgeRight)) {
-        node.box.x = Right(in) - YGNodeStyleGetPosition(flex, YGEdgeRight).value - node.margin.right - node.box.width;
+        node.box.x =
+            Right(in) - YGNodeStyleGetPosition(flex, YGEdgeRight).value - node.margin.right - node.box.width;
     }
     if (IsInset(flex, YGEdgeTop)) {
         node.box.y = in.y + YGNodeStyleGetPosition(flex, YGEdgeTop).value + node.margin.top;
     } else if (IsInset(flex, YGEdgeBottom)) {
-        node.box.y =
-            Bottom(in) - YGNodeStyleGetPosition(flex, YGEdgeBottom).value - node.margin.bottom - node.box.height;
+        node.box.y = Bottom(in) - YGNodeStyleGetPosition(flex, YGEdgeBottom).value - node.margin.bottom -
+                     node.box.height;
     }
 }
 
@@ -68,8 +74,8 @@ void Place(const Entry& entry, LayoutPass& pass) {
         PlaceFixed(node, FixedContainingBox(entry, pass), entry.origin);
         return;
     }
-    // Yoga gives every other box relative to its parent, absolute ones too: it knows their containing block, since
-    // static boxes are static to it.
+    // Yoga gives every other box relative to its parent, absolute ones too: it knows their containing block,
+    // since static boxes are static to it.
     node.box.x = entry.origin.x + Finite(YGNodeLayoutGetLeft(node.flex));
     node.box.y = entry.origin.y + Finite(YGNodeLayoutGetTop(node.flex));
 }

@@ -5,8 +5,8 @@
 
 namespace qorvex::layout {
 
-// Walks from `root` into whatever Yoga laid out anew or a moved containing block carries along. `rootOrigin` is the
-// document position of the root's own origin; `everything` visits all nodes.
+// Walks from `root` into whatever Yoga laid out anew or a moved containing block carries along. `rootOrigin`
+// is the document position of the root's own origin; `everything` visits all nodes.
 struct FlexReadRoot {
     LayoutHandle* handle = nullptr;
     LayoutHandle* fixedContainer = nullptr;
@@ -15,8 +15,8 @@ struct FlexReadRoot {
 };
 void ReadYogaResults(const FlexReadRoot& root, LayoutPass& pass);
 
-// What both engines do with a node whose box has been computed: sets the change marks and enters the handle in the
-// frame's lists.
+// What both engines do with a node whose box has been computed: sets the change marks and enters the handle
+// in the frame's lists.
 struct OldBox {
     Rect box;
     Edges border;

@@ -23,7 +23,8 @@ constexpr std::array kFlexDirections = {YGFlexDirectionRow, YGFlexDirectionRowRe
 constexpr std::array kJustifyContent = {YGJustifyFlexStart, YGJustifyFlexEnd, YGJustifyCenter,
                                         YGJustifySpaceBetween, YGJustifySpaceAround};
 constexpr std::array kAlignItems = {YGAlignFlexStart, YGAlignCenter, YGAlignFlexEnd, YGAlignStretch};
-constexpr std::array kAlignSelf = {YGAlignAuto, YGAlignFlexStart, YGAlignCenter, YGAlignFlexEnd, YGAlignStretch};
+constexpr std::array kAlignSelf = {YGAlignAuto, YGAlignFlexStart, YGAlignCenter, YGAlignFlexEnd,
+                                   YGAlignStretch};
 constexpr std::array kFlexWraps = {YGWrapNoWrap, YGWrapWrap, YGWrapWrapReverse};
 
 template <typename Values, typename Code>
@@ -32,7 +33,8 @@ auto Pick(const Values& values, Code code) {
     return values[index < values.size() ? index : 0];
 }
 
-// Yoga computes in floats and tests for "undefined" by NaN; what a page may write is kept where neither breaks.
+// Yoga computes in floats and tests for "undefined" by NaN; what a page may write is kept where neither
+// breaks.
 float Sane(float value) {
     constexpr float kLargest = 1e7f;
     return std::isnan(value) ? value : std::fmin(std::fmax(value, -kLargest), kLargest);
@@ -45,7 +47,8 @@ struct LengthSetter {
     void (*unset)(YGNodeRef);
 };
 
-void SetLength(YGNodeRef node, const LengthSetter& setter, const Extent& extent, const LengthContext& lengths) {
+void SetLength(YGNodeRef node, const LengthSetter& setter, const Extent& extent,
+               const LengthContext& lengths) {
     if (extent.IsLength() && extent.unit == LengthUnit::Percent) {
         setter.percent(node, Sane(extent.value));
         return;
@@ -59,8 +62,9 @@ void SetLength(YGNodeRef node, const LengthSetter& setter, const Extent& extent,
 }
 
 constexpr LengthSetter kWidth = {YGNodeStyleSetWidth, YGNodeStyleSetWidthPercent, YGNodeStyleSetWidthAuto};
-constexpr LengthSetter kHeight = {YGNodeStyleSetHeight, YGNodeStyleSetHeightPercent, YGNodeStyleSetHeightAuto};
-#define QORVEX_LIMIT_SETTER(Name)                                    \
+constexpr LengthSetter kHeight = {YGNodeStyleSetHeight, YGNodeStyleSetHeightPercent,
+                                  YGNodeStyleSetHeightAuto};
+#define QORVEX_LIMIT_SETTER(Name)                                                          \
     constexpr LengthSetter k##Name = {YGNodeStyleSet##Name, YGNodeStyleSet##Name##Percent, \
                                       [](YGNodeRef node) { YGNodeStyleSet##Name(node, YGUndefined); }};
 QORVEX_LIMIT_SETTER(MinWidth)
@@ -157,15 +161,15 @@ void SyncEdges(YGNodeRef node, const LayoutStyle& style, const LengthContext& le
     padding(YGEdgeBottom, style.paddingBottom);
 }
 
-// A fixed box is laid out against the view, which Yoga does not know as its containing block: percentages become
-// pixels here, and ReadYogaResults places the box.
+// A fixed box is laid out against the view, which Yoga does not know as its containing block: percentages
+// become pixels here, and ReadYogaResults places the box.
 Extent AgainstView(const Extent& extent, float viewSize) {
     if (!extent.IsLength() || extent.unit != LengthUnit::Percent) return extent;
     return Extent::Pixels(extent.value / 100 * viewSize);
 }
 
-void SyncInset(YGNodeRef node, YGEdge edge, const Extent& extent, const LayoutNode& layoutNode, float viewSize,
-               const LengthContext& lengths) {
+void SyncInset(YGNodeRef node, YGEdge edge, const Extent& extent, const LayoutNode& layoutNode,
+               float viewSize, const LengthContext& lengths) {
     if (!layoutNode.flags.isPositioned) {
         YGNodeStyleSetPosition(node, edge, YGUndefined);
         return;
@@ -177,12 +181,14 @@ void SyncInset(YGNodeRef node, YGEdge edge, const Extent& extent, const LayoutNo
     }
     if (isPercent) {
         LogWarning(
-            "Using % values with position:fixed is not supported. Percents will be calculated against viewport.");
+            "Using % values with position:fixed is not supported. Percents will be calculated against "
+            "viewport.");
     }
     YGNodeStyleSetPosition(node, edge, Sane(ResolveExtent(extent, lengths, viewSize, YGUndefined)));
 }
 
-void SyncPosition(YGNodeRef node, const LayoutNode& layoutNode, const LayoutStyle& style, const FlexStyleContext& c) {
+void SyncPosition(YGNodeRef node, const LayoutNode& layoutNode, const LayoutStyle& style,
+                  const FlexStyleContext& c) {
     const float viewWidth = c.lengths.vw * 100;
     const float viewHeight = c.lengths.vh * 100;
     SyncInset(node, YGEdgeLeft, style.left, layoutNode, viewWidth, c.lengths);
@@ -199,12 +205,14 @@ Extent FixedSize(const Extent& size, const Extent& start, const Extent& end, flo
     return Extent::Pixels(std::fmax(viewSize - taken, 0.0f));
 }
 
-void SyncSizes(YGNodeRef node, const LayoutNode& layoutNode, const LayoutStyle& style, const LengthContext& lengths) {
+void SyncSizes(YGNodeRef node, const LayoutNode& layoutNode, const LayoutStyle& style,
+               const LengthContext& lengths) {
     if (layoutNode.flags.isFixed) {
         const float viewWidth = lengths.vw * 100;
         const float viewHeight = lengths.vh * 100;
         SetLength(node, kWidth, FixedSize(style.width, style.left, style.right, viewWidth, lengths), lengths);
-        SetLength(node, kHeight, FixedSize(style.height, style.top, style.bottom, viewHeight, lengths), lengths);
+        SetLength(node, kHeight, FixedSize(style.height, style.top, style.bottom, viewHeight, lengths),
+                  lengths);
         SetLength(node, kMinWidth, AgainstView(style.minWidth, viewWidth), lengths);
         SetLength(node, kMinHeight, AgainstView(style.minHeight, viewHeight), lengths);
         SetLength(node, kMaxWidth, AgainstView(style.maxWidth, viewWidth), lengths);
@@ -219,8 +227,8 @@ void SyncSizes(YGNodeRef node, const LayoutNode& layoutNode, const LayoutStyle& 
     SetLength(node, kMaxHeight, style.maxHeight, lengths);
 }
 
-// Static boxes are static in Yoga too: an absolute box is then laid out against its nearest ancestor that is not.
-// The root always is one.
+// Static boxes are static in Yoga too: an absolute box is then laid out against its nearest ancestor that is
+// not. The root always is one.
 YGPositionType PositionType(const LayoutNode& node, bool isRoot) {
     if (isRoot) return YGPositionTypeRelative;
     if (node.flags.isFixed || node.flags.isAbsolute) return YGPositionTypeAbsolute;

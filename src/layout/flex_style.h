@@ -1,5 +1,5 @@
-// Writes computed style to a Yoga node. Yoga's setters compare before they write and mark dirty only on a change,
-// which is what keeps its own caches alive.
+// Writes computed style to a Yoga node. Yoga's setters compare before they write and mark dirty only on a
+// change, which is what keeps its own caches alive.
 #pragma once
 
 #include "css/values/length_context.h"

@@ -9,7 +9,9 @@ bool Near(const Rect& a, const Rect& b) {
     return Near(a.x, b.x) && Near(a.y, b.y) && Near(a.width, b.width) && Near(a.height, b.height);
 }
 
-bool IsEmpty(const Rect& rect) { return !(rect.width > 0 && rect.height > 0); }
+bool IsEmpty(const Rect& rect) {
+    return !(rect.width > 0 && rect.height > 0);
+}
 
 bool IsFinite(const Rect& rect) {
     return std::isfinite(rect.x) && std::isfinite(rect.y) && std::isfinite(rect.width) &&
@@ -43,7 +45,8 @@ Rect Intersection(const Rect& a, const Rect& b) {
 }
 
 Rect Inset(const Rect& rect, const Edges& edges) {
-    return {rect.x + edges.left, rect.y + edges.top, rect.z, std::max(rect.width - edges.left - edges.right, 0.0f),
+    return {rect.x + edges.left, rect.y + edges.top, rect.z,
+            std::max(rect.width - edges.left - edges.right, 0.0f),
             std::max(rect.height - edges.top - edges.bottom, 0.0f)};
 }
 
@@ -74,10 +77,8 @@ bool IsFlat(const Matrix& m) {
 }
 
 Rect MapBounds(const Matrix& m, const Rect& rect) {
-    const float corners[4][2] = {{rect.x, rect.y},
-                                 {Right(rect), rect.y},
-                                 {Right(rect), Bottom(rect)},
-                                 {rect.x, Bottom(rect)}};
+    const float corners[4][2] = {
+        {rect.x, rect.y}, {Right(rect), rect.y}, {Right(rect), Bottom(rect)}, {rect.x, Bottom(rect)}};
     constexpr float kHuge = 1e9f;
     // Points nearer to the eye than this project so far away that only the direction counts.
     constexpr float kNearEye = 1e-4f;
@@ -115,7 +116,8 @@ Rect MapBounds(const Matrix& m, const Rect& rect) {
 }
 
 bool Invert(const Matrix& m, Matrix& out) {
-    // Gauss-Jordan with partial pivoting; only used where a pointer or a surface goes back through a transform.
+    // Gauss-Jordan with partial pivoting; only used where a pointer or a surface goes back through a
+    // transform.
     double a[4][8] = {};
     for (int row = 0; row < 4; ++row) {
         for (int column = 0; column < 4; ++column)

@@ -41,9 +41,15 @@ inline bool IsScrolled(const ScrollPosition& s) {
     return !Near(s.x, 0) || !Near(s.y, 0);
 }
 
-inline Rect MakeRect(float x, float y, float width, float height) { return {x, y, 0, width, height}; }
-inline float Right(const Rect& rect) { return rect.x + rect.width; }
-inline float Bottom(const Rect& rect) { return rect.y + rect.height; }
+inline Rect MakeRect(float x, float y, float width, float height) {
+    return {x, y, 0, width, height};
+}
+inline float Right(const Rect& rect) {
+    return rect.x + rect.width;
+}
+inline float Bottom(const Rect& rect) {
+    return rect.y + rect.height;
+}
 bool IsEmpty(const Rect& rect);
 bool Intersects(const Rect& a, const Rect& b);
 bool Contains(const Rect& outer, const Rect& inner);
@@ -60,8 +66,8 @@ bool Near(const Matrix& a, const Matrix& b);
 // Neither depth nor perspective: what maps the plane to the plane.
 bool IsFlat(const Matrix& m);
 bool IsFinite(const Rect& rect);
-// The axis-aligned bounds of a mapped rectangle. Empty when a corner is not finite or when all of it lies behind the
-// eye; a rectangle that is cut by the plane of the eye counts as unbounded on that side.
+// The axis-aligned bounds of a mapped rectangle. Empty when a corner is not finite or when all of it lies
+// behind the eye; a rectangle that is cut by the plane of the eye counts as unbounded on that side.
 Rect MapBounds(const Matrix& m, const Rect& rect);
 // False for a singular matrix.
 bool Invert(const Matrix& m, Matrix& out);

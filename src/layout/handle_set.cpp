@@ -14,9 +14,13 @@ bool HandleSet::Erase(LayoutHandle* handle) {
     return true;
 }
 
-bool HandleSet::Contains(const LayoutHandle* handle) const { return set_.contains(handle); }
+bool HandleSet::Contains(const LayoutHandle* handle) const {
+    return set_.contains(handle);
+}
 
-uint32_t HandleSet::Size() const { return set_.size(); }
+uint32_t HandleSet::Size() const {
+    return set_.size();
+}
 
 void HandleSet::Clear() {
     for (LayoutHandle* handle : set_)
@@ -24,6 +28,8 @@ void HandleSet::Clear() {
     set_.clear();
 }
 
-void HandleSet::Swap(HandleSet& other) { set_.swap(other.set_); }
+void HandleSet::Swap(HandleSet& other) {
+    set_.swap(other.set_);
+}
 
 }  // namespace qorvex::layout

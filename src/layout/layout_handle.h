@@ -76,8 +76,8 @@ struct LayoutData {
     bool inTree = false;
 };
 
-// Union of the bounds of some neighbouring children, so that one changed child of ten thousand costs the look at its
-// group and not at all its siblings.
+// Union of the bounds of some neighbouring children, so that one changed child of ten thousand costs the look
+// at its group and not at all its siblings.
 struct ChildGroup {
     Rect content{};
     Rect visual{};
@@ -105,10 +105,10 @@ struct LayoutNode {
     Edges padding;
     Edges margin;
     Size scrollSize;
-    Rect aabb{};          // snapped box and in-flow overflow, document coordinates
-    Rect paintBounds{};   // what the node's own content can touch, view coordinates
-    Rect visualAabb{};    // the same with its subtree
-    Rect contentBounds{}; // of the children: their aabb, document coordinates
+    Rect aabb{};           // snapped box and in-flow overflow, document coordinates
+    Rect paintBounds{};    // what the node's own content can touch, view coordinates
+    Rect visualAabb{};     // the same with its subtree
+    Rect contentBounds{};  // of the children: their aabb, document coordinates
     // Bounds of kChildGroup children each, kept only by nodes with more children than that.
     Vector<ChildGroup, MemoryTag::LayoutNodes> groups;
     Matrix world;
@@ -126,8 +126,8 @@ struct LayoutNode {
     uint32_t index = 0;
     // Depth below the root, which is 0. Nodes at kMaxLayoutDepth and deeper keep zero boxes.
     uint32_t depth = 0;
-    // Sticky and conservative: there is an absolute or fixed box below, whose containing block may lie above this
-    // node. When it is set here, it is set on all ancestors.
+    // Sticky and conservative: there is an absolute or fixed box below, whose containing block may lie above
+    // this node. When it is set here, it is set on all ancestors.
     bool absoluteBelow = false;
     // The transform pass must look at this node, or somewhere below it.
     bool needsTransform = true;

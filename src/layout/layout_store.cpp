@@ -47,8 +47,8 @@ void LayoutStore::RecycleFlexNode(YGNode* node) {
     free_flex_nodes_.push_back(node);
 }
 
-// Children lose a reference each; those that die with it join a list, so that a page's deep tree costs no deep stack.
-// The list runs through the parent links, which mean nothing any more in a dead handle.
+// Children lose a reference each; those that die with it join a list, so that a page's deep tree costs no
+// deep stack. The list runs through the parent links, which mean nothing any more in a dead handle.
 void LayoutStore::Destroy(LayoutHandle* first) noexcept {
     uint32_t died = 0;
     first->data_->parent = nullptr;

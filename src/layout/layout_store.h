@@ -1,8 +1,8 @@
-// Where the handles of one tree live, and what their layout side shares. Counted: it outlives the tree while any
-// handle lives, so that a released handle always has pools to return to.
+// Where the handles of one tree live, and what their layout side shares. Counted: it outlives the tree while
+// any handle lives, so that a released handle always has pools to return to.
 //
-// A handle may be released by the last task of a frame on any thread, so the pools take a lock. Everything else
-// here belongs to the layout thread.
+// A handle may be released by the last task of a frame on any thread, so the pools take a lock. Everything
+// else here belongs to the layout thread.
 #pragma once
 
 #include "layout/layout_handle.h"
@@ -22,7 +22,8 @@ class LayoutStore : public AtomicRefCounted<LayoutStore, MemoryTag::LayoutNodes>
     HandlePtr MakeHandle();
     void Destroy(LayoutHandle* handle) noexcept;
 
-    // What the last layout resolved viewport units and rem against; a difference makes every style be written anew.
+    // What the last layout resolved viewport units and rem against; a difference makes every style be written
+    // anew.
     struct Metrics {
         uint32_t viewWidth = 0;
         uint32_t viewHeight = 0;
@@ -37,7 +38,6 @@ class LayoutStore : public AtomicRefCounted<LayoutStore, MemoryTag::LayoutNodes>
     Engine engine = Engine::None;
 
   private:
-
     YGNode* MakeFlexNode(LayoutHandle* handle);
     void RecycleFlexNode(YGNode* node);
 

@@ -10,7 +10,9 @@ namespace qorvex::layout {
 
 LayoutTree::LayoutTree() : store_(MakeRef<LayoutStore>()) {}
 
-LayoutTree::~LayoutTree() { Clear(nullptr); }
+LayoutTree::~LayoutTree() {
+    Clear(nullptr);
+}
 
 HandlePtr LayoutTree::Create(NewNode&& node) {
     HandlePtr handle = store_->MakeHandle();
@@ -56,8 +58,8 @@ void LayoutTree::Attach(LayoutHandle& handle, LayoutHandle& parent, uint32_t ind
     changed_.Insert(&parent);
 }
 
-// The whole subtree falls apart into single handles: each of its nodes is attached again, if at all, by itself, and
-// no handle is left that points at a parent which may die before it.
+// The whole subtree falls apart into single handles: each of its nodes is attached again, if at all, by
+// itself, and no handle is left that points at a parent which may die before it.
 void LayoutTree::Remove(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
     if (!handle.data().inTree) return;
     if (LayoutHandle* parent = handle.data().parent) {

@@ -17,8 +17,8 @@ namespace qorvex::layout {
 
 namespace {
 
-// Everything that a style resolves against besides itself; when it differs from the last layout's, no style that was
-// written then holds any more.
+// Everything that a style resolves against besides itself; when it differs from the last layout's, no style
+// that was written then holds any more.
 bool TakeMetrics(LayoutPass& pass, LayoutStore::Engine engine) {
     LayoutStore& store = pass.root->store();
     const LayoutStore::Metrics now{pass.viewWidth, pass.viewHeight,

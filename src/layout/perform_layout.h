@@ -24,8 +24,8 @@ struct LayoutPass {
     bool disableFlexBasisUnits = false;
     // False under --dont-snap-to-integer-coords-before-transform.
     bool snapToPixels = true;
-    // Visit the whole tree instead of what changed: after a resize, and in tests as the slow path that the fast one
-    // is compared with. PerformLayout sets it when the view or the root font changed.
+    // Visit the whole tree instead of what changed: after a resize, and in tests as the slow path that the
+    // fast one is compared with. PerformLayout sets it when the view or the root font changed.
     bool everything = false;
 };
 

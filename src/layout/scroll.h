@@ -5,8 +5,8 @@
 
 namespace qorvex::layout {
 
-// A position beyond what the content of a clipping node allows becomes the limit; NaN and negative positions become
-// 0. Nodes that do not clip cannot scroll.
+// A position beyond what the content of a clipping node allows becomes the limit; NaN and negative positions
+// become 0. Nodes that do not clip cannot scroll.
 ScrollPosition ClampScroll(ScrollPosition position, const LayoutNode& node);
 
 }  // namespace qorvex::layout

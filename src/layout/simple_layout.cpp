@@ -31,7 +31,8 @@ Rect ContainingBox(const LayoutNode& node, const Containers& in, const LengthCon
         if (in.fixed != nullptr) return Inset(in.fixed->node().box, in.fixed->node().border);
         return {0, 0, 0, lengths.vw * 100, lengths.vh * 100};
     }
-    if (node.flags.isAbsolute && in.positioned != nullptr) return Inset(in.positioned->box, in.positioned->border);
+    if (node.flags.isAbsolute && in.positioned != nullptr)
+        return Inset(in.positioned->box, in.positioned->border);
     if (node.parent == nullptr) return {0, 0, 0, lengths.vw * 100, lengths.vh * 100};
     const LayoutNode& parent = node.parent->node();
     return Inset(Inset(parent.box, parent.border), parent.padding);
@@ -44,12 +45,13 @@ void ResolveEdges(LayoutNode& node, const LayoutStyle& style, const LengthContex
                    ResolveExtent(style.marginRight, lengths, base, 0),
                    ResolveExtent(style.marginTop, lengths, base, 0),
                    ResolveExtent(style.marginBottom, lengths, base, 0)};
-    node.padding = {ResolveLength(style.paddingLeft, lengths, base), ResolveLength(style.paddingRight, lengths, base),
-                    ResolveLength(style.paddingTop, lengths, base),
-                    ResolveLength(style.paddingBottom, lengths, base)};
+    node.padding = {
+        ResolveLength(style.paddingLeft, lengths, base), ResolveLength(style.paddingRight, lengths, base),
+        ResolveLength(style.paddingTop, lengths, base), ResolveLength(style.paddingBottom, lengths, base)};
 }
 
-Point PlaceIn(const Rect& in, const LayoutNode& node, const LayoutStyle& style, const LengthContext& lengths) {
+Point PlaceIn(const Rect& in, const LayoutNode& node, const LayoutStyle& style,
+              const LengthContext& lengths) {
     Point place{in.x, in.y};
     if (!node.flags.isPositioned) return place;
     place.x += ResolveExtent(style.left, lengths, in.width, 0);
@@ -57,7 +59,9 @@ Point PlaceIn(const Rect& in, const LayoutNode& node, const LayoutStyle& style, 
     return place;
 }
 
-float AtLeastZero(float value) { return value > 0 ? value : 0; }
+float AtLeastZero(float value) {
+    return value > 0 ? value : 0;
+}
 
 // Extents of the in-flow children add up, although the children overlap.
 void FitAutoSizes(LayoutNode& node, const LayoutStyle& style) {
@@ -89,8 +93,8 @@ void LayoutSimpleSubtree(LayoutHandle& handle, LayoutPass& pass, LengthContext l
     node.box.y = place.y;
     if (node.flags.measuredByDisplayElement) {
         Size size;
-        node.display->Measure(handle, kUnknown, kUnknown, dsp::MeasureMode::Undefined, dsp::MeasureMode::Undefined,
-                              size);
+        node.display->Measure(handle, kUnknown, kUnknown, dsp::MeasureMode::Undefined,
+                              dsp::MeasureMode::Undefined, size);
         ++pass.update.counters.measured;
         node.box.width = AtLeastZero(size.width);
         node.box.height = AtLeastZero(size.height);
@@ -110,7 +114,8 @@ void LayoutSimpleSubtree(LayoutHandle& handle, LayoutPass& pass, LengthContext l
         LengthContext own = lengths;
         own.em = childNode.style.text->computedFontSize;
         const Rect box = ContainingBox(childNode, below, own);
-        LayoutFlexInSimple(lengths, pass, *child, PlaceIn(box, childNode, *childNode.style.layout, own), below.fixed);
+        LayoutFlexInSimple(lengths, pass, *child, PlaceIn(box, childNode, *childNode.style.layout, own),
+                           below.fixed);
     }
     FitAutoSizes(node, style);
     NoteBoxChange(handle, old, pass);
@@ -122,7 +127,8 @@ LayoutHandle* TopMostChanged(LayoutHandle& handle, const LayoutPass& pass) {
     for (LayoutHandle* parent = handle.node().parent; parent != nullptr; parent = parent->node().parent) {
         const LayoutNode& node = parent->node();
         // Inside a flex element the run of Yoga begins at that element.
-        if (pass.update.changed.Contains(parent) || node.style.layout->display == css::CSSDisplay::Flex) top = parent;
+        if (pass.update.changed.Contains(parent) || node.style.layout->display == css::CSSDisplay::Flex)
+            top = parent;
     }
     return top;
 }

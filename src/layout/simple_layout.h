@@ -1,5 +1,5 @@
-// The engine for pages whose <body> is `display: simple`: children overlap at the content origin of their parent,
-// positioned ones are placed by left and top. Only the subtrees of changed nodes are touched.
+// The engine for pages whose <body> is `display: simple`: children overlap at the content origin of their
+// parent, positioned ones are placed by left and top. Only the subtrees of changed nodes are touched.
 #pragma once
 
 #include "css/values/length_context.h"
@@ -11,7 +11,7 @@ namespace qorvex::layout {
 void PerformSimpleLayout(LayoutPass& pass, const css::LengthContext& lengths, bool everything);
 
 // A flex element inside a simple tree: a run of Yoga of its own, with no available size.
-void LayoutFlexInSimple(const css::LengthContext& lengths, LayoutPass& pass, LayoutHandle& handle, Point place,
-                        LayoutHandle* fixedContainer);
+void LayoutFlexInSimple(const css::LengthContext& lengths, LayoutPass& pass, LayoutHandle& handle,
+                        Point place, LayoutHandle* fixedContainer);
 
 }  // namespace qorvex::layout

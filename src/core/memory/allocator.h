@@ -88,7 +88,7 @@ template <MemoryTag Tag, class T>
 void Delete(T* object) {
     if (!object) return;
     std::destroy_at(object);
-    DeallocateRaw<T, Tag>(const_cast<std::remove_const_t<T>*>(object));
+    DeallocateRaw<std::remove_const_t<T>, Tag>(const_cast<std::remove_const_t<T>*>(object));
 }
 
 /// Owns one object that was made with New and the same tag.

@@ -21,7 +21,7 @@ class SharedValue {
     void AddRef() const { count_.fetch_add(1, std::memory_order_relaxed); }
     void Release() const {
         if (count_.fetch_sub(1, std::memory_order_acq_rel) == 1)
-            Delete(MemoryTag::CSS, const_cast<Derived*>(static_cast<const Derived*>(this)));
+            Delete<MemoryTag::CSS>(static_cast<const Derived*>(this));
     }
     bool IsUnique() const { return count_.load(std::memory_order_acquire) == 1; }
     uint32_t UseCount() const { return count_.load(std::memory_order_relaxed); }
@@ -32,7 +32,7 @@ class SharedValue {
 
 template <class T, class... Args>
 [[nodiscard]] qsl::RefPtr<T> MakeShared(Args&&... args) {
-    return qsl::RefPtr<T>::Adopt(New<std::remove_const_t<T>>(MemoryTag::CSS, std::forward<Args>(args)...));
+    return qsl::RefPtr<T>::Adopt(New<std::remove_const_t<T>, MemoryTag::CSS>(std::forward<Args>(args)...));
 }
 
 }  // namespace qorvex::css
