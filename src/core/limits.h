@@ -29,9 +29,17 @@ inline constexpr size_t kStringPoolBlockBytes = 512;
 /// Object pools of a process; a thread's cache has one list for each.
 inline constexpr size_t kObjectPools = 32;
 
-/// Levels of nesting that take part in layout and painting, whose passes recurse; deeper content keeps empty boxes.
-/// The flex engine takes up to 10 KB of stack a level in a checked build, so this fits the 8 MB of a usual thread; web
-/// browsers cut documents at the same depth.
+/// Levels of nesting that take part in layout and painting, whose passes recurse; deeper content keeps empty
+/// boxes. The flex engine takes up to 10 KB of stack a level in a checked build, so this fits the 8 MB of a
+/// usual thread; web browsers cut documents at the same depth.
 inline constexpr uint32_t kMaxLayoutDepth = 512;
+
+/// Levels of a document that the HTML builder makes and layout shows; browsers stop near here too, and layout
+/// walks recurse.
+inline constexpr size_t kMaxDocumentDepth = 512;
+
+/// Elements that HTML source may have open at once before the parser sees it: its work grows with the square
+/// of this (5,000 take 20 ms, 100,000 take 17 s).
+inline constexpr size_t kMaxSourceNesting = 4096;
 
 }  // namespace qorvex::limits

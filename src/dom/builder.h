@@ -1,8 +1,8 @@
 // Walks a parsed tree and makes nodes of it, one Step at a time. The walk keeps its own stack, so it can stop
 // in front of any element while a script or sheet has to come first, and go on from there.
 //
-// Invariant: between two steps every element below `stack_` has its parent already in the document, except
-// for the one held back in `pending_child_`.
+// Invariant: between two steps every parent on `stack_` is in place already, except for the one element that
+// is held back in `pending_child_`.
 #pragma once
 
 #include "core/memory/containers.h"
@@ -28,20 +28,26 @@ class Builder {
 
     Builder(RefPtr<ParsedHTML> parsed, Document& document);
     ~Builder();
+    Builder(const Builder&) = delete;
+    Builder& operator=(const Builder&) = delete;
 
     BuildResult Step();
 
   private:
     struct StackEntry {
         RefPtr<Node> parent;
-        GumboInternalNode* node;
-        uint32_t depth;  // of the parent, counted from the root
+        const GumboInternalNode* node;
+        uint32_t depth;  // of the parent, counted from the root of its tree
     };
 
     void PushChildren(const GumboInternalNode& node, Node& parent, uint32_t depth);
-    BuildResult BuildElement(const StackEntry& entry);
+    // True when the building has to stop in front of the element.
+    bool BuildElement(const StackEntry& entry);
+    void PushContent(const StackEntry& entry, Node& element);
     void AppendText(const StackEntry& entry);
-    bool FlushText();
+    void FlushText();
+    void FlushReactions();
+    bool IsPaused() const;
 
     RefPtr<ParsedHTML> parsed_;
     Document& document_;
@@ -49,6 +55,8 @@ class Builder {
     RefPtr<Node> pending_child_;
     RefPtr<Node> pending_parent_;
     bool text_active_ = false;
+    // Fragments are built whole: the page's pauses are not theirs.
+    bool stops_at_pause_ = true;
     bool depth_reported_ = false;
     TaggedString<MemoryTag::DOM> text_run_;
     RefPtr<Node> text_parent_;

@@ -6,6 +6,7 @@
 namespace qorvex::dom {
 
 class CharacterData : public Node {
+    QORVEX_SCRIPT_CLASS(CharacterData)
   public:
     std::string_view GetData() const { return data_; }
     void SetData(std::string_view text);
@@ -16,48 +17,62 @@ class CharacterData : public Node {
     void SetNodeValue(std::string_view value) override { SetData(value); }
     NodeText GetTextContent() const override { return NodeText(GetData()); }
     void SetTextContent(std::string_view text) override { SetData(text); }
-    void OnComputedStyleChanged() override;
 
-    // The first two raise a script error when the offset is beyond the end, and change nothing.
+    // An offset beyond the end raises a script error and changes nothing.
     NodeText SubstringData(size_t offset, size_t count);
     void ReplaceData(size_t offset, size_t count, std::string_view text);
     void AppendData(std::string_view text) { ReplaceData(data_.size(), 0, text); }
     void InsertData(size_t offset, std::string_view text) { ReplaceData(offset, 0, text); }
     void DeleteData(size_t offset, size_t count) { ReplaceData(offset, count, {}); }
 
-    // The text as it is shown: after text-transform.
-    std::string_view GetDisplayedText() const;
-
   protected:
     CharacterData(Document& document, uint32_t flags, std::string_view data);
-    virtual void UpdateDisplayText() {}
+    // The data changed, or what text-transform makes of it.
+    virtual void OnTextChanged() {}
 
   private:
-    void UpdateTransformedText();
+    void RaiseRangeError(std::string_view message);
 
     NodeText data_;
     uint32_t length_ = 0;
 };
 
 class Text final : public CharacterData {
+    QORVEX_SCRIPT_CLASS(Text)
   public:
     Text(Document& document, std::string_view data);
 
-    RefPtr<Node> CloneNode(bool deep) override;
+    void ToDebugString(NodeText& out) const override;
+    qsl::RefPtr<Node> CloneNode(bool deep) override;
     void OnInsertedIntoDocument() override;
+    void OnComputedStyleChanged() override;
     // Cuts this text at `offset` bytes; the rest becomes a new text behind it.
-    RefPtr<Text> SplitText(size_t offset);
+    qsl::RefPtr<Text> SplitText(size_t offset);
+
+    // The text as it is shown: after text-transform.
+    std::string_view GetDisplayedText() const { return transformed_ ? transformed_->view() : GetData(); }
+    // Hands the shown text to the display element; at the commit, while the layout side is idle.
+    void CommitDisplayedText();
 
   protected:
-    void UpdateDisplayText() override;
+    void OnTextChanged() override;
+
+  private:
+    void UpdateTransformedText();
+
+    UniquePtr<NodeText, MemoryTag::DOM> transformed_;
 };
 
 class Comment final : public CharacterData {
+    QORVEX_SCRIPT_CLASS(Comment)
   public:
-    Comment(Document& document, std::string_view data);
+    Comment(Document& document, std::string_view data) : CharacterData(document, kIsComment, data) {}
 
-    RefPtr<Node> CloneNode(bool deep) override;
-    RefPtr<layout::LayoutHandle> CreateLayoutNode(layout::LayoutTree&, layout::LayoutHandle&) override;
+    void ToDebugString(NodeText& out) const override { out.append("Comment"); }
+    qsl::RefPtr<Node> CloneNode(bool deep) override;
+    layout::HandlePtr CreateLayoutNode(layout::LayoutTree&, layout::LayoutHandle&) override {
+        return nullptr;
+    }
 };
 
 }  // namespace qorvex::dom

@@ -14,10 +14,13 @@ class ILocalizationManager;
 class ITextTransformationManager;
 }  // namespace qorvex
 
+namespace qorvex::dsp {
+class DirtyRegion;
+}
+
 namespace qorvex::layout {
 class FontManager;
-struct Rect;
-}  // namespace qorvex::layout
+}
 
 namespace qorvex::dom {
 
@@ -42,8 +45,8 @@ class IDocumentHost {
     virtual ILocalizationManager* GetLocalizationManager() { return nullptr; }
     virtual ITextTransformationManager* GetTextTransformationManager() { return nullptr; }
 
-    // The area that a removed node covered has to be painted anew.
-    virtual void AddDirtyRect(float x, float y, float width, float height) = 0;
+    // What has to be painted anew because a node left the layout; null while nothing is painted.
+    virtual dsp::DirtyRegion* GetDirtyRegion() { return nullptr; }
     // Paint at least this many more frames although nothing else may ask for them.
     virtual void RequestFrames(uint32_t count) = 0;
 

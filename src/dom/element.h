@@ -5,14 +5,11 @@
 // pointer.
 #pragma once
 
+#include "css/parser/stylesheet.h"
 #include "css/values/match_state.h"
 #include "css/values/property_set.h"
 #include "css/values/style_declaration_set.h"
 #include "dom/node.h"
-
-namespace qorvex::css {
-class Stylesheet;
-}
 
 namespace qorvex::dom {
 
@@ -24,31 +21,49 @@ class ILoadedResource;
 class NamedNodeMap;
 class NodeListStatic;
 
+// An attribute as AttributeChanged sees it: data- attributes come without their prefix.
+struct AttributeName {
+    Atom name;
+    bool is_data = false;
+};
+
 class Element : public Node {
+    QORVEX_SCRIPT_CLASS(Element)
   public:
-    Element(Document& document, css::TagId tag);
+    Element(Document& document, css::TagId tag, uint32_t extra_flags = 0);
 
     // --- Attributes
     Atom GetId() const { return id_; }
-    void SetId(Atom id);
     std::span<const Atom> GetClasses() const { return {classes_.data(), classes_.size()}; }
-    bool HasClass(Atom name) const;
+    bool HasClass(Atom name) const { return classes_.contains(name); }
+    bool HasClassNamed(std::string_view name) const;
+    // False when the element has the class already, or does not have it.
     bool AddClass(std::string_view name);
     bool RemoveClass(std::string_view name);
-    void SetClassName(std::string_view text);
+    bool ReplaceClass(std::string_view old_name, std::string_view new_name);
+    // The classes joined by single spaces.
     Atom GetClassName() const;
 
+    // Names are compared without regard to case.
     std::optional<Atom> GetAttribute(std::string_view name) const;
     bool HasAttribute(std::string_view name) const { return GetAttribute(name).has_value(); }
     void SetAttribute(std::string_view name, std::string_view value);
     void RemoveAttribute(std::string_view name);
     size_t GetAttributeCount() const;
     bool HasAttributes() const { return GetAttributeCount() != 0; }
+    // In the order of GetAttributes; the visitor gets the full name and returns false to stop.
+    template <class Visitor>
+    void ForEachAttribute(Visitor&& visit) const;
     // A fresh map of fresh Attr objects at each call.
-    RefPtr<NamedNodeMap> GetAttributes();
-    RefPtr<Attr> GetAttributeNode(std::string_view name);
+    qsl::RefPtr<NamedNodeMap> GetAttributes();
+    // Null when there is no such attribute.
+    qsl::RefPtr<Attr> GetAttributeNode(std::string_view name);
+    // Takes over name and value; gives the attribute that stood there before.
+    qsl::RefPtr<Attr> SetAttributeNode(Attr& attribute);
+    qsl::RefPtr<Attr> RemoveAttributeNode(Attr& attribute);
 
-    // For selectors: the stored value or null. `FindDataAttribute` takes the name without "data-".
+    // For selectors: the stored value or null. Id, class and style are stored elsewhere; FindAttribute does
+    // not know them. FindDataAttribute takes the name without "data-".
     const Atom* FindAttribute(Atom name) const;
     const Atom* FindDataAttribute(Atom name) const;
     std::span<const AttributePair> GetPlainAttributes() const {
@@ -58,70 +73,90 @@ class Element : public Node {
     void SetDataAttribute(std::string_view unprefixed_name, std::string_view value);
     bool RemoveDataAttribute(std::string_view unprefixed_name);
 
-    virtual void AttributeChanged(Atom name, std::optional<Atom> old_value, std::optional<Atom> new_value);
-    RefPtr<DOMTokenList> GetClassList();
+    virtual void AttributeChanged(AttributeName name, std::optional<Atom> old_value,
+                                  std::optional<Atom> new_value);
+    qsl::RefPtr<DOMTokenList> GetClassList();
 
     // --- Style
     css::MatchState& GetMatchState() { return match_state_; }
+    const css::MatchState& GetMatchState() const { return match_state_; }
     css::PropertySet& GetDirtyProperties() { return dirty_properties_; }
     const css::PropertySet& GetDirtyProperties() const { return dirty_properties_; }
+    // Null until first use.
     css::StyleDeclarationSet* GetInlineStyle() const { return inline_style_.get(); }
     css::StyleDeclarationSet& EnsureInlineStyle();
     css::StyleDeclarationSet* GetExtraStyle() const { return extra_style_.get(); }
     css::StyleDeclarationSet& EnsureExtraStyle();
-    // Text of a style attribute: replaces the inline declarations.
+    // Replaces the inline declarations by those of a style attribute's text.
     void SetInlineStyleText(std::string_view text);
 
     void MarkStyleDirty() override;
     void ClearStyleSolved() override;
-    void OnHoverChanged() override;
-    void OnActiveChanged() override;
-    virtual void OnPseudoStateChanged();
+    void OnHoverChanged() override { MarkPseudoDependentChain(kHoverDependent | kHoverDependentQueued); }
+    void OnActiveChanged() override { OnPseudoStateChanged(); }
+    virtual void OnPseudoStateChanged() {
+        MarkPseudoDependentChain(kActiveFocusDependent | kActiveFocusDependentQueued);
+    }
 
     // --- Queries
-    RefPtr<HTMLCollection> GetElementsByTagName(std::string_view name);
-    RefPtr<HTMLCollection> GetElementsByClassName(std::string_view name);
+    qsl::RefPtr<HTMLCollection> GetElementsByTagName(std::string_view name);
+    qsl::RefPtr<HTMLCollection> GetElementsByClassName(std::string_view name);
     Element* QuerySelector(std::string_view selector);
-    RefPtr<NodeListStatic> QuerySelectorAll(std::string_view selector);
+    qsl::RefPtr<NodeListStatic> QuerySelectorAll(std::string_view selector);
     bool Matches(std::string_view selector);
     Element* Closest(std::string_view selector);
     Element* GetFirstElementChild() const;
     Element* GetLastElementChild() const;
     size_t GetChildElementCount() const;
-    RefPtr<HTMLCollection> GetChildElements();
+    qsl::RefPtr<HTMLCollection> GetChildElements();
 
     // --- Content
     void SetInnerHTML(std::string_view text);
-    bool InsertAdjacentHTML(std::string_view position, std::string_view text);
-    RefPtr<Node> InsertAdjacentElement(std::string_view position, RefPtr<Node> node);
+    void InsertAdjacentHTML(std::string_view position, std::string_view text);
+    qsl::RefPtr<Node> InsertAdjacentElement(std::string_view position, qsl::RefPtr<Node> node);
     void InsertAdjacentText(std::string_view position, std::string_view text);
 
-    // --- Geometry of the last finished layout, transforms included, in view pixels.
-    RefPtr<DOMRect> GetBoundingClientRect();
-    bool GetBoundingBox(float& x, float& y, float& width, float& height) const;
+    // --- Geometry of the last finished layout, transforms included, in view pixels; zeros without a box.
+    qsl::RefPtr<DOMRect> GetBoundingClientRect();
+    layout::Rect GetBoundingBox() const;
 
     // --- Focus
-    bool HasTabIndex() const { return HasAttribute("tabindex"); }
+    virtual bool HasTabIndex() const { return HasAttribute("tabindex"); }
     virtual void Focus();
     virtual void Blur();
 
     // --- Answers of the loader. A null resource or sheet means failure.
-    virtual void OnResourceLoaded(uint32_t id, const ILoadedResource* resource);
-    virtual void OnStylesheetLoaded(uint32_t id, RefPtr<css::Stylesheet> sheet);
+    virtual void OnResourceLoaded(uint32_t, const ILoadedResource*) {}
+    virtual void OnStylesheetLoaded(uint32_t, css::StylesheetPtr) {}
 
     // --- Node
     void ToDebugString(NodeText& out) const override;
-    RefPtr<Node> CloneNode(bool deep) override;
+    qsl::RefPtr<Node> CloneNode(bool deep) override;
     void OnInsertedIntoDocument() override;
     void OnRemovedFromDocument() override;
+    void OnSubtreeRemoved() override;
+    bool PreDispatch(Event& event) override;
+    void PostDispatch(Event& event) override;
 
   protected:
-    ~Element() override;
-    void CopyElementTo(Element& target, bool deep);
+    ~Element() override = default;
+    // Attributes and declared style.
+    void CopyElementTo(Element& target);
+    // The document's own atoms are not there yet while the document itself is constructed.
+    struct ForDocument {};
+    Element(ForDocument, Document& document);
 
   private:
-    bool SetAttributeImpl(Atom name, Atom value, std::optional<Atom>& old_value);
-    void QueueSubtreeForMatching();
+    enum class Store { Id, Class, Style, Plain };
+    static Store StoreOf(Atom name);
+    void SetId(Atom id);
+    void SetClassName(std::string_view text);
+    void OnClassesChanged();
+    std::optional<Atom> ClassValueForObservers() const;
+    void AnnounceClassChange(std::optional<Atom> old_value);
+    void MarkPseudoDependentChain(uint16_t bits);
+    void QueueDependents();
+    qsl::RefPtr<Node> InsertAdjacent(std::string_view position, qsl::RefPtr<Node> node);
 
     UniquePtr<css::StyleDeclarationSet, MemoryTag::DOM> inline_style_;
     UniquePtr<css::StyleDeclarationSet, MemoryTag::DOM> extra_style_;
@@ -131,5 +166,25 @@ class Element : public Node {
     Atom id_;
     Vector<Atom, MemoryTag::DOM> classes_;
 };
+
+template <class Visitor>
+void Element::ForEachAttribute(Visitor&& visit) const {
+    if (Is(kHasId) && !visit(std::string_view("id"), id_.view())) return;
+    if (Is(kHasClasses)) {
+        const Atom classes = GetClassName();
+        if (!visit(std::string_view("class"), classes.view())) return;
+    }
+    if (inline_style_ && !inline_style_->empty()) {
+        const css::CssString text = inline_style_->ToText();
+        if (!visit(std::string_view("style"), text.view())) return;
+    }
+    for (const AttributePair& entry : attributes_)
+        if (!visit(entry.name.view(), entry.value.view())) return;
+    for (const AttributePair& entry : GetDataset()) {
+        NodeText name("data-");
+        name.append(entry.name.view());
+        if (!visit(name.view(), entry.value.view())) return;
+    }
+}
 
 }  // namespace qorvex::dom

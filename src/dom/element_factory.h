@@ -14,10 +14,10 @@ class Document;
 class Element;
 
 // For the parser. Null for noscript, whose content does not exist here.
-RefPtr<Element> CreateElementFromParser(const GumboInternalNode& node, Document& document);
+qsl::RefPtr<Element> CreateElementFromParser(const GumboInternalNode& node, Document& document);
 // For script. The name may have any case.
-RefPtr<Element> CreateElementByName(std::string_view name, Document& document);
+qsl::RefPtr<Element> CreateElementByName(std::string_view name, Document& document);
 // A bare element of a tag; `name` counts for custom elements only.
-RefPtr<Element> CreateElementByTag(css::TagId tag, std::string_view name, Document& document);
+qsl::RefPtr<Element> CreateElementByTag(css::TagId tag, std::string_view name, Document& document);
 
 }  // namespace qorvex::dom

@@ -2,7 +2,7 @@
 #pragma once
 
 #include "core/memory/string_pool.h"
-#include "script/scripting_handle.h"
+#include "script/scripting_handle_enabled.h"
 
 namespace qorvex::dom {
 
@@ -12,6 +12,7 @@ class EventTarget;
 enum class EventPhase : uint32_t { None = 0, Capture = 1, AtTarget = 2, Bubble = 3 };
 
 class Event : public script::ScriptingHandleEnabledRefCounted {
+    QORVEX_SCRIPT_CLASS(Event)
   public:
     Event(Document* document, Atom type, bool bubbles, bool cancelable);
 
@@ -20,23 +21,25 @@ class Event : public script::ScriptingHandleEnabledRefCounted {
     bool GetCancelable() const { return cancelable_; }
     bool GetDefaultPrevented() const { return default_prevented_; }
     EventPhase GetPhase() const { return phase_; }
+    // Neither is counted: both are as dispatch left them.
     EventTarget* GetTarget() const { return target_; }
     EventTarget* GetCurrentTarget() const { return current_target_; }
     Document* GetDocument() const { return document_; }
+    // What the client passed with the input that caused the event.
     void* GetUserData() const { return user_data_; }
     void SetUserData(void* data) { user_data_ = data; }
 
+    // No effect while the event is being dispatched.
     void InitEvent(Atom type, bool bubbles, bool cancelable);
     void StopPropagation() { propagation_stopped_ = true; }
-    void StopImmediatePropagation();
+    void StopImmediatePropagation() { propagation_stopped_ = immediate_propagation_stopped_ = true; }
     void PreventDefault() { default_prevented_ = default_prevented_ || cancelable_; }
-
-    // Runs the destructor and gives the memory back to where it came from.
-    virtual void ReleaseMemory();
+    void SetScriptConstructed() { script_constructed_ = true; }
+    bool IsImmediatePropagationStopped() const { return immediate_propagation_stopped_; }
+    bool IsScriptConstructed() const { return script_constructed_; }
 
   private:
     friend class EventDispatcher;
-    friend class Element;
 
     Atom type_;
     bool bubbles_ = false;
@@ -53,6 +56,7 @@ class Event : public script::ScriptingHandleEnabledRefCounted {
 };
 
 class UIEvent : public Event {
+    QORVEX_SCRIPT_CLASS(UIEvent)
   public:
     using Event::Event;
 };

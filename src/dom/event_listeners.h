@@ -1,28 +1,33 @@
 // The listeners of one target, and the document's table from target to listeners.
 #pragma once
 
+#include <JavaScriptCore/JSBase.h>
+
 #include <bitset>
+#include <string_view>
 
 #include "core/memory/containers.h"
 #include "core/memory/string_pool.h"
-#include "script/scripting_handle.h"
+#include "qsl/ref_ptr.h"
+#include "script/scripting_handle_enabled.h"
 
 namespace qorvex::dom {
 
 class Event;
 class EventTarget;
 
-// Holds what is called. Script functions derive from it in the bindings' floor; native listeners of the
-// engine and its tests derive from it directly.
+// Holds what is called: a script function (dom/script_event_listener.h) or native code.
 class EventListener : public script::ScriptingHandleEnabledRefCounted {
+    QORVEX_SCRIPT_CLASS(EventListener)
   public:
     virtual void HandleEvent(Event& event) = 0;
     // Two listeners are the same when their functions are.
     virtual bool IsSameAs(const EventListener& other) const { return this == &other; }
+    virtual JSValueRef GetScriptFunction() const { return nullptr; }
 };
 
 struct ListenerEntry {
-    RefPtr<EventListener> listener;  // null is allowed and does nothing
+    qsl::RefPtr<EventListener> listener;  // null is allowed and does nothing
     bool use_capture = false;
     bool from_binding = false;  // installed by data binding; at most one for each type
 };
@@ -30,14 +35,15 @@ struct ListenerEntry {
 class EventListeners {
   public:
     static constexpr int kEventIdCount = 68;
-    using Entries = Vector<ListenerEntry, MemoryTag::DOM>;
+    using Entries = SmallVector<ListenerEntry, 1, MemoryTag::DOM>;
 
-    void Add(Atom type, RefPtr<EventListener> listener, bool use_capture, bool from_binding);
+    void Add(Atom type, ListenerEntry entry);
     void Remove(Atom type, EventListener* listener, bool use_capture, bool from_binding);
+    // Valid until a type is added; entries may come and go.
     Entries* Find(Atom type);
-    void CopyFrom(const EventListeners& other);
+    void CopyFrom(const EventListeners& other) { *this = other; }
 
-    // Which on<type> properties of the target's script object hold a function.
+    // Which on<type> properties of the target's script object hold a function, by event id.
     std::bitset<kEventIdCount>& InlineHandlers() { return inline_handlers_; }
 
   private:
@@ -45,7 +51,7 @@ class EventListeners {
         Atom type;
         Entries entries;
     };
-    Vector<TypeEntry, MemoryTag::DOM> by_type_;
+    SmallVector<TypeEntry, 1, MemoryTag::DOM> by_type_;
     std::bitset<kEventIdCount> inline_handlers_;
 };
 
@@ -58,8 +64,9 @@ class EventListenerTable {
   public:
     EventListeners* Find(EventTarget& target);
     EventListeners& FindOrCreate(EventTarget& target);
+    void Copy(EventTarget& from, EventTarget& to);
     void Remove(EventTarget& target);
-    void Clear();
+    void Clear() { stores_.clear(); }
 
   private:
     HashMap<EventTarget*, UniquePtr<EventListeners, MemoryTag::DOM>, MemoryTag::DOM> stores_;

@@ -9,12 +9,14 @@ namespace qorvex::dom {
 class DOMStringMap;
 
 class HTMLElement : public Element {
+    QORVEX_SCRIPT_CLASS(HTMLElement)
   public:
-    HTMLElement(Document& document, css::TagId tag);
+    HTMLElement(Document& document, css::TagId tag, uint32_t extra_flags = 0)
+        : Element(document, tag, kDisplayable | extra_flags) {}
 
-    // Made on first use and kept, so that script sees one object: most elements are never asked.
-    RefPtr<DOMStringMap> GetDataset();
+    qsl::RefPtr<DOMStringMap> GetDatasetMap();
 
+    // The nearest positioned ancestor, else the body; null for the body itself and without a box.
     Element* GetOffsetParent() const;
     float GetOffsetTop() const;
     float GetOffsetLeft() const;
@@ -23,18 +25,18 @@ class HTMLElement : public Element {
 
     bool HasLocalizedContent() const override;
     void ApplyLocalization() override;
-    void AttributeChanged(Atom name, std::optional<Atom> old_value, std::optional<Atom> new_value) override;
-    RefPtr<Node> CloneNode(bool deep) override;
+    void AttributeChanged(AttributeName name, std::optional<Atom> old_value,
+                          std::optional<Atom> new_value) override;
+    // An element of the same class, made by the factory.
+    qsl::RefPtr<Node> CloneNode(bool deep) override;
     void OnInsertedIntoDocument() override;
 
   protected:
     ~HTMLElement() override;
     // The display element of the class; made when the element comes into the document without one.
-    virtual RefPtr<dsp::IDisplayElement> CreateDisplayElement();
-    void FinishClone(HTMLElement& clone, bool deep);
-
-  private:
-    RefPtr<DOMStringMap> dataset_map_;
+    virtual dsp::DisplayElementPtr CreateDisplayElement();
+    // What a clone takes over beyond attributes, style and children.
+    virtual void CopyStateTo(HTMLElement&) const {}
 };
 
 }  // namespace qorvex::dom

@@ -7,7 +7,7 @@
 // - kInDocument holds for a node exactly when the chain of parents ends at the document, and then depth is
 // the
 //   length of that chain; else depth is -1;
-// - the document outlives its nodes (see Document::OnBeforeDestroy);
+// - the memory of the document outlives its nodes (see Document::OnBeforeDestroy);
 // - everything runs on the view's script thread.
 #pragma once
 
@@ -22,10 +22,14 @@
 #include "display/display_element.h"
 #include "dom/event_target.h"
 #include "dom/node_flags.h"
+#include "dom/node_link.h"
 #include "dom/node_rare_data.h"
 #include "layout/layout_handle.h"
-#include "layout/node_link.h"
 #include "qsl/ref_ptr.h"
+
+namespace qorvex::layout {
+class LayoutTree;
+}
 
 namespace qorvex::dom {
 
@@ -34,17 +38,16 @@ class Document;
 class Element;
 class NodeList;
 class Text;
+struct ChildListChange;
 
 using NodeText = TaggedString<MemoryTag::DOM>;
-using NodeVector = Vector<RefPtr<Node>, MemoryTag::DOM>;
+using NodeVector = Vector<qsl::RefPtr<Node>, MemoryTag::DOM>;
+using NodeSet = qorvex::NodeSet<Node*, MemoryTag::DOM>;
 
 class Node : public EventTarget {
+    QORVEX_SCRIPT_CLASS(Node)
   public:
-    Node(Document& document, uint32_t flags);
-
     // --- EventTarget
-    EventListeners* GetEventListeners(bool create) override;
-    script::ScriptingContext* GetScriptingContext() override;
     void PostDispatch(Event& event) override;
     Node* GetEventTargetNode() override { return this; }
     Document* GetEventTargetDocument() const override { return document_; }
@@ -60,7 +63,8 @@ class Node : public EventTarget {
     int GetNodeType() const;
     virtual std::optional<std::string_view> GetNodeValue() const { return std::nullopt; }
     virtual void SetNodeValue(std::string_view) {}
-    virtual void ToDebugString(NodeText& out) const;
+    // One line about the node, for logs and dumps.
+    virtual void ToDebugString(NodeText& out) const = 0;
 
     // --- Tree
     Node* GetParent() const { return parent_; }
@@ -68,47 +72,55 @@ class Node : public EventTarget {
     Document* GetDocument() const { return document_; }
     // Null for the document itself, as script sees it.
     Document* GetOwnerDocument() const;
-    std::span<const RefPtr<Node>> GetChildren() const { return {children_.data(), children_.size()}; }
+    std::span<const qsl::RefPtr<Node>> GetChildren() const { return {children_.data(), children_.size()}; }
     size_t GetChildCount() const { return children_.size(); }
     bool HasChildNodes() const { return !children_.empty(); }
-    Node* GetFirstChild() const { return children_.empty() ? nullptr : children_[0].get(); }
-    Node* GetLastChild() const { return children_.empty() ? nullptr : children_[children_.size() - 1].get(); }
+    Node* GetFirstChild() const { return children_.empty() ? nullptr : children_.front().get(); }
+    Node* GetLastChild() const { return children_.empty() ? nullptr : children_.back().get(); }
     Node* GetPreviousSibling() const;
     Node* GetNextSibling() const;
     Element* GetPreviousElementSibling() const;
     Element* GetNextElementSibling() const;
     Node& GetRootNode();
     int32_t GetDepth() const { return depth_; }
-    RefPtr<NodeList> GetChildNodes();
+    qsl::RefPtr<NodeList> GetChildNodes();
+    // Place in the parent's array; kNoIndex without a parent, and for a child whose removal is under way.
+    static constexpr size_t kNoIndex = static_cast<size_t>(-1);
+    size_t GetIndexInParent() const;
 
-    // The single path of every insertion; see node_tree.cpp for the order of its steps. Returns the child in
+    // The single path of every insertion; node_tree.cpp tells the order of its steps. Returns the child in
     // all outcomes but two: a null child, and a reference that is no child of this node.
-    RefPtr<Node> InsertBefore(RefPtr<Node> child, Node* reference, bool suppress_records = false);
-    virtual RefPtr<Node> AppendChild(RefPtr<Node> child) { return InsertBefore(std::move(child), nullptr); }
-    RefPtr<Node> RemoveChild(Node* child, bool suppress_records = false);
-    RefPtr<Node> ReplaceChild(RefPtr<Node> new_child, Node* old_child);
+    qsl::RefPtr<Node> InsertBefore(qsl::RefPtr<Node> child, Node* reference, bool suppress_records = false);
+    virtual qsl::RefPtr<Node> AppendChild(qsl::RefPtr<Node> child) {
+        return InsertBefore(std::move(child), nullptr);
+    }
+    qsl::RefPtr<Node> RemoveChild(Node* child, bool suppress_records = false);
+    qsl::RefPtr<Node> ReplaceChild(qsl::RefPtr<Node> new_child, Node* old_child);
     void RemoveAllChildren();
     void Normalize();
 
     virtual NodeText GetTextContent() const;
     virtual void SetTextContent(std::string_view text);
 
-    virtual RefPtr<Node> CloneNode(bool deep) = 0;
+    virtual qsl::RefPtr<Node> CloneNode(bool deep) = 0;
+    // A node contains itself.
     bool Contains(const Node* other) const;
     bool IsEqualNode(const Node* other) const;
     int CompareDocumentPosition(const Node& other) const;
-    // The next node in document order below `root`, this node excluded; null at the end.
+    // The next node of the subtree of `root` in document order; null at the end.
     Node* GetNextInTree(const Node* root) const;
+    Node* GetNextSkippingChildren(const Node* root) const;
 
-    // --- Connection. The walk over the subtree is the caller's (see node_connection.cpp): each node acts for
-    // itself alone, first before and then after its children were told.
+    // --- Connection. Each node acts for itself alone; the walk over the subtree, which calls one operation
+    // before and one after the node's children, is ConnectSubtree's and DisconnectSubtree's.
     virtual void OnInsertedIntoDocument();
     virtual void OnSubtreeInserted() {}
-    virtual void OnRemovedFromDocument();
+    virtual void OnRemovedFromDocument() {}
+    virtual void OnSubtreeRemoved();
     void ConnectSubtree();
     void DisconnectSubtree();
 
-    // --- Style. Fields that the solver reads and writes on every visit.
+    // --- Style. What the solver reads and writes on every visit is public.
     css::LayoutStyleRefs& GetStyle() { return style_; }
     const css::LayoutStyleRefs& GetStyle() const { return style_; }
     uint16_t pendingStyleBits = 0;
@@ -117,25 +129,24 @@ class Node : public EventTarget {
     uint8_t textTransformFlag = 0;  // Text only
 
     virtual void MarkStyleDirty() {}
-    virtual void ClearStyleSolved();
+    virtual void ClearStyleSolved() { styleSolved = 0; }
     virtual void OnActiveChanged() {}
     virtual void OnHoverChanged() {}
     virtual void OnComputedStyleChanged() {}
-    // Sets textTransformFlag on every text below this node.
+    // Sets textTransformFlag on every text of this subtree.
     void SetTextSelectionFlag();
 
     // --- Layout
     layout::LayoutHandle* GetLayoutHandle() const { return layout_node_.get(); }
-    void SetLayoutHandle(RefPtr<layout::LayoutHandle> handle);
     // Makes the handle of this node below `parent`; null for nodes that have no box of their own.
-    virtual RefPtr<layout::LayoutHandle> CreateLayoutNode(layout::LayoutTree& tree,
-                                                          layout::LayoutHandle& parent);
-    void MarkLayoutDirty(bool clear_style_solved = true);
+    virtual layout::HandlePtr CreateLayoutNode(layout::LayoutTree& tree, layout::LayoutHandle& parent);
+    // The next frame lays the node out again.
+    void MarkLayoutDirty();
     dsp::IDisplayElement* GetDisplayElement() const { return display_element_.get(); }
     // The geometry of the last finished layout; null without a box.
     const layout::LayoutResult* GetLayoutResult() const;
-    // What layout and tasks hold of this node: a weak link that reads null after its death.
-    RefPtr<layout::NodeLink> GetLayoutLink();
+    // What layout and tasks hold of this node: it reads null after the node's death.
+    qsl::RefPtr<NodeLink> GetLayoutLink();
 
     float GetScrollLeft();
     float GetScrollTop();
@@ -153,35 +164,45 @@ class Node : public EventTarget {
     NodeRareData& EnsureRareData();
 
   protected:
+    Node(Document& document, uint32_t flags, css::TagId tag = css::TagId::Unknown);
     ~Node() override;
+
+    // Listeners of this node, and clones of its children when `deep`.
     void CopyCommon(Node& target, bool deep);
     void SetFlag(uint32_t flag, bool on) { flags_ = on ? flags_ | flag : flags_ & ~flag; }
+    void SetScroll(layout::ScrollPosition wanted);
+    layout::ScrollPosition ClampScroll(layout::ScrollPosition wanted) const;
+    // Index among the layout children of `parent` at which a new handle of this node goes.
+    uint32_t FindLayoutIndex(const layout::LayoutHandle& parent) const;
+    void AdoptLayoutHandle(layout::HandlePtr handle) { layout_node_ = std::move(handle); }
 
     css::TagId tag_;
-    RefPtr<dsp::IDisplayElement> display_element_;
-    std::optional<NodeText> transformed_text_;
+    dsp::DisplayElementPtr display_element_;
 
   private:
     friend class Document;
-    friend class Builder;
+    friend class NodeLink;
 
-    // (private tree steps are declared in node_tree.cpp's order)
-    bool CanInsert(const Node& child) const;
+    bool MayInsert(const Node& child) const;
     void InsertFragment(Node& fragment, Node* reference, bool suppress_records);
-    size_t IndexOf(const Node* child) const;
-    void AnnounceRemoval(Node& child);
-    void NotifyAdded(Node& child);
+    bool PlaceChild(qsl::RefPtr<Node>& child, Node* reference);
+    void QueueChildListRecord(const ChildListChange& change);
+    void LeaveDocument(Node& child);
+    void AfterRemoval();
 
     uint32_t flags_;
     int32_t depth_ = -1;
+    // Where the parent's array held this node when it was last looked up: a guess that is checked at each
+    // use, so that walks from sibling to sibling cost no search.
+    mutable uint32_t index_hint_ = 0;
     Node* parent_ = nullptr;
     Document* document_;
     css::LayoutStyleRefs style_;
-    RefPtr<layout::LayoutHandle> layout_node_;
+    layout::HandlePtr layout_node_;
     NodeVector children_;
-    float scroll_left_ = 0;
-    float scroll_top_ = 0;
+    layout::ScrollPosition scroll_;
     UniquePtr<NodeRareData, MemoryTag::DOM> rare_;
+    qsl::RefPtr<NodeLink> link_;
 };
 
 }  // namespace qorvex::dom

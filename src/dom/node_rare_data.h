@@ -7,6 +7,7 @@
 
 namespace qorvex::dom {
 
+class DOMStringMap;
 class NodeList;
 
 struct AttributePair {
@@ -15,7 +16,11 @@ struct AttributePair {
 };
 
 struct NodeRareData {
-    RefPtr<NodeList> child_nodes;
+    NodeRareData();
+    ~NodeRareData();
+
+    qsl::RefPtr<NodeList> child_nodes;
+    qsl::RefPtr<DOMStringMap> dataset_map;
     // The data- attributes, names without "data-".
     Vector<AttributePair, MemoryTag::DOM> dataset;
 };

@@ -25,8 +25,8 @@ class INodeLifetimeObserver {
 enum MutationKinds : uint8_t { kMutationChildList = 1, kMutationAttributes = 2, kMutationCharacterData = 4 };
 
 struct ChildListChange {
-    std::span<const RefPtr<Node>> added;
-    std::span<const RefPtr<Node>> removed;
+    std::span<const qsl::RefPtr<Node>> added;
+    std::span<const qsl::RefPtr<Node>> removed;
     Node* previous_sibling = nullptr;  // as they stood around the place before the change
     Node* next_sibling = nullptr;
 };
@@ -61,6 +61,13 @@ class IDataBindingScanner {
     virtual void OnDataAttribute(Element& element, Atom name, Atom value) = 0;
     virtual void OnElementRemoved(Element& element) = 0;
     virtual void OnDOMReady() = 0;
+};
+
+// Custom elements: what happened to them is told to their definitions at certain points only.
+class ICustomElementReactions {
+  public:
+    virtual ~ICustomElementReactions() = default;
+    virtual void Flush() = 0;
 };
 
 }  // namespace qorvex::dom

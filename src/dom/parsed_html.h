@@ -8,7 +8,6 @@
 
 #include "core/memory/containers.h"
 #include "dom/parse_arena.h"
-#include "qsl/function.h"
 #include "qsl/ref_ptr.h"
 
 struct GumboInternalOutput;
@@ -19,15 +18,16 @@ namespace qorvex::dom {
 class ParsedHTML : public AtomicRefCounted<ParsedHTML, MemoryTag::DOM> {
   public:
     // Runs once when the record dies; gives the source bytes back to who lent them.
-    using ReleaseSource = qsl::function<void()>;
+    using ReleaseSource = Function<void(), MemoryTag::DOM>;
 
     ParsedHTML(std::string_view source, ReleaseSource release);
     ~ParsedHTML();
+    ParsedHTML(const ParsedHTML&) = delete;
+    ParsedHTML& operator=(const ParsedHTML&) = delete;
 
-    GumboInternalNode* GetDocumentNode() const;
-    // Null when the parser made no root.
-    GumboInternalNode* GetRootNode() const;
-    std::string_view GetSource() const { return source_; }
+    // Null when the parser made nothing.
+    const GumboInternalNode* GetDocumentNode() const;
+    const GumboInternalNode* GetRootNode() const;
     size_t GetArenaBytes() const { return arena_.GetAllocatedBytes(); }
 
   private:
@@ -37,6 +37,7 @@ class ParsedHTML : public AtomicRefCounted<ParsedHTML, MemoryTag::DOM> {
     ParseArena arena_;
     std::string_view source_;
     ReleaseSource release_;
+    TaggedString<MemoryTag::DOM> rewritten_;  // what was parsed instead of a source that nests without end
 };
 
 // Borrows `bytes` until `release` is called. Any thread. Never null; a failed parse has no root.

@@ -12,7 +12,7 @@
 namespace qorvex::css {
 struct LayoutStyleRefs;
 class MediaFeatures;
-class Stylesheet;
+struct Stylesheet;
 }  // namespace qorvex::css
 
 namespace qorvex::dom {
@@ -30,7 +30,7 @@ class IStyleEngine {
 
     // Adds the rules of a sheet behind those already there. `media` is the text of a link's media attribute,
     // empty when there is none. The engine requests the full solve itself.
-    virtual void AddStyleSheet(Document& document, Element* owner, RefPtr<css::Stylesheet> sheet,
+    virtual void AddStyleSheet(Document& document, Element* owner, qsl::RefPtr<css::Stylesheet> sheet,
                                std::string_view media) = 0;
     virtual void RemoveStyleSheet(Document& document, Element* owner) = 0;
 

@@ -56,6 +56,7 @@ struct LayoutResult {
     Edges margin;
     Rect aabb{};
     Rect visualAabb{};
+    Rect viewBox{};  // the box under its transforms and the scrolling of its ancestors, in view coordinates
     Size scrollSize;
 };
 

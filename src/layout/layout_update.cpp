@@ -21,6 +21,7 @@ void SyncTrees(LayoutUpdateData& update) {
         result.scrollSize = node.scrollSize;
         result.aabb = node.aabb;
         result.visualAabb = node.visualAabb;
+        result.viewBox = MapBounds(node.world, node.box);
         data.scroll = ClampScroll(data.scroll, node);
         data.flags = node.flags;
         data.establishesStackingContext = node.establishesStackingContext;

@@ -58,6 +58,7 @@
     X(kCharset, "charset") \
     X(kMedia, "media") \
     X(kName, "name") \
+    X(kL10nId, "l10n-id") \
     X(kValue, "value") \
     X(kPlaceholder, "placeholder") \
     X(kDisabled, "disabled") \
