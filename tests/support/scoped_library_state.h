@@ -22,7 +22,7 @@ class ScopedLibraryState {
     }
     ~ScopedLibraryState() {
         CloseThreadScope();
-        StopLogging();
+        EndLogging();
         FreeIdleThreadRecords();
         EXPECT_EQ(allocator.Report(), "");
         SetAllocator(nullptr);

@@ -126,7 +126,7 @@ bool StartLogging(Logging::Severity threshold, Logging::ILogHandler* handler) {
     return true;
 }
 
-void StopLogging() {
+void EndLogging() {
     qsl::g_on_empty_function_call = nullptr;
     Logger* logger = g_logger.exchange(nullptr, std::memory_order_acq_rel);
     if (!logger) return;

@@ -10,7 +10,7 @@ namespace qorvex {
 /// so on standard error and changes nothing; the result tells whether this one started it.
 bool StartLogging(Logging::Severity threshold, Logging::ILogHandler* handler);
 /// No other thread may log any more.
-void StopLogging();
+void EndLogging();
 
 /// The handler that lines go to, null outside the logger's life.
 Logging::ILogHandler* GetLogHandler();

@@ -1,0 +1,130 @@
+// A task: a named function that some thread of the client will run, owned by exactly one holder at any time:
+// its creator, the list of those that wait, a queue, the thread that runs it. That thread destroys it.
+//
+// Tasks that depend on one another or are parent and child belong to one family, so that closing the family
+// takes all of them away together.
+#pragma once
+
+#include <atomic>
+#include <cstdint>
+#include <type_traits>
+#include <utility>
+
+#include <qorvex/work.h>
+
+#include "core/memory/allocator.h"
+#include "qsl/vector.h"
+
+namespace qorvex {
+
+class Task;
+class TaskSystem;
+
+using TaskPtr = UniquePtr<Task, MemoryTag::Tasks>;
+
+/// The numbers stand in log lines.
+enum class TaskChannels : uint32_t {
+    Main = 0,            ///< Main thread, in Advance: results that must reach the document or the client.
+    AfterAPICall = 1,    ///< Main thread, at the end of each public operation of a view.
+    ResourceEvents = 2,  ///< Main thread, in a view's Advance: finished loads.
+    Layout = 3,     ///< A client thread, or the main thread of a synchronous view: a frame's layout side.
+    Resources = 4,  ///< Client threads: parsing, decoding, fonts.
+};
+inline constexpr uint32_t kTaskChannelCount = 5;
+
+/// Where the tasks of one system, view or service go.
+struct TaskFamilyHandle {
+    uint32_t family = 0;
+    TaskSystem* system = nullptr;
+
+    void Push(TaskChannels channel, TaskPtr task) const;
+};
+
+/// Held by whoever wants to know whether a task is still to end; must outlive the task. The task clears it.
+struct TaskHandle {
+    std::atomic<Task*> task{nullptr};
+};
+
+class alignas(8) Task {
+  public:
+    explicit Task(const char* name) : id_(NextId()), name_(name) {}
+    Task(const Task&) = delete;
+    Task& operator=(const Task&) = delete;
+
+    virtual void Execute(TaskFamilyHandle family) = 0;
+    virtual ~Task();
+
+    int32_t id() const { return id_; }
+    const char* name() const { return name_; }
+    void SetHandle(TaskHandle* handle);
+
+  private:
+    friend class TaskSystem;
+
+    static int32_t NextId() { return next_id_.fetch_add(1, std::memory_order_relaxed); }
+    void ClearHandle();
+    /// Nothing waits for this task and it waits for nothing: it ends without telling anybody.
+    bool StandsAlone() const {
+        return child_count_.load(std::memory_order_acquire) == 0 && !parent_ && !handle_ &&
+               dependents_.empty();
+    }
+
+    static std::atomic<int32_t> next_id_;
+
+    const int32_t id_;
+    const char* const name_;  ///< A literal.
+    Task* parent_ = nullptr;
+    TaskHandle* handle_ = nullptr;
+    /// Changes under the task system's mutex; read without it where zero is final.
+    std::atomic<uint32_t> child_count_{0};
+    uint32_t dependency_count_ = 0;
+    qsl::Vector<Task*, TaggedStdAllocator<Task*, MemoryTag::Tasks>> dependents_;
+};
+
+namespace detail {
+template <class F>
+void CallTaskFunction(F& function, TaskFamilyHandle family) {
+    if constexpr (std::is_invocable_v<F&, TaskFamilyHandle>)
+        function(family);
+    else
+        function();
+}
+}  // namespace detail
+
+template <class F>
+class TaskFunc final : public Task {
+  public:
+    TaskFunc(const char* name, F function) : Task(name), function_(std::move(function)) {}
+    void Execute(TaskFamilyHandle family) override { detail::CallTaskFunction(function_, family); }
+
+  private:
+    F function_;
+};
+
+/// The second callable runs when the task goes, also when it was never run.
+template <class F, class G>
+class TaskFuncFinalizer final : public Task {
+  public:
+    TaskFuncFinalizer(const char* name, F function, G finalizer)
+        : Task(name), function_(std::move(function)), finalizer_(std::move(finalizer)) {}
+    ~TaskFuncFinalizer() override { finalizer_(); }
+    void Execute(TaskFamilyHandle family) override { detail::CallTaskFunction(function_, family); }
+
+  private:
+    F function_;
+    G finalizer_;
+};
+
+/// `function` takes the TaskFamilyHandle of the queue it came from, or nothing.
+template <class F>
+[[nodiscard]] TaskPtr MakeTask(const char* name, F&& function) {
+    return TaskPtr(New<TaskFunc<std::decay_t<F>>, MemoryTag::Tasks>(name, std::forward<F>(function)));
+}
+
+template <class F, class G>
+[[nodiscard]] TaskPtr MakeTask(const char* name, F&& function, G&& finalizer) {
+    using Made = TaskFuncFinalizer<std::decay_t<F>, std::decay_t<G>>;
+    return TaskPtr(New<Made, MemoryTag::Tasks>(name, std::forward<F>(function), std::forward<G>(finalizer)));
+}
+
+}  // namespace qorvex

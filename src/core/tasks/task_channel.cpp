@@ -1,0 +1,195 @@
+#include "core/tasks/task_channel.h"
+
+#include "core/logging/log.h"
+#include "core/tasks/task_system.h"
+
+namespace qorvex {
+
+/// A task that this thread is running. Loops nest, so the frames of a thread form a chain; a family that is
+/// closed from inside one of its own tasks must not wait for that one.
+class TaskChannel::RunFrame {
+  public:
+    RunFrame(const TaskChannel* channel, uint32_t family)
+        : channel_(channel), family_(family), outer_(innermost_) {
+        innermost_ = this;
+    }
+    ~RunFrame() { innermost_ = outer_; }
+
+    static int32_t CountOnThisThread(const TaskChannel* channel, uint32_t family) {
+        int32_t count = 0;
+        for (const RunFrame* frame = innermost_; frame; frame = frame->outer_)
+            count += frame->channel_ == channel && frame->family_ == family;
+        return count;
+    }
+
+  private:
+    static thread_local RunFrame* innermost_;
+    const TaskChannel* channel_;
+    uint32_t family_;
+    RunFrame* outer_;
+};
+
+constinit thread_local TaskChannel::RunFrame* TaskChannel::RunFrame::innermost_ = nullptr;
+
+void TaskChannel::Start(TaskChannels number, TaskSystem* system, OnTaskFinished on_finished,
+                        OnTaskPushed on_pushed) {
+    number_ = number;
+    system_ = system;
+    on_finished_ = std::move(on_finished);
+    on_pushed_ = std::move(on_pushed);
+}
+
+void TaskChannel::Open(uint32_t family) {
+    qsl::MutexLock lock(mutex_);
+    if (Find(family)) return;
+    families_.push_back(FamilyQueue{family, {}, MakeUnique<qsl::Condition, MemoryTag::Tasks>()});
+}
+
+void TaskChannel::Close(uint32_t family) {
+    TaskQueue left;
+    UniquePtr<qsl::Condition, MemoryTag::Tasks> idle;
+    {
+        qsl::MutexLock lock(mutex_);
+        const int32_t own = RunFrame::CountOnThisThread(this, family);
+        FamilyQueue* queue;
+        while ((queue = Find(family)) && queue->in_flight > own) {
+            LogDebug("Waiting for in-progress tasks on channel on family ", family);
+            queue->idle->Wait(lock);
+        }
+        if (!queue) return;
+        left.swap(queue->queue);
+        idle = std::move(queue->idle);
+        families_.erase(queue);
+        if (next_queue_ >= families_.size()) next_queue_ = families_.empty() ? 0 : families_.size() - 1;
+    }
+    // What a task owns may come back here when it goes, so the tasks go after the lock.
+}
+
+void TaskChannel::Put(uint32_t family, TaskPtr task) {
+    bool wake_all;
+    {
+        qsl::MutexLock lock(mutex_);
+        FamilyQueue* queue = Find(family);
+        if (!queue) {
+            lock.Unlock();
+            LogDebug("Trying to push task '", task->name(), "' to closed channel in family ", family,
+                     " dropping task!");
+            task.reset();
+            lock.Lock();
+            return;
+        }
+        queue->queue.push_back(std::move(task));
+        if (IsAnnounced() && (!HasWorkers(*queue) || number_ == TaskChannels::Resources)) on_pushed_(family);
+        if (!waiters_) return;
+        // One signal could reach a thread that waits for another family and be lost with it.
+        wake_all = choosy_waiters_ && waiters_ > 1;
+    }
+    wake_all ? work_.Broadcast() : work_.Signal();
+}
+
+void TaskChannel::Run(bool blocking, const std::atomic<uint32_t>* stop_flag, uint32_t family) {
+    const auto stopped = [stop_flag] { return stop_flag && stop_flag->load(std::memory_order_acquire) != 0; };
+    qsl::MutexLock lock(mutex_);
+    Register(family, +1);
+    while (!stopped()) {
+        if (quit_.load(std::memory_order_relaxed)) return Leave(family, false);
+        if (family != kAllTaskFamilies && !Find(family)) {
+            // The placeholder is part of the text.
+            LogDebug("Trying to do tasks on a family (%d) channel that is closed", family);
+            return Leave(family, false);
+        }
+        FamilyQueue* queue = Choose(family);
+        if (!queue) {
+            if (!blocking) return Leave(family, false);
+            WaitForWork(lock, family);
+            continue;
+        }
+        TaskPtr task = queue->queue.pop_front();
+        const uint32_t from = queue->family;
+        ++queue->in_flight;
+        lock.Unlock();
+        {
+            RunFrame frame(this, from);
+            task->Execute({from, system_});
+            on_finished_(from, task);
+            // The task goes before it stops counting as in flight: once a family is closed nothing of it is
+            // left.
+            task.reset();
+        }
+        lock.Lock();
+        NoteFinished(from);
+    }
+    Leave(family, true);
+}
+
+void TaskChannel::Quit() {
+    {
+        qsl::MutexLock lock(mutex_);
+        quit_.exchange(true);
+    }
+    work_.Broadcast();
+}
+
+TaskChannel::FamilyQueue* TaskChannel::Find(uint32_t family) {
+    for (FamilyQueue& queue : families_)
+        if (queue.family == family) return &queue;
+    return nullptr;
+}
+
+TaskChannel::FamilyQueue* TaskChannel::Choose(uint32_t family) {
+    if (family != kAllTaskFamilies) {
+        FamilyQueue* queue = Find(family);
+        return queue && !queue->queue.empty() ? queue : nullptr;
+    }
+    for (uint32_t looked = 0; looked < families_.size(); ++looked) {
+        FamilyQueue& queue = families_[next_queue_];
+        next_queue_ = next_queue_ + 1 == families_.size() ? 0 : next_queue_ + 1;
+        if (!queue.queue.empty()) return &queue;
+    }
+    return nullptr;
+}
+
+void TaskChannel::Register(uint32_t family, int change) {
+    if (!IsAnnounced()) return;
+    if (family == kAllTaskFamilies) {
+        all_workers_ += change;
+        return;
+    }
+    FamilyQueue* queue = Find(family);
+    // A family that was closed and opened again in between does not know this thread.
+    if (queue && (change > 0 || queue->workers)) queue->workers += change;
+}
+
+bool TaskChannel::HasWorkers(const FamilyQueue& queue) const {
+    return queue.workers || all_workers_;
+}
+
+void TaskChannel::Leave(uint32_t family, bool stopped) {
+    Register(family, -1);
+    // Work that came while this thread was there was not announced, and now nobody may be left to see it.
+    if (!stopped || !IsAnnounced()) return;
+    for (const FamilyQueue& queue : families_) {
+        const bool served = family == kAllTaskFamilies || family == queue.family;
+        if (served && !queue.queue.empty() && !HasWorkers(queue)) on_pushed_(queue.family);
+    }
+}
+
+void TaskChannel::NoteFinished(uint32_t family) {
+    FamilyQueue* queue = Find(family);
+    if (!queue) {
+        LogWarning("A family (%d) channel was closed while there were still tasks in-flight!", family);
+        return;
+    }
+    if (--queue->in_flight <= 0) queue->idle->Broadcast();
+}
+
+void TaskChannel::WaitForWork(qsl::MutexLock& lock, uint32_t family) {
+    const uint32_t choosy = family == kAllTaskFamilies ? 0 : 1;
+    ++waiters_;
+    choosy_waiters_ += choosy;
+    work_.Wait(lock);
+    --waiters_;
+    choosy_waiters_ -= choosy;
+}
+
+}  // namespace qorvex

@@ -1,0 +1,74 @@
+// One of the five work queues, divided by task family, and the loop in which client threads take tasks from
+// it.
+//
+// Invariants: everything below the mutex is touched with it held; a task runs with no lock of this room held;
+// the task system's mutex may be held when this one is taken, never the other way round.
+#pragma once
+
+#include <atomic>
+#include <cstdint>
+
+#include "core/memory/containers.h"
+#include "core/tasks/task_queue.h"
+#include "qsl/mutex.h"
+
+namespace qorvex {
+
+class TaskChannel {
+  public:
+    /// Told of each task that has run, with no lock held; may keep the task.
+    using OnTaskFinished = Function<void(uint32_t family, TaskPtr& task), MemoryTag::Tasks>;
+    /// Announces new work of a family to the client. Called with the channel's mutex held.
+    using OnTaskPushed = Function<void(uint32_t family), MemoryTag::Tasks>;
+
+    void Start(TaskChannels number, TaskSystem* system, OnTaskFinished on_finished, OnTaskPushed on_pushed);
+
+    void Open(uint32_t family) QSL_EXCLUDES(mutex_);
+    /// Waits for tasks of the family that other threads are running, and destroys the rest without running
+    /// it.
+    void Close(uint32_t family) QSL_EXCLUDES(mutex_);
+    /// A task for a family that is not open is destroyed.
+    void Put(uint32_t family, TaskPtr task) QSL_EXCLUDES(mutex_);
+    /// Runs tasks of one family, or of all, until there are none, or, when blocking, until the channel quits
+    /// or the flag is set.
+    void Run(bool blocking, const std::atomic<uint32_t>* stop_flag, uint32_t family) QSL_EXCLUDES(mutex_);
+    void Quit() QSL_EXCLUDES(mutex_);
+
+  private:
+    struct FamilyQueue {
+        using TriviallyRelocatable = FamilyQueue;
+        uint32_t family;
+        TaskQueue queue;
+        /// Apart, because waiters must not move with the entry.
+        UniquePtr<qsl::Condition, MemoryTag::Tasks> idle;
+        int32_t in_flight = 0;
+        uint32_t workers = 0;
+    };
+    class RunFrame;
+
+    FamilyQueue* Find(uint32_t family) QSL_REQUIRES(mutex_);
+    FamilyQueue* Choose(uint32_t family) QSL_REQUIRES(mutex_);
+    void Register(uint32_t family, int change) QSL_REQUIRES(mutex_);
+    bool HasWorkers(const FamilyQueue& queue) const QSL_REQUIRES(mutex_);
+    void Leave(uint32_t family, bool stopped) QSL_REQUIRES(mutex_);
+    void NoteFinished(uint32_t family) QSL_REQUIRES(mutex_);
+    void WaitForWork(qsl::MutexLock& lock, uint32_t family) QSL_REQUIRES(mutex_);
+    bool IsAnnounced() const { return static_cast<bool>(on_pushed_); }
+
+    TaskChannels number_ = TaskChannels::Main;
+    TaskSystem* system_ = nullptr;
+    OnTaskFinished on_finished_;
+    OnTaskPushed on_pushed_;
+
+    qsl::Mutex mutex_;
+    qsl::Condition work_;
+    Vector<FamilyQueue, MemoryTag::Tasks> families_ QSL_GUARDED_BY(mutex_);
+    uint32_t next_queue_ QSL_GUARDED_BY(mutex_) = 0;
+    /// Threads in a loop over all families; they count as workers of each.
+    uint32_t all_workers_ QSL_GUARDED_BY(mutex_) = 0;
+    uint32_t waiters_ QSL_GUARDED_BY(mutex_) = 0;
+    uint32_t choosy_waiters_ QSL_GUARDED_BY(mutex_) = 0;
+    std::atomic<bool> quit_{false};
+};
+
+}  // namespace qorvex
