@@ -54,6 +54,9 @@ class IDebugInterface {
     // True when the page's "load" event has been sent.
     virtual bool IsLoaded(View* view) = 0;
 
+    // True when the last Advance gave the layout side something to do; false when nothing had changed.
+    virtual bool HasChanged(View* view) = 0;
+
     // Console calls of all pages go to the callback instead of the log. They come on the main thread, inside
     // a public call. Null restores the log.
     virtual void SetConsoleCallback(ConsoleCallback callback, void* userData) = 0;

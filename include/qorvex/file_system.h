@@ -1,7 +1,7 @@
 // File access and piecemeal data, as the rendering library expects them.
 #pragma once
 
-#include <fresco/io.h>
+#include <fresco/file_manipulator.h>
 
 namespace qorvex {
 

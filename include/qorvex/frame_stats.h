@@ -11,6 +11,10 @@ class View;
 // An id of this project's own, beyond those that the engine family shares.
 constexpr unsigned kFrameStatsFeature = 0x51000001u;
 
+// A switch for LibraryParams::AdditionalOptions: counts allocations for each thread, at the price of one more call
+// for each of them.
+constexpr const char* kCountAllocationsOption = "--count-allocations";
+
 // Stages of a frame in thread CPU milliseconds. Advance is the whole main-thread call; the sum of Script,
 // Style and Commit is a part of it, and in synchronous layout mode so are Layout and Record.
 struct FrameStats {
@@ -27,7 +31,8 @@ struct FrameStats {
     std::uint64_t LaidOut = 0;        // layout nodes whose geometry was worked on
     std::uint64_t Recorded = 0;       // display elements recorded
     std::uint64_t PaintedPixels = 0;  // pixels inside the redrawn rectangles
-    std::uint64_t Allocations = 0;    // requests to the client's allocator inside Advance, on its thread
+    // With kCountAllocationsOption: requests to the client's allocator inside Advance, on its thread; else 0.
+    std::uint64_t Allocations = 0;
 };
 
 class IFrameStats {

@@ -19,15 +19,13 @@ struct SystemRendererSettings {
     bool EnableDebugNames = false;
 };
 
-// A surface of the rendering back end as it takes one. For the CPU back end, ColorTarget is a pointer to the
-// first pixel and RowPitch the distance between rows.
+// What View's drawing is to fit. The colour target itself is an object of the rendering back end: for the CPU
+// back end a fresco::CpuRenderTarget, which names the pixels and their row pitch.
 struct RenderTargetDescription {
-    std::uint32_t Flags = 0;
+    std::uint32_t Flags = 256;
     std::uint32_t Width = 0;  // pixels
     std::uint32_t Height = 0;
     std::uint32_t Samples = 1;
-    std::uint32_t RowPitch = 0;  // bytes; 0 means rows follow each other without a gap
-    std::uint32_t Format = 0;    // a pixel format of the rendering library; 0 is premultiplied RGBA8
 };
 
 // Draws the frames of one view. Must be destroyed before its View.
@@ -60,8 +58,9 @@ class SystemRenderer {
     // One for each view. Released with ViewRenderer::Destroy.
     virtual ViewRenderer* CreateViewRenderer(View* view) = 0;
     virtual void Destroy() = 0;
-    // Tells an internal rendering library which thread this is and hands it what its back end needs there.
-    virtual void RegisterRenderThread(void* backendData) = 0;
+    // The calling thread becomes the render thread of an internal rendering library; the arguments belong to
+    // its back end (the CPU one takes none).
+    virtual void RegisterRenderThread(void* device, void* context, std::uint64_t flags) = 0;
     // Drops what an internal rendering library holds for all views. Call every ViewRenderer's
     // FreeRenderingResources along with it.
     virtual void FreeRenderingResources() = 0;

@@ -14,10 +14,11 @@ struct UserImageData {
     std::uint32_t ContentRect[4] = {0, 0, 0, 0};
     // The client's own id, for System::UserImagesChanged. 0: the image never changes.
     std::uint32_t UserImageId = 0;
-    std::uint32_t Format = 0;  // a pixel format of the rendering library; 0 is RGBA8
-    void* Texture = nullptr;   // the client's image object, as the rendering back end takes it
-    bool HasAlpha = true;
-    bool AlphaPremultiplied = true;
+    std::uint32_t Format = 0;  // a fresco::PixelFormat; 0 is RGBA8
+    // The client's image object as the rendering back end takes it; for the CPU back end a fresco::UserImage.
+    void* Texture = nullptr;
+    bool PlainPixels = false;  // true: Texture points at the pixels themselves, which never change
+    bool TopDown = true;       // false: the last row comes first
 };
 
 }  // namespace qorvex

@@ -42,4 +42,12 @@ inline constexpr size_t kMaxDocumentDepth = 512;
 /// of this (5,000 take 20 ms, 100,000 take 17 s).
 inline constexpr size_t kMaxSourceNesting = 4096;
 
+/// Loads that finish inside the request for them may run a script that asks for the next one; deeper than this
+/// they wait for the next frame.
+inline constexpr uint32_t kMaxNestedResourceEvents = 16;
+
+/// Frame ids of a view that wait for Paint. A client that never paints keeps the newest so many; at 60 frames a
+/// second a client that paints late has four seconds.
+inline constexpr size_t kMaxWaitingFrames = 256;
+
 }  // namespace qorvex::limits

@@ -35,7 +35,7 @@ JSClassRef CreateClass(ScriptClass script_class, const ClassDescription* descrip
 }  // namespace
 
 void CreateScriptClasses(std::span<const ClassDescription* const> descriptions) {
-    LogInfo("Initializing scripting...");
+    LogTrace("Initializing scripting...");
     g_descriptions = {};
     for (const ClassDescription* description : descriptions) {
         g_descriptions[static_cast<size_t>(description->script_class)] = description;
@@ -48,7 +48,7 @@ void CreateScriptClasses(std::span<const ClassDescription* const> descriptions) 
 }
 
 void ReleaseScriptClasses() {
-    LogInfo("Uninitializing scripting...");
+    LogTrace("Uninitializing scripting...");
     ScriptClassTable& table = GetScriptClassTable();
     for (size_t i = 0; i < kScriptClassCount; ++i) {
         const auto script_class = static_cast<ScriptClass>(i);

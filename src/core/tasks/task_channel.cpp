@@ -1,6 +1,7 @@
 #include "core/tasks/task_channel.h"
 
 #include "core/logging/log.h"
+#include "core/memory/temp_allocator.h"
 #include "core/tasks/task_system.h"
 
 namespace qorvex {
@@ -58,6 +59,7 @@ void TaskChannel::Close(uint32_t family) {
         }
         if (!queue) return;
         left.swap(queue->queue);
+        pending_.fetch_sub(left.size(), std::memory_order_release);
         idle = std::move(queue->idle);
         families_.erase(queue);
         if (next_queue_ >= families_.size()) next_queue_ = families_.empty() ? 0 : families_.size() - 1;
@@ -79,6 +81,7 @@ void TaskChannel::Put(uint32_t family, TaskPtr task) {
             return;
         }
         queue->queue.push_back(std::move(task));
+        pending_.fetch_add(1, std::memory_order_relaxed);
         if (IsAnnounced() && (!HasWorkers(*queue) || number_ == TaskChannels::Resources)) on_pushed_(family);
         if (!waiters_) return;
         // One signal could reach a thread that waits for another family and be lost with it.
@@ -110,12 +113,15 @@ void TaskChannel::Run(bool blocking, const std::atomic<uint32_t>* stop_flag, uin
         lock.Unlock();
         {
             RunFrame frame(this, from);
+            TempMark mark;
+            LogTrace("Executing task ", task->name());
             task->Execute({from, system_});
             on_finished_(from, task);
             // The task goes before it stops counting as in flight: once a family is closed nothing of it is
             // left.
             task.reset();
         }
+        pending_.fetch_sub(1, std::memory_order_release);
         lock.Lock();
         NoteFinished(from);
     }

@@ -33,6 +33,8 @@ class TaskChannel {
     /// or the flag is set.
     void Run(bool blocking, const std::atomic<uint32_t>* stop_flag, uint32_t family) QSL_EXCLUDES(mutex_);
     void Quit() QSL_EXCLUDES(mutex_);
+    /// Tasks that are queued or running. A task that another one pushes counts before that one stops counting.
+    uint32_t GetPending() const { return pending_.load(std::memory_order_acquire); }
 
   private:
     struct FamilyQueue {
@@ -69,6 +71,7 @@ class TaskChannel {
     uint32_t waiters_ QSL_GUARDED_BY(mutex_) = 0;
     uint32_t choosy_waiters_ QSL_GUARDED_BY(mutex_) = 0;
     std::atomic<bool> quit_{false};
+    std::atomic<uint32_t> pending_{0};
 };
 
 }  // namespace qorvex

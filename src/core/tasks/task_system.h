@@ -44,6 +44,10 @@ class TaskSystem {
     void Run(TaskChannels channel, bool blocking, const std::atomic<uint32_t>* stop_flag, uint32_t family);
     /// The way in for client threads.
     void ExecuteWork(WorkType type, WorkExecutionMode mode, uint32_t family);
+    /// Tasks of all families on the channel that are queued or running.
+    uint32_t GetPendingTasks(TaskChannels channel) const {
+        return channels_[static_cast<uint32_t>(channel)].GetPending();
+    }
     /// Ends all run loops; the channels run nothing any more.
     void Stop();
     bool IsRunning() const { return running_.load(std::memory_order_acquire); }
