@@ -50,4 +50,12 @@ inline constexpr uint32_t kMaxNestedResourceEvents = 16;
 /// second a client that paints late has four seconds.
 inline constexpr size_t kMaxWaitingFrames = 256;
 
+/// Pixels a side of a surface that holds a blurred shadow: twice a 4K screen; a larger one would be mostly
+/// out of sight.
+inline constexpr size_t kMaxShadowSurfaceSide = 8192;
+
+/// Repetitions of a gradient that are drawn one by one for one background; a smaller pattern is not seen as
+/// one.
+inline constexpr size_t kMaxGradientTiles = 4096;
+
 }  // namespace qorvex::limits

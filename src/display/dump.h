@@ -1,5 +1,5 @@
-// Text of the layout tree and of the stacking contexts, for tests and for people. Layout side idle, any
-// thread.
+// Text of the layout tree and of the stacking contexts, for tests and for people. Any thread, while the
+// layout side is idle.
 #pragma once
 
 #include "core/memory/containers.h"
@@ -7,9 +7,11 @@
 
 namespace qorvex::dsp {
 
-// One line a node: depth as indentation, name, box, flags.
-String DumpLayoutTree(const layout::LayoutHandle& root);
-// The paint order of every stacking context, nested.
-String DumpStackingContexts(const layout::LayoutHandle& root);
+using DumpText = TaggedString<MemoryTag::DebugDump>;
+
+// One line a node in tree order: display, box, flags.
+DumpText DumpLayoutTree(const layout::LayoutHandle& root);
+// One line a node in paint order; what a context or clip paints by itself is indented below it.
+DumpText DumpStackingContexts(const layout::LayoutHandle& root);
 
 }  // namespace qorvex::dsp

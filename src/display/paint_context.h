@@ -1,16 +1,12 @@
 // What display elements see while one frame is recorded. Lives for one record, on the layout thread.
 #pragma once
 
-#include "css/values/length.h"
-#include "layout/geometry.h"
+#include "css/values/color.h"
+#include "css/values/length_context.h"
+#include "layout/layout_handle.h"
 #include "layout/work_counters.h"
 
-#include <span>
-
-namespace fresco {
-class EffectFactory;
-class Library;
-}  // namespace fresco
+#include <fresco/paint.h>
 
 namespace qorvex::dsp {
 
@@ -21,7 +17,6 @@ struct FrameRecord;
 
 class PaintContext {
   public:
-    fresco::Library* library = nullptr;
     FrameRecord& record;
     ShadowCache& shadows;
     PathCache& paths;
@@ -34,11 +29,16 @@ class PaintContext {
     bool snapToPixels = true;
     bool partialRedraw = false;
     bool showDirtyRects = false;
-    // Areas to paint in view coordinates; everything outside may be left out.
-    std::span<const layout::Rect> dirty;
-
-    // The node's box as it is painted: snapped unless the library was started without snapping.
-    layout::Rect PaintBox(const layout::LayoutNode& node) const;
 };
+
+inline fresco::Color ToFresco(const css::Color& color) {
+    return {color.red, color.green, color.blue, color.alpha};
+}
+
+inline fresco::Paint SolidPaint(const fresco::Color& color) {
+    fresco::Paint paint;
+    paint.color = color;
+    return paint;
+}
 
 }  // namespace qorvex::dsp

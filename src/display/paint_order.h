@@ -1,12 +1,14 @@
 // The order in which the nodes of one stacking context paint.
 //
-// From back to front: negative z-index contexts; in-flow content in tree order; positioned content and
-// z-index 0 contexts in tree order, however deep; positive z-index contexts (CSS 2.1, appendix E, without
-// floats).
+// From back to front: contexts of negative z-index; in-flow content in tree order; positioned content and
+// contexts of z-index 0 in tree order, however deep; contexts of positive z-index (CSS 2.1, appendix E,
+// without floats). A positioned node that is no context paints together with its own in-flow content, as one
+// layer.
 #pragma once
 
-#include "core/memory/containers.h"
+#include "core/memory/temp_vector.h"
 #include "layout/layout_handle.h"
+#include "layout/work_counters.h"
 
 #include <span>
 
@@ -15,20 +17,30 @@ namespace qorvex::dsp {
 struct PaintEntry {
     const layout::LayoutNode* node = nullptr;
     int32_t zIndex = 0;
-    uint32_t layer = 0;  // 0 for in-flow content, 1 for positioned content and contexts
+    uint32_t layer =
+        0;  // 0: in flow; else the tree order of the positioned node or context that it paints with
     uint32_t order = 0;  // tree order
 };
 
 using PaintList = TempVector<PaintEntry>;
 
 // Lists what paints below `context`, which is a stacking context, a clip or the root. Children of entries
-// that are contexts or clips are left to the recursion of those entries. With a cull rectangle (view
-// coordinates), what cannot touch it is left out.
-void CollectPaintOrder(const layout::LayoutNode& context, std::span<const layout::Rect> cull, PaintList& out);
+// that are contexts or clips are left to the recursion of those entries. What touches none of the rectangles
+// in `areas` (view coordinates) is left out with its subtree; no rectangles ask for everything.
+void CollectPaintOrder(const layout::LayoutNode& context, std::span<const layout::Rect> areas, PaintList& out,
+                       layout::WorkCounters& counters);
 
 // A plain node paints by itself; a context or clip recurses.
 inline bool PaintsAsUnit(const layout::LayoutNode& node) {
     return node.establishesStackingContext || node.flags.shouldOverflowClip;
+}
+
+inline bool TouchesAny(std::span<const layout::Rect> areas, const layout::Rect& rect) {
+    if (areas.empty()) return true;
+    for (const layout::Rect& area : areas) {
+        if (layout::Intersects(area, rect)) return true;
+    }
+    return false;
 }
 
 }  // namespace qorvex::dsp

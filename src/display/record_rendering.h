@@ -8,9 +8,8 @@
 namespace qorvex::dsp {
 
 struct RecordRequest {
-    fresco::Library* library = nullptr;  // makes buffers, surfaces, images and paths
-    RenderCaches& caches;                // of the view, used on the layout thread only
-    float scaleX = 1;                    // virtual resolution
+    RenderCaches& caches;  // of the view, used on the layout thread only
+    float scaleX = 1;      // virtual resolution
     float scaleY = 1;
     bool partialRedraw = true;
     bool showPaintRectangles = false;

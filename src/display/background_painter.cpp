@@ -1,0 +1,126 @@
+#include "display/background_painter.h"
+
+#include "css/values/style_groups.h"
+#include "display/gradient_painter.h"
+
+#include <algorithm>
+
+namespace qorvex::dsp {
+
+using fresco::CommandBuffer;
+using layout::Edges;
+using layout::LayoutNode;
+using layout::Rect;
+
+namespace {
+
+constexpr float kMinArea = 0.001f;
+
+bool HasBorderImage(const css::VisualStyle& visual) {
+    return visual.borderImageSource.kind > css::ImageKind::Initial;
+}
+
+// A pixel less below each border, so that the colour does not bleed through the antialiased edge outside.
+// Sides that take room without painting (dotted, dashed) hide nothing and get none.
+Edges BleedInset(const BoxShape& shape) {
+    auto inset = [](float width) { return width > 1 ? 1.0f : 0.0f; };
+    return {inset(shape.border.left), inset(shape.border.right), inset(shape.border.top),
+            inset(shape.border.bottom)};
+}
+
+void ClipToShape(const BoxShape& shape, CommandBuffer& buffer) {
+    buffer.PushState(fresco::kStateClip);
+    shape.IsRounded() ? buffer.ClipRoundedRect(shape.box, shape.radii, fresco::kClipIntersect)
+                      : buffer.ClipRect(shape.box, fresco::kClipIntersect);
+}
+
+void DrawImageLayer(const ImageSlot& slot, const ResolvedImageLayer& layer, const Rect& box,
+                    CommandBuffer& buffer) {
+    Rect tile = layer.tile;
+    tile.x += box.x;
+    tile.y += box.y;
+    const auto image = static_cast<fresco::ImageId>(slot.resource);
+    if (!layer.repeatX && !layer.repeatY) {
+        buffer.DrawImage(image, tile, {}, fresco::Paint());
+        return;
+    }
+    Rect area = box;
+    if (!layer.repeatX) area.x = tile.x, area.width = tile.width;
+    if (!layer.repeatY) area.y = tile.y, area.height = tile.height;
+    buffer.DrawImageTiled(image, area, {{}, tile, layer.spacingX, layer.spacingY}, fresco::Paint());
+}
+
+}  // namespace
+
+void PaintBackgroundColor(const LayoutNode& node, const BoxShape& shape, CommandBuffer& buffer) {
+    const css::VisualStyle& visual = *node.style.visual;
+    if (visual.backgroundColor.alpha <= 0) return;
+    const Edges inset = HasBorderImage(visual) ? Edges{} : BleedInset(shape);
+    const Rect rect = layout::Inset(shape.box, inset);
+    if (rect.width * rect.height <= kMinArea) return;
+    const fresco::Paint paint = SolidPaint(ToFresco(visual.backgroundColor));
+    const layout::Point center{rect.x + rect.width / 2, rect.y + rect.height / 2};
+    if (!shape.IsRounded()) {
+        buffer.FillRect(rect, paint);
+    } else if ((shape.bits & kShapeCircle) != 0) {
+        buffer.FillCircle(center.x, center.y, 0, rect.width / 2, paint);
+    } else if ((shape.bits & kShapeEllipse) != 0) {
+        buffer.FillEllipse(center.x, center.y, 0, rect.width / 2, rect.height / 2, paint);
+    } else {
+        buffer.FillRoundedRect(rect, InsetRadii(shape.radii, inset), paint);
+    }
+}
+
+void PaintBackgroundImages(PaintContext& context, const LayoutNode& node, const BoxShape& shape,
+                           ImageSlots& slots, CommandBuffer& buffer) {
+    const css::VisualStyle& visual = *node.style.visual;
+    if (visual.backgroundImage.empty() || !node.visuals || layout::IsEmpty(shape.box)) return;
+    const auto& layers = node.visuals->backgrounds;
+    bool clipped = false;
+    for (size_t i = std::min<size_t>(visual.backgroundImage.size(), layers.size()); i-- > 0;) {
+        const css::ImageValue& image = visual.backgroundImage[i];
+        const bool isImage = !image.IsGradient() && i < slots.size() && slots[i].resource >= 0;
+        if (layout::IsEmpty(layers[i].tile) || (!image.gradient && !isImage)) continue;
+        if (!clipped) ClipToShape(shape, buffer);
+        clipped = true;
+        if (image.gradient) {
+            PaintGradientLayer(context, *image.gradient, layers[i], {shape.box.x, shape.box.y}, shape.box,
+                               buffer);
+        } else {
+            DrawImageLayer(slots[i], layers[i], shape.box, buffer);
+        }
+    }
+    if (clipped) buffer.PopState();
+}
+
+bool PaintBorderImage(const LayoutNode& node, const BoxShape& shape, ImageSlots& slots,
+                      CommandBuffer& buffer) {
+    const css::VisualStyle& visual = *node.style.visual;
+    if (!HasBorderImage(visual) || slots.empty() || slots[0].resource < 0 || !node.visuals) return false;
+    const ImageSlot& slot = slots[0];
+    const Edges& outset = node.visuals->borderImageOutset;
+    const Rect area = layout::Inset(shape.box, {-outset.left, -outset.right, -outset.top, -outset.bottom});
+    const Edges& w = node.visuals->borderImageWidth;
+    const Edges& s = slot.slices;
+    // The nine pieces as columns and rows of the image and of the area.
+    const float columns[4] = {area.x, area.x + w.left, layout::Right(area) - w.right, layout::Right(area)};
+    const float rows[4] = {area.y, area.y + w.top, layout::Bottom(area) - w.bottom, layout::Bottom(area)};
+    const float sourceColumns[4] = {0, s.left, slot.intrinsic.width - s.right, slot.intrinsic.width};
+    const float sourceRows[4] = {0, s.top, slot.intrinsic.height - s.bottom, slot.intrinsic.height};
+    const auto image = static_cast<fresco::ImageId>(slot.resource);
+    for (int row = 0; row < 3; ++row) {
+        for (int column = 0; column < 3; ++column) {
+            if (row == 1 && column == 1 && !visual.borderImageSlice.fill) continue;
+            const Rect dst{columns[column], rows[row], 0, columns[column + 1] - columns[column],
+                           rows[row + 1] - rows[row]};
+            const Rect src{sourceColumns[column], sourceRows[row], 0,
+                           sourceColumns[column + 1] - sourceColumns[column],
+                           sourceRows[row + 1] - sourceRows[row]};
+            if (!layout::IsEmpty(dst) && !layout::IsEmpty(src))
+                buffer.DrawImage(image, dst, src, fresco::Paint());
+        }
+    }
+    return true;
+}
+
+}  // namespace qorvex::dsp

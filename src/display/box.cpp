@@ -1,0 +1,32 @@
+#include "display/box.h"
+
+#include "display/background_painter.h"
+#include "display/border_painter.h"
+#include "display/box_shape.h"
+#include "display/shadow_painter.h"
+
+namespace qorvex::dsp {
+
+void Box::SetHasMask(bool on) {
+    SetFlag(kHasMask, on);
+    if (!on) {
+        mask_.reset();
+    } else if (!mask_) {
+        mask_ = MakeUnique<ImageSlots, MemoryTag::Rendering>();
+    }
+}
+
+void Box::Paint(PaintContext& context, bool dirty, const layout::LayoutNode& node,
+                fresco::CommandBuffer& buffer) {
+    const BoxShape shape = AnalyseBox(node, context.snapToPixels);
+    PaintOuterShadows(context, node, shape, buffer);
+    PaintBackgroundColor(node, shape, buffer);
+    PaintBackgroundImages(context, node, shape, background_, buffer);
+    PaintInsetShadows(context, node, shape, buffer);
+    PaintContent(context, dirty, node, buffer);
+    if (!PaintBorderImage(node, shape, border_image_, buffer)) PaintBorder(context, shape, buffer);
+}
+
+void Box::PaintContent(PaintContext&, bool, const layout::LayoutNode&, fresco::CommandBuffer&) {}
+
+}  // namespace qorvex::dsp

@@ -1,0 +1,62 @@
+#include "display/mask_painter.h"
+
+#include "core/logging/log.h"
+#include "css/values/style_groups.h"
+#include "display/box.h"
+#include "display/gradient_painter.h"
+#include "display/transforms.h"
+
+namespace qorvex::dsp {
+
+using fresco::CommandBuffer;
+using layout::LayoutNode;
+using layout::Rect;
+
+namespace {
+
+ImageSlots* SlotsOf(const LayoutNode& node) {
+    if (!node.display || !node.display->Has(IDisplayElement::kPaintsBox)) return nullptr;
+    return static_cast<Box*>(node.display.get())->MaskSlots();
+}
+
+// A gradient has no image: what it paints, as a layer of its own, is what stays of the content.
+void ApplyGradientMask(const LayoutNode& node, PaintContext& context, const ResolvedImageLayer& layer,
+                       const Rect& box, CommandBuffer& buffer) {
+    CommandBuffer* mask =
+        buffer.BeginLayer(fresco::kLayerContent, fresco::MakeLayerPaint(1, fresco::kBlendDestinationIn));
+    PaintGradientLayer(context, *node.style.visual->maskImage.gradient, layer, {box.x, box.y}, box, *mask);
+    mask->EndLayer();
+}
+
+}  // namespace
+
+MaskState PrepareMask(const LayoutNode& node) {
+    const css::ImageValue& image = node.style.visual->maskImage;
+    if (image.kind <= css::ImageKind::Initial) return MaskState::None;
+    if (image.gradient) return MaskState::Ready;
+    const ImageSlots* slots = SlotsOf(node);
+    if (slots == nullptr || slots->empty()) return MaskState::Hold;
+    if (slots->size() > 1) LogWarning("Multiple mask images are not supported!");
+    return (*slots)[0].resource >= 0 ? MaskState::Ready : MaskState::Hold;
+}
+
+void ApplyMask(const LayoutNode& node, PaintContext& context, CommandBuffer& buffer) {
+    if (!node.visuals || node.visuals->masks.empty()) return;
+    const ResolvedImageLayer& layer = node.visuals->masks[0];
+    const Rect box = PaintBox(node, context.snapToPixels);
+    if (node.style.visual->maskImage.gradient) {
+        ApplyGradientMask(node, context, layer, box, buffer);
+        return;
+    }
+    const auto image = static_cast<fresco::ImageId>((*SlotsOf(node))[0].resource);
+    Rect tile = layer.tile;
+    tile.x += box.x;
+    tile.y += box.y;
+    if (!layer.repeatX && !layer.repeatY) {
+        buffer.SetMaskImage(image, tile, {}, 0);
+    } else {
+        buffer.SetMaskImageTiled(image, box, {{}, tile, layer.spacingX, layer.spacingY}, 0);
+    }
+}
+
+}  // namespace qorvex::dsp

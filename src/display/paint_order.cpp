@@ -1,0 +1,68 @@
+#include "display/paint_order.h"
+
+#include <algorithm>
+
+namespace qorvex::dsp {
+
+using layout::kChildGroup;
+using layout::LayoutNode;
+using layout::Rect;
+
+namespace {
+
+bool PaintsBefore(const PaintEntry& a, const PaintEntry& b) {
+    if (a.zIndex != b.zIndex) return a.zIndex < b.zIndex;
+    if (a.layer != b.layer) return a.layer < b.layer;
+    return a.order < b.order;
+}
+
+class Collector {
+  public:
+    Collector(std::span<const Rect> areas, PaintList& out, layout::WorkCounters& counters)
+        : areas_(areas), out_(out), counters_(counters) {}
+
+    // Depth first, in tree order. Recursion ends at contexts and clips, and at the depth limit.
+    void Walk(const LayoutNode& parent, uint32_t layer) {
+        const uint32_t count = parent.children.size();
+        for (uint32_t i = 0; i < count; ++i) {
+            // A group of children out of sight costs one test.
+            if (i % kChildGroup == 0 && i / kChildGroup < parent.groups.size() &&
+                !TouchesAny(areas_, parent.groups[i / kChildGroup].visual)) {
+                i += kChildGroup - 1;
+                order_ += kChildGroup;
+                continue;
+            }
+            Take(parent.children[i]->node(), layer);
+        }
+    }
+
+  private:
+    void Take(const LayoutNode& node, uint32_t layer) {
+        ++order_;
+        if (node.IsBeyondLimit()) return;
+        ++counters_.visited;
+        if (!TouchesAny(areas_, node.visualAabb)) return;
+        const bool positioned = node.flags.isPositioned || node.establishesStackingContext;
+        const uint32_t own = positioned ? order_ : layer;
+        out_.push_back({&node, node.establishesStackingContext ? node.zIndex : 0, own, order_});
+        if (!PaintsAsUnit(node)) Walk(node, own);
+    }
+
+    std::span<const Rect> areas_;
+    PaintList& out_;
+    layout::WorkCounters& counters_;
+    uint32_t order_ = 0;
+};
+
+}  // namespace
+
+void CollectPaintOrder(const LayoutNode& context, std::span<const Rect> areas, PaintList& out,
+                       layout::WorkCounters& counters) {
+    const uint32_t first = out.size();
+    Collector(areas, out, counters).Walk(context, 0);
+    // Most lists hold nothing but in-flow content, which was found in its order.
+    if (!std::is_sorted(out.begin() + first, out.end(), PaintsBefore))
+        std::sort(out.begin() + first, out.end(), PaintsBefore);
+}
+
+}  // namespace qorvex::dsp

@@ -1,0 +1,167 @@
+#include "display/record_node.h"
+
+#include "css/values/style_groups.h"
+#include "display/box_shape.h"
+#include "display/clip_path.h"
+#include "display/dirty_region.h"
+#include "display/layer_effects.h"
+#include "display/mask_painter.h"
+#include "display/paint_order.h"
+#include "display/transforms.h"
+
+namespace qorvex::dsp {
+
+using fresco::CommandBuffer;
+using layout::LayoutNode;
+using layout::Rect;
+
+namespace {
+
+using Areas = std::span<const Rect>;
+
+// Counts the pushes of one scope and takes them back together.
+class StateScope {
+  public:
+    explicit StateScope(CommandBuffer& buffer) : buffer_(buffer) {}
+    StateScope(const StateScope&) = delete;
+    StateScope& operator=(const StateScope&) = delete;
+    ~StateScope() {
+        while (pushes_-- > 0)
+            buffer_.PopState();
+    }
+    void Push(uint32_t mask) {
+        buffer_.PushState(mask);
+        ++pushes_;
+    }
+
+  private:
+    CommandBuffer& buffer_;
+    int pushes_ = 0;
+};
+
+bool IsVisible(const LayoutNode& node) {
+    return node.style.visual->visibility == css::Visibility::Visible;
+}
+
+void PaintOwn(const LayoutNode& node, PaintContext& context, Areas areas, CommandBuffer& buffer) {
+    if (!node.display || !IsVisible(node) || !TouchesAny(areas, node.paintBounds)) return;
+    context.lengths.em = node.style.text->computedFontSize;
+    node.display->Paint(context, context.partialRedraw, node, buffer);
+    ++context.counters.recorded;
+}
+
+void ClipToPaddingBox(const LayoutNode& node, const PaintContext& context, CommandBuffer& buffer) {
+    const Rect padding = ClipBox(node, context.snapToPixels);
+    if (node.visuals && HasRadii(node.visuals->radii)) {
+        const Rect box = PaintBox(node, context.snapToPixels);
+        fresco::CornerRadii radii = node.visuals->radii;
+        FitRadii(radii, box.width, box.height);
+        buffer.ClipRoundedRect(padding, InsetRadii(radii, node.border), fresco::kClipIntersect);
+    } else {
+        buffer.ClipRect(padding, fresco::kClipIntersect);
+    }
+}
+
+// The areas of the children: cut by the node's clip, or all that a filter may spread into view.
+class ChildAreas {
+  public:
+    ChildAreas(const LayoutNode& node, const PaintContext& context, Areas areas) {
+        const css::VisualStyle& visual = *node.style.visual;
+        // Neither the filter nor the client's effect says which pixels it needs, so it gets all of them.
+        if (!visual.filter.empty() || !visual.customEffectName.empty()) {
+            rects_[count_++] = node.visualAabb;
+            areas = {rects_.data(), 1};
+        }
+        if (!node.flags.shouldOverflowClip) {
+            if (count_ == 0)
+                count_ = static_cast<uint32_t>(std::copy(areas.begin(), areas.end(), rects_.begin()) -
+                                               rects_.begin());
+            return;
+        }
+        const Rect clip =
+            layout::RoundOut(layout::MapBounds(node.world, ClipBox(node, context.snapToPixels)));
+        uint32_t kept = 0;
+        for (const Rect& area : areas) {
+            const Rect cut = layout::Intersection(area, clip);
+            if (!layout::IsEmpty(cut)) rects_[kept++] = cut;
+        }
+        count_ = kept;
+    }
+    Areas Get() const { return {rects_.data(), count_}; }
+
+  private:
+    std::array<Rect, DirtyRegion::kScissorCount> rects_;
+    uint32_t count_ = 0;
+};
+
+void PushChildState(const LayoutNode& node, const PaintContext& context, StateScope& scope,
+                    CommandBuffer& buffer) {
+    if (!node.flags.preserves3d && !layout::IsFlat(node.world)) {
+        scope.Push(fresco::kStateTransform);
+        buffer.FlattenTransform();
+    }
+    if (node.perspective) {
+        scope.Push(fresco::kStateTransform);
+        buffer.MultiplyTransform(*node.perspective);
+    }
+    const bool scrolled = layout::IsScrolled(node.scroll);
+    if (!scrolled && !node.flags.shouldOverflowClip) return;
+    scope.Push((node.flags.shouldOverflowClip ? fresco::kStateClip : 0u) |
+               (scrolled ? fresco::kStateTransform : 0u));
+    if (node.flags.shouldOverflowClip) ClipToPaddingBox(node, context, buffer);
+    if (scrolled) buffer.Translate(-node.scroll.x, -node.scroll.y);
+}
+
+void RecordChildren(const LayoutNode& node, PaintContext& context, Areas areas, CommandBuffer& buffer) {
+    if (node.children.empty() || areas.empty()) return;
+    const TempMark mark;
+    PaintList list;
+    CollectPaintOrder(node, areas, list, context.counters);
+    if (list.empty()) return;
+    StateScope scope(buffer);
+    PushChildState(node, context, scope, buffer);
+    for (const PaintEntry& entry : list) {
+        if (PaintsAsUnit(*entry.node)) {
+            RecordNode(*entry.node, context, areas, &buffer);
+        } else {
+            PaintOwn(*entry.node, context, areas, buffer);
+        }
+    }
+}
+
+void RecordContent(const LayoutNode& node, PaintContext& context, Areas areas, CommandBuffer& buffer) {
+    const css::VisualStyle& visual = *node.style.visual;
+    const MaskState mask = PrepareMask(node);
+    if (mask == MaskState::Hold) return;
+    StateScope scope(buffer);
+    if (!visual.clipPath.IsNone()) {
+        scope.Push(fresco::kStateClip);
+        context.lengths.em = node.style.text->computedFontSize;
+        if (!ApplyClipPath(node, context, buffer)) return;
+    }
+    PaintOwn(node, context, areas, buffer);
+    RecordChildren(node, context, ChildAreas(node, context, areas).Get(), buffer);
+    if (mask == MaskState::Ready) ApplyMask(node, context, buffer);
+}
+
+}  // namespace
+
+void RecordNode(const LayoutNode& node, PaintContext& context, Areas areas, CommandBuffer* buffer) {
+    const css::VisualStyle& visual = *node.style.visual;
+    if (visual.opacity.value <= 0 || !TouchesAny(areas, node.visualAabb)) return;
+    // The transform goes around the layer, so that filters measure in the node's own space.
+    if (node.local) {
+        buffer->PushState(fresco::kStateTransform);
+        buffer->MultiplyTransform(*node.local);
+    }
+    const bool hasLayer = NeedsLayer(node);
+    if (hasLayer) {
+        context.lengths.em = node.style.text->computedFontSize;
+        buffer = OpenLayer(node, context, buffer);
+    }
+    RecordContent(node, context, areas, *buffer);
+    if (hasLayer) buffer = CloseLayer(node, buffer);
+    if (node.local) buffer->PopState();
+}
+
+}  // namespace qorvex::dsp
