@@ -29,8 +29,8 @@ class ParserArena {
     }
     [[nodiscard]] std::string_view Copy(std::string_view text);
 
-    // Text built piece by piece at the end of the arena. One text at a time; nothing else may be allocated until it
-    // is finished.
+    // Text built piece by piece at the end of the arena. One text at a time; nothing else may be allocated
+    // until it is finished.
     void BeginText() { textStart_ = 0, textSize_ = 0; }
     void AppendText(std::string_view piece);
     [[nodiscard]] std::string_view FinishText();

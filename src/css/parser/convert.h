@@ -1,5 +1,5 @@
-// Syntax trees to records: selectors in matching form, declarations with values. Names are interned in the pool of the
-// System that the records will belong to; the pool may be used by several threads at once.
+// Syntax trees to records: selectors in matching form, declarations with values. Names are interned in the
+// pool of the System that the records will belong to; the pool may be used by several threads at once.
 #pragma once
 
 #include <optional>
@@ -19,21 +19,23 @@ namespace qorvex::css {
 [[nodiscard]] StylesheetPtr ConvertStylesheet(const ParserContext& context, std::string_view baseUrl,
                                               StringPool& strings);
 // Parse and conversion in one go, for <style> text and for tasks.
-[[nodiscard]] StylesheetPtr MakeStylesheet(std::string_view text, std::string_view baseUrl, StringPool& strings);
+[[nodiscard]] StylesheetPtr MakeStylesheet(std::string_view text, std::string_view baseUrl,
+                                           StringPool& strings);
 
 // The declarations of a style attribute.
 [[nodiscard]] StyleDeclarationSet ConvertInlineStyle(const ParserContext& context, std::string_view baseUrl,
                                                      StringPool& strings);
 
-// The features of a media attribute; nothing when it holds no usable one. The caller says what that means for it.
+// The features of a media attribute; nothing when it holds no usable one. The caller says what that means for
+// it.
 [[nodiscard]] std::optional<MediaFeatureList> ConvertMediaQuery(const ParserContext& context);
 
 // The selectors of a script query; nothing when the text is not exactly one rule with a usable selector.
 [[nodiscard]] std::optional<CssVector<ComplexSelector>> ConvertSelector(const ParserContext& context,
                                                                         StringPool& strings);
 
-// One declaration from the object model, data binding or the inspector: property and value text as script gives
-// them, with var() and calc() allowed. A shorthand is refused with an assertion.
+// One declaration from the object model, data binding or the inspector: property and value text as script
+// gives them, with var() and calc() allowed. A shorthand is refused with an assertion.
 [[nodiscard]] std::optional<Declaration> MakeDeclaration(PropertyId property, std::string_view valueText,
                                                          StringPool& strings, uint8_t flags = 0);
 // As above, but a shorthand gives all of its longhands. False, with nothing appended, when it does not parse.
@@ -41,6 +43,7 @@ namespace qorvex::css {
                                     uint8_t flags, CssVector<Declaration>& out);
 
 // Calls visit(url) for each image URL in the declaration's value.
-void ForEachImageUrl(const Declaration& declaration, void (*visit)(std::string_view url, void* user), void* user);
+void ForEachImageUrl(const Declaration& declaration, void (*visit)(std::string_view url, void* user),
+                     void* user);
 
 }  // namespace qorvex::css

@@ -1,5 +1,5 @@
-// Parsing in two steps: text to a short-lived syntax tree (ParserContext), and that to records (convert.h). A context
-// is used by one thread; any number of threads may parse at once.
+// Parsing in two steps: text to a short-lived syntax tree (ParserContext), and that to records (convert.h). A
+// context is used by one thread; any number of threads may parse at once.
 #pragma once
 
 #include <cstdint>
@@ -28,7 +28,8 @@ class IContext {
 
 }  // namespace parser
 
-// Invariant: everything in the lists lies in the arena or in the text copied into it, and dies with the context.
+// Invariant: everything in the lists lies in the arena or in the text copied into it, and dies with the
+// context.
 class ParserContext final : public SharedValue<ParserContext>, public parser::IContext {
   public:
     explicit ParserContext(size_t arenaChunkSize) : arena_(arenaChunkSize) {}
@@ -59,7 +60,7 @@ class ParserContext final : public SharedValue<ParserContext>, public parser::IC
     bool hasError_ = false;
 };
 
-using ParserContextPtr = qsl::RefPtr<ParserContext>;
+using ParserContextPtr = RefPtr<ParserContext>;
 
 // A whole sheet; a UTF-8 byte order mark is skipped. The text need not outlive the call.
 [[nodiscard]] ParserContextPtr ParseStylesheet(std::string_view text);

@@ -28,13 +28,13 @@ enum class Combinator : uint8_t { Descendant = 0, Child = 1, Adjacent = 2, Sibli
 
 struct SimpleSelector {
     SelectorType type = SelectorType::Universal;
-    TagId tag = TagId::Any;                                  // Tag
-    PseudoCode pseudo = PseudoCode::None;                    // Pseudo
-    AttributeOperator op = AttributeOperator::Presence;      // Attribute
-    bool ignoreCase = false;                                 // Attribute: the "i" flag
-    bool isData = false;                                     // Attribute: `name` lacks its "data-"
-    Atom name;                                               // Id, Class, Attribute, Tag of a custom element
-    Atom value;                                              // Attribute
+    TagId tag = TagId::Any;                              // Tag
+    PseudoCode pseudo = PseudoCode::None;                // Pseudo
+    AttributeOperator op = AttributeOperator::Presence;  // Attribute
+    bool ignoreCase = false;                             // Attribute: the "i" flag
+    bool isData = false;                                 // Attribute: `name` lacks its "data-"
+    Atom name;                                           // Id, Class, Attribute, Tag of a custom element
+    Atom value;                                          // Attribute
     friend bool operator==(const SimpleSelector&, const SimpleSelector&) = default;
 };
 
@@ -58,9 +58,9 @@ struct Specificity {
 
 // combinators[i] stands between compounds[i] and what is to its right (the key for i = 0).
 struct ComplexSelector {
-    CompoundSelector key;                     // the rightmost
-    CssVector<CompoundSelector> compounds;    // going leftward
-    CssVector<Combinator> combinators;        // as many as compounds
+    CompoundSelector key;                   // the rightmost
+    CssVector<CompoundSelector> compounds;  // going leftward
+    CssVector<Combinator> combinators;      // as many as compounds
     Specificity specificity;
 
     bool HasCombinators() const { return !combinators.empty(); }

@@ -1,5 +1,5 @@
-// A parsed sheet. Read-only once converted, apart from its count: the stylesheet cache and any number of documents of
-// one System may hold it. Copying a sheet copies selectors and shares declarations.
+// A parsed sheet. Read-only once converted, apart from its count: the stylesheet cache and any number of
+// documents of one System may hold it. Copying a sheet copies selectors and shares declarations.
 #pragma once
 
 #include "css/parser/media_feature.h"
@@ -19,13 +19,13 @@ struct DeclarationBlock : SharedValue<DeclarationBlock> {
     bool empty() const { return declarations.empty() && customProperties.empty(); }
 };
 
-// One selector with its declarations. The selectors of one CSS rule each make a Ruleset; they behave as if each had
-// its own copy of the block, which they share until one is changed: a list of N selectors over M declarations must
-// not cost N times M.
+// One selector with its declarations. The selectors of one CSS rule each make a Ruleset; they behave as if
+// each had its own copy of the block, which they share until one is changed: a list of N selectors over M
+// declarations must not cost N times M.
 class Ruleset {
   public:
     Ruleset() = default;
-    Ruleset(ComplexSelector selector, qsl::RefPtr<DeclarationBlock> block)
+    Ruleset(ComplexSelector selector, RefPtr<DeclarationBlock> block)
         : selector(std::move(selector)), block_(std::move(block)) {}
 
     ComplexSelector selector;
@@ -34,12 +34,12 @@ class Ruleset {
     const CustomPropertyMap& customProperties() const { return block_->customProperties; }
     // For editing; elements matched to this rule must be re-matched.
     DeclarationBlock& MutableBlock() {
-        if (!block_->IsUnique()) block_ = MakeShared<DeclarationBlock>(*block_);
+        if (!block_->HasOneRef()) block_ = MakeRef<DeclarationBlock>(*block_);
         return *block_;
     }
 
   private:
-    qsl::RefPtr<DeclarationBlock> block_;
+    RefPtr<DeclarationBlock> block_;
 };
 
 struct MediaBlock {
@@ -77,6 +77,6 @@ struct Stylesheet : SharedValue<Stylesheet> {
     CssVector<KeyframesRule> keyframes;
 };
 
-using StylesheetPtr = qsl::RefPtr<Stylesheet>;
+using StylesheetPtr = RefPtr<Stylesheet>;
 
 }  // namespace qorvex::css

@@ -1,5 +1,5 @@
-// The short-lived syntax tree of one parse: plain records in the arena, chained in source order. Texts point into the
-// arena or into the parsed text, which the arena holds a copy of.
+// The short-lived syntax tree of one parse: plain records in the arena, chained in source order. Texts point
+// into the arena or into the parsed text, which the arena holds a copy of.
 #pragma once
 
 #include <cstdint>
@@ -69,7 +69,8 @@ struct SimpleSelectorSyntax {
 
 struct CompoundSyntax {
     CompoundSyntax* next = nullptr;
-    Combinator combinator = Combinator::Descendant;  // to the compound before it; of the first one meaningless
+    Combinator combinator =
+        Combinator::Descendant;  // to the compound before it; of the first one meaningless
     SyntaxList<SimpleSelectorSyntax> simple;
 };
 

@@ -50,8 +50,8 @@ struct TimingFunction {
 
 enum class TransitionTargetKind : uint8_t { All, None, Property };
 
-// A property may be a longhand or a shorthand. An unrecognised name is kept as None, so that the other lists stay
-// in step (CSS Transitions, 2.1).
+// A property may be a longhand or a shorthand. An unrecognised name is kept as None, so that the other lists
+// stay in step (CSS Transitions, 2.1).
 struct TransitionTarget {
     TransitionTargetKind kind = TransitionTargetKind::All;
     PropertyId property = PropertyId::kUnknown;

@@ -1,5 +1,5 @@
-// Custom properties (--name: text) and values that hold var() or calc(), kept as text templates that are filled and
-// parsed anew for each element.
+// Custom properties (--name: text) and values that hold var() or calc(), kept as text templates that are
+// filled and parsed anew for each element.
 #pragma once
 
 #include <cstdint>
@@ -51,7 +51,7 @@ struct CustomProperty : SharedValue<CustomProperty> {
     }
 };
 
-using CustomPropertyPtr = qsl::RefPtr<const CustomProperty>;
+using CustomPropertyPtr = RefPtr<const CustomProperty>;
 // Name without "--" to record.
 using CustomPropertyMap = CssHashMap<Atom, CustomPropertyPtr>;
 
@@ -63,7 +63,8 @@ struct SharedCustomProperties : SharedValue<SharedCustomProperties> {
 // Logs and returns nothing for a text that is no custom expression.
 [[nodiscard]] std::optional<CustomExpression> PrepareCustomExpression(std::string_view valueText,
                                                                       StringPool& strings);
-[[nodiscard]] CustomPropertyPtr MakeCustomProperty(std::string_view valueText, uint8_t flags, StringPool& strings);
+[[nodiscard]] CustomPropertyPtr MakeCustomProperty(std::string_view valueText, uint8_t flags,
+                                                   StringPool& strings);
 // The kHasVar and kHasCalc bits of a value text.
 [[nodiscard]] uint8_t FindExpressionFlags(std::string_view valueText);
 

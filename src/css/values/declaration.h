@@ -1,9 +1,9 @@
 // One parsed declaration: a longhand, where its value comes from, and the value record itself.
 //
-// Invariant: the property and the kind tell what the 20 bytes of room hold. A plain value of a small, trivially
-// copyable type lies in them; any other value, and every custom expression, is an object of its own behind an owned
-// pointer there, which the top bit of the kind byte says. Copying, comparing and destroying go through one table
-// indexed by property.
+// Invariant: the property and the kind tell what the 20 bytes of room hold. A plain value of a small,
+// trivially copyable type lies in them; any other value, and every custom expression, is an object of its own
+// behind an owned pointer there, which the top bit of the kind byte says. Copying, comparing and destroying
+// go through one table indexed by property.
 #pragma once
 
 #include <cstdint>
@@ -23,8 +23,9 @@ enum class DeclarationKind : uint8_t { Value = 0, Inherit = 1, CustomExpression 
 inline constexpr size_t kDeclarationRoom = 20;
 
 template <class T>
-inline constexpr bool kInlineValue = sizeof(T) <= kDeclarationRoom && alignof(T) <= 4 &&
-                                     std::is_trivially_copyable_v<T> && std::is_trivially_destructible_v<T>;
+inline constexpr bool kInlineValue =
+    sizeof(T) <= kDeclarationRoom &&
+    alignof(T) <= 4 && std::is_trivially_copyable_v<T>&& std::is_trivially_destructible_v<T>;
 
 class Declaration {
   public:
@@ -50,6 +51,13 @@ class Declaration {
     static Declaration Expression(PropertyId id, CustomExpression expression, uint8_t flags);
     // The property's initial value as a plain value.
     static Declaration Initial(PropertyId id, uint8_t flags = 0);
+
+    // The same value for another longhand of the same value type.
+    Declaration WithProperty(PropertyId id) const {
+        Declaration copy(*this);
+        copy.property_ = id;
+        return copy;
+    }
 
     PropertyId property() const { return property_; }
     DeclarationKind kind() const { return static_cast<DeclarationKind>(kind_ & ~kOwnsPointer); }
@@ -87,7 +95,7 @@ class Declaration {
         if constexpr (kInlineValue<T>)
             new (room_) T(value);
         else
-            SetPointer(New<T>(MemoryTag::CSS, std::move(value)));
+            SetPointer(New<T, MemoryTag::CSS>(std::move(value)));
     }
 
     // Same property, kind, flags and value.

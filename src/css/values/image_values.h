@@ -57,8 +57,8 @@ enum class ImageKind : uint8_t {
 
 struct ImageValue {
     ImageKind kind = ImageKind::None;
-    CssString url;                          // as written, without url( ) and quotes
-    qsl::RefPtr<const Gradient> gradient;  // of the four gradient kinds
+    CssString url;                    // as written, without url( ) and quotes
+    RefPtr<const Gradient> gradient;  // of the four gradient kinds
 
     bool IsGradient() const { return kind >= ImageKind::LinearGradient; }
     friend bool operator==(const ImageValue& a, const ImageValue& b) {

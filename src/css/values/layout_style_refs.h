@@ -1,5 +1,5 @@
-// The computed style of one node: handles to the shared groups. Embedded in DOM nodes and copied by both halves of a
-// layout handle; a copy copies references, never style data.
+// The computed style of one node: handles to the shared groups. Embedded in DOM nodes and copied by both
+// halves of a layout handle; a copy copies references, never style data.
 #pragma once
 
 #include <array>
@@ -19,7 +19,7 @@ class StyleHandle {
     using TriviallyRelocatable = StyleHandle;
 
     StyleHandle() = default;
-    explicit StyleHandle(qsl::RefPtr<Group> group) : group_(std::move(group)) {}
+    explicit StyleHandle(RefPtr<Group> group) : group_(std::move(group)) {}
 
     const Group* get() const { return group_.get(); }
     const Group* operator->() const { return group_.get(); }
@@ -28,16 +28,16 @@ class StyleHandle {
     // By identity: equal handles share one group.
     friend bool operator==(const StyleHandle& a, const StyleHandle& b) { return a.group_ == b.group_; }
 
-    // The group for writing: itself while nobody else holds it, else a copy that this handle moves to. `written` is
-    // set when a copy was made, and by the caller's store through it.
+    // The group for writing: itself while nobody else holds it, else a copy that this handle moves to.
+    // `written` is set when a copy was made, and by the caller's store through it.
     Group& MakeMutable(uint8_t& written) {
-        if (!group_->IsUnique()) group_ = MakeShared<Group>(*group_);
+        if (!group_->HasOneRef()) group_ = MakeRef<Group>(*group_);
         written = 1;
         return *group_;
     }
 
   private:
-    qsl::RefPtr<Group> group_;
+    RefPtr<Group> group_;
 };
 
 // Extras of a node that few nodes need; owned by one LayoutStyleRefs and not copied with it.
@@ -66,7 +66,7 @@ struct LayoutStyleRefs {
     StyleHandle<TransformStyle> transform;
     StyleHandle<AnimationStyle> animation;
     StyleHandle<TransitionStyle> transition;
-    qsl::RefPtr<const SharedCustomProperties> customProperties;  // null: none in force
+    RefPtr<const SharedCustomProperties> customProperties;  // null: none in force
     UniquePtr<RareStyle, MemoryTag::CSS> rare;
     // Set when a group is made private, cleared when layout has taken it over.
     std::array<uint8_t, 7> written = {};
@@ -91,17 +91,29 @@ struct LayoutStyleRefs {
 };
 
 template <>
-inline StyleHandle<LayoutStyle>& LayoutStyleRefs::Handle() { return layout; }
+inline StyleHandle<LayoutStyle>& LayoutStyleRefs::Handle() {
+    return layout;
+}
 template <>
-inline StyleHandle<VisualStyle>& LayoutStyleRefs::Handle() { return visual; }
+inline StyleHandle<VisualStyle>& LayoutStyleRefs::Handle() {
+    return visual;
+}
 template <>
-inline StyleHandle<TextLayoutStyle>& LayoutStyleRefs::Handle() { return text; }
+inline StyleHandle<TextLayoutStyle>& LayoutStyleRefs::Handle() {
+    return text;
+}
 template <>
-inline StyleHandle<TransformStyle>& LayoutStyleRefs::Handle() { return transform; }
+inline StyleHandle<TransformStyle>& LayoutStyleRefs::Handle() {
+    return transform;
+}
 template <>
-inline StyleHandle<AnimationStyle>& LayoutStyleRefs::Handle() { return animation; }
+inline StyleHandle<AnimationStyle>& LayoutStyleRefs::Handle() {
+    return animation;
+}
 template <>
-inline StyleHandle<TransitionStyle>& LayoutStyleRefs::Handle() { return transition; }
+inline StyleHandle<TransitionStyle>& LayoutStyleRefs::Handle() {
+    return transition;
+}
 
 template <class Group>
 inline constexpr StyleGroup kGroupOf = StyleGroup::Layout;

@@ -1,4 +1,5 @@
-// Lengths and the records that hold one: all are final after parsing and are resolved to pixels by layout and paint.
+// Lengths and the records that hold one: all are final after parsing and are resolved to pixels by layout and
+// paint.
 #pragma once
 
 #include <cstdint>
@@ -44,14 +45,23 @@ struct Extent {
     friend constexpr bool operator==(const Extent&, const Extent&) = default;
 };
 
-enum class BorderWidthKind : uint32_t { Medium = 0, Thin = 1, Thick = 2, Initial = 3, Inherit = 4, Length = 5 };
+enum class BorderWidthKind : uint32_t {
+    Medium = 0,
+    Thin = 1,
+    Thick = 2,
+    Initial = 3,
+    Inherit = 4,
+    Length = 5
+};
 
 struct BorderWidth {
     BorderWidthKind kind = BorderWidthKind::Medium;
     LengthUnit unit = LengthUnit::Px;
     float value = 0;
 
-    static constexpr BorderWidth Of(Length length) { return {BorderWidthKind::Length, length.unit, length.value}; }
+    static constexpr BorderWidth Of(Length length) {
+        return {BorderWidthKind::Length, length.unit, length.value};
+    }
     constexpr Length AsLength() const { return {unit, value}; }
     friend constexpr bool operator==(const BorderWidth&, const BorderWidth&) = default;
 };

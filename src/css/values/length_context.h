@@ -23,35 +23,49 @@ inline constexpr float kNoPercentBase = std::numeric_limits<float>::quiet_NaN();
 [[nodiscard]] inline float ResolveLength(Length length, const LengthContext& context,
                                          float percentBase = kNoPercentBase) {
     switch (length.unit) {
-        case LengthUnit::Px: return length.value;
+        case LengthUnit::Px:
+            return length.value;
         case LengthUnit::Percent:
             return std::isnan(percentBase) ? context.fallback : length.value / 100 * percentBase;
-        case LengthUnit::Vw: return length.value * context.vw;
-        case LengthUnit::Vh: return length.value * context.vh;
-        case LengthUnit::Vmin: return length.value * std::fmin(context.vw, context.vh);
-        case LengthUnit::Vmax: return length.value * std::fmax(context.vw, context.vh);
-        case LengthUnit::Em: return length.value * context.em;
-        case LengthUnit::Rem: return length.value * context.rem;
+        case LengthUnit::Vw:
+            return length.value * context.vw;
+        case LengthUnit::Vh:
+            return length.value * context.vh;
+        case LengthUnit::Vmin:
+            return length.value * std::fmin(context.vw, context.vh);
+        case LengthUnit::Vmax:
+            return length.value * std::fmax(context.vw, context.vh);
+        case LengthUnit::Em:
+            return length.value * context.em;
+        case LengthUnit::Rem:
+            return length.value * context.rem;
         // Physical units land on whole pixels; the factor of pt is this number, not 4/3.
-        case LengthUnit::In: return std::round(length.value * 96);
-        case LengthUnit::Pt: return std::round(length.value * 1.333333f);
+        case LengthUnit::In:
+            return std::round(length.value * 96);
+        case LengthUnit::Pt:
+            return std::round(length.value * 1.333333f);
     }
     return context.fallback;
 }
 
 // The caller's default (often NaN or 0) for auto and the keywords.
-[[nodiscard]] inline float ResolveExtent(const Extent& extent, const LengthContext& context, float percentBase,
-                                         float whenAuto) {
+[[nodiscard]] inline float ResolveExtent(const Extent& extent, const LengthContext& context,
+                                         float percentBase, float whenAuto) {
     return extent.IsLength() ? ResolveLength(extent.AsLength(), context, percentBase) : whenAuto;
 }
 
 [[nodiscard]] inline float ResolveBorderWidth(const BorderWidth& width, const LengthContext& context) {
     switch (width.kind) {
-        case BorderWidthKind::Thin: return 1;
-        case BorderWidthKind::Medium: return 3;
-        case BorderWidthKind::Thick: return 5;
-        case BorderWidthKind::Length: return ResolveLength(width.AsLength(), context);
-        default: return 0;
+        case BorderWidthKind::Thin:
+            return 1;
+        case BorderWidthKind::Medium:
+            return 3;
+        case BorderWidthKind::Thick:
+            return 5;
+        case BorderWidthKind::Length:
+            return ResolveLength(width.AsLength(), context);
+        default:
+            return 0;
     }
 }
 

@@ -1,5 +1,6 @@
-// The winning declarations of one element, filled by selector matching and read by style solving. Declarations are
-// borrowed from rules and from the element's own sets: the owner of a rule re-matches before it dies.
+// The winning declarations of one element, filled by selector matching and read by style solving.
+// Declarations are borrowed from rules and from the element's own sets: the owner of a rule re-matches before
+// it dies.
 #pragma once
 
 #include <array>
@@ -23,7 +24,8 @@ class MatchState {
 
     // Costs one step per slot, not per property.
     void Reset() {
-        for (const Slot& slot : slots_) slotOfProperty_[IndexOf(slot.property)] = kNoSlot;
+        for (const Slot& slot : slots_)
+            slotOfProperty_[IndexOf(slot.property)] = kNoSlot;
         slots_.clear();
         customProperties_.clear();
     }

@@ -1,5 +1,5 @@
-// The lexical readers that all value parsers share. No exponents, no "inf", no locale; a number out of the range of a
-// float is refused. Linear in the text, no allocation.
+// The lexical readers that all value parsers share. No exponents, no "inf", no locale; a number out of the
+// range of a float is refused. Linear in the text, no allocation.
 #pragma once
 
 #include <cstddef>
@@ -10,7 +10,8 @@
 
 namespace qorvex::css {
 
-// Reads a number from the start of the text (sign, digits, fraction); returns its length, 0 when there is none.
+// Reads a number from the start of the text (sign, digits, fraction); returns its length, 0 when there is
+// none.
 [[nodiscard]] size_t ReadFloat(std::string_view text, float& out);
 
 // These must consume every character.

@@ -16,7 +16,7 @@ enum class PropertyId : uint16_t {
     kLonghandCount,
     QORVEX_CSS_SHORTHANDS(QORVEX_ROW)
 #undef QORVEX_ROW
-    kEnd,
+        kEnd,
     kUnknown = 0xFFFF,
 };
 
@@ -40,11 +40,18 @@ inline constexpr size_t kStyleGroupCount = 6;
 // What a changed value asks for at least; a member of the text group can be only Visual.
 enum class ChangeClass : uint8_t { Layout, Visual, Transform, Animation, Transition };
 
-constexpr size_t IndexOf(PropertyId id) { return static_cast<size_t>(id); }
-constexpr bool IsLonghand(PropertyId id) { return IndexOf(id) < kLonghandCount; }
-constexpr bool IsShorthand(PropertyId id) { return IndexOf(id) > kLonghandCount && IndexOf(id) < kPropertyEnd; }
+constexpr size_t IndexOf(PropertyId id) {
+    return static_cast<size_t>(id);
+}
+constexpr bool IsLonghand(PropertyId id) {
+    return IndexOf(id) < kLonghandCount;
+}
+constexpr bool IsShorthand(PropertyId id) {
+    return IndexOf(id) > kLonghandCount && IndexOf(id) < kPropertyEnd;
+}
 
-// Case-sensitive: property names in sheets are matched exactly as written. kUnknown for a name of no property.
+// Case-sensitive: property names in sheets are matched exactly as written. kUnknown for a name of no
+// property.
 [[nodiscard]] PropertyId FindProperty(std::string_view name);
 // The empty text for the count row and out of range.
 [[nodiscard]] std::string_view PropertyName(PropertyId id);

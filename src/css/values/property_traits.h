@@ -15,18 +15,18 @@ namespace qorvex::css {
 template <PropertyId id>
 struct PropertyTraits;
 
-#define QORVEX_TRAITS(group, id, name, type, field, inheritance, animation, change, ...)  \
-    template <>                                                                           \
-    struct PropertyTraits<PropertyId::id> {                                               \
-        using Type = type;                                                                \
-        using Group = group##Style;                                                       \
-        static constexpr Type Group::*kField = &Group::field;                             \
-        static constexpr StyleGroup kGroup = StyleGroup::group;                           \
-        static constexpr std::string_view kName = name;                                   \
-        static constexpr bool kInherited = QORVEX_##inheritance;                          \
-        static constexpr bool kAnimatable = QORVEX_##animation;                           \
-        static constexpr ChangeClass kChange = ChangeClass::change;                       \
-        static Type Initial() { return __VA_ARGS__; }                                     \
+#define QORVEX_TRAITS(group, id, name, type, field, inheritance, animation, change, ...) \
+    template <>                                                                          \
+    struct PropertyTraits<PropertyId::id> {                                              \
+        using Type = type;                                                               \
+        using Group = group##Style;                                                      \
+        static constexpr Type Group::*kField = &Group::field;                            \
+        static constexpr StyleGroup kGroup = StyleGroup::group;                          \
+        static constexpr std::string_view kName = name;                                  \
+        static constexpr bool kInherited = QORVEX_##inheritance;                         \
+        static constexpr bool kAnimatable = QORVEX_##animation;                          \
+        static constexpr ChangeClass kChange = ChangeClass::change;                      \
+        static Type Initial() { return __VA_ARGS__; }                                    \
     };
 #define QORVEX_ROW(id, name, type, parser, field, ...) \
     QORVEX_TRAITS(Layout, id, name, type, field, __VA_ARGS__)

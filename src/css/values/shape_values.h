@@ -1,4 +1,5 @@
-// Shapes of clip-path. A shape is immutable once parsed and counted atomically, since the render side reads it.
+// Shapes of clip-path. A shape is immutable once parsed and counted atomically, since the render side reads
+// it.
 #pragma once
 
 #include <array>
@@ -11,7 +12,6 @@
 #include "css/values/length.h"
 #include "css/values/shared_value.h"
 #include "css/values/svg_path_data.h"
-
 
 namespace qorvex::css {
 
@@ -100,7 +100,7 @@ class PathShape final : public BasicShape {
 struct ClipPathType {
     bool hasBox = false;
     ClipBox box = ClipBox::BorderBox;
-    qsl::RefPtr<const BasicShape> shape;
+    RefPtr<const BasicShape> shape;
 
     bool IsNone() const { return !hasBox && !shape; }
     friend bool operator==(const ClipPathType& a, const ClipPathType& b) {

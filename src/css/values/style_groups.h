@@ -1,6 +1,7 @@
-// Computed style in counted groups, one field per longhand of the property table plus the numbers that style solving
-// derives. A group is shared by any number of nodes, layout records and frames, and is immutable while its count is
-// above 1: StyleHandle::MakeMutable is the only way to write. Equal handles therefore mean equal style.
+// Computed style in counted groups, one field per longhand of the property table plus the numbers that style
+// solving derives. A group is shared by any number of nodes, layout records and frames, and is immutable
+// while its count is above 1: StyleHandle::MakeMutable is the only way to write. Equal handles therefore mean
+// equal style.
 #pragma once
 
 #include <cstdint>
@@ -17,8 +18,8 @@ struct LayoutDerived {
     friend bool operator==(const LayoutDerived&, const LayoutDerived&) = default;
 };
 
-// Font ids of the text renderer in fallback order; the last one is the embedded fallback font. Faces that are not
-// loaded yet have the empty id.
+// Font ids of the text renderer in fallback order; the last one is the embedded fallback font. Faces that are
+// not loaded yet have the empty id.
 inline constexpr uint32_t kNoTypeface = 0xFFFFFFFF;
 
 struct TextLayoutDerived {
@@ -35,11 +36,12 @@ struct NothingDerived {
     friend bool operator==(const NothingDerived&, const NothingDerived&) = default;
 };
 
-#define QORVEX_FIELD(id, name, type, parser, field, inheritance, animation, change, ...) type field = __VA_ARGS__;
+#define QORVEX_FIELD(id, name, type, parser, field, inheritance, animation, change, ...) \
+    type field = __VA_ARGS__;
 
-#define QORVEX_STYLE_GROUP(name, table, derived)          \
-    struct name : SharedValue<name>, derived {            \
-        table(QORVEX_FIELD)                               \
+#define QORVEX_STYLE_GROUP(name, table, derived) \
+    struct name : SharedValue<name>, derived {   \
+        table(QORVEX_FIELD)                      \
     };
 
 QORVEX_STYLE_GROUP(LayoutStyle, QORVEX_CSS_LAYOUT_PROPERTIES, LayoutDerived)

@@ -20,8 +20,8 @@ struct SvgPathData {
     friend bool operator==(const SvgPathData&, const SvgPathData&) = default;
 };
 
-// Reads as much as is well formed. `consumed` is where reading stopped: the text's size when all of it was read.
-// False when not even a first move-to could be read.
+// Reads as much as is well formed. `consumed` is where reading stopped: the text's size when all of it was
+// read. False when not even a first move-to could be read.
 [[nodiscard]] bool ParseSvgPath(std::string_view text, SvgPathData& out, size_t& consumed);
 
 }  // namespace qorvex::css

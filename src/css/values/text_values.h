@@ -18,8 +18,8 @@ struct LetterSpacing {
     friend bool operator==(const LetterSpacing&, const LetterSpacing&) = default;
 };
 
-// A plain number is a length in em: it multiplies the font size of the element that it is inherited by, which is
-// what the standard asks of the number form.
+// A plain number is a length in em: it multiplies the font size of the element that it is inherited by, which
+// is what the standard asks of the number form.
 struct LineHeight {
     SpacingKind kind = SpacingKind::Normal;
     Length length{LengthUnit::Em, 1};

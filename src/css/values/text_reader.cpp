@@ -1,0 +1,98 @@
+#include "css/values/text_reader.h"
+
+namespace qorvex::css {
+
+std::string_view Trim(std::string_view text) {
+    while (!text.empty() && IsSpace(text.front()))
+        text.remove_prefix(1);
+    while (!text.empty() && IsSpace(text.back()))
+        text.remove_suffix(1);
+    return text;
+}
+
+bool EqualsIgnoreCase(std::string_view a, std::string_view b) {
+    if (a.size() != b.size()) return false;
+    for (size_t i = 0; i < a.size(); ++i)
+        if (ToLower(a[i]) != ToLower(b[i])) return false;
+    return true;
+}
+
+bool StartsWithIgnoreCase(std::string_view text, std::string_view prefix) {
+    return text.size() >= prefix.size() && EqualsIgnoreCase(text.substr(0, prefix.size()), prefix);
+}
+
+bool TakeFunction(std::string_view text, std::string_view name, std::string_view& arguments) {
+    if (text.size() < name.size() + 2 || text[name.size()] != '(' || text.back() != ')') return false;
+    if (!StartsWithIgnoreCase(text, name)) return false;
+    arguments = Trim(text.substr(name.size() + 1, text.size() - name.size() - 2));
+    return true;
+}
+
+namespace {
+
+// Follows parentheses and quotes along a text.
+class Nesting {
+  public:
+    // True while the character, and what precedes it, lies outside of both.
+    bool Outside(std::string_view text, size_t& i) {
+        char c = text[i];
+        if (quote_) {
+            if (c == '\\' && i + 1 < text.size())
+                ++i;
+            else if (c == quote_)
+                quote_ = 0;
+            return false;
+        }
+        if (c == '"' || c == '\'') {
+            quote_ = c;
+            return false;
+        }
+        if (c == '(') ++depth_;
+        if (c == ')' && depth_ > 0) {
+            --depth_;
+            return false;
+        }
+        return depth_ == 0;
+    }
+
+  private:
+    size_t depth_ = 0;
+    char quote_ = 0;
+};
+
+}  // namespace
+
+bool WordReader::Next(std::string_view& word) {
+    while (!rest_.empty() && IsSpace(rest_.front()))
+        rest_.remove_prefix(1);
+    if (rest_.empty()) return false;
+    size_t end = 0;
+    if (slashes_ && rest_.front() == '/') {
+        end = 1;
+    } else {
+        Nesting nesting;
+        for (; end < rest_.size(); ++end) {
+            if (!nesting.Outside(rest_, end)) continue;
+            if (IsSpace(rest_[end]) || (slashes_ && rest_[end] == '/')) break;
+        }
+    }
+    word = rest_.substr(0, end);
+    rest_.remove_prefix(word.size());
+    return true;
+}
+
+bool ListReader::Next(std::string_view& item) {
+    if (done_) return false;
+    Nesting nesting;
+    size_t end = 0;
+    for (; end < rest_.size(); ++end)
+        if (nesting.Outside(rest_, end) && rest_[end] == ',') break;
+    item = Trim(rest_.substr(0, end));
+    if (end < rest_.size())
+        rest_.remove_prefix(end + 1);
+    else
+        done_ = true;
+    return true;
+}
+
+}  // namespace qorvex::css
