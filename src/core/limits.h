@@ -49,6 +49,12 @@ inline constexpr uint32_t kMaxNestedResourceEvents = 16;
 /// Frame ids of a view that wait for Paint. A client that never paints keeps the newest so many; at 60 frames a
 /// second a client that paints late has four seconds.
 inline constexpr size_t kMaxWaitingFrames = 256;
+/// Bytes of a value whose variables were replaced by their text: custom properties that name each other can grow
+/// with every level.
+inline constexpr size_t kSubstitutedTextBytes = 1024 * 1024;
+
+/// Parsed selectors of script queries that are kept for the next query with the same text.
+inline constexpr size_t kCachedQueries = 64;
 
 /// Pixels a side of a surface that holds a blurred shadow: twice a 4K screen; a larger one would be mostly
 /// out of sight.

@@ -20,11 +20,13 @@ class DirtyRegion;
 
 namespace qorvex::layout {
 class FontManager;
-}
+class IFontResolver;
+}  // namespace qorvex::layout
 
 namespace qorvex::dom {
 
 class Document;
+class Node;
 
 struct HostSize {
     uint32_t width = 0;
@@ -42,6 +44,11 @@ class IDocumentHost {
     virtual bool AreComplexSelectorsEnabled() const = 0;
     // Null without fonts (server pages, some tests): text is then measured on the layout side only.
     virtual layout::FontManager* GetFontManager() { return nullptr; }
+    // The same fonts as style solving sees them; null without fonts.
+    virtual layout::IFontResolver* GetFontResolver() { return nullptr; }
+    // Where the pointer is, and what it holds down; null for none. Selectors ask.
+    virtual Node* GetHoveredNode() const { return nullptr; }
+    virtual Node* GetActiveNode() const { return nullptr; }
     virtual ILocalizationManager* GetLocalizationManager() { return nullptr; }
     virtual ITextTransformationManager* GetTextTransformationManager() { return nullptr; }
 

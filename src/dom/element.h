@@ -6,6 +6,7 @@
 #pragma once
 
 #include "css/parser/stylesheet.h"
+#include "css/values/animated_properties.h"
 #include "css/values/match_state.h"
 #include "css/values/property_set.h"
 #include "css/values/style_declaration_set.h"
@@ -82,6 +83,9 @@ class Element : public Node {
     const css::MatchState& GetMatchState() const { return match_state_; }
     css::PropertySet& GetDirtyProperties() { return dirty_properties_; }
     const css::PropertySet& GetDirtyProperties() const { return dirty_properties_; }
+    // What running animations and transitions say; null without any.
+    qsl::RefPtr<css::AnimatedProperties> animatedProperties;
+    qsl::RefPtr<css::TransitionProperties> transitionProperties;
     // Null until first use.
     css::StyleDeclarationSet* GetInlineStyle() const { return inline_style_.get(); }
     css::StyleDeclarationSet& EnsureInlineStyle();
