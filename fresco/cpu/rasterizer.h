@@ -1,0 +1,61 @@
+// Exact-area scan conversion.
+//
+// Every edge adds its signed area to the cells it crosses; the running sum along a row is the winding number
+// weighted by area, which the fill rule turns into coverage. Sums are integers (1 / 65536 of a pixel), so the
+// coverage of a pixel depends neither on the bounds nor on the order of the edges: a partial repaint gives
+// the pixels of a full one, bit for bit. A row only visits cells that an edge touched; between them it emits
+// spans.
+#pragma once
+#include <fresco/path.h>
+#include "fresco/cpu/pixels.h"
+
+namespace fresco::cpu {
+
+class CoverageSink {
+  public:
+    // Constant coverage over [x0, x1), 1 to 255.
+    virtual void Span(int y, int x0, int x1, uint8_t coverage) = 0;
+    // One byte a pixel from x0 on.
+    virtual void Mask(int y, int x0, const uint8_t* coverage, int count) = 0;
+
+  protected:
+    ~CoverageSink() = default;
+};
+
+class Rasterizer {
+  public:
+    // Only pixels inside of the bounds are emitted.
+    void Begin(const IRect& bounds);
+    // An edge of a closed outline, in device pixels. Coordinates must be finite.
+    void AddLine(double x0, double y0, double x1, double y1);
+    // Emits rows from top to bottom, spans from left to right.
+    void Sweep(FillRule rule, CoverageSink& sink);
+    bool HasEdges() const { return !edges_.empty(); }
+
+  private:
+    struct Edge {
+        double x, y;  // upper end
+        double slope, minX, maxX;
+        int64_t top, bottom;  // 48.16
+        int32_t winding;
+        int32_t next;
+    };
+
+    void AccumulateRow(const Edge& edge, int row);
+    void AddCell(int x, int32_t value) {
+        cells_[size_t(x)] += value;
+        touched_[size_t(x) >> 6] |= uint64_t(1) << (x & 63);
+    }
+    void EmitRow(int y, FillRule rule, CoverageSink& sink);
+
+    IRect bounds_;
+    int firstRow_ = 0, lastRow_ = -1;
+    Vector<Edge> edges_;
+    Vector<int32_t> heads_;
+    Vector<int32_t> active_;
+    Vector<int32_t> cells_;  // zero between rows
+    Vector<uint64_t> touched_;
+    Vector<uint8_t> mask_;
+};
+
+}  // namespace fresco::cpu

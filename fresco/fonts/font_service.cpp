@@ -1,0 +1,161 @@
+#include "fresco/fonts/font_service.h"
+
+#include <ft2build.h>
+#include FT_FREETYPE_H
+#include FT_MODULE_H
+
+#include "fresco/core/log.h"
+
+namespace fresco {
+namespace {
+
+// The largest fonts there are (all of CJK in one collection) stay below this.
+constexpr size_t kMaxFontBytes = size_t(128) << 20;
+constexpr size_t kFontAlignment = 16;
+
+// FreeType's own memory, from the client. Blocks carry their size in front for Realloc.
+struct BlockHeader {
+    size_t size;
+    size_t unused;
+};
+
+void* FtAllocate(FT_Memory, long size) {
+    auto* header =
+        static_cast<BlockHeader*>(HeapAllocate(size_t(size) + sizeof(BlockHeader), kFontAlignment));
+    if (!header) return nullptr;
+    header->size = size_t(size);
+    return header + 1;
+}
+
+void FtFree(FT_Memory, void* block) {
+    if (block) HeapFree(static_cast<BlockHeader*>(block) - 1, kFontAlignment);
+}
+
+void* FtReallocate(FT_Memory memory, long, long newSize, void* block) {
+    void* moved = FtAllocate(memory, newSize);
+    if (!moved || !block) return moved;
+    const size_t oldSize = (static_cast<BlockHeader*>(block) - 1)->size;
+    std::memcpy(moved, block, std::min(oldSize, size_t(newSize)));
+    FtFree(memory, block);
+    return moved;
+}
+
+bool ReadAll(IStreamReader* stream, Vector<uint8_t>* bytes) {
+    const size_t size = stream ? stream->GetSize() : 0;
+    if (size == 0 || size > kMaxFontBytes) return false;
+    bytes->resize(size);
+    size_t done = 0;
+    while (done < size) {
+        const size_t read = stream->Read(done, bytes->data() + done, size - done);
+        if (read == 0 || read > size - done) return false;
+        done += read;
+    }
+    return true;
+}
+
+bool EqualFamily(const char* a, const char* b) {
+    const auto lower = [](char c) { return c >= 'A' && c <= 'Z' ? char(c + 32) : c; };
+    while (*a && lower(*a) == lower(*b))
+        ++a, ++b;
+    return *a == *b;
+}
+
+}  // namespace
+
+FontService::FontService() {
+    memory_ = HeapNew<FT_MemoryRec_>();
+    if (!memory_) return;
+    memory_->user = nullptr;
+    memory_->alloc = FtAllocate;
+    memory_->free = FtFree;
+    memory_->realloc = FtReallocate;
+    if (FT_New_Library(memory_, &library_)) {
+        library_ = nullptr;
+        return;
+    }
+    FT_Add_Default_Modules(library_);
+}
+
+FontService::~FontService() {
+    faces_.clear();
+    if (library_) FT_Done_Library(library_);
+    HeapDelete(memory_);
+}
+
+void FontService::Configure(void*) {
+    FRESCO_WARN("IFontService::Configure is not available in this build");
+}
+
+FontId FontService::RegisterBitmapFont(IStreamReader*, const BitmapFontDescription&) {
+    FRESCO_WARN("IFontService::RegisterBitmapFont is not available in this build");
+    return kNoId;
+}
+
+uint32_t FontService::GetFaceCount(IStreamReader* stream) {
+    Vector<uint8_t> bytes;
+    if (!ReadAll(stream, &bytes)) return 0;
+    std::lock_guard lock(mutex_);
+    FT_Face face = nullptr;
+    if (!library_ || FT_New_Memory_Face(library_, bytes.data(), FT_Long(bytes.size()), -1, &face)) return 0;
+    const FT_Long count = face->num_faces;
+    FT_Done_Face(face);
+    return uint32_t(std::clamp<FT_Long>(count, 0, 0xFFFF));
+}
+
+// The faces of a collection come as one file each time; keep its bytes once.
+std::shared_ptr<FontData> FontService::ShareData(Vector<uint8_t> bytes) {
+    for (const auto& [id, face] : faces_) {
+        const FontData& data = face->GetData();
+        if (data.bytes.size() == bytes.size() &&
+            std::memcmp(data.bytes.data(), bytes.data(), bytes.size()) == 0) {
+            return face->ShareData();
+        }
+    }
+    auto data = std::allocate_shared<FontData>(StdAllocator<FontData>());
+    data->bytes = std::move(bytes);
+    return data;
+}
+
+bool FontService::AddFace(std::shared_ptr<FontData> data, uint32_t faceIndex, SdfMode sdf, FontId id) {
+    std::unique_ptr<FontFace, HeapDeleter<FontFace>> face(HeapNew<FontFace>());
+    if (!library_ || !face || !face->Load(library_, std::move(data), faceIndex, sdf, id)) return false;
+    faces_[id] = std::move(face);
+    order_.push_back(id);
+    nextId_ = std::max(nextId_, id + 1);
+    return true;
+}
+
+FontId FontService::LoadFace(IStreamReader* stream, uint32_t faceIndex, SdfMode sdf) {
+    Vector<uint8_t> bytes;
+    if (!ReadAll(stream, &bytes)) return kNoId;
+    std::lock_guard lock(mutex_);
+    const FontId id = nextId_;
+    return AddFace(ShareData(std::move(bytes)), faceIndex, sdf, id) ? id : kNoId;
+}
+
+bool FontService::LoadFaceAs(FontId id, const void* data, size_t size, uint32_t faceIndex, SdfMode sdf) {
+    const auto* begin = static_cast<const uint8_t*>(data);
+    std::lock_guard lock(mutex_);
+    if (id == kNoId || id >= kNoId - 1 || faces_.count(id)) return false;
+    return AddFace(ShareData(Vector<uint8_t>(begin, begin + size)), faceIndex, sdf, id);
+}
+
+FontId FontService::FindFont(const char* family, uint32_t flags) {
+    std::shared_lock lock(mutex_);
+    for (auto id = order_.rbegin(); family && id != order_.rend(); ++id) {
+        const FontFace& face = *faces_.find(*id)->second;
+        // The question knows one style bit; an oblique face answers to it as well.
+        uint32_t faceFlags = face.GetFlags();
+        if (faceFlags & kFontOblique) faceFlags = (faceFlags & ~uint32_t(kFontOblique)) | kFontItalic;
+        if (faceFlags == flags && EqualFamily(face.GetFamilyName(), family)) return *id;
+    }
+    return kNoId;
+}
+
+FontFace* FontService::FindFace(FontId id) {
+    std::shared_lock lock(mutex_);
+    const auto found = faces_.find(id);
+    return found == faces_.end() ? nullptr : found->second.get();
+}
+
+}  // namespace fresco

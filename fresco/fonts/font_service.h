@@ -1,0 +1,41 @@
+// The faces of a rendering library. One lock guards the list and the FreeType library object; faces
+// themselves never move and never go before the service.
+#pragma once
+#include <shared_mutex>
+
+#include "fresco/fonts/font_face.h"
+
+struct FT_MemoryRec_;
+
+namespace fresco {
+
+class FontService final : public IFontService {
+  public:
+    FontService();
+    ~FontService() override;
+
+    void Configure(void* argument) override;
+    uint32_t GetFaceCount(IStreamReader* stream) override;
+    FontId LoadFace(IStreamReader* stream, uint32_t faceIndex, SdfMode sdf) override;
+    FontId RegisterBitmapFont(IStreamReader* stream, const BitmapFontDescription& description) override;
+    FontId FindFont(const char* family, uint32_t flags) override;
+    IFont* GetFont(FontId id) override { return FindFace(id); }
+
+    const FontFace* GetFace(FontId id) const { return const_cast<FontService*>(this)->FindFace(id); }
+    // For replays: a face under the id that it had when it was captured.
+    bool LoadFaceAs(FontId id, const void* data, size_t size, uint32_t faceIndex, SdfMode sdf);
+
+  private:
+    FontFace* FindFace(FontId id);
+    std::shared_ptr<FontData> ShareData(Vector<uint8_t> bytes);
+    bool AddFace(std::shared_ptr<FontData> data, uint32_t faceIndex, SdfMode sdf, FontId id);
+
+    mutable std::shared_mutex mutex_;
+    FT_MemoryRec_* memory_ = nullptr;
+    FT_LibraryRec_* library_ = nullptr;
+    HashMap<FontId, std::unique_ptr<FontFace, HeapDeleter<FontFace>>> faces_;
+    Vector<FontId> order_;  // as loaded: FindFont takes the last match
+    FontId nextId_ = 0;
+};
+
+}  // namespace fresco
