@@ -1,0 +1,27 @@
+// The CPU implementation of IRenderingLibrary.
+#pragma once
+#include <fresco/rendering_library.h>
+#include "fresco/cpu/cpu_backend.h"
+
+namespace fresco::cpu {
+
+class CpuLibrary final : public IRenderingLibrary {
+  public:
+    void RegisterRenderThread(void*, void*, uint64_t) override {}
+    void FreeRenderingResources() override;
+    const char* GetBuildIdentifier() const override { return fresco::GetBuildIdentifier(); }
+    // Fonts come as streams and images as memory: nothing here opens a file yet.
+    void SetFileManipulator(IFileManipulator* files) override { files_ = files; }
+    IFontService* GetFontService() override { return &shared_.fonts; }
+    IScene* CreateScene(const SceneParams& params) override;
+    void Forward(uint64_t first, uint64_t second, uint64_t third) override;
+    void Destroy() override;
+
+    SharedState& shared() { return shared_; }
+
+  private:
+    SharedState shared_;
+    IFileManipulator* files_ = nullptr;
+};
+
+}  // namespace fresco::cpu

@@ -1,0 +1,115 @@
+// Glyph runs. Upright text of ordinary size comes from the glyph cache; large, turned or stroked glyphs are
+// outlines like any path; picture glyphs are images.
+#include "fresco/cpu/cpu_backend.h"
+
+namespace fresco::cpu {
+
+void CpuBackend::DrawGlyphBitmap(const FontFace& face, uint32_t glyph, float size, Vec2 at, const Ink& ink) {
+    constexpr double kFar = 1 << 22;
+    if (!(std::abs(at.x) < kFar) || !(std::abs(at.y) < kFar)) return;
+    const int64_t quarter = std::llround(at.x * GlyphCache::kSubpixels);
+    const int subpixel = int(quarter & (GlyphCache::kSubpixels - 1));
+    const int x = int((quarter - subpixel) / GlyphCache::kSubpixels), y = int(std::lround(at.y));
+    const GlyphBitmap& bitmap = shared_.glyphs.Get(face, glyph, size, subpixel);
+    const IRect box{x + bitmap.left, y + bitmap.top, x + bitmap.left + bitmap.width,
+                    y + bitmap.top + bitmap.height};
+    const IRect visible = Intersect(box, clip_.bounds());
+    if (visible.IsEmpty()) return;
+    const uint8_t* coverage = shared_.glyphs.Coverage(bitmap);
+    const Bitmap target = CurrentBitmap();
+    PaintSink sink(target, ink, row_);
+    for (int row = visible.y0; row < visible.y1; ++row) {
+        const uint8_t* line = coverage + size_t(row - box.y0) * size_t(bitmap.width) + (visible.x0 - box.x0);
+        if (clip_.IsSimple())
+            sink.Mask(row, visible.x0, line, visible.Width());
+        else
+            clip_.Filter(row, visible.x0, line, visible.Width(), sink);
+    }
+    Touch(visible);
+    stats_.paintedPixels += sink.painted();
+}
+
+bool CpuBackend::DrawColorGlyph(const FontFace& face, uint32_t glyph, float size, Point at,
+                                const Paint& paint) {
+    const ColorGlyph* picture = face.GetColorGlyph(glyph);
+    if (!picture) return false;
+    Texture& texture = shared_.colorGlyphs[uint64_t(face.GetId()) << 32 | glyph];
+    if (texture.width == 0) {
+        if (!texture.pixels.Allocate(int(picture->width), int(picture->height))) return true;
+        texture.width = picture->width, texture.height = picture->height;
+        std::memcpy(texture.pixels.pixels(), picture->pixels.data(), picture->pixels.size() * 4);
+    }
+    const Rect target{at.x + picture->left * size, at.y + picture->top * size, 0, picture->emWidth * size,
+                      picture->emHeight * size};
+    DrawTexture(texture, target, {.target = target}, paint);
+    return true;
+}
+
+void CpuBackend::DrawRun(const GlyphRunParams& run, const Glyph* glyphs, uint32_t count, bool stroke) {
+    EndScissors();
+    const FontFace* face = shared_.fonts.GetFace(run.font);
+    if (!face || !(run.size > 0) || clip_.IsEmpty()) return;
+    const Ink ink = SolidInk(run.paint);
+    if (ink.DrawsNothing()) return;
+    ++stats_.draws;
+    const Homography plane = PlaneAt(0);
+    const double scale = plane.xx;
+    const bool upright = plane.IsScaleTranslate() && scale > 0 && std::abs(plane.yy - scale) < 1e-3 * scale;
+    const bool cached =
+        upright && !stroke && run.size * scale <= GlyphCache::kMaxSize && run.size * scale >= 0.5;
+    const float unit = run.size / face->GetUnitsPerEm();
+    for (uint32_t i = 0; i < count; ++i) {
+        const Point at{run.x + glyphs[i].x + run.letterSpacing * float(i), run.y + glyphs[i].y};
+        if (face->HasColorGlyphs() && !stroke &&
+            DrawColorGlyph(*face, glyphs[i].index, run.size, at, run.paint))
+            continue;
+        if (cached) {
+            DrawGlyphBitmap(*face, glyphs[i].index, float(run.size * scale), plane.Apply(at.x, at.y), ink);
+            continue;
+        }
+        const GlyphOutline& outline = face->GetOutline(glyphs[i].index);
+        if (outline.path.points.empty()) continue;
+        Homography place;
+        place.xx = place.yy = unit, place.x0 = at.x, place.y0 = at.y;
+        if (!stroke) {
+            DrawOutline(outline.path, plane * place, kFillNonZero, ink);
+            continue;
+        }
+        Paint paint = run.paint;
+        paint.strokeWidth /= unit;
+        DrawStroke(outline.path, plane * place, paint, ink);
+    }
+}
+
+void CpuBackend::DrawGlyphs(const DrawGlyphsRecord& record, const GlyphsTail& tail) {
+    DrawRun(record.run, tail.glyphs, tail.count, false);
+}
+
+void CpuBackend::StrokeGlyphs(const StrokeGlyphsRecord& record, const GlyphsTail& tail) {
+    DrawRun(record.run, tail.glyphs, tail.count, true);
+}
+
+void CpuBackend::FillString(const FillStringRecord& record, const TextTail& tail) {
+    const FontFace* face = shared_.fonts.GetFace(record.text.font);
+    if (!face) return;
+    codePoints_.clear();
+    DecodeUtf8(tail.text, tail.length, &codePoints_);
+    const size_t count = codePoints_.size();
+    glyphIndices_.resize(count);
+    advances_.resize(count);
+    glyphs_.resize(count);
+    face->GetGlyphIndices(codePoints_.data(), count, glyphIndices_.data());
+    face->GetAdvances(glyphIndices_.data(), count, record.text.size, advances_.data());
+    float x = 0;
+    for (size_t i = 0; i < count; ++i) {
+        glyphs_[i] = {glyphIndices_[i], x, 0};
+        x += advances_[i];
+    }
+    GlyphRunParams run;
+    run.font = record.text.font, run.size = record.text.size;
+    run.x = record.text.x, run.y = record.text.y;
+    run.paint = record.text.paint;
+    DrawRun(run, glyphs_.data(), uint32_t(count), record.text.flags & kTextStroke);
+}
+
+}  // namespace fresco::cpu

@@ -1,0 +1,70 @@
+// The last step of a draw: coverage to pixels.
+#pragma once
+#include <fresco/paint.h>
+#include "fresco/cpu/blend.h"
+#include "fresco/cpu/clip.h"
+#include "fresco/cpu/sources.h"
+
+namespace fresco::cpu {
+
+// What a draw puts down: one colour, or a source, or another bitmap's pixels at the same place.
+struct Ink {
+    uint32_t color = 0;  // premultiplied, opacity included
+    PixelSource* source = nullptr;
+    const Bitmap* bitmap = nullptr;
+    uint32_t blend = kBlendNormal;
+
+    bool DrawsNothing() const { return !source && !bitmap && color == 0 && blend == kBlendNormal; }
+};
+
+class PaintSink final : public CoverageSink {
+  public:
+    PaintSink(const Bitmap& target, const Ink& ink, Vector<uint32_t>& row)
+        : target_(target), ink_(ink), row_(row) {
+        row_.resize(std::max<size_t>(row_.size(), size_t(target.bounds.Width())));
+        solid_ = !ink.source && !ink.bitmap;
+        if (solid_ && ink.blend != kBlendNormal) std::fill(row_.begin(), row_.end(), ink.color);
+    }
+    void Span(int y, int x0, int x1, uint8_t coverage) override {
+        uint32_t* dst = target_.Row(y) + x0;
+        painted_ += uint64_t(x1 - x0);
+        if (solid_ && ink_.blend == kBlendNormal) return BlendSolid(dst, x1 - x0, ink_.color, coverage);
+        BlendRowMode(ink_.blend, dst, Source(y, x0, x1 - x0), x1 - x0, nullptr, coverage);
+    }
+    void Mask(int y, int x0, const uint8_t* coverage, int count) override {
+        uint32_t* dst = target_.Row(y) + x0;
+        painted_ += uint64_t(count);
+        if (solid_ && ink_.blend == kBlendNormal) return BlendSolidMask(dst, count, ink_.color, coverage);
+        BlendRowMode(ink_.blend, dst, Source(y, x0, count), count, coverage, 255);
+    }
+    uint64_t painted() const { return painted_; }
+
+  private:
+    const uint32_t* Source(int y, int x0, int count) {
+        if (ink_.bitmap) return ink_.bitmap->Row(y) + x0;
+        if (ink_.source) ink_.source->Fetch(x0, y, count, row_.data());
+        return row_.data();
+    }
+
+    const Bitmap& target_;
+    const Ink& ink_;
+    Vector<uint32_t>& row_;
+    bool solid_ = true;
+    uint64_t painted_ = 0;
+};
+
+// Sends coverage through a clip that is more than a rectangle.
+class ClipSink final : public CoverageSink {
+  public:
+    ClipSink(const Clip& clip, CoverageSink& out) : clip_(clip), out_(out) {}
+    void Span(int y, int x0, int x1, uint8_t coverage) override { clip_.Filter(y, x0, x1, coverage, out_); }
+    void Mask(int y, int x0, const uint8_t* coverage, int count) override {
+        clip_.Filter(y, x0, coverage, count, out_);
+    }
+
+  private:
+    const Clip& clip_;
+    CoverageSink& out_;
+};
+
+}  // namespace fresco::cpu

@@ -1,0 +1,46 @@
+// Images and surfaces by id, for all scenes of a library. Render thread only.
+#pragma once
+#include <fresco/command_records.h>
+#include "fresco/cpu/pixels.h"
+
+namespace fresco::cpu {
+
+// A picture as draws read it. Mip levels are made when a draw first shrinks below one half.
+struct Texture {
+    PixelBuffer pixels;     // RGBA8 premultiplied; empty for A8
+    Vector<uint8_t> alpha;  // A8 content
+    uint32_t width = 0, height = 0;
+    bool opaque = false;
+    uint32_t sourceFormat = 0;  // PixelFormat of updates
+    uint32_t flags = 0;         // ImageFlags
+    const UserImage* user = nullptr;
+    Vector<PixelBuffer> levels;  // half sizes, from the second level on
+    bool levelsValid = false;
+
+    // The level for a draw that shows `scale` device pixels a texel.
+    const PixelBuffer& Level(double scale, int* shift);
+};
+
+class Resources {
+  public:
+    // Null when absent. User images are read anew.
+    Texture* FindImage(ImageId id);
+    Texture* FindSurface(SurfaceId id);
+    void CreateImage(const CreateImageRecord& record, const void* pixels, size_t size);
+    void UpdateImage(const UpdateImageRecord& record, const void* pixels, size_t size);
+    void DestroyImage(ImageId id) { images_.erase(id); }
+    void CreateSurface(const CreateSurfaceRecord& record);
+    void DestroySurface(SurfaceId id) { surfaces_.erase(id); }
+    void Clear();
+    // For replays: pixels as a capture stored them.
+    bool RestoreImage(ImageId id, uint32_t format, uint32_t width, uint32_t height, const uint8_t* data);
+    bool RestoreSurface(SurfaceId id, uint32_t width, uint32_t height, const uint8_t* data);
+
+  private:
+    void Load(Texture& texture, const uint8_t* pixels, size_t pitch);
+
+    HashMap<ImageId, Texture> images_;
+    HashMap<SurfaceId, Texture> surfaces_;
+};
+
+}  // namespace fresco::cpu
