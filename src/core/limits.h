@@ -64,4 +64,8 @@ inline constexpr size_t kMaxShadowSurfaceSide = 8192;
 /// one.
 inline constexpr size_t kMaxGradientTiles = 4096;
 
+/// Font sizes in pixels between which font-fit-mode looks: smaller text cannot be read, larger text has no screen.
+inline constexpr float kSmallestFitSize = 6;
+inline constexpr float kLargestFitSize = 8192;
+
 }  // namespace qorvex::limits

@@ -20,6 +20,7 @@ enum class DOMTaskKind : uint8_t {
     UpdateTextAlignmentInDOM,
     UpdateScrollPositionInDOM,
     UpdateDirtyHighlightRect,
+    FontArrived,  // delivered at once, from the DOM thread: a font that the node's style waited for
 };
 
 // The name under which the task runs and is traced.

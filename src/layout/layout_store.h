@@ -12,6 +12,10 @@
 
 struct YGConfig;
 
+namespace fresco {
+class IFontService;
+}
+
 namespace qorvex::layout {
 
 class LayoutStore : public AtomicRefCounted<LayoutStore, MemoryTag::LayoutNodes> {
@@ -31,6 +35,8 @@ class LayoutStore : public AtomicRefCounted<LayoutStore, MemoryTag::LayoutNodes>
         friend bool operator==(const Metrics&, const Metrics&) = default;
     };
     Metrics metrics;
+    // Where text finds its fonts; set by the document before the first layout. Null: no text is measured.
+    fresco::IFontService* fonts = nullptr;
     // The warning about the depth limit is given once a tree.
     bool reportedDepth = false;
     // The engine of the last layout; the other one's inputs are stale.

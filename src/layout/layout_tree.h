@@ -7,6 +7,7 @@
 
 #include "layout/handle_set.h"
 #include "layout/layout_handle.h"
+#include "layout/layout_store.h"
 #include "layout/layout_update.h"
 
 #include <span>
@@ -31,6 +32,9 @@ class LayoutTree {
     LayoutTree(const LayoutTree&) = delete;
     LayoutTree& operator=(const LayoutTree&) = delete;
     ~LayoutTree();
+
+    // Where the text of this tree finds its fonts. Before the first layout.
+    void SetFonts(fresco::IFontService* fonts) { store_->fonts = fonts; }
 
     LayoutHandle* Root() const { return root_.get(); }
     HandlePtr CreateRoot(NewNode&& node);

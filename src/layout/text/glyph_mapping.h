@@ -1,0 +1,41 @@
+// Plain path: characters to glyphs, font by font, without shaping.
+#pragma once
+
+#include "layout/text/characters.h"
+#include "layout/text/text_style.h"
+
+namespace fresco {
+class IFont;
+class IFontService;
+}  // namespace fresco
+
+namespace qorvex::layout {
+
+// How tall a line is that holds glyphs of one typeface, in pixels.
+struct LineMetrics {
+    float baseline = 0;
+    float height = 0;
+};
+
+// The loaded typefaces of a style, in priority order.
+struct LoadedTypefaces {
+    TempVector<fresco::IFont*> fonts;
+    TempVector<uint32_t> ids;
+    TempVector<LineMetrics> metrics;
+};
+
+struct GlyphMap {
+    TempVector<uint32_t> glyphs;
+    TempVector<uint8_t> fonts;   // index into LoadedTypefaces
+    TempVector<float> advances;  // letter spacing included
+};
+
+// Empty when nothing is loaded.
+void LoadTypefaces(const TextStyle& style, fresco::IFontService& service, bool applyLineHeight,
+                   LoadedTypefaces& out);
+
+// Every character gets the first font that has it, else the box of the first font.
+void MapGlyphs(const Characters& characters, const LoadedTypefaces& typefaces, const TextStyle& style,
+               GlyphMap& out);
+
+}  // namespace qorvex::layout

@@ -1,0 +1,66 @@
+// Laid-out text: lines of positioned glyph runs. A value that measuring fills and painting reads; all arrays
+// are flat, so that a label of one line costs three small blocks.
+#pragma once
+
+#include <fresco/paint.h>
+
+#include "core/memory/containers.h"
+#include "layout/text/text_style.h"
+
+namespace qorvex::layout {
+
+template <class T>
+using TextArray = Vector<T, MemoryTag::LayoutData>;
+
+// Glyphs of one font and one direction on one line.
+struct TextRun {
+    uint32_t font = css::kNoTypeface;
+    uint32_t firstGlyph = 0;  // in TextInfo::glyphs; positions are relative to the run
+    uint32_t glyphCount = 0;
+    uint32_t firstCharacter = 0;  // in the collapsed text, code points
+    uint32_t endCharacter = 0;
+    float x = 0;  // in the line, alignment included
+    float width = 0;
+    bool rightToLeft = false;
+};
+
+// The sign that stands for what was cut off; it is a run of its own behind the others.
+struct TextEllipsis {
+    uint32_t glyph = 0;
+    uint32_t font = css::kNoTypeface;  // kNoTypeface: the line is not cut
+    float advance = 0;
+    float x = 0;
+};
+
+struct TextLineInfo {
+    uint32_t firstRun = 0;  // in TextInfo::runs
+    uint32_t runCount = 0;
+    uint32_t firstCharacter = 0;
+    uint32_t endCharacter = 0;
+    float x = 0;  // that alignment gave the line
+    float width = 0;
+    float height = 0;
+    float baseline = 0;          // from the line's top
+    bool endsParagraph = false;  // by a line feed or the end of the text
+    TextEllipsis ellipsis;
+};
+
+struct TextInfo {
+    TextArray<TextLineInfo> lines;
+    TextArray<TextRun> runs;
+    TextArray<fresco::Glyph> glyphs;  // one for each character, spaces included, in the plain path
+    float width = 0;
+    float height = 0;
+    float usedSize = 0;    // font size of this layout in pixels
+    bool wrapped = false;  // some line ended because of the available width
+
+    void Clear() {
+        lines.clear();
+        runs.clear();
+        glyphs.clear();
+        width = height = 0;
+        wrapped = false;
+    }
+};
+
+}  // namespace qorvex::layout
