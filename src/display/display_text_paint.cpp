@@ -5,6 +5,7 @@
 
 #include "core/logging/log.h"
 #include "display/display_text.h"
+#include "display/transforms.h"
 #include "display/paint_context.h"
 #include "display/resolved_visuals.h"
 #include "layout/layout_handle.h"
@@ -13,10 +14,6 @@
 namespace qorvex::dsp {
 
 namespace {
-
-fresco::Color ToFresco(const css::Color& color) {
-    return {color.red, color.green, color.blue, color.alpha};
-}
 
 // One pass over all runs in one colour.
 struct TextPass {
@@ -59,7 +56,7 @@ struct TextPass {
 void DisplayText::Paint(PaintContext& context, bool, const layout::LayoutNode& node,
                         fresco::CommandBuffer& buffer) {
     if (layout::IsEmpty(node.visualAabb)) return;
-    const layout::Rect box = context.PaintBox(node);
+    const layout::Rect box = PaintBox(node, context.snapToPixels);
     if (!layout::IsFinite(box)) {
         AssertFailure("Trying to display text with invalid size.");
         return;

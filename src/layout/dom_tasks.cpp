@@ -19,6 +19,8 @@ const char* DOMTaskName(DOMTaskKind kind) {
             return "UpdateScrollPositionInDOM";
         case DOMTaskKind::UpdateDirtyHighlightRect:
             return "UpdateDirtyHighlightRect";
+        case DOMTaskKind::FontArrived:
+            return "FontArrived";
     }
     return "";
 }
