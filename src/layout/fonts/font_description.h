@@ -15,6 +15,7 @@ struct FontDescription {
 
     // Everything is said, so that the file has nothing to add.
     bool IsExplicit() const { return !family.empty() && style != 0 && weight != 0; }
+    uint64_t HashValue() const { return family.HashValue() * 31 + style * 16u + weight; }
     friend bool operator==(const FontDescription&, const FontDescription&) = default;
 };
 

@@ -21,9 +21,9 @@ void LogChannel(const char* what, TaskChannels channel, uint32_t family) {
 fresco::SdfMode ToSdfMode(uint32_t useSDF) {
     switch (useSDF) {
         case 1:
-            return fresco::SdfMode::WhenLarge;
-        case 2:
             return fresco::SdfMode::Always;
+        case 2:
+            return fresco::SdfMode::WhenLarge;
         default:
             return fresco::SdfMode::Never;
     }
@@ -185,20 +185,16 @@ bool FontManager::RemoveFontDescription(const FontDescription& description) {
     return loaded_.erase(description) > 0;
 }
 
-void FontManager::AddFontFaces(const css::CssVector<css::FontFace>& faces, const URL& base, uint32_t useSDF) {
-    for (const css::FontFace& face : faces) {
-        URL url;
-        url.Parse(face.url.view(), 0);
-        if (!url.IsEmpty() && url.IsRelative()) url = url.Merge(base);
-        if (url.IsEmpty() || url.IsRelative()) {
-            LogWarning("@font-face src url must be a valid URI");
-            continue;
-        }
-        const int32_t hundreds = (face.weight + 50) / 100;
-        const auto weight =
-            static_cast<uint8_t>(std::clamp<int32_t>(hundreds, kLightestWeight, kHeaviestWeight));
-        AddFontDescription({strings_.Intern(face.family.view()), StyleCode(face.style), weight}, url, useSDF);
+void FontManager::AddFontFace(const css::FontFace& face) {
+    const URL url(face.url.view());
+    if (url.IsEmpty() || url.IsRelative()) {
+        LogWarning("@font-face src url must be a valid URI");
+        return;
     }
+    const auto weight =
+        static_cast<uint8_t>(std::clamp<int32_t>((face.weight + 50) / 100, kLightestWeight, kHeaviestWeight));
+    // Pages get outlines at their true shape: distance fields pay only for text that a GPU scales.
+    AddFontDescription({strings_.Intern(face.family.view()), StyleCode(face.style), weight}, url, 0);
 }
 
 }  // namespace qorvex::layout

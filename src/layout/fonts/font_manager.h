@@ -49,19 +49,13 @@ class FontManager final : public IFontResolver {
 
     // Loads a font file for a description that has no font yet. useSDF: 0 off, 1 on, 2 auto.
     void AddFontDescription(const FontDescription& description, const URL& url, uint32_t useSDF);
-    // The @font-face rules of a sheet that was added to a document.
-    void AddFontFaces(const css::CssVector<css::FontFace>& faces, const URL& base, uint32_t useSDF);
     bool RemoveFontDescription(const FontDescription& description);
 
     void ResolveTypefaces(const css::FontFamily& families, css::FontStyle style, uint8_t weight,
                           const NodeLinkPtr& waiter, TypefaceList& out) override;
+    void AddFontFace(const css::FontFace& face) override;
 
   private:
-    struct DescriptionHash {
-        uint64_t operator()(const FontDescription& key) const {
-            return (key.family.HashValue() * 31) + key.style * 16u + key.weight;
-        }
-    };
     using WaiterList = SmallVector<NodeLinkPtr, 2, MemoryTag::General>;
 
     void LoadFallbackFont(int32_t which);
@@ -77,8 +71,8 @@ class FontManager final : public IFontResolver {
     TaskFamilyHandle family_;
     IFontResourceLoader& loader_;
     StringPool& strings_;
-    HashMap<FontDescription, fresco::FontId, MemoryTag::General, DescriptionHash> loaded_;
-    HashMap<FontDescription, WaiterList, MemoryTag::General, DescriptionHash> pending_;
+    HashMap<FontDescription, fresco::FontId, MemoryTag::General> loaded_;
+    HashMap<FontDescription, WaiterList, MemoryTag::General> pending_;
     Atom default_family_;
     fresco::FontId fallback_ = fresco::kNoId;
 };
