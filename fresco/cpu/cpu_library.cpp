@@ -32,7 +32,11 @@ void CpuLibrary::Destroy() {
 IRenderingLibrary* IRenderingLibrary::Initialize(const RenderingLibraryParams& params) {
     Library::Start(params.allocator, params.logHandler, params.loggingSeverity);
     auto* library = HeapNew<cpu::CpuLibrary>();
-    if (!library) Library::Stop();
+    if (!library) {
+        Library::Stop();
+        return nullptr;
+    }
+    library->shared().fonts.SetOptions(params.additionalOptions);
     return library;
 }
 

@@ -10,8 +10,8 @@ class CpuLibrary final : public IRenderingLibrary {
     void RegisterRenderThread(void*, void*, uint64_t) override {}
     void FreeRenderingResources() override;
     const char* GetBuildIdentifier() const override { return fresco::GetBuildIdentifier(); }
-    // Fonts come as streams and images as memory: nothing here opens a file yet.
-    void SetFileManipulator(IFileManipulator* files) override { files_ = files; }
+    // Only fonts that the options name are opened by the library itself.
+    void SetFileManipulator(IFileManipulator* files) override { shared_.fonts.SetFiles(files); }
     IFontService* GetFontService() override { return &shared_.fonts; }
     IScene* CreateScene(const SceneParams& params) override;
     void Forward(uint64_t first, uint64_t second, uint64_t third) override;
@@ -21,7 +21,6 @@ class CpuLibrary final : public IRenderingLibrary {
 
   private:
     SharedState shared_;
-    IFileManipulator* files_ = nullptr;
 };
 
 }  // namespace fresco::cpu

@@ -141,6 +141,28 @@ bool FontService::LoadFaceAs(FontId id, const void* data, size_t size, uint32_t 
 }
 
 FontId FontService::FindFont(const char* family, uint32_t flags) {
+    const FontId id = FindLoaded(family, flags);
+    return id == kNoId && LoadSystemFonts() ? FindLoaded(family, flags) : id;
+}
+
+// System fonts stand before all others in the order, so that a face which a page brings under the same name
+// wins.
+bool FontService::LoadSystemFonts() {
+    std::lock_guard lock(mutex_);
+    const Vector<FontId> loaded = std::move(order_);
+    order_.clear();
+    const bool opened = system_.Open([this](IStreamReader* reader) {
+        Vector<uint8_t> bytes;
+        if (!ReadAll(reader, &bytes)) return;
+        const std::shared_ptr<FontData> data = ShareData(std::move(bytes));
+        for (uint32_t face = 0; AddFace(data, face, SdfMode::WhenLarge, nextId_); ++face) {
+        }
+    });
+    order_.insert(order_.end(), loaded.begin(), loaded.end());
+    return opened;
+}
+
+FontId FontService::FindLoaded(const char* family, uint32_t flags) const {
     std::shared_lock lock(mutex_);
     for (auto id = order_.rbegin(); family && id != order_.rend(); ++id) {
         const FontFace& face = *faces_.find(*id)->second;

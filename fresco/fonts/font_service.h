@@ -4,6 +4,7 @@
 #include <shared_mutex>
 
 #include "fresco/fonts/font_face.h"
+#include "fresco/fonts/system_fonts.h"
 
 struct FT_MemoryRec_;
 
@@ -21,12 +22,18 @@ class FontService final : public IFontService {
     FontId FindFont(const char* family, uint32_t flags) override;
     IFont* GetFont(FontId id) override { return FindFace(id); }
 
+    // Before the first search.
+    void SetOptions(const char* options) { system_.SetOptions(options); }
+    void SetFiles(IFileManipulator* files) { system_.SetFiles(files); }
+
     const FontFace* GetFace(FontId id) const { return const_cast<FontService*>(this)->FindFace(id); }
     // For replays: a face under the id that it had when it was captured.
     bool LoadFaceAs(FontId id, const void* data, size_t size, uint32_t faceIndex, SdfMode sdf);
 
   private:
     FontFace* FindFace(FontId id);
+    FontId FindLoaded(const char* family, uint32_t flags) const;
+    bool LoadSystemFonts();
     std::shared_ptr<FontData> ShareData(Vector<uint8_t> bytes);
     bool AddFace(std::shared_ptr<FontData> data, uint32_t faceIndex, SdfMode sdf, FontId id);
 
@@ -36,6 +43,7 @@ class FontService final : public IFontService {
     HashMap<FontId, std::unique_ptr<FontFace, HeapDeleter<FontFace>>> faces_;
     Vector<FontId> order_;  // as loaded: FindFont takes the last match
     FontId nextId_ = 0;
+    SystemFonts system_;
 };
 
 }  // namespace fresco

@@ -44,7 +44,7 @@ class NullLibrary final : public IRenderingLibrary {
     void RegisterRenderThread(void*, void*, uint64_t) override {}
     void FreeRenderingResources() override {}
     const char* GetBuildIdentifier() const override { return fresco::GetBuildIdentifier(); }
-    void SetFileManipulator(IFileManipulator*) override {}
+    void SetFileManipulator(IFileManipulator* files) override { fonts_.SetFiles(files); }
     IFontService* GetFontService() override { return &fonts_; }
     IScene* CreateScene(const SceneParams&) override { return HeapNew<NullScene>(); }
     void Forward(uint64_t, uint64_t, uint64_t) override {}
@@ -52,6 +52,7 @@ class NullLibrary final : public IRenderingLibrary {
         HeapDelete(this);
         Library::Stop();
     }
+    FontService& fonts() { return fonts_; }
 
   private:
     FontService fonts_;
@@ -62,7 +63,11 @@ class NullLibrary final : public IRenderingLibrary {
 IRenderingLibrary* CreateNullRenderingLibrary(const RenderingLibraryParams& params) {
     Library::Start(params.allocator, params.logHandler, params.loggingSeverity);
     auto* library = HeapNew<NullLibrary>();
-    if (!library) Library::Stop();
+    if (!library) {
+        Library::Stop();
+        return nullptr;
+    }
+    library->fonts().SetOptions(params.additionalOptions);
     return library;
 }
 
