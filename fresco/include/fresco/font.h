@@ -22,8 +22,8 @@ enum FontFlags : uint32_t {
 };
 
 enum class SdfMode : uint32_t {
-    WhenLarge = 0,  // a back end may switch to distance fields where it pays
-    Always = 1,
+    Always = 0,
+    WhenLarge = 1,  // a back end may switch to distance fields where it pays
     Never = 2,
 };
 
