@@ -1,0 +1,159 @@
+#include "layout/page_fixture.h"
+
+#include "core/limits.h"
+#include "layout/debug_names.h"
+
+namespace qorvex::test {
+namespace {
+
+using layout::HandlePtr;
+using layout::LayoutHandle;
+
+using LayoutTreeTest = LayoutTest;
+
+std::vector<const LayoutHandle*> NodeChildren(const LayoutHandle* handle) {
+    std::vector<const LayoutHandle*> children;
+    for (const HandlePtr& child : handle->node().children)
+        children.push_back(child.get());
+    return children;
+}
+
+TEST_F(LayoutTreeTest, NewChildFindsItsPlaceAmongSiblingsOfWhichSomeHaveNoHandle) {
+    Page page;
+    LayoutHandle* first = page.Add(page.body, "");
+    LayoutHandle* last = page.Add(page.body, "");
+    // DOM children: first, (none), new, (none), last
+    LayoutHandle* dom[] = {first, nullptr, nullptr, nullptr, last};
+    auto at = [&](uint32_t i) { return dom[i]; };
+    EXPECT_EQ(layout::LayoutIndexForChild(*page.body, 5, 2, at), 1u);
+    EXPECT_EQ(layout::LayoutIndexForChild(*page.body, 5, 0, at), 0u + 1u);
+    EXPECT_EQ(layout::LayoutIndexForChild(*page.body, 6, 5, [&](uint32_t i) { return i < 5 ? dom[i] : nullptr; }), 2u);
+    LayoutHandle* middle = page.Insert(page.body, 1, "");
+    page.Frame();
+    EXPECT_EQ(NodeChildren(page.body), (std::vector<const LayoutHandle*>{first, middle, last}));
+}
+
+TEST_F(LayoutTreeTest, CommitCopiesOnlyChangedHandles) {
+    Page page;
+    std::vector<LayoutHandle*> boxes;
+    for (int i = 0; i < 1000; ++i)
+        boxes.push_back(page.Add(page.body, "position: absolute; width: 5px; height: 5px"));
+    page.Settle();
+    page.Frame();
+    EXPECT_EQ(page.Counters().committed, 0u);
+    for (LayoutHandle* box : boxes)
+        page.Change(box, "top: 7px");
+    EXPECT_EQ(page.tree.Changed().Size(), 1000u);
+    page.Frame();
+    EXPECT_EQ(page.Counters().committed, 1000u);
+    EXPECT_EQ(BoxOf(boxes[500]), "0 7 5 5");
+    EXPECT_TRUE(page.tree.Changed().Empty());
+}
+
+TEST_F(LayoutTreeTest, RemovingTakesTheSubtreeOutOnceAndDirtiesWhatItCovered) {
+    Page page;
+    FakeNode node;
+    LayoutHandle* parent = page.Insert(page.body, 0, "width: 50px; height: 40px; background-color: red", &node);
+    LayoutHandle* child = page.Add(parent, "width: 80px; height: 90px");
+    page.Settle();
+    EXPECT_TRUE(node.inTree);
+    page.tree.Remove(*parent, nullptr);
+    page.tree.Remove(*parent, nullptr);
+    page.tree.Remove(*child, nullptr);
+    EXPECT_EQ(page.tree.Removed().Size(), 2u);
+    EXPECT_FALSE(node.inTree);
+    EXPECT_FALSE(child->data().inTree);
+    page.Frame();
+    EXPECT_TRUE(page.body->node().children.empty());
+    EXPECT_EQ(BoxOf(page.body), "0 0 1000 0");
+    EXPECT_TRUE(layout::Contains(page.dirty.Bounds(), layout::MakeRect(0, 0, 80, 90)));
+}
+
+TEST_F(LayoutTreeTest, MovedNodeIsRemovedAndAttached) {
+    Page page;
+    LayoutHandle* a = page.Add(page.body, "height: 10px");
+    LayoutHandle* b = page.Add(page.body, "height: 10px");
+    LayoutHandle* moved = page.Add(a, "width: 10px; height: 5px");
+    page.Settle();
+    page.tree.Remove(*moved, nullptr);
+    page.tree.Attach(*moved, *b, 0);
+    EXPECT_TRUE(page.tree.Removed().Empty());
+    page.Frame();
+    EXPECT_TRUE(a->node().children.empty());
+    EXPECT_EQ(BoxOf(moved), "0 10 10 5");
+    // There and back between two frames.
+    page.tree.Remove(*moved, nullptr);
+    page.tree.Attach(*moved, *a, 0);
+    page.tree.Remove(*moved, nullptr);
+    page.tree.Attach(*moved, *b, 0);
+    page.Frame();
+    EXPECT_EQ(BoxOf(moved), "0 10 10 5");
+}
+
+TEST_F(LayoutTreeTest, HandlesOutliveTheTree) {
+    HandlePtr kept;
+    {
+        Page page;
+        LayoutHandle* parent = page.Add(page.body, "");
+        kept = HandlePtr(page.Add(parent, ""));
+        page.Frame();
+    }
+    EXPECT_EQ(kept->data().parent, nullptr);
+    EXPECT_FALSE(kept->data().inTree);
+}
+
+TEST_F(LayoutTreeTest, DeepTreesAreCutWithOneWarning) {
+    Page page;
+    LayoutHandle* at = page.body;
+    LayoutHandle* within = nullptr;
+    for (int i = 0; i < 5000; ++i) {
+        at = page.Add(at, "padding: 1px; position: relative; z-index: 1");
+        if (i == 100) within = at;
+    }
+    LayoutHandle* deepest = page.Add(at, "width: 10px; height: 10px");
+    page.Frame();
+    EXPECT_EQ(log_.Count("nested deeper"), 1u);
+    EXPECT_EQ(BoxOf(deepest), "0 0 0 0");
+    EXPECT_EQ(within->data().result.left, 100);
+    // A subtree that comes up again is laid out.
+    page.tree.Remove(*deepest, nullptr);
+    page.tree.Attach(*deepest, *page.body, 0);
+    page.Frame();
+    EXPECT_EQ(BoxOf(deepest), "0 0 10 10");
+}
+
+TEST_F(LayoutTreeTest, DiagnosticNamesFollowTheTree) {
+    Page page;
+    FakeNode node;
+    LayoutHandle* box = page.Insert(page.body, 0, "", &node);
+    layout::DebugNames names;
+    layout::LayoutUpdatePtr update = MakeRef<layout::LayoutUpdateData>();
+    page.tree.Commit(*update, nullptr, &names);
+    EXPECT_EQ(names.Find(box), "div");
+    page.tree.Remove(*box, nullptr);
+    page.tree.Commit(*update, nullptr, &names);
+    EXPECT_EQ(names.Find(box), "");
+}
+
+TEST_F(LayoutTreeTest, ScrollPositionIsClampedWhenContentShrinks) {
+    Page page;
+    LayoutHandle* scroller = page.Add(page.body, "overflow: auto; width: 100px; height: 100px");
+    LayoutHandle* content = page.Add(scroller, "height: 500px");
+    page.Settle();
+    page.tree.SetScroll(*scroller, {0, 300});
+    page.Frame();
+    EXPECT_EQ(scroller->data().scroll.y, 300);
+    EXPECT_EQ(content->node().world.m[13], -300);
+    EXPECT_EQ(scroller->data().result.scrollSize.height, 500);
+    page.Change(content, "height: 250px");
+    page.Frame();
+    EXPECT_EQ(scroller->data().scroll.y, 150);
+    EXPECT_EQ(content->node().world.m[13], -150);
+    page.tree.SetScroll(*scroller, {std::nanf(""), -5});
+    page.Frame();
+    EXPECT_EQ(scroller->data().scroll.x, 0);
+    EXPECT_EQ(scroller->data().scroll.y, 0);
+}
+
+}  // namespace
+}  // namespace qorvex::test

@@ -1,0 +1,179 @@
+// A page made of layout handles alone: elements with styles from declaration texts, and frames as the view runs them.
+#pragma once
+
+#include "css/values/layout_style_refs.h"
+#include "css/values/property_traits.h"
+#include "css/values/value_text.h"
+#include "display/box.h"
+#include "display/dirty_region.h"
+#include "display/page_elements.h"
+#include "display/visual_style.h"
+#include "layout/layout_tree.h"
+#include "layout/perform_layout.h"
+#include "support/scoped_library_state.h"
+
+#include <string>
+#include <vector>
+
+namespace qorvex::test {
+
+// A leaf of a fixed size, which wraps like text: width given, it takes as many lines as it needs.
+class FakeText final : public dsp::IDisplayElement {
+  public:
+    FakeText(float width, float height) : IDisplayElement(kMeasures), width_(width), height_(height) {}
+    void Paint(dsp::PaintContext&, bool, const layout::LayoutNode&, fresco::CommandBuffer&) override { ++paints; }
+    void Measure(layout::LayoutHandle&, float availableWidth, float, dsp::MeasureMode mode, dsp::MeasureMode,
+                 layout::Size& out) override {
+        ++measures;
+        const bool wraps = mode != dsp::MeasureMode::Undefined && availableWidth < width_;
+        const float lines = wraps ? std::ceil(width_ / std::max(availableWidth, 1.0f)) : 1;
+        out = {wraps ? availableWidth : width_, height_ * lines};
+    }
+    void SetWidth(float width) { width_ = width; }
+    int measures = 0;
+    int paints = 0;
+
+  private:
+    float width_;
+    float height_;
+};
+
+// Keeps the flag that the layout tree mirrors to its node.
+class FakeNode final : public layout::INodeLink {
+  public:
+    void AddRef() noexcept override { ++references; }
+    void Release() noexcept override { --references; }
+    void SetInLayoutTree(bool in) override { inTree = in; }
+    std::string_view DebugName() const override { return "div"; }
+    void Receive(layout::DOMTaskKind, const layout::DOMTaskData&) override {}
+    int references = 0;
+    bool inTree = false;
+};
+
+inline void ApplyDeclarations(css::LayoutStyleRefs& style, std::string_view text) {
+    while (!text.empty()) {
+        const size_t end = std::min(text.find(';'), text.size());
+        std::string_view declaration = text.substr(0, end);
+        text.remove_prefix(std::min(end + 1, text.size()));
+        while (!declaration.empty() && declaration.front() == ' ')
+            declaration.remove_prefix(1);
+        if (declaration.empty()) continue;
+        const size_t colon = declaration.find(':');
+        const css::PropertyId id = css::FindProperty(declaration.substr(0, colon));
+        std::string_view value = declaration.substr(colon + 1);
+        while (!value.empty() && value.front() == ' ')
+            value.remove_prefix(1);
+        css::CssVector<css::Declaration> parsed;
+        if (css::IsShorthand(id)) {
+            EXPECT_TRUE(css::ParseShorthand(id, value, 0, parsed)) << declaration;
+        } else {
+            css::Declaration single;
+            EXPECT_TRUE(css::ParseLonghand(id, value, single)) << declaration;
+            parsed.push_back(single);
+        }
+        for (const css::Declaration& one : parsed) {
+            auto store = [&]<css::PropertyId property>() {
+                using Traits = css::PropertyTraits<property>;
+                if (one.property() != property || !one.IsValue()) return;
+                style.Mutable<typename Traits::Group>().*Traits::kField = one.Get<property>();
+                if constexpr (property == css::PropertyId::FontSize)
+                    style.Mutable<css::TextLayoutStyle>().computedFontSize = one.Get<property>().value;
+            };
+            css::ForEachLonghand(store);
+        }
+    }
+}
+
+class Page {
+  public:
+    explicit Page(uint32_t width = 1000, uint32_t height = 500) : viewWidth(width), viewHeight(height) {
+        root = Keep(tree.CreateRoot({Style(""), MakeRef<dsp::DisplayHTML>(), nullptr, {}, false}));
+        body = Add(root, "");
+    }
+    Page(const Page&) = delete;
+    Page& operator=(const Page&) = delete;
+
+    static css::LayoutStyleRefs Style(std::string_view text) {
+        css::LayoutStyleRefs style = css::DefaultStyles();
+        ApplyDeclarations(style, text);
+        return style;
+    }
+
+    layout::LayoutHandle* Add(layout::LayoutHandle* parent, std::string_view style) {
+        return Insert(parent, parent->data().children.size(), style);
+    }
+    layout::LayoutHandle* Insert(layout::LayoutHandle* parent, uint32_t index, std::string_view style,
+                                 layout::NodeLinkPtr link = nullptr) {
+        return Keep(tree.AddChild(*parent, index, {Style(style), MakeRef<dsp::Box>(), link, {}, false}));
+    }
+    layout::LayoutHandle* AddText(layout::LayoutHandle* parent, RefPtr<FakeText> text, std::string_view style = "") {
+        return Keep(tree.AddChild(*parent, parent->data().children.size(), {Style(style), text, nullptr, {}, false}));
+    }
+    // Adds declarations to the style that the handle has.
+    void Change(layout::LayoutHandle* handle, std::string_view style) {
+        css::LayoutStyleRefs changed = handle->data().style;
+        changed.written.fill(0);
+        ApplyDeclarations(changed, style);
+        tree.UpdateStyle(*handle, changed);
+    }
+
+    layout::LayoutPass MakePass() {
+        return {*update, tree.Root(), viewWidth, viewHeight, dirty, algorithm, false, snapToPixels};
+    }
+
+    // A frame up to the recording.
+    void Frame(layout::LayoutWork work = layout::LayoutWork::Layout) {
+        update = MakeRef<layout::LayoutUpdateData>();
+        update->bodyDisplay = body->data().style.layout->display;
+        tree.Commit(*update, work == layout::LayoutWork::Layout ? nullptr : &dirty, nullptr);
+        layout::LayoutPass pass = MakePass();
+        pass.everything = everything;
+        if (work == layout::LayoutWork::Layout) layout::PerformLayout(pass);
+        if (work == layout::LayoutWork::Transforms) layout::UpdateNodeTransforms(pass);
+        if (work == layout::LayoutWork::VisualStyle) layout::UpdateNodeFlags(pass);
+        dsp::RecalculateVisualStyle(pass);
+        if (sync) layout::SyncTrees(*update);
+    }
+    // Lays out and forgets what became dirty.
+    void Settle() {
+        Frame();
+        dirty.Clear();
+    }
+
+    const layout::WorkCounters& Counters() const { return update->counters; }
+
+    uint32_t viewWidth;
+    uint32_t viewHeight;
+    bool everything = false;
+    bool sync = true;
+    bool snapToPixels = true;
+    layout::FlexAlgorithm algorithm = layout::FlexAlgorithm::Yoga;
+    layout::LayoutTree tree;
+    dsp::DirtyRegion dirty;
+    layout::LayoutUpdatePtr update = MakeRef<layout::LayoutUpdateData>();
+    layout::LayoutHandle* root;
+    layout::LayoutHandle* body;
+
+  private:
+    layout::LayoutHandle* Keep(layout::HandlePtr handle) {
+        kept_.push_back(handle);
+        return handle.get();
+    }
+    std::vector<layout::HandlePtr> kept_;
+};
+
+class LayoutTest : public QorvexTest {
+  protected:
+    LayoutTest() { css::CreateDefaultStyles(); }
+    ~LayoutTest() override { css::DestroyDefaultStyles(); }
+};
+
+// "x y width height" as scripts read it.
+inline std::string BoxOf(const layout::LayoutHandle* handle) {
+    const layout::LayoutResult& r = handle->data().result;
+    char text[96];
+    std::snprintf(text, sizeof(text), "%g %g %g %g", r.left, r.top, r.width, r.height);
+    return text;
+}
+
+}  // namespace qorvex::test
