@@ -13,7 +13,9 @@ class DebugNames {
   public:
     using Name = TaggedString<MemoryTag::LayoutData>;
 
-    void Set(const LayoutHandle* handle, std::string_view name) { names_.insert_or_assign(handle, Name(name)); }
+    void Set(const LayoutHandle* handle, std::string_view name) {
+        names_.insert_or_assign(handle, Name(name));
+    }
     void Erase(const LayoutHandle* handle) { names_.erase(handle); }
     // Empty when unknown.
     std::string_view Find(const LayoutHandle* handle) const;

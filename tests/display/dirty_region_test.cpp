@@ -62,7 +62,8 @@ TEST(DirtyRegion, StaysBelowItsCapacityAndReducesForScissors) {
 TEST(DirtyRegion, ReducesRectanglesThatLieFarApart) {
     DirtyRegion region;
     for (int i = 0; i < 64; ++i)
-        region.Add(MakeRect(static_cast<float>(i % 8) * 1e6f - 4e6f, static_cast<float>(i / 8) * 1e6f - 4e6f, 1, 1));
+        region.Add(
+            MakeRect(static_cast<float>(i % 8) * 1e6f - 4e6f, static_cast<float>(i / 8) * 1e6f - 4e6f, 1, 1));
     region.ReduceForScissors();
     EXPECT_LE(region.Count(), DirtyRegion::kScissorCount);
 }

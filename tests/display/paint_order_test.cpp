@@ -1,5 +1,5 @@
-#include "display/dump.h"
 #include "display/paint_order.h"
+#include "display/dump.h"
 #include "layout/page_fixture.h"
 
 #include <map>

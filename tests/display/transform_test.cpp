@@ -14,7 +14,9 @@ using layout::Rect;
 
 using TransformTest = LayoutTest;
 
-Rect Mapped(const LayoutHandle* handle) { return layout::MapBounds(handle->node().world, handle->node().box); }
+Rect Mapped(const LayoutHandle* handle) {
+    return layout::MapBounds(handle->node().world, handle->node().box);
+}
 
 void ExpectRect(const Rect& rect, float x, float y, float width, float height) {
     EXPECT_TRUE(layout::Near(rect, MakeRect(x, y, width, height)))
@@ -23,7 +25,8 @@ void ExpectRect(const Rect& rect, float x, float y, float width, float height) {
 
 TEST_F(TransformTest, OperationsApplyInOrderAroundTheOrigin) {
     Page page;
-    LayoutHandle* box = page.Add(page.body, "position: absolute; left: 100px; top: 50px; width: 40px; height: 20px");
+    LayoutHandle* box =
+        page.Add(page.body, "position: absolute; left: 100px; top: 50px; width: 40px; height: 20px");
     struct Case {
         const char* style;
         float x, y, width, height;
@@ -82,7 +85,8 @@ TEST_F(TransformTest, PerspectiveAppliesToChildrenAndFlatteningDropsDepth) {
 
 TEST_F(TransformTest, VisualBoundsIncludeShadowsAndFilters) {
     Page page;
-    LayoutHandle* box = page.Add(page.body, "position: absolute; left: 100px; top: 100px; width: 50px; height: 50px");
+    LayoutHandle* box =
+        page.Add(page.body, "position: absolute; left: 100px; top: 100px; width: 50px; height: 50px");
     page.Change(box, "box-shadow: 10px 0 5px 2px black, inset 0 0 500px red");
     page.Frame();
     // Right: offset 10, spread 2, twice the blur 5, and a pixel for antialiasing.
@@ -97,7 +101,8 @@ TEST_F(TransformTest, VisualBoundsIncludeShadowsAndFilters) {
 
 TEST_F(TransformTest, SnappingMovesEdgesToPixels) {
     Page page;
-    LayoutHandle* box = page.Add(page.body, "position: absolute; left: 1.5px; top: 0.4px; width: 10.2px; height: 3px");
+    LayoutHandle* box =
+        page.Add(page.body, "position: absolute; left: 1.5px; top: 0.4px; width: 10.2px; height: 3px");
     page.Frame();
     ExpectRect(dsp::PaintBox(box->node(), true), 2, 0, 10, 3);
     ExpectRect(dsp::PaintBox(box->node(), false), 1.5f, 0.4f, 10.2f, 3);
@@ -106,7 +111,8 @@ TEST_F(TransformTest, SnappingMovesEdgesToPixels) {
 TEST_F(TransformTest, DirtyAreasAreOldAndNewBoundsWithinClips) {
     Page page;
     LayoutHandle* clip = page.Add(page.body, "overflow: hidden; width: 100px; height: 100px");
-    LayoutHandle* box = page.Add(clip, "position: absolute; left: 10px; top: 10px; width: 20px; height: 20px");
+    LayoutHandle* box =
+        page.Add(clip, "position: absolute; left: 10px; top: 10px; width: 20px; height: 20px");
     page.Settle();
     page.Change(box, "left: 300px");
     page.Frame();
@@ -209,9 +215,9 @@ std::string Describe(const LayoutHandle* handle) {
         std::snprintf(part, sizeof(part), "[%g %g %g %g]", rect.x, rect.y, rect.width, rect.height);
         return std::string(part);
     };
-    std::snprintf(text, sizeof(text), " scroll %g %g %g %g z %d %d world %g %g %g %g %g %g", n.scroll.x, n.scroll.y,
-                  n.scrollSize.width, n.scrollSize.height, n.zIndex, n.establishesStackingContext, n.world.m[0],
-                  n.world.m[1], n.world.m[4], n.world.m[5], n.world.m[12], n.world.m[13]);
+    std::snprintf(text, sizeof(text), " scroll %g %g %g %g z %d %d world %g %g %g %g %g %g", n.scroll.x,
+                  n.scroll.y, n.scrollSize.width, n.scrollSize.height, n.zIndex, n.establishesStackingContext,
+                  n.world.m[0], n.world.m[1], n.world.m[4], n.world.m[5], n.world.m[12], n.world.m[13]);
     return BoxOf(handle) + r(n.box) + r(n.aabb) + r(n.paintBounds) + r(n.visualAabb) + text;
 }
 
@@ -274,18 +280,22 @@ TEST_F(TransformTest, IncrementalPassesEqualFullOnesUnderRandomChanges) {
                     gone[node] = true;
                     break;
                 case 6: {
-                    const layout::ScrollPosition scroll{static_cast<float>(pick(30)), static_cast<float>(pick(30))};
+                    const layout::ScrollPosition scroll{static_cast<float>(pick(30)),
+                                                        static_cast<float>(pick(30))};
                     twin.fast.tree.SetScroll(*twin.fastNodes[node], scroll);
                     twin.slow.tree.SetScroll(*twin.slowNodes[node], scroll);
                     break;
                 }
-                default: twin.Change(node, styles[pick(std::size(styles))]); break;
+                default:
+                    twin.Change(node, styles[pick(std::size(styles))]);
+                    break;
             }
         }
         twin.Frame(LayoutWork::Layout);
         for (size_t i = 0; i < twin.fastNodes.size(); ++i) {
             if (!twin.fastNodes[i]->data().inTree) continue;
-            ASSERT_EQ(Describe(twin.fastNodes[i]), Describe(twin.slowNodes[i])) << "step " << step << " node " << i;
+            ASSERT_EQ(Describe(twin.fastNodes[i]), Describe(twin.slowNodes[i]))
+                << "step " << step << " node " << i;
         }
     }
 }

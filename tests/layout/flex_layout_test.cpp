@@ -64,8 +64,9 @@ TEST_F(FlexLayoutTest, ContainerPropertiesFollowDisplay) {
     LayoutHandle* box = page.Add(page.body, "width: 100px; height: 100px");
     LayoutHandle* child = page.Add(box, "width: 20px; height: 20px");
     for (const Case& c : cases) {
-        page.Change(box, "display: block; justify-content: flex-start; align-items: stretch; flex-direction: row; "
-                         "text-align: left");
+        page.Change(box,
+                    "display: block; justify-content: flex-start; align-items: stretch; flex-direction: row; "
+                    "text-align: left");
         page.Change(box, c.style);
         page.Frame();
         EXPECT_EQ(BoxOf(child), c.box) << c.style;
@@ -140,8 +141,9 @@ TEST_F(FlexLayoutTest, OnlyTheContainingBlockChangesAndItsBoxStillFollows) {
 
 TEST_F(FlexLayoutTest, FixedBoxesUseTheView) {
     Page page;
-    LayoutHandle* outer = page.Add(page.body, "position: relative; margin: 50px; width: 100px; height: 100px; "
-                                              "border: 4px solid red");
+    LayoutHandle* outer = page.Add(page.body,
+                                   "position: relative; margin: 50px; width: 100px; height: 100px; "
+                                   "border: 4px solid red");
     LayoutHandle* fixed = page.Add(outer, "position: fixed; left: 50%; top: 10px; width: 30px; height: 10%");
     page.Frame();
     EXPECT_EQ(BoxOf(fixed), "500 10 30 50");
@@ -239,7 +241,8 @@ TEST_F(FlexLayoutTest, TinyDifferencesAreNoChange) {
 TEST_F(FlexLayoutTest, HostileNumbersStayFinite) {
     Page page;
     LayoutHandle* box = page.Add(page.body, "display: flex; width: 1000000000px; padding: 3000000000%");
-    LayoutHandle* child = page.Add(box, "width: -50px; height: 100000%; margin: -1000000000px; flex: 99999999999");
+    LayoutHandle* child =
+        page.Add(box, "width: -50px; height: 100000%; margin: -1000000000px; flex: 99999999999");
     page.Frame();
     for (const LayoutHandle* handle : {box, child}) {
         EXPECT_TRUE(layout::IsFinite(handle->node().box));

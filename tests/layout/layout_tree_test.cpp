@@ -27,7 +27,9 @@ TEST_F(LayoutTreeTest, NewChildFindsItsPlaceAmongSiblingsOfWhichSomeHaveNoHandle
     auto at = [&](uint32_t i) { return dom[i]; };
     EXPECT_EQ(layout::LayoutIndexForChild(*page.body, 5, 2, at), 1u);
     EXPECT_EQ(layout::LayoutIndexForChild(*page.body, 5, 0, at), 0u + 1u);
-    EXPECT_EQ(layout::LayoutIndexForChild(*page.body, 6, 5, [&](uint32_t i) { return i < 5 ? dom[i] : nullptr; }), 2u);
+    EXPECT_EQ(
+        layout::LayoutIndexForChild(*page.body, 6, 5, [&](uint32_t i) { return i < 5 ? dom[i] : nullptr; }),
+        2u);
     LayoutHandle* middle = page.Insert(page.body, 1, "");
     page.Frame();
     EXPECT_EQ(NodeChildren(page.body), (std::vector<const LayoutHandle*>{first, middle, last}));
@@ -53,7 +55,8 @@ TEST_F(LayoutTreeTest, CommitCopiesOnlyChangedHandles) {
 TEST_F(LayoutTreeTest, RemovingTakesTheSubtreeOutOnceAndDirtiesWhatItCovered) {
     Page page;
     FakeNode node;
-    LayoutHandle* parent = page.Insert(page.body, 0, "width: 50px; height: 40px; background-color: red", &node);
+    LayoutHandle* parent =
+        page.Insert(page.body, 0, "width: 50px; height: 40px; background-color: red", &node);
     LayoutHandle* child = page.Add(parent, "width: 80px; height: 90px");
     page.Settle();
     EXPECT_TRUE(node.inTree);

@@ -1,4 +1,5 @@
-// A page made of layout handles alone: elements with styles from declaration texts, and frames as the view runs them.
+// A page made of layout handles alone: elements with styles from declaration texts, and frames as the view
+// runs them.
 #pragma once
 
 #include "css/values/layout_style_refs.h"
@@ -21,7 +22,9 @@ namespace qorvex::test {
 class FakeText final : public dsp::IDisplayElement {
   public:
     FakeText(float width, float height) : IDisplayElement(kMeasures), width_(width), height_(height) {}
-    void Paint(dsp::PaintContext&, bool, const layout::LayoutNode&, fresco::CommandBuffer&) override { ++paints; }
+    void Paint(dsp::PaintContext&, bool, const layout::LayoutNode&, fresco::CommandBuffer&) override {
+        ++paints;
+    }
     void Measure(layout::LayoutHandle&, float availableWidth, float, dsp::MeasureMode mode, dsp::MeasureMode,
                  layout::Size& out) override {
         ++measures;
@@ -106,8 +109,10 @@ class Page {
                                  layout::NodeLinkPtr link = nullptr) {
         return Keep(tree.AddChild(*parent, index, {Style(style), MakeRef<dsp::Box>(), link, {}, false}));
     }
-    layout::LayoutHandle* AddText(layout::LayoutHandle* parent, RefPtr<FakeText> text, std::string_view style = "") {
-        return Keep(tree.AddChild(*parent, parent->data().children.size(), {Style(style), text, nullptr, {}, false}));
+    layout::LayoutHandle* AddText(layout::LayoutHandle* parent, RefPtr<FakeText> text,
+                                  std::string_view style = "") {
+        return Keep(
+            tree.AddChild(*parent, parent->data().children.size(), {Style(style), text, nullptr, {}, false}));
     }
     // Adds declarations to the style that the handle has.
     void Change(layout::LayoutHandle* handle, std::string_view style) {

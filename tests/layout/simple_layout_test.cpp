@@ -26,11 +26,13 @@ TEST_F(SimpleLayoutTest, ChildrenOverlapAndAutoSizesAddUp) {
 }
 
 TEST_F(SimpleLayoutTest, PositionedBoxesUseLeftAndTopOfTheirContainingBox) {
-    LayoutHandle* outer = page.Add(page.body, "position: relative; left: 10px; top: 20px; width: 200px; "
-                                              "height: 100px; border: 5px solid red; padding: 8px");
+    LayoutHandle* outer = page.Add(page.body,
+                                   "position: relative; left: 10px; top: 20px; width: 200px; "
+                                   "height: 100px; border: 5px solid red; padding: 8px");
     LayoutHandle* flow = page.Add(outer, "width: 50%; height: 50px");
-    LayoutHandle* box = page.Add(flow, "position: absolute; left: 10%; top: 5px; right: 10px; width: 20px; "
-                                       "height: 10px");
+    LayoutHandle* box = page.Add(flow,
+                                 "position: absolute; left: 10%; top: 5px; right: 10px; width: 20px; "
+                                 "height: 10px");
     LayoutHandle* fixed = page.Add(flow, "position: fixed; left: 50%; top: 0; width: 10px; height: 100%");
     page.Frame();
     EXPECT_EQ(BoxOf(flow), "23 33 87 50");
