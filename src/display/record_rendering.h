@@ -16,7 +16,7 @@ struct RecordRequest {
     bool record = true;  // false: rendering is off; pending resources still travel
     uint32_t frameNumber = 0;
     // Buffers queued by other tasks (uploads, releases): they go first. Taken over.
-    BufferList resourceBuffers;
+    BufferList resourceBuffers{};
 };
 
 // Body of the task RecordRendering; takes the pass's dirty region and leaves it empty.
