@@ -5,9 +5,9 @@
 
 #include "core/logging/log.h"
 #include "display/display_text.h"
-#include "display/transforms.h"
 #include "display/paint_context.h"
 #include "display/resolved_visuals.h"
+#include "display/transforms.h"
 #include "layout/layout_handle.h"
 #include "layout/layout_store.h"
 

@@ -63,7 +63,8 @@ TEST_F(BoxPaintTest, RoundBordersOfSeveralColoursClipEachSide) {
 
 TEST_F(BoxPaintTest, EqualShadowsShareOneSurface) {
     page.Add(page.body, std::string(kBox) + "box-shadow: 3px 4px 5px 2px black; background-color: white");
-    page.Add(page.body, std::string(kBox) + "left: 400px; box-shadow: 9px 9px 5px 2px black; background-color: white");
+    page.Add(page.body,
+             std::string(kBox) + "left: 400px; box-shadow: 9px 9px 5px 2px black; background-color: white");
     auto lines = Frame();
     EXPECT_EQ(caches.shadows.Size(), 1u);
     ASSERT_EQ(frame.resourceBuffers.size(), 1u);
@@ -95,7 +96,8 @@ TEST_F(BoxPaintTest, AFullShadowCacheEvictsTheOldest) {
 }
 
 TEST_F(BoxPaintTest, SharpAndInsetShadows) {
-    LayoutHandle* box = page.Add(page.body, std::string(kBox) + "background-color: white; border: 2px solid red");
+    LayoutHandle* box =
+        page.Add(page.body, std::string(kBox) + "background-color: white; border: 2px solid red");
     page.Change(box, "box-shadow: 3px 4px 0 1px black");
     auto lines = Frame();
     EXPECT_EQ(lines[0], "FillRect 102 53 62 42 #000000ff");
@@ -123,17 +125,19 @@ TEST_F(BoxPaintTest, Gradients) {
         size_t count;
     };
     const Case cases[] = {
-        {"background-image: linear-gradient(red, blue)", "FillLinearGradient 100 50 60 40 #000000ff 0.5 0 0.5 0.666667", 1},
+        {"background-image: linear-gradient(red, blue)",
+         "FillLinearGradient 100 50 60 40 #000000ff 0.5 0 0.5 0.666667", 1},
         {"background-image: linear-gradient(to right, red, blue)",
          "FillLinearGradient 100 50 60 40 #000000ff 0 0.333333 1 0.333333", 1},
         {"background-image: radial-gradient(circle closest-side, red, blue)",
          "FillRadialGradient 100 50 60 40 #000000ff 0.5 0.333333 0.333333 0.333333", 1},
-        {"background-image: linear-gradient(red, blue); background-size: 30px 20px",
-         "FillLinearGradient", 4},
-        {"background-image: linear-gradient(red, blue); background-size: 30px 20px; background-repeat: no-repeat; "
+        {"background-image: linear-gradient(red, blue); background-size: 30px 20px", "FillLinearGradient", 4},
+        {"background-image: linear-gradient(red, blue); background-size: 30px 20px; background-repeat: "
+         "no-repeat; "
          "background-position-x: right; background-position-y: 50%",
          "FillLinearGradient 130 60 30 20", 1},
-        {"background-image: linear-gradient(red, blue), linear-gradient(blue, red); background-repeat: repeat; "
+        {"background-image: linear-gradient(red, blue), linear-gradient(blue, red); background-repeat: "
+         "repeat; "
          "background-size: auto",
          "FillLinearGradient 100 50 60 40", 2},
     };

@@ -22,8 +22,9 @@ TEST_F(RecordTest, OneChangeRecordsOneElement) {
     std::vector<LayoutHandle*> boxes;
     for (int i = 0; i < 400; ++i) {
         char style[128];
-        std::snprintf(style, sizeof(style), "position: absolute; width: 10px; height: 10px; left: %dpx; top: %dpx; %s",
-                      i % 20 * 40, i / 20 * 24, "background-color: red");
+        std::snprintf(style, sizeof(style),
+                      "position: absolute; width: 10px; height: 10px; left: %dpx; top: %dpx; %s", i % 20 * 40,
+                      i / 20 * 24, "background-color: red");
         boxes.push_back(page.Add(page.body, style));
     }
     page.Frame();
@@ -41,8 +42,10 @@ TEST_F(RecordTest, OneChangeRecordsOneElement) {
 }
 
 TEST_F(RecordTest, ScissorsAreTheDirtyRectangles) {
-    LayoutHandle* a = page.Add(page.body, "position: absolute; width: 10px; height: 10px; left: 100px; top: 100px");
-    LayoutHandle* b = page.Add(page.body, "position: absolute; width: 10px; height: 10px; left: 700px; top: 400px");
+    LayoutHandle* a =
+        page.Add(page.body, "position: absolute; width: 10px; height: 10px; left: 100px; top: 100px");
+    LayoutHandle* b =
+        page.Add(page.body, "position: absolute; width: 10px; height: 10px; left: 700px; top: 400px");
     page.Settle();
     page.Change(a, "background-color: red");
     page.Change(b, "background-color: red");
@@ -97,23 +100,26 @@ TEST_F(RecordTest, LayersOpenOnlyWhereAsked) {
 }
 
 TEST_F(RecordTest, ClipsAndScrollingWrapTheChildren) {
-    LayoutHandle* box = page.Add(page.body, "overflow: hidden; width: 100px; height: 50px; border: 5px solid red; "
-                                            "border-radius: 10px");
+    LayoutHandle* box = page.Add(page.body,
+                                 "overflow: hidden; width: 100px; height: 50px; border: 5px solid red; "
+                                 "border-radius: 10px");
     page.Add(box, "height: 300px; background-color: blue");
     page.Settle();
     page.tree.SetScroll(*box, {0, 20});
-    EXPECT_EQ(Join(Frame()), "StrokeRoundedRect 2.5 2.5 95 45 r 7.5 7.5 7.5 7.5 7.5 7.5 7.5 7.5 #ff0000ff\n"
-                             "PushState 3\n"
-                             "ClipRoundedRect 5 5 90 40 r 5 5 5 5 5 5 5 5 2\n"
-                             "MultiplyTransform 1 0 0 1 0 -20\n"
-                             "FillRect 5 5 90 300 #0000ffff\n"
-                             "PopState 0\n");
+    EXPECT_EQ(Join(Frame()),
+              "StrokeRoundedRect 2.5 2.5 95 45 r 7.5 7.5 7.5 7.5 7.5 7.5 7.5 7.5 #ff0000ff\n"
+              "PushState 3\n"
+              "ClipRoundedRect 5 5 90 40 r 5 5 5 5 5 5 5 5 2\n"
+              "MultiplyTransform 1 0 0 1 0 -20\n"
+              "FillRect 5 5 90 300 #0000ffff\n"
+              "PopState 0\n");
 }
 
 TEST_F(RecordTest, TransformsNestAsTheWorldMatrixDoes) {
     LayoutHandle* outer = page.Add(page.body, "width: 100px; height: 100px; perspective: 200px");
-    LayoutHandle* inner = page.Add(outer, "width: 50px; height: 50px; background-color: red; "
-                                          "transform: rotateY(30deg); transform-style: preserve-3d");
+    LayoutHandle* inner = page.Add(outer,
+                                   "width: 50px; height: 50px; background-color: red; "
+                                   "transform: rotateY(30deg); transform-style: preserve-3d");
     page.Add(inner, "width: 50px; height: 50px; background-color: blue; transform: translateZ(10px)");
     const auto lines = Frame();
     EXPECT_EQ(CountOf(lines, "MultiplyTransform"), 3u);
@@ -142,19 +148,23 @@ TEST_F(RecordTest, PaintRectanglesFadeFromFullFrames) {
     EXPECT_TRUE(Record().Empty());
 }
 
-// What a partial frame leaves out lies outside of its scissors: every draw of the full frame that touches a dirty
-// rectangle is in the partial one too.
+// What a partial frame leaves out lies outside of its scissors: every draw of the full frame that touches a
+// dirty rectangle is in the partial one too.
 TEST_F(RecordTest, PartialFramesHoldAllThatTouchesTheirRectangles) {
     std::mt19937 random(7);
     std::vector<LayoutHandle*> boxes{page.body};
     auto number = [&](uint32_t below) { return static_cast<int>(random() % below); };
     for (int i = 0; i < 120; ++i) {
         char style[192];
-        std::snprintf(style, sizeof(style),
-                      "position: %s; width: %dpx; height: %dpx; left: %dpx; top: %dpx; background-color: red; %s",
-                      number(2) ? "absolute" : "relative", 5 + number(200), 5 + number(100), number(300), number(200),
-                      number(4) == 0 ? "overflow: hidden" : number(4) == 0 ? "opacity: 0.5" : "");
-        boxes.push_back(page.Add(boxes[static_cast<size_t>(number(static_cast<uint32_t>(boxes.size())))], style));
+        std::snprintf(
+            style, sizeof(style),
+            "position: %s; width: %dpx; height: %dpx; left: %dpx; top: %dpx; background-color: red; %s",
+            number(2) ? "absolute" : "relative", 5 + number(200), 5 + number(100), number(300), number(200),
+            number(4) == 0   ? "overflow: hidden"
+            : number(4) == 0 ? "opacity: 0.5"
+                             : "");
+        boxes.push_back(
+            page.Add(boxes[static_cast<size_t>(number(static_cast<uint32_t>(boxes.size())))], style));
     }
     page.Frame();
     Record();
@@ -172,7 +182,8 @@ TEST_F(RecordTest, PartialFramesHoldAllThatTouchesTheirRectangles) {
         EXPECT_LE(partLines.size(), fullLines.size() + 14);
         for (const std::string& line : fullLines) {
             layout::Rect r{};
-            if (std::sscanf(line.c_str(), "FillRect %f %f %f %f", &r.x, &r.y, &r.width, &r.height) != 4) continue;
+            if (std::sscanf(line.c_str(), "FillRect %f %f %f %f", &r.x, &r.y, &r.width, &r.height) != 4)
+                continue;
             bool touches = false;
             for (const layout::Rect& rect : part.dirtyRects)
                 touches = touches || layout::Intersects(rect, r);

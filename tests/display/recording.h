@@ -19,7 +19,9 @@ inline std::string Numbers(std::initializer_list<float> values) {
     }
     return text;
 }
-inline std::string Text(const fresco::Rect& r) { return Numbers({r.x, r.y, r.width, r.height}); }
+inline std::string Text(const fresco::Rect& r) {
+    return Numbers({r.x, r.y, r.width, r.height});
+}
 inline std::string Text(const fresco::Paint& p) {
     char part[32];
     auto byte = [](float channel) { return static_cast<int>(std::lround(channel * 255)); };
@@ -27,12 +29,16 @@ inline std::string Text(const fresco::Paint& p) {
                   byte(p.color.a));
     return part;
 }
-inline std::string Text(const fresco::LayerPaint& p) { return Text(static_cast<const fresco::Paint&>(p)); }
-inline std::string Text(const fresco::CornerRadii& r) {
-    return " r" + Numbers({r.topLeft.x, r.topLeft.y, r.topRight.x, r.topRight.y, r.bottomRight.x, r.bottomRight.y,
-                           r.bottomLeft.x, r.bottomLeft.y});
+inline std::string Text(const fresco::LayerPaint& p) {
+    return Text(static_cast<const fresco::Paint&>(p));
 }
-inline std::string Text(const fresco::Circle& c) { return Numbers({c.cx, c.cy, c.rx, c.ry}); }
+inline std::string Text(const fresco::CornerRadii& r) {
+    return " r" + Numbers({r.topLeft.x, r.topLeft.y, r.topRight.x, r.topRight.y, r.bottomRight.x,
+                           r.bottomRight.y, r.bottomLeft.x, r.bottomLeft.y});
+}
+inline std::string Text(const fresco::Circle& c) {
+    return Numbers({c.cx, c.cy, c.rx, c.ry});
+}
 inline std::string Text(const fresco::Matrix4& m) {
     return Numbers({m.m[0], m.m[1], m.m[4], m.m[5], m.m[12], m.m[13]});
 }
@@ -48,8 +54,12 @@ inline std::string Text(const fresco::Quad& q) {
         text += Numbers({point.x, point.y});
     return text;
 }
-inline std::string Text(uint32_t value) { return Numbers({static_cast<float>(value)}); }
-inline std::string Text(float value) { return Numbers({value}); }
+inline std::string Text(uint32_t value) {
+    return Numbers({static_cast<float>(value)});
+}
+inline std::string Text(float value) {
+    return Numbers({value});
+}
 template <typename Other>
 std::string Text(const Other&) {
     return "";
@@ -65,16 +75,18 @@ inline std::vector<std::string> Records(const fresco::CommandBuffer& buffer) {
         std::string line;
         switch (static_cast<fresco::CommandType>(header.type)) {
 #define QORVEX_FIELD(type, field) line += Text(record.field);
-#define QORVEX_RECORD(name, tail, fields)                                                \
-    case fresco::CommandType::name: {                                                    \
+#define QORVEX_RECORD(name, tail, fields)                                                           \
+    case fresco::CommandType::name: {                                                               \
         [[maybe_unused]] const auto& record = *reinterpret_cast<const fresco::name##Record*>(body); \
-        line = #name;                                                                    \
-        fields break;                                                                    \
+        line = #name;                                                                               \
+        fields break;                                                                               \
     }
             FRESCO_COMMANDS(QORVEX_RECORD, QORVEX_FIELD)
 #undef QORVEX_RECORD
 #undef QORVEX_FIELD
-            default: line = "?"; break;
+            default:
+                line = "?";
+                break;
         }
         lines.push_back(line);
         at += header.size;
@@ -98,7 +110,8 @@ class RecordTest : public LayoutTest {
         page.Frame();
         page.dirty.Add(layout::MakeRect(0, 0, 1000, 500));
         frame = Record();
-        std::vector<std::string> lines = frame.buffers.empty() ? std::vector<std::string>() : Records(*frame.buffers[0]);
+        std::vector<std::string> lines =
+            frame.buffers.empty() ? std::vector<std::string>() : Records(*frame.buffers[0]);
         EXPECT_GE(lines.size(), 5u);
         // BeginScissor, PushState, ClipRect, ClearRect ... PopState
         lines.erase(lines.begin(), lines.begin() + 4);
