@@ -73,26 +73,50 @@ void BoxLine(const uint32_t* from, uint32_t* to, int count, int before, int afte
     }
 }
 
-// https://www.w3.org/TR/filter-effects-1/#feGaussianBlurElement: three boxes of d pixels.
-void BlurLine(uint32_t* line, uint32_t* scratch, int count, float sigma, const Kernel& kernel) {
-    if (sigma <= kExactSigma) {
-        ConvolveLine(line, scratch, count, kernel);
-        std::memcpy(line, scratch, size_t(count) * 4);
-        return;
+// Three boxes whose variances add up to the Gaussian's as nearly as whole pixels allow: two of one size,
+// which may be even (they lean to opposite sides), and an odd one. Equal boxes alone miss the width by up to
+// a tenth.
+struct Boxes {
+    int pair = 1, single = 1;
+};
+
+Boxes ChooseBoxes(float sigma) {
+    const double target = 12.0 * sigma * sigma + 3;  // sum of the squared sizes
+    const int middle = int(std::sqrt(target / 3));
+    Boxes best;
+    double bestMiss = 1e30;
+    for (int pair = std::max(1, middle - 2); pair <= middle + 2; ++pair) {
+        for (int single = std::max(1, middle - 3) | 1; single <= middle + 4; single += 2) {
+            const double miss = std::abs(2.0 * pair * pair + double(single) * single - target);
+            if (miss < bestMiss) best = {pair, single}, bestMiss = miss;
+        }
     }
-    const int d = std::max(2, int(std::floor(sigma * 3 * std::sqrt(2 * 3.14159265) / 4 + 0.5)));
-    const int half = d / 2;
-    if (d & 1) {
-        BoxLine(line, scratch, count, half, half);
-        BoxLine(scratch, line, count, half, half);
-        BoxLine(line, scratch, count, half, half);
-    } else {
-        BoxLine(line, scratch, count, half, half - 1);
-        BoxLine(scratch, line, count, half - 1, half);
-        BoxLine(line, scratch, count, half, half);
-    }
-    std::memcpy(line, scratch, size_t(count) * 4);
+    return best;
 }
+
+struct LineBlur {
+    float sigma;
+    Kernel kernel;  // of small radii
+    Boxes boxes;    // of the others
+
+    explicit LineBlur(float s) : sigma(s) {
+        if (sigma <= kExactSigma)
+            kernel = MakeGaussian(sigma);
+        else
+            boxes = ChooseBoxes(sigma);
+    }
+    void Run(uint32_t* line, uint32_t* scratch, int count) const {
+        if (sigma <= kExactSigma) {
+            ConvolveLine(line, scratch, count, kernel);
+        } else {
+            const int half = boxes.pair / 2, odd = boxes.pair & 1, rest = boxes.single / 2;
+            BoxLine(line, scratch, count, half, half - 1 + odd);
+            BoxLine(scratch, line, count, half - 1 + odd, half);
+            BoxLine(line, scratch, count, rest, rest);
+        }
+        std::memcpy(line, scratch, size_t(count) * 4);
+    }
+};
 
 bool IsBlank(const uint32_t* line, int count) {
     uint32_t any = 0;
@@ -104,8 +128,7 @@ bool IsBlank(const uint32_t* line, int count) {
 // Columns are gathered into lines, a block of them at a time, so that each row is read in whole cache lines.
 constexpr int kColumnBlock = 16;
 
-void BlurColumns(const Bitmap& bitmap, float sigma, const Kernel& kernel, Vector<uint32_t>& lines,
-                 uint32_t* scratch) {
+void BlurColumns(const Bitmap& bitmap, const LineBlur& blur, Vector<uint32_t>& lines, uint32_t* scratch) {
     const int height = bitmap.bounds.Height();
     for (int x0 = bitmap.bounds.x0; x0 < bitmap.bounds.x1; x0 += kColumnBlock) {
         const int block = std::min(kColumnBlock, bitmap.bounds.x1 - x0);
@@ -116,7 +139,7 @@ void BlurColumns(const Bitmap& bitmap, float sigma, const Kernel& kernel, Vector
         }
         for (int i = 0; i < block; ++i) {
             uint32_t* line = lines.data() + size_t(i) * size_t(height);
-            if (!IsBlank(line, height)) BlurLine(line, scratch, height, sigma, kernel);
+            if (!IsBlank(line, height)) blur.Run(line, scratch, height);
         }
         for (int y = 0; y < height; ++y) {
             uint32_t* row = bitmap.Row(bitmap.bounds.y0 + y) + x0;
@@ -140,16 +163,16 @@ bool Blur(const Bitmap& bitmap, float sigmaX, float sigmaY) {
     sigmaX = std::min(sigmaX, kMaxSigma), sigmaY = std::min(sigmaY, kMaxSigma);
     Vector<uint32_t> scratch(size_t(std::max(width, height)));
     if (sigmaX > 0.05f) {
-        const Kernel kernel = sigmaX <= kExactSigma ? MakeGaussian(sigmaX) : Kernel{};
+        const LineBlur blur(sigmaX);
         for (int y = bitmap.bounds.y0; y < bitmap.bounds.y1; ++y) {
             uint32_t* line = bitmap.Row(y) + bitmap.bounds.x0;
-            if (!IsBlank(line, width)) BlurLine(line, scratch.data(), width, sigmaX, kernel);
+            if (!IsBlank(line, width)) blur.Run(line, scratch.data(), width);
         }
     }
     if (sigmaY > 0.05f) {
-        const Kernel kernel = sigmaY <= kExactSigma ? MakeGaussian(sigmaY) : Kernel{};
+        const LineBlur blur(sigmaY);
         Vector<uint32_t> lines(size_t(kColumnBlock) * size_t(height));
-        BlurColumns(bitmap, sigmaY, kernel, lines, scratch.data());
+        BlurColumns(bitmap, blur, lines, scratch.data());
     }
     return true;
 }

@@ -6,7 +6,8 @@ namespace fresco::cpu {
 namespace {
 
 // Largest distance between a curve and its chords, in device pixels.
-constexpr double kTolerance = 1.0 / 12;
+// At this a circle of 60 pixels loses less than a thousandth of its area.
+constexpr double kTolerance = 1.0 / 32;
 constexpr int kMaxCurvePieces = 512;
 // What lies nearer to the eye's plane than this is cut off.
 constexpr double kNear = 1.0 / 1024;

@@ -1,6 +1,9 @@
 // Pixel memory: RGBA8, premultiplied, r in the low byte. Device coordinates are whole pixels of the frame; a
 // layer's bitmap covers a rectangle of them.
 #pragma once
+#include <algorithm>
+#include <cmath>
+#include <cstdint>
 #include <cstring>
 
 #include <fresco/geometry.h>

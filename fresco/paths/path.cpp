@@ -148,7 +148,7 @@ class PathImpl final : public Path {
         hasCurrent_ = false;
     }
     void SetFillRule(FillRule rule) override { rule_ = rule; }
-    // Curves are flattened to a twelfth of a pixel where they are drawn; there is nothing left to gain here.
+    // Curves are flattened to a fraction of a pixel where they are drawn; there is nothing left to gain here.
     void SetFastLineSegmentDrawing(bool) override {}
 
     bool IsEmpty() const override { return data_.verbs.empty(); }
