@@ -1,6 +1,7 @@
 // Text and comments.
 #pragma once
 
+#include "core/memory/atoms.h"
 #include "dom/node.h"
 
 namespace qorvex::dom {
@@ -42,6 +43,7 @@ class Text final : public CharacterData {
   public:
     Text(Document& document, std::string_view data);
 
+    Atom GetNodeName() const override { return atoms::kText; }
     void ToDebugString(NodeText& out) const override;
     qsl::RefPtr<Node> CloneNode(bool deep) override;
     void OnInsertedIntoDocument() override;
@@ -68,6 +70,7 @@ class Comment final : public CharacterData {
   public:
     Comment(Document& document, std::string_view data) : CharacterData(document, kIsComment, data) {}
 
+    Atom GetNodeName() const override { return atoms::kComment; }
     void ToDebugString(NodeText& out) const override { out.append("Comment"); }
     qsl::RefPtr<Node> CloneNode(bool deep) override;
     layout::HandlePtr CreateLayoutNode(layout::LayoutTree&, layout::LayoutHandle&) override {

@@ -1,6 +1,7 @@
 // The small nodes: fragment, document type, and the placeholder of structural data binding.
 #pragma once
 
+#include "core/memory/atoms.h"
 #include "dom/node.h"
 
 namespace qorvex::dom {
@@ -9,7 +10,7 @@ class DocumentFragment final : public Node {
     QORVEX_SCRIPT_CLASS(DocumentFragment)
   public:
     explicit DocumentFragment(Document& document) : Node(document, kIsFragment) {}
-    Atom GetNodeName() const override;
+    Atom GetNodeName() const override { return atoms::kDocumentFragment; }
     void ToDebugString(NodeText& out) const override { out.append("DocumentFragment"); }
     qsl::RefPtr<Node> CloneNode(bool deep) override;
     layout::HandlePtr CreateLayoutNode(layout::LayoutTree&, layout::LayoutHandle&) override {

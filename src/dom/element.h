@@ -155,6 +155,7 @@ class Element : public Node {
     static Store StoreOf(Atom name);
     void SetId(Atom id);
     void SetClassName(std::string_view text);
+    void SetStyleAttribute(std::string_view text);
     void OnClassesChanged();
     std::optional<Atom> ClassValueForObservers() const;
     void AnnounceClassChange(std::optional<Atom> old_value);

@@ -1,0 +1,175 @@
+#include "dom/nesting_guard.h"
+
+#include "core/limits.h"
+#include "css/values/html_tags.h"
+#include "dom/ascii.h"
+
+namespace qorvex::dom {
+
+using css::TagId;
+
+namespace {
+
+struct Tag {
+    size_t start = 0;
+    size_t end = 0;  // behind the ">"
+    TagId id = TagId::Unknown;
+    bool closing = false;
+    bool self_closing = false;
+};
+
+// Elements that never stay open, or that another start tag closes: they do not nest by themselves.
+bool StaysOpen(const Tag& tag) {
+    switch (tag.id) {
+        case TagId::Area:
+        case TagId::Base:
+        case TagId::Br:
+        case TagId::Col:
+        case TagId::Embed:
+        case TagId::Hr:
+        case TagId::Img:
+        case TagId::Input:
+        case TagId::Link:
+        case TagId::Meta:
+        case TagId::Param:
+        case TagId::Source:
+        case TagId::Track:
+        case TagId::Wbr:
+        case TagId::KeyGen:
+        case TagId::Html:
+        case TagId::Head:
+        case TagId::Body:
+        case TagId::P:
+        case TagId::Li:
+        case TagId::Dt:
+        case TagId::Dd:
+        case TagId::Option:
+        case TagId::OptGroup:
+        case TagId::Tr:
+        case TagId::Td:
+        case TagId::Th:
+        case TagId::TBody:
+        case TagId::THead:
+        case TagId::TFoot:
+        case TagId::ColGroup:
+        case TagId::Caption:
+        case TagId::Rb:
+        case TagId::Rt:
+        case TagId::Rtc:
+        case TagId::Rp:
+            return false;
+        default:
+            return true;
+    }
+}
+
+// Elements whose content is text up to their end tag.
+bool HoldsRawText(TagId id) {
+    return id == TagId::Script || id == TagId::Style || id == TagId::TextArea || id == TagId::Title ||
+           id == TagId::Xmp || id == TagId::IFrame || id == TagId::NoEmbed || id == TagId::NoFrames;
+}
+
+class TagScanner {
+  public:
+    explicit TagScanner(std::string_view source) : source_(source) {}
+
+    bool Next(Tag& tag) {
+        while ((position_ = source_.find('<', position_)) != std::string_view::npos) {
+            const std::string_view rest = source_.substr(position_);
+            if (rest.starts_with("<!--")) {
+                Skip("-->", 4);
+                continue;
+            }
+            const bool closing = rest.size() > 1 && rest[1] == '/';
+            const size_t name = closing ? 2 : 1;
+            const bool is_tag = rest.size() > name && (IsAsciiLower(rest[name]) || IsAsciiUpper(rest[name]));
+            if (!is_tag) {
+                ++position_;
+                continue;
+            }
+            ReadTag(tag, closing, position_ + name);
+            return true;
+        }
+        return false;
+    }
+
+  private:
+    void Skip(std::string_view terminator, size_t from) {
+        const size_t end = source_.find(terminator, position_ + from);
+        position_ = end == std::string_view::npos ? source_.size() : end + terminator.size();
+    }
+
+    void ReadTag(Tag& tag, bool closing, size_t name) {
+        tag.start = position_;
+        tag.closing = closing;
+        size_t end = name;
+        char upper[24];
+        size_t length = 0;
+        while (end < source_.size() && !IsAsciiSpace(source_[end]) && source_[end] != '>' &&
+               source_[end] != '/') {
+            if (length < sizeof(upper)) upper[length++] = ToAsciiUpper(source_[end]);
+            ++end;
+        }
+        tag.id = css::TagLookup({upper, length});
+        char quote = 0;
+        for (; end < source_.size(); ++end) {
+            const char c = source_[end];
+            if (quote) {
+                if (c == quote) quote = 0;
+            } else if (c == '>') {
+                break;
+            } else if ((c == '"' || c == '\'') && source_[end - 1] == '=') {
+                quote = c;
+            }
+        }
+        tag.self_closing = end < source_.size() && source_[end - 1] == '/';
+        tag.end = position_ = std::min(end + 1, source_.size());
+        if (!closing && HoldsRawText(tag.id)) SkipRawText(std::string_view(upper, length));
+    }
+
+    // Stops in front of the end tag.
+    void SkipRawText(std::string_view upper_name) {
+        while ((position_ = source_.find("</", position_)) != std::string_view::npos) {
+            if (EqualsIgnoringAsciiCase(source_.substr(position_ + 2, upper_name.size()), upper_name)) return;
+            position_ += 2;
+        }
+        position_ = source_.size();
+    }
+
+    std::string_view source_;
+    size_t position_ = 0;
+};
+
+}  // namespace
+
+bool FlattenNesting(std::string_view source, TaggedString<MemoryTag::DOM>& rewritten) {
+    // So many tags do not fit in less.
+    if (source.size() < limits::kMaxSourceNesting * 3) return false;
+    TagScanner scanner(source);
+    Tag tag;
+    size_t open = 0;
+    size_t blanked = 0;  // start tags whose end tags have to go too
+    bool changed = false;
+    while (scanner.Next(tag)) {
+        // Content of raw text must not turn into text of the page.
+        if (!StaysOpen(tag) || tag.self_closing || HoldsRawText(tag.id)) continue;
+        if (tag.closing) {
+            if (blanked == 0) {
+                if (open > 0) --open;
+                continue;
+            }
+            --blanked;
+        } else if (open < limits::kMaxSourceNesting) {
+            ++open;
+            continue;
+        } else {
+            ++blanked;
+        }
+        if (!changed) rewritten = source;
+        changed = true;
+        std::fill(rewritten.data() + tag.start, rewritten.data() + tag.end, ' ');
+    }
+    return changed;
+}
+
+}  // namespace qorvex::dom

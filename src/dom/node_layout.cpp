@@ -1,0 +1,98 @@
+// A node's side of the layout tree: its handle, its dirty mark, its scroll position.
+
+#include "core/limits.h"
+#include "core/logging/log.h"
+#include "dom/document.h"
+#include "dom/element.h"
+#include "layout/layout_tree.h"
+
+namespace qorvex::dom {
+
+layout::HandlePtr Node::CreateLayoutNode(layout::LayoutTree& tree, layout::LayoutHandle& parent) {
+    if (!Is(kDisplayable)) return nullptr;
+    layout_node_ = tree.AddChild(parent, FindLayoutIndex(parent),
+                                 {.style = style_,
+                                  .display = display_element_,
+                                  .link = GetLayoutLink(),
+                                  .scroll = scroll_,
+                                  .isImage = tag_ == css::TagId::Img});
+    return layout_node_;
+}
+
+uint32_t Node::FindLayoutIndex(const layout::LayoutHandle& parent) const {
+    if (!parent_) return static_cast<uint32_t>(parent.data().children.size());
+    const NodeVector& siblings = parent_->children_;
+    const size_t own_index = GetIndexInParent();
+    // Children mostly arrive in order: behind the last one that has a handle there is nothing to search.
+    for (size_t i = own_index; i-- > 0;) {
+        if (!siblings[i]->Is(kInLayoutTree)) continue;
+        const layout::HandleVector& handles = parent.data().children;
+        if (!handles.empty() && handles.back() == siblings[i]->layout_node_) return handles.size();
+        break;
+    }
+    return layout::LayoutIndexForChild(
+        parent, siblings.size(), static_cast<uint32_t>(own_index), [&](uint32_t i) {
+            const Node& sibling = *siblings[i];
+            return sibling.Is(kInLayoutTree) ? sibling.layout_node_.get() : nullptr;
+        });
+}
+
+void Node::MarkLayoutDirty() {
+    if (layout_node_ && IsInDocument()) document_->QueueLayoutChange(*this);
+    // The next solve reports a layout change for this node. Its properties stay clean: a child that came or
+    // went changes none of them, and dirty inherited properties would be looked at in the whole subtree.
+    styleSolved = 0;
+}
+
+const layout::LayoutResult* Node::GetLayoutResult() const {
+    return layout_node_ && Is(kInLayoutTree) ? &layout_node_->data().result : nullptr;
+}
+
+layout::ScrollPosition Node::ClampScroll(layout::ScrollPosition wanted) const {
+    const layout::LayoutResult* box = GetLayoutResult();
+    if (!box) return wanted;
+    const float width = box->width - box->border.left - box->border.right;
+    const float height = box->height - box->border.top - box->border.bottom;
+    const float max_x = std::max(0.0f, box->scrollSize.width - width);
+    const float max_y = std::max(0.0f, box->scrollSize.height - height);
+    return {std::clamp(wanted.x, 0.0f, max_x), std::clamp(wanted.y, 0.0f, max_y)};
+}
+
+float Node::GetScrollLeft() {
+    scroll_ = ClampScroll(scroll_);
+    return scroll_.x;
+}
+
+float Node::GetScrollTop() {
+    scroll_ = ClampScroll(scroll_);
+    return scroll_.y;
+}
+
+void Node::SetScrollLeft(float value) {
+    SetScroll({value, scroll_.y});
+}
+void Node::SetScrollTop(float value) {
+    SetScroll({scroll_.x, value});
+}
+
+void Node::SetScroll(layout::ScrollPosition wanted) {
+    if (!std::isfinite(wanted.x) || !std::isfinite(wanted.y)) return;
+    const layout::ScrollPosition clamped = ClampScroll(wanted);
+    if (layout::Near(clamped.x, scroll_.x) && layout::Near(clamped.y, scroll_.y)) return;
+    scroll_ = clamped;
+    if (!layout_node_ || !IsInDocument()) return;
+    document_->GetLayoutTree().SetScroll(*layout_node_, scroll_);
+    document_->QueueTransformChange(*this);
+}
+
+float Node::GetScrollWidth() const {
+    const layout::LayoutResult* box = GetLayoutResult();
+    return box ? std::max(box->scrollSize.width, box->width) : 0;
+}
+
+float Node::GetScrollHeight() const {
+    const layout::LayoutResult* box = GetLayoutResult();
+    return box ? std::max(box->scrollSize.height, box->height) : 0;
+}
+
+}  // namespace qorvex::dom

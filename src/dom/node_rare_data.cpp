@@ -1,0 +1,11 @@
+#include "dom/node_rare_data.h"
+
+#include "dom/dom_string_map.h"
+#include "dom/node_list.h"
+
+namespace qorvex::dom {
+
+NodeRareData::NodeRareData() = default;
+NodeRareData::~NodeRareData() = default;
+
+}  // namespace qorvex::dom

@@ -1,0 +1,74 @@
+#include "core/logging/log.h"
+#include "display/display_text.h"
+#include "dom/character_data.h"
+#include "dom/document.h"
+#include "dom/document_host.h"
+#include "dom/text_transform.h"
+#include "script/make_handle.h"
+
+namespace qorvex::dom {
+
+using qsl::RefPtr;
+
+Text::Text(Document& document, std::string_view data)
+    : CharacterData(document, kIsText | kDisplayable, data) {}
+
+void Text::ToDebugString(NodeText& out) const {
+    out.append("Text [");
+    out.append(GetData().substr(0, 16));
+    out.append("...]");
+}
+
+RefPtr<Node> Text::CloneNode(bool deep) {
+    RefPtr<Text> clone = script::MakeHandle<Text>(*GetDocument(), GetData());
+    CopyCommon(*clone, deep);
+    return clone;
+}
+
+RefPtr<Text> Text::SplitText(size_t offset) {
+    if (offset > GetData().size()) return nullptr;
+    RefPtr<Text> rest = script::MakeHandle<Text>(*GetDocument(), GetData().substr(offset));
+    if (Node* parent = GetParent()) parent->InsertBefore(rest, GetNextSibling());
+    DeleteData(offset, GetData().size());
+    return rest;
+}
+
+void Text::OnInsertedIntoDocument() {
+    transformed_.reset();
+    CharacterData::OnInsertedIntoDocument();
+    if (!display_element_) display_element_ = MakeRef<dsp::DisplayText>();
+    GetDocument()->QueueTextCommit(*this);
+}
+
+void Text::OnComputedStyleChanged() {
+    UpdateTransformedText();
+    if (IsInDocument()) GetDocument()->QueueTextCommit(*this);
+}
+
+void Text::OnTextChanged() {
+    UpdateTransformedText();
+    if (!IsInDocument()) return;
+    GetDocument()->QueueTextCommit(*this);
+    MarkLayoutDirty();
+}
+
+void Text::UpdateTransformedText() {
+    if (!IsInDocument()) return;
+    NodeText transformed;
+    switch (TransformText(GetStyle(), *GetDocument(), GetData(), transformed)) {
+        case TextTransformResult::NotWanted:
+            transformed_.reset();
+            break;
+        case TextTransformResult::Failed:
+            break;  // what was shown stays
+        case TextTransformResult::Done:
+            transformed_ = MakeUnique<NodeText, MemoryTag::DOM>(std::move(transformed));
+            break;
+    }
+}
+
+void Text::CommitDisplayedText() {
+    if (display_element_) static_cast<dsp::DisplayText&>(*display_element_).SetText(GetDisplayedText());
+}
+
+}  // namespace qorvex::dom
