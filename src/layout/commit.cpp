@@ -82,11 +82,13 @@ void LayoutTree::Commit(LayoutUpdateData& update, dsp::DirtyRegion* dirty, Debug
         if (names != nullptr && handle.data().node) names->Set(&handle, handle.data().node->DebugName());
         ++update.counters.committed;
     });
-    // Child lists and depths need the parents of all handles in place.
-    changed_.ForEach([](LayoutHandle& handle) {
-        UpdateDepths(handle);
-        SyncFlexChildren(handle);
+    // Child lists and depths need the parents of all handles in place. One walk from each top-most changed
+    // handle keeps deep trees linear.
+    changed_.ForEach([&](LayoutHandle& handle) {
+        const LayoutHandle* parent = handle.node().parent;
+        if (parent == nullptr || !changed_.Contains(parent)) UpdateDepths(handle, changed_);
     });
+    changed_.ForEach([](LayoutHandle& handle) { SyncFlexChildren(handle); });
     removed_.ForEach([](LayoutHandle& handle) { Sever(handle); });
     changed_.ForEach([](LayoutHandle& handle) { dsp::MarkForTransform(handle); });
     // Two commits may meet before one layout ran; nothing of the first may be lost.

@@ -60,10 +60,10 @@ void SyncFlexChildren(LayoutHandle& handle) {
         YGNodeSetMeasureFunc(owner, MeasureFlexNode);
 }
 
-void UpdateDepths(LayoutHandle& handle) {
+void UpdateDepths(LayoutHandle& top, const HandleSet& changed) {
     const TempMark mark;
     TempVector<LayoutHandle*> stack;
-    stack.push_back(&handle);
+    stack.push_back(&top);
     while (!stack.empty()) {
         LayoutHandle* parent = stack.back();
         stack.pop_back();
@@ -71,11 +71,11 @@ void UpdateDepths(LayoutHandle& handle) {
         for (uint32_t i = 0; i < node.children.size(); ++i) {
             LayoutNode& child = node.children[i]->node();
             child.index = i;
-            if (child.depth == node.depth + 1) continue;
+            const bool moved = child.depth != node.depth + 1;
             child.depth = node.depth + 1;
-            stack.push_back(node.children[i].get());
+            if (moved || changed.Contains(node.children[i].get())) stack.push_back(node.children[i].get());
         }
-        if (parent != &handle) SyncFlexChildren(*parent);
+        if (!changed.Contains(parent)) SyncFlexChildren(*parent);
     }
 }
 

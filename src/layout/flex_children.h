@@ -1,6 +1,7 @@
 // Keeps Yoga's child lists equal to the children of the layout nodes. Runs in the commit.
 #pragma once
 
+#include "layout/handle_set.h"
 #include "layout/layout_handle.h"
 
 namespace qorvex::layout {
@@ -9,7 +10,9 @@ namespace qorvex::layout {
 // suffix allow. Children of measured nodes and of nodes at the depth limit stay out.
 void SyncFlexChildren(LayoutHandle& handle);
 
-// Renumbers the children of `handle` and, where their depth changed, everything below them.
-void UpdateDepths(LayoutHandle& handle);
+// Renumbers children and depths from `top` down: through the changed handles below it, and through everything
+// whose depth came out different. Flex children of handles that did not change are synced on the way; those
+// of changed ones wait until all depths are known.
+void UpdateDepths(LayoutHandle& top, const HandleSet& changed);
 
 }  // namespace qorvex::layout

@@ -110,7 +110,7 @@ TEST_F(LayoutTreeTest, DeepTreesAreCutWithOneWarning) {
     LayoutHandle* at = page.body;
     LayoutHandle* within = nullptr;
     for (int i = 0; i < 5000; ++i) {
-        at = page.Add(at, "padding: 1px; position: relative; z-index: 1");
+        at = page.Add(at, "height: 3px; padding-left: 1px; position: relative; z-index: 1");
         if (i == 100) within = at;
     }
     LayoutHandle* deepest = page.Add(at, "width: 10px; height: 10px");
