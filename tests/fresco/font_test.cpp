@@ -1,0 +1,115 @@
+// Fonts: what they measure, and that threads may share them.
+#include <thread>
+
+#include <gtest/gtest.h>
+#include "canvas.h"
+
+namespace fresco::test {
+namespace {
+
+constexpr char kSans[] = "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf";
+constexpr char kBold[] = "/usr/share/fonts/truetype/dejavu/DejaVuSans-Bold.ttf";
+
+struct Collect : IShapeSink {
+    std::vector<ShapedGlyph> glyphs;
+    void OnGlyphs(const ShapedGlyph* list, size_t count) override { glyphs.assign(list, list + count); }
+};
+
+}  // namespace
+
+TEST(Font, LoadsFindsAndMeasures) {
+    Canvas canvas;
+    IFontService* service = canvas.library->GetFontService();
+    const FontId regular = canvas.LoadFont(kSans), bold = canvas.LoadFont(kBold);
+    if (regular == kNoId || bold == kNoId) GTEST_SKIP() << "no DejaVu on this machine";
+    EXPECT_EQ(service->FindFont("dejavu sans", 0), regular);
+    EXPECT_EQ(service->FindFont("DejaVu Sans", kFontWeight700), bold);
+    EXPECT_EQ(service->FindFont("DejaVu Sans", kFontItalic), kNoId);
+    EXPECT_EQ(service->GetFont(77), nullptr);
+    IFont* font = service->GetFont(regular);
+    EXPECT_STREQ(font->GetFamilyName(), "DejaVu Sans");
+    const FontMetrics m = font->GetMetrics(100);
+    EXPECT_NEAR(m.ascent, -92.8f, 0.5f);
+    EXPECT_NEAR(m.descent, 23.6f, 0.5f);
+    const uint32_t text[] = {'A', 'V', 0x10FFFF};
+    uint32_t glyphs[3];
+    float advances[3];
+    font->GetGlyphIndices(text, 3, glyphs);
+    EXPECT_EQ(glyphs[2], 0u);
+    EXPECT_TRUE(font->GetAdvances(glyphs, 3, 100, advances));
+    EXPECT_NEAR(advances[0], 68.4f, 0.1f);
+    EXPECT_FALSE(font->GetAdvances(glyphs, 3, -1, advances));
+    Collect shaped;
+    ShapeRequest request;
+    request.codePoints = text, request.count = 2, request.size = 100;
+    ASSERT_TRUE(font->Shape(request, shaped));
+    ASSERT_EQ(shaped.glyphs.size(), 2u);
+    EXPECT_LT(shaped.glyphs[0].advance, 68);  // kerned
+    request.direction = TextDirection::RightToLeft;
+    ASSERT_TRUE(font->Shape(request, shaped));
+    EXPECT_EQ(shaped.glyphs[0].cluster, 1u);
+}
+
+TEST(Font, RefusesWhatIsNoFont) {
+    Canvas canvas;
+    IFontService* service = canvas.library->GetFontService();
+    std::vector<uint8_t> bytes = ReadFile(kSans);
+    for (const size_t size : {size_t(0), size_t(10), bytes.size() / 2}) {
+        MemoryReader cut(
+            std::vector<uint8_t>(bytes.begin(), bytes.begin() + ptrdiff_t(std::min(size, bytes.size()))));
+        // Half a font may load; it must then answer all the same.
+        const FontId id = service->LoadFace(&cut, 0, SdfMode::Never);
+        if (IFont* font = service->GetFont(id)) font->PreloadText("abc", 3);
+    }
+    MemoryReader whole(bytes);
+    EXPECT_EQ(service->LoadFace(&whole, 9, SdfMode::Never), kNoId);
+    if (!bytes.empty()) EXPECT_EQ(service->GetFaceCount(&whole), 1u);
+}
+
+TEST(Font, ThreadsShareAFace) {
+    Canvas canvas;
+    const FontId id = canvas.LoadFont(kSans);
+    if (id == kNoId) GTEST_SKIP() << "no DejaVu on this machine";
+    IFont* font = canvas.library->GetFontService()->GetFont(id);
+    std::vector<std::thread> threads;
+    std::atomic<int> shaped{0};
+    for (int t = 0; t < 4; ++t) {
+        threads.emplace_back([&, t] {
+            for (int i = 0; i < 50; ++i) {
+                Collect sink;
+                uint32_t text[] = {uint32_t('A' + i % 26), uint32_t('a' + t)};
+                ShapeRequest request;
+                request.codePoints = text, request.count = 2;
+                shaped += font->Shape(request, sink);
+                font->PreloadGlyphs(text, 2);
+                canvas.library->GetFontService()->FindFont("nothing", 0);
+            }
+        });
+    }
+    CommandBuffer* b = Library::CreateBuffer(0, 0);
+    TextPaint paint;
+    paint.font = id, paint.y = 20;
+    b->FillString("ABCabc", 6, paint);
+    canvas.Draw(b);
+    for (std::thread& thread : threads)
+        thread.join();
+    EXPECT_EQ(shaped, 200);
+}
+
+TEST(Font, TheNullLibraryMeasuresAndDrawsNothing) {
+    IRenderingLibrary* library = CreateNullRenderingLibrary({});
+    EXPECT_STREQ(library->GetBuildIdentifier(), GetBuildIdentifier());
+    EXPECT_EQ(std::strlen(library->GetBuildIdentifier()), 64u);
+    MemoryReader reader(ReadFile(kSans));
+    const FontId id = library->GetFontService()->LoadFace(&reader, 0, SdfMode::Never);
+    if (id != kNoId) EXPECT_LT(library->GetFontService()->GetFont(id)->GetMetrics(10).ascent, 0);
+    IScene* scene = library->CreateScene({});
+    CommandBuffer* b = Library::CreateBuffer(0, 0);
+    b->FillRect({0, 0, 0, 1, 1}, Paint{});
+    scene->ExecuteBackEnd(&b, 1);
+    b->Release();
+    scene->Destroy();
+    library->Destroy();
+}
+
+}  // namespace fresco::test
