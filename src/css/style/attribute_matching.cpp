@@ -1,0 +1,99 @@
+#include "css/style/attribute_matching.h"
+
+#include <optional>
+
+#include "core/memory/atoms.h"
+#include "dom/element.h"
+
+namespace qorvex::css {
+namespace {
+
+char ToLower(char c) {
+    return c >= 'A' && c <= 'Z' ? static_cast<char>(c + 32) : c;
+}
+
+bool SameText(std::string_view a, std::string_view b, bool ignoreCase) {
+    if (a.size() != b.size()) return false;
+    if (!ignoreCase) return a == b;
+    for (size_t i = 0; i < a.size(); ++i) {
+        if (ToLower(a[i]) != ToLower(b[i])) return false;
+    }
+    return true;
+}
+
+size_t Find(std::string_view text, std::string_view part, size_t from, bool ignoreCase) {
+    if (!ignoreCase) return text.find(part, from);
+    for (size_t i = from; i + part.size() <= text.size(); ++i) {
+        if (SameText(text.substr(i, part.size()), part, true)) return i;
+    }
+    return std::string_view::npos;
+}
+
+// Only the first occurrence is examined.
+bool IncludesWord(std::string_view text, std::string_view word, bool ignoreCase) {
+    const size_t at = Find(text, word, 0, ignoreCase);
+    if (at == std::string_view::npos) return false;
+    const size_t end = at + word.size();
+    return (at == 0 || text[at - 1] == ' ') && (end == text.size() || text[end] == ' ');
+}
+
+// A whole word, or the start of a word up to a "-". Wider than Selectors Level 4, 6.1, where the attribute is
+// one word.
+bool StartsWordBeforeDash(std::string_view text, std::string_view part, bool ignoreCase) {
+    for (size_t at = Find(text, part, 0, ignoreCase); at != std::string_view::npos;
+         at = Find(text, part, at + 1, ignoreCase)) {
+        const size_t end = at + part.size();
+        const bool startsWord = at == 0 || text[at - 1] == ' ';
+        if (startsWord && (end == text.size() || text[end] == '-' || text[end] == ' ')) return true;
+    }
+    return false;
+}
+
+bool Compare(const SimpleSelector& simple, std::string_view text) {
+    const std::string_view value = simple.value.view();
+    switch (simple.op) {
+        case AttributeOperator::Presence:
+            return true;
+        case AttributeOperator::Equals:
+            return SameText(text, value, simple.ignoreCase);
+        case AttributeOperator::Includes:
+            return !value.empty() && IncludesWord(text, value, simple.ignoreCase);
+        case AttributeOperator::DashMatch:
+            return value.empty() ? text.empty() || text[0] == '-'
+                                 : StartsWordBeforeDash(text, value, simple.ignoreCase);
+        // An empty value matches nothing (Selectors Level 4, 6.2).
+        case AttributeOperator::Prefix:
+            return !value.empty() && SameText(text.substr(0, value.size()), value, simple.ignoreCase);
+        case AttributeOperator::Suffix:
+            return !value.empty() && text.size() >= value.size() &&
+                   SameText(text.substr(text.size() - value.size()), value, simple.ignoreCase);
+        case AttributeOperator::Substring:
+            return !value.empty() && Find(text, value, 0, simple.ignoreCase) != std::string_view::npos;
+    }
+    return false;
+}
+
+// id, class and style are attributes to a selector although the element keeps them in fields of their own.
+std::optional<Atom> FindStoredApart(Atom name, const dom::Element& element) {
+    if (name == atoms::kId) return element.Is(dom::kHasId) ? std::optional(element.GetId()) : std::nullopt;
+    if (name == atoms::kClass)
+        return element.Is(dom::kHasClasses) ? std::optional(element.GetClassName()) : std::nullopt;
+    if (name == atoms::kStyle) return element.GetAttribute("style");
+    return std::nullopt;
+}
+
+}  // namespace
+
+bool MatchAttribute(const SimpleSelector& simple, const dom::Element& element) {
+    const Atom* stored =
+        simple.isData ? element.FindDataAttribute(simple.name) : element.FindAttribute(simple.name);
+    if (stored) {
+        if (simple.op == AttributeOperator::Equals && !simple.ignoreCase) return *stored == simple.value;
+        return Compare(simple, stored->view());
+    }
+    if (simple.isData) return false;
+    const std::optional<Atom> apart = FindStoredApart(simple.name, element);
+    return apart && Compare(simple, apart->view());
+}
+
+}  // namespace qorvex::css

@@ -1,0 +1,146 @@
+// The rules of one document (or of the user-agent sheet) in a form that is searched per element. A page has
+// one index for the default sheet and one for the author's.
+//
+// A rule is quick when its selector is a single universal, tag, id or class selector: looking it up under its
+// key is all the matching there is. Every other rule is complex and goes through MatchSelector, found under a
+// class of its key compound if it has one, else tried on every element after a look at its packed key.
+//
+// Invariants:
+// - positions are unique and decide the cascade; where a rule is stored does not matter;
+// - a searchable rule is in exactly one of quickRules_, complexRules_ and the class lists; rules of inactive
+// media
+//   groups are in none of them;
+// - the maps and keys describe the rule vectors unless indexStale_ is set, and every search refreshes them
+// first. View thread only.
+#pragma once
+
+#include <cstdint>
+#include <span>
+
+#include "css/parser/stylesheet.h"
+#include "css/values/length_context.h"
+#include "css/values/shared_value.h"
+
+namespace qorvex::css {
+
+struct IndexedRule : Ruleset {
+    uint64_t ruleId = 0;    // unique in its index, never reused
+    uint32_t position = 0;  // later positions win ties
+};
+
+// A candidate during matching.
+struct MatchedRule {
+    uint64_t ruleId;
+    uint32_t position;
+    const IndexedRule* rule;
+};
+
+// The ids that a sheet brought, in order; shared by its owner and its script objects.
+struct RuleIdList : SharedValue<RuleIdList> {
+    CssVector<uint64_t> ids;
+};
+using RuleIdListPtr = qsl::RefPtr<RuleIdList>;
+
+// What the key compound of a complex rule asks first, packed so that most rules are refused without touching
+// them.
+struct SelectorKey {
+    SelectorType type = SelectorType::Universal;  // Universal: no quick refusal
+    TagId tag = TagId::Any;
+    Atom name;
+};
+
+class RuleIndex {
+  public:
+    // Takes copies of the sheet's rules (their declarations stay shared). `media` are the conditions of a
+    // link's media attribute: the top-level rules then apply while any of them holds. Nothing of a media
+    // group applies before the next UpdateMedia.
+    RuleIdListPtr AddSheet(const Stylesheet& sheet, std::span<const MediaFeatureList> media = {});
+    uint64_t AddRule(Ruleset rule);
+    // The new rule takes the cascade position of the rule `before`, which moves behind it with all later
+    // ones.
+    uint64_t InsertRule(Ruleset rule, uint64_t before);
+    bool RemoveRule(uint64_t ruleId);
+    // One pass over the index, however many rules go.
+    void RemoveRules(std::span<const uint64_t> ruleIds);
+    // Borrowed until the next change of the index; null for an unknown id.
+    const IndexedRule* FindRule(uint64_t ruleId) const;
+    // Files the rule anew. False for an unknown id.
+    bool SetSelector(uint64_t ruleId, ComplexSelector selector);
+
+    // Moves groups between active and inactive; true if any moved. em and rem are the root's font size.
+    bool UpdateMedia(const LengthContext& metrics);
+
+    bool IsEmpty() const { return GetSearchableRuleCount() == 0; }
+    uint32_t GetSearchableRuleCount() const;
+    uint32_t GetQuickRuleCount() const { return quickRules_.size(); }
+    uint32_t GetComplexRuleCount() const { return GetSearchableRuleCount() - GetQuickRuleCount(); }
+    uint32_t GetSubtreeInvalidatingRules() const { return subtreeInvalidatingRules_; }
+    uint32_t GetSiblingInvalidatingRules() const { return siblingInvalidatingRules_; }
+    const CssVector<KeyframesRule>& GetKeyframes() const { return keyframes_; }
+    const CssVector<FontFace>& GetFontFaces() const { return fontFaces_; }
+    CssVector<uint64_t> GetAllRuleIds() const;  // by position
+
+    // --- Searching. Call Refresh before a batch of the rest.
+    void Refresh() {
+        if (indexStale_) [[unlikely]]
+            Rebuild();
+    }
+    using Indices = CssVector<uint32_t>;
+    const IndexedRule& QuickRule(uint32_t index) const { return quickRules_[index]; }
+    const Indices* FindQuickByClass(Atom name) const { return quickByClass_.get(name); }
+    const Indices* FindQuickById(Atom name) const { return quickById_.get(name); }
+    const Indices& FindQuickByTag(TagId tag) const { return quickByTag_[static_cast<size_t>(tag)]; }
+    const Indices& GetQuickUniversal() const { return quickUniversal_; }
+    const CssVector<IndexedRule>* FindComplexByClass(Atom name) const {
+        return complexRulesByClass_.get(name);
+    }
+    std::span<const SelectorKey> GetComplexKeys() const { return {complexKeys_.data(), complexKeys_.size()}; }
+    const IndexedRule& ComplexRule(size_t index) const { return complexRules_[index]; }
+
+  private:
+    struct MediaGroup {
+        MediaFeatureList features;
+        CssVector<IndexedRule> rules;
+    };
+    struct ActiveMediaGroup {
+        MediaFeatureList features;
+        CssVector<uint64_t> ruleIds;
+    };
+
+    IndexedRule Number(Ruleset rule);
+    void File(IndexedRule rule);
+    void NoteQuickRule(uint32_t index);
+    void CountCombinators(const ComplexSelector& selector, int32_t change);
+    void AddMediaGroup(const MediaFeatureList& features, const CssVector<Ruleset>& rules, RuleIdList& ids);
+    CssVector<IndexedRule> TakeRules(std::span<const uint64_t> ruleIds);
+    void Rebuild();
+    template <class Visitor>
+    void ForEachRule(Visitor&& visit);
+    template <class Visitor>
+    void ForEachList(Visitor&& visit);
+
+    uint64_t nextRuleId_ = 0;
+    uint32_t nextPosition_ = 0;
+    CssVector<IndexedRule> complexRules_;
+    CssHashMap<Atom, CssVector<IndexedRule>> complexRulesByClass_;
+    uint32_t complexByClassCount_ = 0;
+    CssVector<IndexedRule> quickRules_;
+    CssVector<MediaGroup> inactiveMediaGroups_;
+    CssVector<ActiveMediaGroup> activeMediaGroups_;
+    CssVector<FontFace> fontFaces_;
+    CssVector<KeyframesRule> keyframes_;
+    uint32_t subtreeInvalidatingRules_ = 0;
+    uint32_t siblingInvalidatingRules_ = 0;
+    bool indexStale_ = false;
+
+    CssVector<SelectorKey> complexKeys_;  // one per complex rule
+    CssHashMap<Atom, Indices> quickById_;
+    CssHashMap<Atom, Indices> quickByClass_;
+    Indices quickByTag_[kTagCount];
+    Indices quickUniversal_;
+};
+
+// Do all conditions hold? An empty list holds.
+[[nodiscard]] bool EvaluateMedia(const MediaFeatureList& features, const LengthContext& metrics);
+
+}  // namespace qorvex::css
