@@ -1,6 +1,7 @@
 #include "dom/node_link.h"
 
-#include "dom/node.h"
+#include "dom/document.h"
+#include "layout/dom_tasks.h"
 
 namespace qorvex::dom {
 
@@ -16,7 +17,13 @@ std::string_view NodeLink::DebugName() const {
     return node_ ? node_->GetNodeName().view() : std::string_view();
 }
 
-void NodeLink::Receive(layout::DOMTaskKind, const layout::DOMTaskData&) {
+void NodeLink::Receive(layout::DOMTaskKind kind, const layout::DOMTaskData&) {
+    if (kind == layout::DOMTaskKind::FontArrived && node_ && node_->IsElement() && node_->IsInDocument()) {
+        // The next solve asks for the faces of the family list again.
+        static_cast<Element*>(node_)->GetDirtyProperties().Add(css::PropertyId::FontFamily);
+        node_->GetDocument()->MarkNodeDirty(*node_);
+        return;
+    }
     // Text controls and per-character positions, which are what layout reports, come with their own classes.
 }
 

@@ -1,0 +1,305 @@
+#include "css/style/element_solver.h"
+
+#include "css/style/custom_property_inheritance.h"
+#include "css/style/derived_text_values.h"
+#include "css/style/property_appliers.h"
+#include "css/values/animated_properties.h"
+
+namespace qorvex::css {
+namespace {
+
+using dom::Element;
+
+constexpr PropertySet Range(PropertyId first, PropertyId last) {
+    PropertySet set;
+    for (size_t id = IndexOf(first); id <= IndexOf(last); ++id)
+        set.Add(static_cast<PropertyId>(id));
+    return set;
+}
+constexpr PropertySet kTransitionGroup =
+    Range(PropertyId::TransitionProperty, PropertyId::TransitionTimingFunction);
+constexpr PropertySet kTextGroup = Range(PropertyId::Color, PropertyId::TextStrokeColor);
+
+class ElementSolver {
+  public:
+    ElementSolver(Element& element, StyleRun& run)
+        : element_(element),
+          run_(run),
+          parentNode_(*element.GetParent()),
+          style_(element.GetStyle()),
+          parent_(parentNode_.GetStyle()),
+          match_(element.GetMatchState()),
+          dirty_(element.GetDirtyProperties()),
+          isHtml_(&element == run.document.GetHtmlElement()),
+          isBody_(&element == run.document.GetBodyElement()),
+          wasDisplayed_(style_.layout->display != CSSDisplay::None) {}
+
+    uint32_t Run() {
+        if (element_.timesSolved < 2) ++element_.timesSolved;
+        const bool ownEmpty = dirty_.Empty();
+        const bool animates = TakeAnimatedChanges();
+        const bool inherits = InheritDirtiness();
+        if (dirty_.Empty() && element_.styleSolved) return 0;
+
+        ++run_.counters.elementsSolved;
+        mask_ = dom::kChangeSolved;
+        if (!element_.styleSolved) {
+            element_.styleSolved = 1;
+            mask_ |= dom::kChangeLayout;
+        }
+        if (animates && !inherits && ownEmpty) {
+            ApplyAll(dirty_ & kAnimatableProperties);
+        } else if (!TakeSharedStyle()) {
+            FullPath();
+        }
+        if (run_.rootFontSizeChanged) mask_ |= dom::kChangeLayout;  // lengths in rem are resolved by layout
+        CheckDisplay();
+        return mask_;
+    }
+
+  private:
+    // What running animations and transitions wrote since the last solve.
+    bool TakeAnimatedChanges() {
+        bool any = false;
+        for (AnimatedProperties* record :
+             {element_.animatedProperties.get(),
+              static_cast<AnimatedProperties*>(element_.transitionProperties.get())}) {
+            if (!record || record->dirty.Empty()) continue;
+            dirty_ |= record->dirty;
+            record->dirty.Clear();
+            any = true;
+        }
+        return any;
+    }
+
+    bool InheritDirtiness() {
+        PropertySet added;
+        if (parentNode_.IsElement()) {
+            const PropertySet& parentDirty = static_cast<Element&>(parentNode_).GetDirtyProperties();
+            if (!parentDirty.Empty()) {
+                added = parentDirty & kInheritedProperties;
+                AddDependents(DeclarationKind::Inherit, parentDirty, added);
+                // A variable may hold the word inherit; inside calc(), an em is the parent's.
+                const bool newEm = parentDirty.Contains(PropertyId::FontSize);
+                AddDependents(DeclarationKind::CustomExpression, newEm ? PropertySet::All() : parentDirty,
+                              added);
+            }
+        }
+        if (UpdateCustomProperties(style_, parent_, match_) || run_.rootFontSizeChanged)
+            AddDependents(DeclarationKind::CustomExpression, PropertySet::All(), added);
+        if (run_.rootFontSizeChanged) added |= kDerivedTextInputs;
+        dirty_ |= added;
+        return !added.Empty();
+    }
+
+    void AddDependents(DeclarationKind kind, const PropertySet& among, PropertySet& added) const {
+        for (const MatchState::Slot& slot : match_.slots()) {
+            if (slot.declaration->kind() == kind && among.Contains(slot.property)) added.Add(slot.property);
+        }
+    }
+
+    bool IsAnimated() const { return element_.animatedProperties || element_.transitionProperties; }
+
+    // Only for elements all of whose properties are looked at: theirs is the cost that sharing saves.
+    bool TakeSharedStyle() {
+        if (dirty_ != PropertySet::All() || isHtml_ || isBody_ || IsAnimated() ||
+            !match_.customProperties().empty())
+            return false;
+        sharingKey_ = StyleSharingTable::MakeKey(element_, parent_, IsLandmark(parentNode_));
+        canShare_ = true;
+        const StyleSharingTable::Entry* entry = run_.sharing.Find(sharingKey_, element_, parent_);
+        if (!entry) return false;
+        ++run_.counters.stylesShared;
+        mask_ |= entry->changeMask;
+        const LayoutStyleRefs& other = entry->element->GetStyle();
+        NoteCompositionChange(*other.visual);
+        const bool newFont = !(style_.text == other.text);
+        Take(other.layout);
+        Take(other.visual);
+        Take(other.text);
+        Take(other.transform);
+        Take(other.animation);
+        Take(other.transition);
+        // The fonts tell the first asker alone when a face arrives; each holder of the group must ask for
+        // itself.
+        if (newFont && run_.fonts && style_.text->typefaces.contains(kNoTypeface) &&
+            UpdateTypefaces(element_, *run_.fonts))
+            mask_ |= dom::kChangeLayout;
+        return true;
+    }
+
+    template <class Group>
+    void Take(const StyleHandle<Group>& group) {
+        if (style_.Handle<Group>() == group) return;
+        style_.Handle<Group>() = group;
+        style_.written[static_cast<size_t>(kGroupOf<Group>)] = 1;
+    }
+
+    bool IsLandmark(const dom::Node& node) const {
+        return &node == run_.document.GetHtmlElement() || &node == run_.document.GetBodyElement();
+    }
+
+    void FullPath() {
+        const uint32_t maskBefore = std::exchange(mask_, 0);
+        PropertySet properties = dirty_;
+        if (isHtml_ || isBody_) properties &= ~kPropagatedProperties;
+        const bool adopts = AdoptParentText();
+        if (adopts) properties &= ~kTextGroup;
+        // Transitions first: they decide how the others may change.
+        ApplyAll(properties & kTransitionGroup);
+        ApplyAll(properties & ~kTransitionGroup);
+        if (!adopts) UpdateText();
+        if ((isHtml_ || isBody_) && (dirty_.Intersects(kPropagatedProperties))) {
+            const PropertyInputs inputs = MakeInputs();
+            PropertySolver solver(inputs, run_.counters);
+            run_.rootStyles.Record(isHtml_, solver);
+        }
+        if (canShare_) run_.sharing.Insert(sharingKey_, element_, mask_);
+        mask_ |= maskBefore;
+    }
+
+    PropertyInputs MakeInputs() const {
+        const dom::Element* html = run_.document.GetHtmlElement();
+        PropertyInputs inputs{
+            style_,
+            parent_,
+            match_,
+            ActiveOrNull(element_.animatedProperties.get()),
+            ActiveOrNull(element_.transitionProperties.get()),
+            element_.timesSolved < 2,
+            {&parent_, html ? &html->GetStyle() : nullptr, run_.metrics.vw, run_.metrics.vh}};
+        if (IsLandmark(parentNode_)) {
+            inputs.parentRoot = &run_.rootStyles;
+            inputs.parentIsHtml = &parentNode_ == html;
+        }
+        return inputs;
+    }
+
+    template <class Record>
+    static Record* ActiveOrNull(Record* record) {
+        return record && record->totalActive ? record : nullptr;
+    }
+
+    void ApplyAll(const PropertySet& properties) {
+        if (properties.Empty()) return;
+        const PropertyInputs inputs = MakeInputs();
+        PropertySolver solver(inputs, run_.counters);
+        CssString compositionBefore;
+        if (properties.Contains(PropertyId::CompositionId))
+            compositionBefore = style_.visual->compositionId.value;
+        properties.ForEach([&](PropertyId id) { solver.Apply(id, mask_); });
+        if (!compositionBefore.empty() && !(compositionBefore == style_.visual->compositionId.value))
+            run_.document.AddRemovedCompositionId(compositionBefore);
+    }
+
+    void NoteCompositionChange(const VisualStyle& next) {
+        const auto& old = style_.visual->compositionId;
+        if (!old.empty() && !(old == next.compositionId)) run_.document.AddRemovedCompositionId(old.value);
+    }
+
+    // An element that says nothing about text has its parent's text style; sharing the group saves a copy in
+    // each of its kind. Not where the parent has values of its own that are not inherited.
+    bool AdoptParentText() {
+        if (isHtml_ || !dirty_.Intersects(kTextGroup) || IsAnimated()) return false;
+        for (const MatchState::Slot& slot : match_.slots()) {
+            if (kTextGroup.Contains(slot.property)) return false;
+        }
+        const TextLayoutStyle& parent = *parent_.text;
+        const TextLayoutStyle& initial = *DefaultStyles().text;
+        if (parent.fontFitMode != initial.fontFitMode || parent.textOverflow != initial.textOverflow ||
+            parent.fontSdf != initial.fontSdf)
+            return false;
+        if (!HoldsAbsoluteValues(parent)) return false;
+        if (style_.text == parent_.text) return true;
+        const StyleHandle<TextLayoutStyle> old = style_.text;
+        Take(parent_.text);
+        NoteTextChanges(*old, *style_.text);
+        return true;
+    }
+
+    // What the element would inherit must be what the group says: not where the parent declared something
+    // relative to a font size or a weight, which its heirs take as an absolute value.
+    static bool HoldsAbsoluteValues(const TextLayoutStyle& text) {
+        const auto isPixels = [](Length length) { return length.unit == LengthUnit::Px; };
+        return isPixels(text.fontSize) && text.fontSize.value == text.computedFontSize &&
+               isPixels(text.textStrokeWidth) &&
+               (text.letterSpacing.kind != SpacingKind::Length || isPixels(text.letterSpacing.length)) &&
+               (text.lineHeight.kind != SpacingKind::Length || isPixels(text.lineHeight.length) ||
+                text.lineHeight.length.unit == LengthUnit::Em) &&
+               static_cast<uint16_t>(text.fontWeight) * 100 == text.computedFontWeight;
+    }
+
+    void NoteTextChanges(const TextLayoutStyle& old, const TextLayoutStyle& next) {
+        (dirty_ & kTextGroup).ForEach([&](PropertyId id) {
+            ++run_.counters.propertiesApplied;
+            if (FieldsEqual(old, next, id)) return;
+            ++run_.counters.propertiesChanged;
+            mask_ |= kPropertyAppliers[IndexOf(id)].changeMask;
+        });
+        if (!(static_cast<const TextLayoutDerived&>(old) == static_cast<const TextLayoutDerived&>(next)))
+            mask_ |= dom::kChangeLayout;
+    }
+
+    static bool FieldsEqual(const TextLayoutStyle& a, const TextLayoutStyle& b, PropertyId id) {
+        switch (id) {
+#define QORVEX_ROW(id, name, type, parser, field, ...) \
+    case PropertyId::id:                               \
+        return a.field == b.field;
+            QORVEX_CSS_TEXT_PROPERTIES(QORVEX_ROW)
+#undef QORVEX_ROW
+            default:
+                return true;
+        }
+    }
+
+    void UpdateText() {
+        const float sizeBefore = style_.text->computedFontSize;
+        if (dirty_.Intersects(kDerivedTextInputs)) {
+            LengthContext metrics = run_.metrics;
+            // On the root a rem is the initial size (CSS Values and Units, 6.1.2).
+            if (isHtml_) metrics.rem = DefaultStyles().text->computedFontSize;
+            if (UpdateDerivedText(style_, parent_, metrics)) mask_ |= dom::kChangeLayout;
+        }
+        if (run_.fonts && dirty_.Intersects(kFontKeyInputs) && UpdateTypefaces(element_, *run_.fonts))
+            mask_ |= dom::kChangeLayout;
+        if (!isHtml_) return;
+        run_.metrics.em = run_.metrics.rem = style_.text->computedFontSize;
+        run_.rootFontSizeChanged |= sizeBefore != style_.text->computedFontSize;
+    }
+
+    void CheckDisplay() {
+        if (!dirty_.Contains(PropertyId::Display)) return;
+        const bool displayed = style_.layout->display != CSSDisplay::None;
+        if (isHtml_) {
+            // The root's handle carries the tree, so the tree is made anew around it.
+            if (displayed != wasDisplayed_ && run_.document.IsLayoutTreeBuilt())
+                run_.document.RequestLayoutTreeRebuild();
+            return;
+        }
+        const bool inLayout = element_.Is(dom::kInLayoutTree);
+        if (displayed == inLayout) return;
+        mask_ |= dom::kChangeLayout | (displayed ? dom::kChangeEnteredLayout : dom::kChangeLeftLayout);
+    }
+
+    Element& element_;
+    StyleRun& run_;
+    dom::Node& parentNode_;
+    LayoutStyleRefs& style_;
+    const LayoutStyleRefs& parent_;
+    const MatchState& match_;
+    PropertySet& dirty_;
+    const bool isHtml_;
+    const bool isBody_;
+    const bool wasDisplayed_;
+    uint32_t mask_ = 0;
+    bool canShare_ = false;
+    StyleSharingTable::Key sharingKey_;
+};
+
+}  // namespace
+
+uint32_t SolveElement(Element& element, StyleRun& run) {
+    return ElementSolver(element, run).Run();
+}
+
+}  // namespace qorvex::css

@@ -1,0 +1,110 @@
+#include "css/style/selector_queries.h"
+
+#include "core/limits.h"
+#include "core/logging/log.h"
+#include "css/parser/convert.h"
+#include "css/style/selector_matching.h"
+#include "dom/document.h"
+
+namespace qorvex::css {
+
+using dom::Element;
+using dom::Node;
+
+namespace {
+
+// Visits the elements below `root` in document order until `visit` answers false. The stack holds how far the
+// walk has come in each ancestor, since nodes have no links to their siblings.
+template <class Visitor>
+void ForEachElementBelow(Node& root, Visitor&& visit) {
+    struct Level {
+        Node* node;
+        size_t next;
+    };
+    CssSmallVector<Level, 16> stack;
+    stack.push_back({&root, 0});
+    while (!stack.empty()) {
+        Level& level = stack.back();
+        const auto children = level.node->GetChildren();
+        if (level.next == children.size()) {
+            stack.pop_back();
+            continue;
+        }
+        Node& child = *children[level.next++];
+        if (child.IsElement() && !visit(static_cast<Element&>(child))) return;
+        if (child.HasChildNodes()) stack.push_back({&child, 0});
+    }
+}
+
+}  // namespace
+
+const SelectorQueries::SelectorList* SelectorQueries::Parse(std::string_view text,
+                                                            std::string_view operation) {
+    if (const SelectorList* known = cache_.get(text)) return known;
+    const ParserContextPtr context = ParseSelector(text);
+    std::optional<SelectorList> selectors = context ? ConvertSelector(*context, strings_) : std::nullopt;
+    if (!selectors) {
+        LogWarning("Invalid CSS selector (", text, ") in ", operation, "!");
+        return nullptr;
+    }
+    if (cache_.size() >= limits::kCachedQueries) cache_.clear();
+    return &cache_.insert_or_assign(CssString(text), std::move(*selectors)).first->second;
+}
+
+bool SelectorQueries::Matches(Element& element, std::string_view text) {
+    const SelectorList* selectors = Parse(text, "Matches");
+    if (!selectors) return false;
+    const PseudoState pseudo(*element.GetDocument());
+    MatchContext context(pseudo);
+    for (const ComplexSelector& selector : *selectors) {
+        if (MatchSelector(selector, element, context, false)) return true;
+    }
+    return false;
+}
+
+Element* SelectorQueries::Closest(Element& element, std::string_view text) {
+    const SelectorList* selectors = Parse(text, "Matches");
+    if (!selectors) return nullptr;
+    const PseudoState pseudo(*element.GetDocument());
+    MatchContext context(pseudo);
+    for (Node* node = element.GetParent(); node && node->IsElement() && !node->Is(dom::kIsDocument);
+         node = node->GetParent()) {
+        auto& ancestor = static_cast<Element&>(*node);
+        for (const ComplexSelector& selector : *selectors) {
+            if (MatchSelector(selector, ancestor, context, false)) return &ancestor;
+        }
+    }
+    return nullptr;
+}
+
+Element* SelectorQueries::QuerySelector(Node& root, std::string_view text) {
+    const SelectorList* selectors = Parse(text, "QuerySelector");
+    if (!selectors) return nullptr;
+    const PseudoState pseudo(*root.GetDocument());
+    MatchContext context(pseudo);
+    Element* found = nullptr;
+    for (const ComplexSelector& selector : *selectors) {
+        ForEachElementBelow(root, [&](Element& element) {
+            if (MatchSelector(selector, element, context, false)) found = &element;
+            return !found;
+        });
+        if (found) break;
+    }
+    return found;
+}
+
+void SelectorQueries::QuerySelectorAll(Node& root, std::string_view text,
+                                       Vector<Element*, MemoryTag::DOM>& matches) {
+    const SelectorList* selectors = Parse(text, "QuerySelector");
+    if (!selectors) return;
+    const PseudoState pseudo(*root.GetDocument());
+    MatchContext context(pseudo);
+    for (const ComplexSelector& selector : *selectors) {
+        ForEachElementBelow(root, [&](Element& element) {
+            if (MatchSelector(selector, element, context, false)) matches.push_back(&element);
+            return true;
+        });
+    }
+}
+
+}  // namespace qorvex::css

@@ -1,0 +1,61 @@
+// Elements whose winning declarations are the same, below parents with the same style, have the same computed
+// style. The table finds such an element among those solved in this run, and the new one takes its groups: a
+// list of a thousand equal rows costs one cascade and the memory of one style.
+//
+// Invariants, on which sharing is sound:
+// - an entry is good for one run: declarations, parents and pseudo states do not change inside it;
+// - equal slots mean equal values, since a slot points at a declaration and evaluating one depends on nothing
+// but the
+//   parent's style, the root's style and the custom properties in force, which are compared by handle;
+// - the two elements had the same style before, so that they changed in the same way: a change mask is shared
+// too.
+//   Handles seen before are compared as bare addresses. None can have been reused: the second element has
+//   held the group since before the run.
+#pragma once
+
+#include <array>
+#include <cstdint>
+
+#include "css/values/layout_style_refs.h"
+#include "css/values/match_state.h"
+
+namespace qorvex::dom {
+class Element;
+}
+
+namespace qorvex::css {
+
+class StyleSharingTable {
+  public:
+    // What identifies a style before it is solved.
+    struct Key {
+        uint64_t hash = 0;
+        std::array<const void*, 7> before = {};
+        // Set below html and body, whose groups do not tell all that their children may inherit.
+        const void* onlyBelow = nullptr;
+        friend bool operator==(const Key&, const Key&) = default;
+    };
+    struct Entry {
+        dom::Element* element = nullptr;
+        Key key;
+        uint32_t changeMask = 0;
+        uint32_t run = 0;
+    };
+
+    void BeginRun() { ++run_; }
+
+    static Key MakeKey(const dom::Element& element, const LayoutStyleRefs& parent, bool onlySiblings);
+    // An element solved before in this run whose style this one may take; null if there is none.
+    const Entry* Find(const Key& key, const dom::Element& element, const LayoutStyleRefs& parent) const;
+    void Insert(const Key& key, dom::Element& element, uint32_t changeMask) {
+        entries_[key.hash % kEntries] = {&element, key, changeMask, run_};
+    }
+
+  private:
+    // Pages have a few hundred distinct styles; a lost entry costs one more cascade.
+    static constexpr size_t kEntries = 256;
+    std::array<Entry, kEntries> entries_ = {};
+    uint32_t run_ = 0;
+};
+
+}  // namespace qorvex::css

@@ -1,0 +1,11 @@
+// The style of one text node, from its parent alone.
+#pragma once
+
+#include "css/style/style_run.h"
+
+namespace qorvex::css {
+
+// dom::ChangeMask bits of what changed.
+[[nodiscard]] uint32_t SolveTextNode(dom::Node& text, StyleRun& run);
+
+}  // namespace qorvex::css
