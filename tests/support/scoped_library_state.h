@@ -7,6 +7,7 @@
 
 #include "core/logging/logger.h"
 #include "core/memory/allocator.h"
+#include "core/memory/object_pool.h"
 #include "core/memory/thread_scope.h"
 #include "support/capturing_log_handler.h"
 #include "support/test_allocator.h"
@@ -21,6 +22,7 @@ class ScopedLibraryState {
         OpenThreadScope();
     }
     ~ScopedLibraryState() {
+        FreePoolChunks();
         CloseThreadScope();
         EndLogging();
         FreeIdleThreadRecords();

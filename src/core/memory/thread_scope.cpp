@@ -28,6 +28,13 @@ class IdleStack {
         head_ = item;
         Unlock();
     }
+    template <class Visit>
+    void ForEach(Visit&& visit) {
+        Lock();
+        for (T* item = head_; item; item = item->next_free)
+            visit(*item);
+        Unlock();
+    }
     void FreeAll() {
         Lock();
         T* item = head_;
@@ -69,6 +76,15 @@ void CloseOutermostScope() {
 }
 
 }  // namespace detail
+
+void ForgetPooledObjects() {
+    const auto forget = [](PoolCache& cache) {
+        for (PoolList& list : cache.lists)
+            list = PoolList();
+    };
+    if (t_thread_record.pools) forget(*t_thread_record.pools);
+    g_idle_pool_caches.ForEach(forget);
+}
 
 void FreeIdleThreadRecords() {
     g_idle_temp_allocators.FreeAll();

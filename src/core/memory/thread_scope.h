@@ -46,6 +46,9 @@ class ThreadScope {
     ThreadScope& operator=(const ThreadScope&) = delete;
 };
 
+/// Empties the lists of free objects of the calling thread and of all idle records.
+void ForgetPooledObjects();
+
 /// Frees the records that no thread holds; for the end of the library.
 void FreeIdleThreadRecords();
 
