@@ -340,7 +340,10 @@ void Element::AnnounceClassChange(std::optional<Atom> old_value) {
 }
 
 RefPtr<DOMTokenList> Element::GetClassList() {
-    return script::MakeHandle<DOMTokenList>(*this);
+    // One list for each element that is asked: pages that toggle classes in every frame make no objects.
+    RefPtr<DOMTokenList>& list = EnsureRareData().class_list;
+    if (!list) list = script::MakeHandle<DOMTokenList>(*this);
+    return list;
 }
 
 // --- style

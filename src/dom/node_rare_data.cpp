@@ -1,6 +1,7 @@
 #include "dom/node_rare_data.h"
 
 #include "dom/dom_string_map.h"
+#include "dom/dom_token_list.h"
 #include "dom/node_list.h"
 
 namespace qorvex::dom {

@@ -8,6 +8,7 @@
 namespace qorvex::dom {
 
 class DOMStringMap;
+class DOMTokenList;
 class NodeList;
 
 struct AttributePair {
@@ -21,6 +22,7 @@ struct NodeRareData {
 
     qsl::RefPtr<NodeList> child_nodes;
     qsl::RefPtr<DOMStringMap> dataset_map;
+    qsl::RefPtr<DOMTokenList> class_list;
     // The data- attributes, names without "data-".
     Vector<AttributePair, MemoryTag::DOM> dataset;
 };

@@ -1,0 +1,166 @@
+#include "dom/attr.h"
+#include "dom/dom_fixture.h"
+#include "dom/dom_string_map.h"
+#include "dom/dom_token_list.h"
+#include "dom/element_proxy.h"
+#include "dom/html_element.h"
+#include "dom/node_list.h"
+
+namespace qorvex::dom::test {
+
+using qsl::RefPtr;
+
+class AttributeTest : public DomTest {
+  protected:
+    static std::string List(Element& element) {
+        std::string text;
+        element.ForEachAttribute([&](std::string_view name, std::string_view value) {
+            text += std::string(name) + "=" + std::string(value) + ";";
+            return true;
+        });
+        return text;
+    }
+};
+
+TEST_F(AttributeTest, OneListOverFourStores) {
+    LoadEmpty();
+    RefPtr<Element> e = Make("div");
+    e->SetAttribute("data-Key", "1");
+    e->SetAttribute("TITLE", "t");
+    e->SetAttribute("style", "width: 10px");
+    e->SetAttribute("class", "  x\ty ");
+    e->SetAttribute("id", "i");
+    EXPECT_EQ(List(*e), "id=i;class=x y;style=width: 10px; ;title=t;data-key=1;");
+    EXPECT_EQ(e->GetAttributeCount(), 5u);
+    EXPECT_EQ(e->GetAttribute("Title")->view(), "t");
+    EXPECT_EQ(e->GetAttribute("data-KEY")->view(), "1");
+    EXPECT_FALSE(e->GetAttribute("absent"));
+    for (const char* name : {"id", "class", "style", "title", "data-key"})
+        e->RemoveAttribute(name);
+    EXPECT_FALSE(e->HasAttributes());
+    EXPECT_FALSE(e->Is(kHasId | kHasClasses));
+}
+
+TEST_F(AttributeTest, AnEmptyIdIsNone) {
+    Load("<p id=a></p>");
+    Element& p = Find("a");
+    p.SetAttribute("id", "");
+    EXPECT_FALSE(p.Is(kHasId));
+    EXPECT_FALSE(p.GetAttribute("id"));
+    EXPECT_EQ(document_->GetElementById("a"), nullptr);
+}
+
+TEST_F(AttributeTest, AttrObjectsAreFreshAndWriteThrough) {
+    Load("<p id=a title=t></p>");
+    RefPtr<Element> p(&Find("a"));
+    RefPtr<NamedNodeMap> map = p->GetAttributes();
+    ASSERT_EQ(map->GetLength(), 2u);
+    RefPtr<Attr> title(map->GetItem(1));
+    EXPECT_NE(p->GetAttributes()->GetItem(1), title.get());
+    title->SetValue("new");
+    EXPECT_EQ(p->GetAttribute("title")->view(), "new");
+    p->SetAttribute("title", "newer");
+    EXPECT_EQ(title->GetValue(), "newer");
+    Body().RemoveChild(p.get());
+    p = nullptr;
+    EXPECT_EQ(title->GetOwnerElement(), nullptr);
+    EXPECT_EQ(title->GetValue(), "newer");
+}
+
+TEST_F(AttributeTest, TokenListEditsTheClasses) {
+    Load("<p id=a class='x y'></p>");
+    Element& p = Find("a");
+    RefPtr<DOMTokenList> list = p.GetClassList();
+    EXPECT_EQ(p.GetClassList().get(), list.get());
+    list->Add("z");
+    list->Add("x");
+    EXPECT_TRUE(list->Replace("y", "w"));
+    EXPECT_FALSE(list->Replace("absent", "w"));
+    EXPECT_FALSE(list->Toggle("z"));
+    EXPECT_TRUE(list->Toggle("v", true));
+    EXPECT_EQ(list->GetValue().view(), "x w v");
+    list->Add("with space");
+    list->Remove("");
+    EXPECT_EQ(log_.Count("Invalid class name: "), 2u);
+    EXPECT_EQ(list->GetItem(9).view(), "");
+    list->Remove("x"), list->Remove("w"), list->Remove("v");
+    EXPECT_FALSE(p.HasAttribute("class"));
+}
+
+TEST_F(AttributeTest, DatasetKeysAreCamelCase) {
+    Load("<p id=a data-foo-bar=1></p>");
+    auto& p = static_cast<HTMLElement&>(Find("a"));
+    RefPtr<DOMStringMap> map = p.GetDatasetMap();
+    EXPECT_EQ(map.get(), p.GetDatasetMap().get());
+    EXPECT_EQ(map->GetKey(0).view(), "fooBar");
+    EXPECT_TRUE(map->Set("bazQux", "2"));
+    EXPECT_EQ(p.GetAttribute("data-baz-qux")->view(), "2");
+    EXPECT_FALSE(map->Set("a-b", "x"));
+    EXPECT_FALSE(map->Set("a b", "x"));
+    EXPECT_TRUE(map->Delete("fooBar"));
+    EXPECT_FALSE(map->Delete("fooBar"));
+    EXPECT_EQ(map->GetLength(), 1u);
+}
+
+TEST_F(AttributeTest, MarksOnlyWhatSelectorsLookAt) {
+    Load("<p id=a></p><p id=b></p>");
+    document_->SolveStyles();
+    Element& a = Find("a");
+    a.SetAttribute("title", "x");
+    a.SetAttribute("data-other", "x");
+    EXPECT_TRUE(document_->GetSelectorDirtyElements().empty());
+    a.SetAttribute("watched", "x");
+    EXPECT_TRUE(document_->GetSelectorDirtyElements().contains(&a));
+    document_->SolveStyles();
+    a.SetAttribute("data-watched", "x");
+    EXPECT_EQ(document_->GetStyleDirtyNodes().size(), 1u);
+}
+
+TEST_F(AttributeTest, CombinatorsDirtySubtreesAndLaterSiblings) {
+    Load("<div id=a><p id=a1></p></div><div id=b><p id=b1></p></div><div id=c></div>");
+    document_->SolveStyles();
+    const auto dirty = [&] {
+        std::string ids;
+        document_->ForEachElement([&](Element& element) {
+            if (document_->GetSelectorDirtyElements().contains(&element))
+                ids += std::string(element.GetId().view());
+        });
+        document_->SolveStyles();
+        return ids;
+    };
+    Find("b").AddClass("1");
+    EXPECT_EQ(dirty(), "b");
+    style_->subtree_rules = 1;
+    Find("a").AddClass("1");
+    EXPECT_EQ(dirty(), "aa1");
+    style_->sibling_rules = 1;
+    Find("b").AddClass("2");
+    EXPECT_EQ(dirty(), "bb1c");
+    // A subtree that arrives is dirty as a whole, one that leaves not at all.
+    RefPtr<Node> b(&Find("b"));
+    Body().RemoveChild(b.get());
+    EXPECT_EQ(document_->GetSelectorDirtyElements().contains(b.get()), false);
+    document_->SolveStyles();
+    style_->subtree_rules = style_->sibling_rules = 0;
+    Body().AppendChild(b);
+    EXPECT_EQ(dirty(), "bb1");
+}
+
+TEST_F(AttributeTest, TheClientsProxyCutsTextsToItsBuffers) {
+    Load("<p id=a class='x y' title=long-text data-k=v>text</p>");
+    const ElementProxy proxy(Find("a"));
+    char buffer[5] = {};
+    EXPECT_EQ(proxy.GetAttribute("title", buffer, sizeof buffer), 9u);
+    EXPECT_STREQ(buffer, "long");
+    EXPECT_EQ(proxy.GetAttributeAt(3, buffer, sizeof buffer), 1u);
+    EXPECT_STREQ(buffer, "v");
+    EXPECT_EQ(proxy.GetAttributeAt(4, buffer, sizeof buffer), 0u);
+    EXPECT_STREQ(buffer, "");
+    EXPECT_EQ(proxy.GetTextContent(nullptr, 0), 4u);
+    EXPECT_STREQ(proxy.GetTag(), "P");
+    EXPECT_STREQ(proxy.GetClass(1), "y");
+    EXPECT_STREQ(proxy.GetClass(2), "");
+    EXPECT_EQ(proxy.GetAttributeCount(), 4u);
+}
+
+}  // namespace qorvex::dom::test
