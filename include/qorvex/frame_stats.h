@@ -11,8 +11,8 @@ class View;
 // An id of this project's own, beyond those that the engine family shares.
 constexpr unsigned kFrameStatsFeature = 0x51000001u;
 
-// A switch for LibraryParams::AdditionalOptions: counts allocations for each thread, at the price of one more call
-// for each of them.
+// A switch for LibraryParams::AdditionalOptions: counts allocations for each thread, at the price of one more
+// call for each of them.
 constexpr const char* kCountAllocationsOption = "--count-allocations";
 
 // Stages of a frame in thread CPU milliseconds. Advance is the whole main-thread call; the sum of Script,

@@ -1,0 +1,69 @@
+#include "core/frame/frame_queue.h"
+
+#include "core/logging/log.h"
+
+namespace qorvex {
+
+void FrameQueue::RegisterFrame(uint32_t id) {
+    LogTrace("Registering frame for painting ", id);
+    RenderFramePtr dropped;  // dies after the lock
+    std::lock_guard<std::mutex> lock(mutex_);
+    // A client that never paints (a server, a minimised window) must not grow the queue for ever: the oldest
+    // frame goes, and a later Paint of it finds it missing.
+    if (entries_.size() >= limits::kMaxWaitingFrames) {
+        dropped = std::move(entries_[0].frame);
+        entries_.erase(entries_.begin());
+    }
+    entries_.push_back(Entry{id, nullptr});
+}
+
+void FrameQueue::SetFrame(uint32_t id, const RenderFramePtr& frame) {
+    LogTrace("Setting frame for painting ", id);
+    std::lock_guard<std::mutex> lock(mutex_);
+    const size_t index = IndexOf(id);
+    if (index < entries_.size()) entries_[index].frame = frame;
+}
+
+void FrameQueue::ClearFrames() {
+    LogTrace("Clearing frames for painting");
+    Vector<Entry, MemoryTag::Rendering> dropped;  // frames die after the lock
+    dropped.reserve(limits::kMaxWaitingFrames);
+    std::lock_guard<std::mutex> lock(mutex_);
+    dropped.swap(entries_);
+}
+
+bool FrameQueue::Find(uint32_t id, RenderFramePtr* frame) const {
+    std::lock_guard<std::mutex> lock(mutex_);
+    const size_t index = IndexOf(id);
+    if (index >= entries_.size()) return false;
+    *frame = entries_[index].frame;
+    return true;
+}
+
+void FrameQueue::Remove(uint32_t id) {
+    RenderFramePtr dropped;
+    std::lock_guard<std::mutex> lock(mutex_);
+    const size_t index = IndexOf(id);
+    if (index >= entries_.size()) return;
+    dropped = std::move(entries_[index].frame);
+    entries_.erase(entries_.begin() + index);
+}
+
+void FrameQueue::DiscardAll() {
+    std::lock_guard<std::mutex> lock(mutex_);
+    for (Entry& entry : entries_) {
+        LogDebug("Trying to discard frame ", entry.id);
+        if (!entry.frame) continue;
+        entry.frame->Discard();
+        LogTrace("Discarded frame ", entry.id);
+    }
+}
+
+size_t FrameQueue::IndexOf(uint32_t id) const {
+    size_t index = 0;
+    while (index < entries_.size() && entries_[index].id != id)
+        ++index;
+    return index;
+}
+
+}  // namespace qorvex

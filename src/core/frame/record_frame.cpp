@@ -1,0 +1,94 @@
+// From the laid-out tree to the render thread: the tasks that go into a frame on the layout side.
+#include "core/frame/frame_capture_impl.h"
+#include "core/frame/frame_data.h"
+#include "core/logging/log.h"
+
+namespace qorvex {
+
+namespace {
+
+// Recorded commands on their way through the render thread. Whatever happens to the task that holds it, the
+// buffers go back to the rendering library with it.
+using SharedRecord = RefPtr<struct HeldRecord>;
+struct HeldRecord : AtomicRefCounted<HeldRecord, MemoryTag::Rendering> {
+    explicit HeldRecord(dsp::FrameRecord&& taken) : record(std::move(taken)) {}
+    dsp::FrameRecord record;
+};
+
+double PaintedArea(const dsp::FrameRecord& record) {
+    double area = 0;
+    for (const layout::Rect& rect : record.dirtyRects)
+        area += static_cast<double>(rect.width) * static_cast<double>(rect.height);
+    return area;
+}
+
+void ExecutePaint(HeldRecord& held, fresco::IScene& scene, FrameStatsRecorder& stats, uint32_t frame_id) {
+    StageTimer timer(stats, frame_id, &FrameStats::Paint);
+    dsp::FrameRecord& record = held.record;
+    if (record.buffers.empty() && record.resourceBuffers.empty()) {
+        AssertFailure("Missing command buffer for paint!");
+        return;
+    }
+    LogTrace("Execute Process FE Commands");
+    if (!record.resourceBuffers.empty())
+        scene.ExecuteFrontEnd(record.resourceBuffers.data(),
+                              static_cast<uint32_t>(record.resourceBuffers.size()));
+    LogTrace("Execute Paint");
+    if (!record.buffers.empty())
+        scene.ExecuteBackEnd(record.buffers.data(), static_cast<uint32_t>(record.buffers.size()));
+    scene.FreeSurfaces(record.surfacesToFree.data(), static_cast<uint32_t>(record.surfacesToFree.size()));
+    scene.FreeImages(record.imagesToFree.data(), static_cast<uint32_t>(record.imagesToFree.size()));
+    const auto pixels = static_cast<uint64_t>(PaintedArea(record));
+    stats.Update(frame_id, [&](FrameStats& frame) { frame.PaintedPixels += pixels; });
+}
+
+TaskPtr MakeCaptureTask(const FrameData& frame, const SharedRecord& held) {
+    return MakeTask("CaptureFrame", [held, scene = frame.scene, callback = frame.capture_callback,
+                                     user_data = frame.capture_user_data](TaskFamilyHandle family) {
+        // The record's own resource buffers come first, so that the capture starts from what the frame starts
+        // from.
+        Vector<fresco::CommandBuffer*, MemoryTag::Rendering> buffers;
+        for (auto* buffer : held->record.resourceBuffers)
+            buffers.push_back(buffer);
+        for (auto* buffer : held->record.buffers)
+            buffers.push_back(buffer);
+        const fresco::CaptureData data =
+            scene->SerializeBuffers(buffers.data(), static_cast<uint32_t>(buffers.size()));
+        if (!data.data) return;
+        auto capture = MakeRef<FrameCaptureImpl>(data.data, data.size);
+        scene->FreeCapture(data);
+        family.Push(TaskChannels::Main,
+                    MakeTask("CaptureFrameCallback", [capture, callback, user_data](TaskFamilyHandle) {
+                        callback(user_data, *capture);
+                    }));
+    });
+}
+
+}  // namespace
+
+layout::LayoutPass FrameData::MakePass() {
+    return layout::LayoutPass{
+        *update, root.get(), width, height, dirty, flex_algorithm, disable_flex_basis_units, snap_to_pixels};
+}
+
+void RecordFrame(FrameData& frame) {
+    layout::LayoutPass pass = frame.MakePass();
+    dsp::RecordRequest request{.caches = *frame.caches,
+                               .scaleX = frame.scale_x,
+                               .scaleY = frame.scale_y,
+                               .showPaintRectangles = frame.show_paint_rectangles,
+                               .record = frame.should_record,
+                               .frameNumber = frame.frame_id,
+                               .resourceBuffers = {}};
+    dsp::FrameRecord record = dsp::RecordRendering(pass, std::move(request));
+    if (!record.Empty()) {
+        SharedRecord held = MakeRef<HeldRecord>(std::move(record));
+        RenderFrame& target = *frame.render_frame;
+        if (frame.capture_callback) target.Push(MakeCaptureTask(frame, held));
+        target.Push(MakeTask("Paint", [held, scene = frame.scene, stats = frame.stats, id = frame.frame_id](
+                                          TaskFamilyHandle) { ExecutePaint(*held, *scene, *stats, id); }));
+    }
+    frame.render_frame->PushClose();
+}
+
+}  // namespace qorvex

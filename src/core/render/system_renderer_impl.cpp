@@ -1,0 +1,44 @@
+#include "core/render/system_renderer_impl.h"
+
+#include <fresco/rendering_library.h>
+
+#include "core/logging/log.h"
+#include "core/memory/thread_scope.h"
+#include "core/render/view_renderer_impl.h"
+#include "core/view_impl.h"
+
+namespace qorvex {
+
+ViewRenderer* SystemRendererImpl::CreateViewRenderer(View* view) {
+    ThreadScope scope;
+    // A rendering library may refuse a scene; such a view cannot be drawn.
+    if (!view || !static_cast<ViewImpl&>(*view).GetScene()) return nullptr;
+    return New<ViewRendererImpl, MemoryTag::General>(static_cast<ViewImpl&>(*view));
+}
+
+void SystemRendererImpl::Destroy() {
+    ThreadScope scope;
+    Delete<MemoryTag::General>(this);
+}
+
+void SystemRendererImpl::RegisterRenderThread(void* device, void* context, uint64_t flags) {
+    if (external_rendering_library_) {
+        LogError("RegisterRenderThread cannot be used when using external RenderingLibrary!");
+        return;
+    }
+    rendering_.RegisterRenderThread(device, context, flags);
+}
+
+void SystemRendererImpl::FreeRenderingResources() {
+    if (external_rendering_library_) {
+        LogError("FreeRenderingResources cannot be used when using external RenderingLibrary!");
+        return;
+    }
+    rendering_.FreeRenderingResources();
+    LogDebug(
+        "SystemRenderer::FreeRenderingResources should be called along ViewRenderer::FreeRenderingResources "
+        "to "
+        "free all resources. Make sure to call ViewRenderer's counterpart to free all resources.");
+}
+
+}  // namespace qorvex

@@ -1,0 +1,31 @@
+// The render thread's end of a system. Render thread only.
+#pragma once
+
+#include <qorvex/renderers.h>
+
+#include "core/memory/containers.h"
+
+namespace fresco {
+class IRenderingLibrary;
+}
+
+namespace qorvex {
+
+class SystemRendererImpl final : public SystemRenderer {
+  public:
+    SystemRendererImpl(fresco::IRenderingLibrary& rendering, bool debug_names, bool external)
+        : debug_names_(debug_names), rendering_(rendering), external_rendering_library_(external) {}
+    ~SystemRendererImpl() override = default;
+
+    ViewRenderer* CreateViewRenderer(View* view) override;
+    void Destroy() override;
+    void RegisterRenderThread(void* device, void* context, uint64_t flags) override;
+    void FreeRenderingResources() override;
+
+  private:
+    bool debug_names_;
+    fresco::IRenderingLibrary& rendering_;
+    bool external_rendering_library_;
+};
+
+}  // namespace qorvex

@@ -1,0 +1,79 @@
+// Caches of a system as the client manages them.
+#include "core/logging/log.h"
+#include "core/memory/thread_scope.h"
+#include "core/system_impl.h"
+#include "core/unavailable.h"
+
+namespace qorvex {
+
+namespace {
+
+enum class Need { Valid, ValidAndAbsolute };
+
+// The URL of a cache operation; empty, with an Error line, when it will not do.
+URL ParseCacheURL(const char* text, Need need, const char* error) {
+    URL url;
+    url.Parse(text ? text : "");
+    if (!url.IsEmpty() && (need == Need::Valid || !url.IsRelative())) return url;
+    LogError(error, text ? text : "");
+    return URL();
+}
+
+}  // namespace
+
+void SystemImpl::PreloadAndCacheHTML(const char* url) {
+    ThreadScope scope;
+    const URL parsed =
+        ParseCacheURL(url, Need::ValidAndAbsolute, "PreloadAndCacheHTML expects a valid and absolute URL: ");
+    if (!parsed.IsEmpty()) html_cache_.Preload(parsed);
+}
+
+bool SystemImpl::RemoveHTMLCacheEntry(const char* url) {
+    ThreadScope scope;
+    const URL parsed =
+        ParseCacheURL(url, Need::ValidAndAbsolute, "RemoveHTMLCacheEntry expects a valid and absolute URL: ");
+    return !parsed.IsEmpty() && html_cache_.Remove(parsed);
+}
+
+void SystemImpl::ClearHTMLCache() {
+    ThreadScope scope;
+    html_cache_.Clear();
+}
+
+void SystemImpl::PreloadAndCacheStylesheet(const char* url) {
+    ThreadScope scope;
+    const URL parsed =
+        ParseCacheURL(url, Need::Valid, "PreloadAndCacheStylesheet invoked with invalid URL: ");
+    if (!parsed.IsEmpty()) stylesheet_cache_.Load(parsed);
+}
+
+bool SystemImpl::RemoveStylesheetCacheEntry(const char* url) {
+    ThreadScope scope;
+    URL parsed;
+    parsed.Parse(url ? url : "");
+    return !parsed.IsEmpty() && stylesheet_cache_.Remove(parsed);
+}
+
+void SystemImpl::ClearStylesheetCache() {
+    ThreadScope scope;
+    stylesheet_cache_.Clear();
+}
+
+// Images come with a later build, and with them what there is to count and to prune.
+SystemCacheStats* SystemImpl::CreateCacheStats() {
+    ThreadScope scope;
+    LogUnavailable("System::CreateCacheStats");
+    return nullptr;
+}
+
+void SystemImpl::PruneOrphanedResources() {
+    ThreadScope scope;
+    LogUnavailable("System::PruneOrphanedResources");
+}
+
+void SystemImpl::UserImagesChanged(const unsigned*, unsigned) {
+    ThreadScope scope;
+    LogUnavailable("System::UserImagesChanged");
+}
+
+}  // namespace qorvex

@@ -1,0 +1,64 @@
+#include "resources/resource_stream_request_job.h"
+
+#include <qorvex/file_system.h>
+
+#include "core/logging/log.h"
+#include "core/memory/thread_scope.h"
+#include "resources/resource_context.h"
+
+namespace qorvex {
+
+namespace {
+constexpr uint32_t kStreamRequestId = 0xFFFFFFFFu;
+}
+
+ResourceStreamRequestJob::ResourceStreamRequestJob(ResourceContext& context,
+                                                   const ResourceRequestDescription& description,
+                                                   Callback on_finished)
+    : AsyncResourceRequest(description, kStreamRequestId),
+      context_(&context),
+      on_finished_(std::move(on_finished)) {
+    context_->CountOpenRequest();
+}
+
+ResourceStreamRequestJob::~ResourceStreamRequestJob() {
+    Discount();
+}
+
+void ResourceStreamRequestJob::Discount() {
+    if (counted_.exchange(false)) context_->DiscountOpenRequest();
+}
+
+void ResourceStreamRequestJob::Dispatch() {
+    LogDebug("Trying to load resource stream ", GetAbsoluteURL());
+    AddRef();  // the client's, until Finish
+    if (IAsyncResourceHandler* handler = context_->GetHandler())
+        handler->OnResourceStreamRequest(this, this);
+    else
+        Finish(Status::Failure);
+}
+
+void ResourceStreamRequestJob::Finish(Status status) {
+    ThreadScope scope;
+    if (finished_.exchange(true)) {
+        LogWarning("ResourceRequestJob | Finished more than once: ", GetAbsoluteURL());
+        return;
+    }
+    ISyncStreamReader* reader = std::exchange(reader_, nullptr);
+    if (reader && status != Status::Success) {
+        reader->Close();
+        reader = nullptr;
+    }
+    const bool taken = static_cast<bool>(on_finished_);
+    on_finished_(reader);
+    if (reader && !taken) reader->Close();
+    if (status == Status::Success)
+        LogDebug("ResourceRequestJob | Loaded resource stream: ", GetAbsoluteURL());
+    else
+        LogWarning("ResourceRequestJob | Failed loading resource stream: ", GetAbsoluteURL());
+    on_finished_ = nullptr;
+    Discount();
+    Release();
+}
+
+}  // namespace qorvex

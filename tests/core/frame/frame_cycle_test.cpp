@@ -1,0 +1,152 @@
+// The frame cycle from a page to pixels. For the order of things the log is the witness.
+#include <gtest/gtest.h>
+
+#include "core/frame/client.h"
+
+namespace {
+
+using client::Client;
+using client::Options;
+
+constexpr const char* kPage =
+    "<html><head><style>body{margin:0;background-color:#ff0000}"
+    "#box{position:absolute;left:8px;top:8px;width:16px;height:16px;background-color:#0000ff}</style></head>"
+    "<body><div id=\"box\"></div></body></html>";
+
+constexpr uint32_t kRed = 0x0000ff;  // as the pixel's three low bytes: r, g, b from low to high
+constexpr uint32_t kBlue = 0xff0000;
+constexpr uint32_t kGreen = 0x00ff00;
+
+TEST(FrameCycle, PageBecomesPixels) {
+    Client client;
+    client.Load(kPage);
+    EXPECT_EQ(client.Pixel(2, 2), kRed);
+    EXPECT_EQ(client.Pixel(12, 12), kBlue);
+    EXPECT_EQ(client.Pixel(40, 40), kRed);
+    const std::vector<std::string> expected = {"navigate coui://page/index.html", "context", "built",
+                                               "loaded coui://page/index.html"};
+    EXPECT_EQ(client.listener.events, expected);
+    EXPECT_EQ(client.log.Lines(qorvex::Logging::Error), std::vector<std::string>());
+}
+
+TEST(FrameCycle, TaskGraphRunsInItsOrder) {
+    Client client;
+    client.files.Put("coui://page/index.html", kPage);
+    client.view->LoadURL("coui://page/index.html");
+    client.log.Clear();
+    client.RunUntilLoaded();
+    const std::vector<std::string> names = {
+        "Executing task Layout",          "Executing task RecalculateVisualStyle",
+        "Executing task RecordRendering", "Executing task SignalFrameCompletion",
+        "Executing task SyncTrees",       "Executing task UnblockLayout"};
+    std::vector<std::string> ran = client.log.Matching(names);
+    ASSERT_GE(ran.size(), names.size());
+    ran.resize(names.size());
+    EXPECT_EQ(ran, names);
+}
+
+TEST(FrameCycle, IdleFramesCostNothing) {
+    Options options;
+    options.severity = qorvex::Logging::Info;
+    Client client(options);
+    client.Load(kPage);
+    for (int i = 0; i < 3; ++i)
+        client.Frame();
+    const size_t completed = client.completed.size();
+    const uint64_t requests = client.allocator.requests();
+    client.view->Advance(client.time += 16);
+    client.view->Advance(client.time += 16);
+    EXPECT_EQ(client.completed.size(), completed + 2) << "each Advance completes its frame";
+    EXPECT_EQ(client.allocator.requests(), requests) << "an idle Advance allocates nothing";
+    EXPECT_EQ(client.renderer->Paint(client.last_frame, false), qorvex::PaintStatus::Complete);
+    EXPECT_EQ(client.renderer->Paint(client.last_frame, false), qorvex::PaintStatus::FrameMissing);
+    EXPECT_EQ(client.renderer->Paint(client.last_frame + 1, false), qorvex::PaintStatus::Complete);
+    client.last_frame += 2;
+}
+
+TEST(FrameCycle, AdvanceWithoutDocumentCountsFrames) {
+    Client client;
+    client.Frame();
+    client.Frame();
+    EXPECT_EQ(client.completed, (std::vector<uint32_t>{0, 1}));
+}
+
+TEST(FrameCycle, ScriptChangesReachTheNextPixels) {
+    Client client;
+    client.Load(kPage);
+    client.view->ExecuteScript("document.getElementById('box').style.backgroundColor = '#00ff00'");
+    client.Frame();
+    client.Frame();
+    EXPECT_EQ(client.Pixel(12, 12), kGreen);
+    EXPECT_EQ(client.Pixel(2, 2), kRed);
+}
+
+TEST(FrameCycle, AllThreadModesGiveTheSamePixels) {
+    std::vector<std::vector<uint32_t>> pictures;
+    for (int mode = 0; mode < 3; ++mode) {
+        Options options;
+        options.dedicated_layout = mode > 0;
+        options.layout_threads = mode > 0 ? 1 : 0;
+        options.resource_threads = mode == 2 ? 3 : 0;
+        options.requests_on_workers = mode == 2;
+        Client client(options);
+        client.Load(kPage);
+        client.view->ExecuteScript("document.getElementById('box').style.left = '20px'");
+        for (int i = 0; i < 4; ++i)
+            client.Frame();
+        pictures.push_back(client.pixels);
+        EXPECT_EQ(client.Pixel(22, 12), kBlue) << "mode " << mode;
+    }
+    EXPECT_EQ(pictures[0], pictures[1]);
+    EXPECT_EQ(pictures[0], pictures[2]);
+}
+
+TEST(FrameCycle, TimeGoingBackIsReportedAndIgnored) {
+    Client client;
+    client.view->Advance(100);
+    client.view->Advance(200);
+    client.view->Advance(150);  // below the last one only: time goes back without a word
+    EXPECT_EQ(client.log.Count("Time given to Advance is less"), 0u);
+    client.view->Advance(100);
+    EXPECT_TRUE(client.log.Contains(
+        "Time given to Advance is less than last advance time, last advance time: 200 / time given: 100"));
+}
+
+TEST(FrameCycle, FreedRenderingResourcesRedrawTheWholeView) {
+    Client client;
+    client.Load(kPage);
+    client.renderer->FreeRenderingResources();
+    std::fill(client.pixels.begin(), client.pixels.end(), 0);
+    client.Frame();
+    client.Frame();
+    EXPECT_TRUE(client.log.Contains("Rendering resources reset detected. Next valid frame id "));
+    EXPECT_EQ(client.Pixel(40, 40), kRed);
+    EXPECT_EQ(client.Pixel(12, 12), kBlue);
+}
+
+TEST(FrameCycle, CaptureHandsOutTheFrame) {
+    Client client;
+    client.Load(kPage);
+    size_t size = 0;
+    client.view->CaptureNextFrame(
+        [](void* user, const qorvex::FrameCapture& capture) {
+            *static_cast<size_t*>(user) = capture.GetSize();
+        },
+        &size);
+    client.Frame();
+    client.Frame();
+    EXPECT_GT(size, 0u);
+}
+
+TEST(FrameCycle, PaintOfADiscardedFrameDrawsNothing) {
+    Client client;
+    client.Load(kPage);
+    client.view->ContinuousRepaint(true);
+    client.view->Advance(client.time += 16);
+    const uint32_t frame = client.last_frame++;
+    client.renderer->FreeRenderingResources();
+    EXPECT_EQ(client.renderer->Paint(frame, true), qorvex::PaintStatus::NothingExecuted);
+    EXPECT_EQ(client.renderer->Paint(frame, true), qorvex::PaintStatus::FrameMissing);
+}
+
+}  // namespace

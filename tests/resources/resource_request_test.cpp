@@ -1,0 +1,114 @@
+// The objects that a client's resource handler sees.
+#include "resources/resource_test_support.h"
+
+namespace qorvex {
+namespace {
+
+using Status = IAsyncResourceResponse::Status;
+
+class ResourceRequestTest : public ResourceTest {
+  protected:
+    // A request that waits for the test's answer.
+    client::Files::Waiting Request(const char* url, bool binary = false) {
+        files.SetDeferred(true);
+        TaskPtr task = context->MakeResourceRequest(
+            DescribeGet(MakeURL(url)),
+            [this](ResourceRequestJob& job) { finished.push_back(job.GetStatus()); },
+            [this](ResourceRequestJob&) { ++progress; }, binary, nullptr);
+        client::Files::Waiting entry = files.waiting.back();
+        files.waiting.pop_back();
+        return entry;
+    }
+    std::vector<Status> finished;
+    int progress = 0;
+};
+
+TEST_F(ResourceRequestTest, MappingChangesTheURLAndOffersAlternatives) {
+    const char* targets[] = {"dds", "ktx", "png"};
+    ResourceMapping mapping;
+    mapping.Name = "PNG";
+    mapping.Targets = targets;
+    mapping.TargetCount = 3;
+    context->GetMappings().Add(mapping);
+    context->SetBaseURL(MakeURL("coui://ui/index.html"));
+    auto entry = Request("images/hero.png");
+    EXPECT_EQ(entry.url, "coui://ui/images/hero.dds");
+    auto* job = static_cast<ResourceRequestJob*>(entry.response);
+    const auto alternatives = job->GetAlternativeURLs();
+    ASSERT_EQ(alternatives.Count, 2u);
+    EXPECT_STREQ(alternatives.URLs[0], "coui://ui/images/hero.ktx");
+    EXPECT_STREQ(alternatives.URLs[1], "coui://ui/images/hero.png");
+    job->Finish(Status::Success);
+    auto plain = Request("coui://ui/a.txt");
+    EXPECT_EQ(static_cast<ResourceRequestJob*>(plain.response)->GetAlternativeURLs().Count, 0u);
+    plain.response->Finish(Status::Success);
+}
+
+TEST_F(ResourceRequestTest, SpaceGrowsShrinksAndEndsWithAZeroForText) {
+    auto entry = Request("coui://a/b.txt");
+    auto* space = static_cast<char*>(entry.response->GetSpace(3));
+    std::memcpy(space, "abc", 3);
+    space = static_cast<char*>(entry.response->GetSpace(6));
+    std::memcpy(space + 3, "def", 3);
+    space = static_cast<char*>(entry.response->GetSpace(4));
+    EXPECT_STREQ(space, "abcd");
+    entry.response->SignalDataReceived();
+    EXPECT_EQ(progress, 1);
+    auto* job = static_cast<ResourceRequestJob*>(entry.response);
+    EXPECT_EQ(job->GetData().size(), 4u);
+    UserImageData image;
+    entry.response->RecieveUserImage(image);
+    EXPECT_TRUE(log.Contains("GetSpace already called."));
+    entry.response->Finish(Status::Success);
+
+    auto binary = Request("coui://a/b.bin", true);
+    EXPECT_NE(binary.response->GetSpace(8), nullptr);
+    EXPECT_EQ(binary.response->GetSpace(0), nullptr);
+    binary.response->Finish(Status::Success);
+
+    auto user = Request("coui://a/c.png", true);
+    user.response->RecieveUserImage(image);
+    EXPECT_EQ(user.response->GetSpace(8), nullptr);
+    EXPECT_TRUE(log.Contains("RecieveUserImage already called."));
+    user.response->Finish(Status::Success);
+}
+
+TEST_F(ResourceRequestTest, FinishActsOnceAndCountsTheOpenRequest) {
+    auto entry = Request("coui://a/b.txt");
+    EXPECT_EQ(context->GetOpenRequests(), 1u);
+    ResourceJobPtr held(static_cast<ResourceRequestJob*>(entry.response));
+    entry.response->Finish(Status::Failure);
+    entry.response->Finish(Status::Success);
+    EXPECT_EQ(finished, std::vector<Status>{Status::Failure});
+    EXPECT_EQ(context->GetOpenRequests(), 0u);
+    EXPECT_TRUE(log.Contains("ResourceRequestJob | Failed loading resource: coui://a/b.txt"));
+    EXPECT_FALSE(log.Contains("ResourceRequestJob | Loaded resource"));
+}
+
+TEST_F(ResourceRequestTest, RequestAnswersAsItWasDescribed) {
+    ResourceRequestDescription description = DescribeGet(MakeURL("coui://a/b"));
+    using Text = ResourceRequestDescription::Text;
+    description.method = RequestMethod::Patch;
+    description.body = Text("body");
+    description.headers.push_back({Text("A"), Text("1")});
+    description.headers.push_back({Text("a"), Text("2")});
+    description.headers.push_back({Text("A"), Text("3")});
+    const AsyncResourceRequest request(description, 7);
+    EXPECT_STREQ(request.GetMethod(), "PATCH");
+    EXPECT_STREQ(request.GetHeaderValue("A"), "1");
+    EXPECT_STREQ(request.GetHeaderValue("a"), "2");
+    EXPECT_EQ(request.GetHeaderValue("b"), nullptr);
+    EXPECT_EQ(request.GetHeaderNameAt(3), nullptr);
+    EXPECT_EQ(request.GetUser(), nullptr);
+    EXPECT_EQ(request.GetBodySize(), 4u);
+}
+
+TEST_F(ResourceRequestTest, RelativeURLWithoutABaseGoesOutAsItIs) {
+    auto entry = Request("page.html");
+    EXPECT_TRUE(log.Contains("Unable to generate absolute URL for resource load!"));
+    EXPECT_EQ(entry.url, "page.html");
+    entry.response->Finish(Status::Failure);
+}
+
+}  // namespace
+}  // namespace qorvex
