@@ -3,9 +3,13 @@
 include(GNUInstallDirs)
 include(CMakePackageConfigHelpers)
 
-set_target_properties(qorvex-player fresco-replay PROPERTIES INSTALL_RPATH "$ORIGIN/../${CMAKE_INSTALL_LIBDIR}")
+set(_programs qorvex-player)
+if(TARGET fresco-replay)
+    list(APPEND _programs fresco-replay)
+endif()
+set_target_properties(${_programs} PROPERTIES INSTALL_RPATH "$ORIGIN/../${CMAKE_INSTALL_LIBDIR}")
 install(TARGETS qorvex EXPORT qorvex-targets LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR})
-install(TARGETS qorvex-player fresco-replay RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
+install(TARGETS ${_programs} RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
 install(DIRECTORY include/qorvex fresco/include/fresco DESTINATION ${CMAKE_INSTALL_INCLUDEDIR} FILES_MATCHING
         PATTERN "*.h")
 install(DIRECTORY host DESTINATION ${CMAKE_INSTALL_DATADIR}/qorvex FILES_MATCHING PATTERN "*.h" PATTERN "*.cpp")
