@@ -1,0 +1,28 @@
+#pragma once
+
+#include <qorvex/file_system.h>
+
+#include <cstdio>
+#include <filesystem>
+
+namespace qorvex::host {
+
+// A file read piece by piece. Close ends it.
+class FileStreamReader final : public ISyncStreamReader {
+  public:
+    // Null when the file cannot be opened.
+    [[nodiscard]] static FileStreamReader* Open(const std::filesystem::path& path);
+
+    std::size_t GetSize() override { return size_; }
+    std::size_t Read(std::size_t offset, void* destination, std::size_t size) override;
+    void Close() override { delete this; }
+
+  private:
+    FileStreamReader(std::FILE* file, std::size_t size) : file_(file), size_(size) {}
+    ~FileStreamReader() override { std::fclose(file_); }
+
+    std::FILE* file_;
+    std::size_t size_;
+};
+
+}  // namespace qorvex::host
