@@ -29,6 +29,8 @@ void DirtyRegion::Add(const Rect& area) {
         bounds_ = rect;
         return;
     }
+    // Frames that repaint everything add thousands of rectangles to one that holds them all.
+    if (Contains(rects_[count_ - 1], rect)) return;
     bounds_ = Union(bounds_, rect);
     for (uint32_t i = 0; i < count_; ++i) {
         if (!Intersects(rects_[i], rect)) continue;

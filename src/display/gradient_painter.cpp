@@ -77,8 +77,7 @@ class GradientFill {
         if (gradient.IsRepeating()) NormaliseRepeat(stops_, from, to);
         const uint32_t spread = gradient.IsRepeating() ? fresco::kSpreadRepeat : fresco::kSpreadPad;
         if (radial_) {
-            // Circles repeat from the centre; a first stop away from it moves the pattern, which the stops
-            // carry.
+            ShiftStops(from / (to - from));
             radialGeometry_ = {layer.start, {layer.end.x * (to - from), layer.end.y * (to - from)}, spread};
             return;
         }
@@ -87,6 +86,17 @@ class GradientFill {
                          layer.start.y + (layer.end.y - layer.start.y) * t};
         };
         linearGeometry_ = {at(from), at(to), spread};
+    }
+
+    // Circles repeat from the centre: where the first stop lies away from it, the stops carry the distance.
+    void ShiftStops(float periods) {
+        const float phase = periods - std::floor(periods);
+        const uint32_t count = stops_.size();
+        if (phase < 1e-4f) return;
+        for (uint32_t i = 0; i < count; ++i)
+            stops_.push_back({stops_[i].offset + phase, stops_[i].color});
+        for (uint32_t i = 0; i < count; ++i)
+            stops_[i].offset += phase - 1;
     }
 
     void Draw(const Rect& rect, CommandBuffer& buffer) const {

@@ -137,7 +137,8 @@ void AnnotateLayer(const LayoutNode& node, PaintContext& context, CommandBuffer&
 bool NeedsLayer(const LayoutNode& node) {
     const VisualStyle& style = *node.style.visual;
     return style.opacity.value < 1 || !style.filter.empty() ||
-           (node.display && node.display->Has(IDisplayElement::kHasMask)) ||
+           // A mask erases what it is applied to, so it must never meet the parent's pixels.
+           style.maskImage.kind > css::ImageKind::Initial ||
            style.mixBlendMode != css::BlendModeType::Normal ||
            style.isolation == css::IsolationType::Isolate || !style.compositionId.empty() ||
            !style.customEffectName.empty();

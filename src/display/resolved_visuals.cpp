@@ -41,7 +41,7 @@ void Grow(Edges& edges, float left, float right, float top, float bottom) {
 }
 
 void GrowByShadow(Edges& edges, const ResolvedShadow& shadow) {
-    const float reach = shadow.spread + 2 * shadow.blur;
+    const float reach = shadow.spread + shadow.blur;
     Grow(edges, reach - shadow.x, reach + shadow.x, reach - shadow.y, reach + shadow.y);
 }
 

@@ -73,6 +73,7 @@ void UpdateDepths(LayoutHandle& top, const HandleSet& changed) {
             child.index = i;
             const bool moved = child.depth != node.depth + 1;
             child.depth = node.depth + 1;
+            if (child.IsBeyondLimit()) child.box = child.aabb = child.paintBounds = child.visualAabb = {};
             if (moved || changed.Contains(node.children[i].get())) stack.push_back(node.children[i].get());
         }
         if (!changed.Contains(parent)) SyncFlexChildren(*parent);

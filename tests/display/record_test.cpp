@@ -87,6 +87,7 @@ TEST_F(RecordTest, LayersOpenOnlyWhereAsked) {
         {"clip-path: inset(1px 2px 3px 4px)", "ClipRect 4 1 4 6 2", 1, 2},
         {"clip-path: polygon(0 0, 10px 0, 0 10px)", "ClipPath", 1, 2},
         {"mask-image: url(a.png)", "FillRect", 0, 0},
+        {"mask-image: linear-gradient(red, transparent)", "BeginLayer", 2, 2},
     };
     for (const Case& c : cases) {
         page.tree.UpdateStyle(*box, plain);

@@ -53,8 +53,8 @@ TEST_F(LayoutTreeTest, CommitCopiesOnlyChangedHandles) {
 }
 
 TEST_F(LayoutTreeTest, RemovingTakesTheSubtreeOutOnceAndDirtiesWhatItCovered) {
-    Page page;
     FakeNode node;
+    Page page;
     LayoutHandle* parent =
         page.Insert(page.body, 0, "width: 50px; height: 40px; background-color: red", &node);
     LayoutHandle* child = page.Add(parent, "width: 80px; height: 90px");
@@ -126,8 +126,8 @@ TEST_F(LayoutTreeTest, DeepTreesAreCutWithOneWarning) {
 }
 
 TEST_F(LayoutTreeTest, DiagnosticNamesFollowTheTree) {
-    Page page;
     FakeNode node;
+    Page page;
     LayoutHandle* box = page.Insert(page.body, 0, "", &node);
     layout::DebugNames names;
     layout::LayoutUpdatePtr update = MakeRef<layout::LayoutUpdateData>();
