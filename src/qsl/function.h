@@ -14,7 +14,8 @@
 namespace qsl {
 
 /// Called when an empty function is called; the engine points it to its log.
-inline constinit void (*g_on_empty_function_call)() = nullptr;
+using EmptyCallHook = void (*)();
+inline constinit EmptyCallHook g_on_empty_function_call = nullptr;
 
 template <class Signature, class Alloc = std::allocator<std::byte>>
 class function;

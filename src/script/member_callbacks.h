@@ -22,6 +22,7 @@
 
 #include "script/class_description.h"
 #include "script/convert.h"
+#include "script/make_handle.h"
 #include "script/scripting_context.h"
 
 namespace qorvex::script {
@@ -54,6 +55,21 @@ struct FixedString {
             text[i] = literal[i];
     }
 };
+
+// "on" and "click" as "onclick".
+template <size_t P, size_t N>
+constexpr FixedString<P + N - 1> Join(const char (&prefix)[P], const FixedString<N>& tail) {
+    char text[P + N - 1] = {};
+    for (size_t i = 0; i + 1 < P; ++i)
+        text[i] = prefix[i];
+    for (size_t i = 0; i < N; ++i)
+        text[P - 1 + i] = tail.text[i];
+    return text;
+}
+
+// A template parameter's text as an object that outlives all.
+template <FixedString kName>
+inline constexpr auto kText = kName;
 
 namespace internal {
 
@@ -123,14 +139,20 @@ JSValueRef ApplyToThis(ScriptCall& call) {
     }(*self, call, typename Signature<decltype(kOperation)>::Arguments{});
 }
 
+// The class in a message: its script name, unless the class says otherwise.
+template <class T>
+constexpr const char* ErrorClassName() {
+    if constexpr (requires { T::kErrorClassName; }) return T::kErrorClassName;
+    return GetScriptClassRow(T::kScriptClass).name;
+}
+
 template <class T, FixedString kName, auto kOperation, unsigned kRequired>
 JSValueRef MethodCallback(JSContextRef context, JSObjectRef function, JSObjectRef this_object, size_t count,
                           const JSValueRef arguments[], JSValueRef* exception) {
     ScriptCall call{context, function, this_object, {arguments, count}, exception};
     if constexpr (kRequired > 0) {
         if (count < kRequired) {
-            return RaiseArgumentCountError(call, kName.text, GetScriptClassRow(T::kScriptClass).name,
-                                           kRequired);
+            return RaiseArgumentCountError(call, kName.text, ErrorClassName<T>(), kRequired);
         }
     }
     return ApplyToThis<T, kOperation>(call);
@@ -149,8 +171,7 @@ template <class T>
 struct Binding {
     template <FixedString kName, auto kOperation, unsigned kRequired = 0>
     static constexpr MethodDescription Method() {
-        // The text outlives all: it is the template parameter's own object.
-        return {internal_name<kName>.text, internal::MethodCallback<T, kName, kOperation, kRequired>};
+        return {kText<kName>.text, internal::MethodCallback<T, kName, kOperation, kRequired>};
     }
 
     template <auto kGetter>
@@ -162,10 +183,6 @@ struct Binding {
     static constexpr AttributeDescription ReadWrite(const char* name) {
         return {name, internal::AccessorCallback<T, kGetter>, internal::AccessorCallback<T, kSetter>};
     }
-
-  private:
-    template <FixedString kName>
-    static constexpr auto internal_name = kName;
 };
 
 }  // namespace qorvex::script

@@ -5,9 +5,8 @@
 namespace qorvex::script {
 
 NativePrivate PrivateOfGlobal(JSContextRef context, JSObjectRef object) {
-    if (object != JSContextGetGlobalObject(context)) return {};
     const ScriptingContext* page = GetScriptingContext(context);
-    if (!page || !page->global_handle) return {};
+    if (!page || !page->global_handle || object != page->global_object) return {};
     return {page->global_handle, ScriptClass::Window, true};
 }
 

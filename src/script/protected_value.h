@@ -14,7 +14,7 @@ class ProtectedValue {
     ProtectedValue() = default;
     // Null stands for "no value".
     ProtectedValue(JSContextRef context, JSValueRef value)
-        : context_(value ? JSContextGetGlobalContext(context) : nullptr), value_(value) {
+        : context_(value ? GetGlobalContext(context) : nullptr), value_(value) {
         if (value_) JSValueProtect(context_, value_);
     }
     ProtectedValue(ProtectedValue&& other) noexcept

@@ -30,10 +30,14 @@ ScriptContextTeardownScope::~ScriptContextTeardownScope() {
 }
 
 void UnprotectUnlessTeardown(JSContextRef context, JSValueRef value) {
-    if (context && value && !g_teardown) JSValueUnprotect(context, value);
+    if (!value || g_teardown) return;
+    for (const ScriptingContext* page = t_contexts; page; page = page->next) {
+        if (page->context == context) return JSValueUnprotect(context, value);
+    }
 }
 
 void RegisterScriptingContext(ScriptingContext& context) {
+    context.global_object = JSContextGetGlobalObject(context.context);
     context.next = t_contexts;
     t_contexts = &context;
 }
@@ -52,11 +56,22 @@ void UnregisterScriptingContext(ScriptingContext& context) {
 }
 
 ScriptingContext* GetScriptingContext(JSContextRef context) {
+    // What the engine hands to callbacks is the global context itself, so the question that would settle it,
+    // which takes the engine's lock, is hardly ever asked.
+    for (ScriptingContext* page = t_contexts; page; page = page->next) {
+        if (page->context == context) return page;
+    }
+    if (!t_contexts || !context) return nullptr;
     JSGlobalContextRef global = JSContextGetGlobalContext(context);
     for (ScriptingContext* page = t_contexts; page; page = page->next) {
         if (page->context == global) return page;
     }
     return nullptr;
+}
+
+JSGlobalContextRef GetGlobalContext(JSContextRef context) {
+    const ScriptingContext* page = GetScriptingContext(context);
+    return page ? page->context : JSContextGetGlobalContext(context);
 }
 
 JSValueRef MakeError(JSContextRef context, std::string_view message) {

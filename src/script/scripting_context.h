@@ -1,8 +1,8 @@
 // The script side of one loaded document. Owned by the view; the document keeps a pointer so that any node
 // reaches it. Created and destroyed by script/bindings/context_lifecycle.h.
 //
-// Invariant: one thread, the view's script thread, touches a context; two contexts of one view are never alive
-// together.
+// Invariant: one thread, the view's script thread, touches a context; two contexts of one view are never
+// alive together.
 #pragma once
 
 #include <JavaScriptCore/JSBase.h>
@@ -21,13 +21,14 @@ namespace qorvex::script {
 class ScriptingHandleEnabled;
 
 struct ScriptingContext {
-    // Error raised by native code that has no exception out-parameter at hand; protected while it stands here.
-    // Set by RaiseError, moved out by HandOverPendingException.
+    // Error raised by native code that has no exception out-parameter at hand; protected while it stands
+    // here. Set by RaiseError, moved out by HandOverPendingException.
     JSValueRef pending_exception = nullptr;
     dom::Window* window = nullptr;
     JSGlobalContextRef context = nullptr;
 
-    // The window as the handle that calls on the global object act on.
+    // The global object, and the window as the handle that calls on it act on.
+    JSObjectRef global_object = nullptr;
     ScriptingHandleEnabled* global_handle = nullptr;
     // The prototype of each class in this context, all held by `prototype_keeper`.
     std::array<JSObjectRef, kScriptClassCount> prototypes{};
@@ -45,8 +46,11 @@ void UnregisterScriptingContext(ScriptingContext& context);
 // thread has as many contexts as it has views.
 [[nodiscard]] ScriptingContext* GetScriptingContext(JSContextRef context);
 
-// While true nobody issues a JSValueUnprotect: the heap is on its way out. Process-wide and plain, as the views
-// of a system share one thread.
+// The global context behind any context.
+[[nodiscard]] JSGlobalContextRef GetGlobalContext(JSContextRef context);
+
+// While true nobody issues a JSValueUnprotect: the heap is on its way out. Process-wide and plain, as the
+// views of a system share one thread.
 [[nodiscard]] bool IsScriptContextTeardown();
 
 class ScriptContextTeardownScope {
@@ -57,7 +61,8 @@ class ScriptContextTeardownScope {
     ScriptContextTeardownScope& operator=(const ScriptContextTeardownScope&) = delete;
 };
 
-// JSValueUnprotect, or nothing during a teardown. Null values are fine.
+// JSValueUnprotect, or nothing during a teardown and for a context that is gone: what native code kept of a
+// page may be dropped after it. `context` is a global context; null values are fine.
 void UnprotectUnlessTeardown(JSContextRef context, JSValueRef value);
 
 // An `Error` with this message, as all errors that native code raises are: no TypeError, no DOMException.
@@ -70,8 +75,8 @@ void RaiseError(JSContextRef context, std::string_view message, JSValueRef* exce
 // null context drops the message into the log.
 void RaiseError(ScriptingContext* context, std::string_view message);
 
-// The end of each binding callback: moves a waiting error to the out-parameter. Costs one load when no context
-// of the process has one.
+// The end of each binding callback: moves a waiting error to the out-parameter. Costs one load when no
+// context of the process has one.
 void HandOverPendingException(JSContextRef context, JSValueRef* exception);
 
 }  // namespace qorvex::script

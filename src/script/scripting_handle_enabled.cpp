@@ -29,12 +29,12 @@ void ScriptingHandleEnabled::ProtectWrapper() {
 }
 
 bool ScriptingHandleEnabled::MakeWrapper(ScriptClass script_class, bool has_weak, JSContextRef context) {
-    if (!wrapper_context_) wrapper_context_ = JSContextGetGlobalContext(context);
     JSClassRef engine_class = GetScriptClassTable()[script_class];
     if (!engine_class) return false;
+    const ScriptingContext* page = GetScriptingContext(context);
+    if (!wrapper_context_) wrapper_context_ = GetGlobalContext(context);
     wrapper_ = JSObjectMake(wrapper_context_, engine_class, PackPrivate(this, script_class, has_weak));
     // The classes have no prototypes of their own, see prototypes.h.
-    const ScriptingContext* page = GetScriptingContext(wrapper_context_);
     const JSObjectRef prototype = page ? page->prototypes[static_cast<size_t>(script_class)] : nullptr;
     if (prototype) JSObjectSetPrototype(wrapper_context_, wrapper_, prototype);
     return true;

@@ -1,4 +1,6 @@
 // Running script that fails, hangs and exhausts the stack: the page goes on and the log tells.
+#include "script/inline_handler_attribute.h"
+#include "script/protected_value.h"
 #include "script/script_fixture.h"
 
 namespace qorvex::script::test {
@@ -83,6 +85,33 @@ TEST_F(Evaluate, CountsTheEnginesMemoryAndPumps) {
     EXPECT_GT(GetScriptEngineMemory(page_.context).object_count, before.object_count + 90000);
     for (int i = 0; i < 3; ++i)
         PumpScriptEngine();
+}
+
+TEST_F(Evaluate, HandlerAttributesBecomeFunctionsOfTheirObject) {
+    Run("globalThis.target = {}; 0");
+    const JSObjectRef target = const_cast<JSObjectRef>(
+        GetProperty(page_.context, JSContextGetGlobalObject(page_.context), "target"));
+    InstallInlineHandler(page_.context, target, "onclick", "return [this === target, event];");
+    EXPECT_EQ(Run("target.onclick(5)"), "true,5");
+    InstallInlineHandler(page_.context, target, "onclick", "not a { function");
+    EXPECT_EQ(log_.Count("onclick attribute value is not a valid function: \"not a { function\"!"), 1u);
+    EXPECT_EQ(Run("target.onclick(6)"), "true,6");
+    InstallInlineHandler(page_.context, target, "online-ish", "1");
+    InstallInlineHandler(page_.context, target, "title", "1");
+    EXPECT_EQ(Run("typeof target.title"), "undefined");
+}
+
+TEST_F(Evaluate, KeptValuesOutliveTheirContext) {
+    Run("globalThis.v = { alive: 1 }; 0");
+    ProtectedValue kept(page_.context,
+                        GetProperty(page_.context, JSContextGetGlobalObject(page_.context), "v"));
+    Run("v = null");
+    Collect();
+    EXPECT_EQ(std::string(SerializeToJSON(page_.context, kept.get()).view()), R"({"alive":1})");
+    ProtectedValue moved = std::move(kept);
+    EXPECT_FALSE(kept);
+    DestroyContext();
+    moved.reset();
 }
 
 }  // namespace
