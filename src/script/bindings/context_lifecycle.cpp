@@ -1,0 +1,91 @@
+#include "script/bindings/context_lifecycle.h"
+
+#include <JavaScriptCore/JavaScript.h>
+
+#include "core/limits.h"
+#include "dom/document.h"
+#include "script/bindings/window.h"
+#include "script/class_installation.h"
+#include "script/convert.h"
+#include "script/engine_seam.h"
+#include "script/evaluate.h"
+#include "script/make_handle.h"
+
+namespace qorvex::script {
+
+namespace {
+
+// Dates print in one form everywhere, whatever the locale of the machine.
+constexpr std::string_view kDateShim =
+    "Date.prototype.toLocaleString = Date.prototype.toString;"
+    "Date.prototype.toLocaleDateString = Date.prototype.toDateString;"
+    "Date.prototype.toLocaleTimeString = Date.prototype.toTimeString;";
+// So that `const log = console.log` works.
+constexpr std::string_view kConsoleShim =
+    "['assert', 'debug', 'error', 'info', 'log', 'time', 'timeEnd', 'warn']"
+    ".forEach(m => console[m] = console[m].bind(console));\n";
+
+void DefineGlobals(ScriptingContext& page) {
+    JSContextRef context = page.context;
+    const JSObjectRef global = JSContextGetGlobalObject(context);
+    constexpr JSPropertyAttributes kFixed = kJSPropertyAttributeReadOnly | kJSPropertyAttributeDontDelete;
+    SetProperty(context, global, "window", global, kJSPropertyAttributeNone);
+    // Its place until the Location object comes.
+    SetProperty(context, global, "location", global, kJSPropertyAttributeNone);
+    SetProperty(context, global, "self", global, kFixed);
+    SetProperty(context, global, "parent", global, kFixed);
+    SetProperty(context, global, "document", ToScript(context, page.window->GetEventTargetDocument()),
+                kFixed);
+    SetProperty(context, global, "performance", ToScript(context, &page.window->performance()), kFixed);
+    // The script engine has a console of its own, which leads nowhere.
+    SetProperty(context, global, "console", ToScript(context, &page.window->console()),
+                kJSPropertyAttributeNone);
+}
+
+}  // namespace
+
+ScriptingContextPtr CreateScriptingContext(dom::IWindowHost& host, dom::Document& document) {
+    ScriptingContextPtr page = MakeUnique<ScriptingContext>();
+    JSContextGroupRef group = JSContextGroupCreate();
+    page->context = JSGlobalContextCreateInGroup(group, nullptr);
+    SetScriptTimeLimit(group, limits::kScriptTimeLimitSeconds);
+    RegisterScriptingContext(*page);
+
+    // The context owns the window by the reference that it was made with.
+    page->window = MakeHandle<dom::Window>(host, *page, document).leak();
+    page->global_handle = page->window;
+    document.SetScriptingContext(page.get());
+    document.SetWindow(page->window);
+
+    InstallClasses(*page);
+    DefineGlobals(*page);
+    return page;
+}
+
+void RunPreludeScripts(ScriptingContext& context) {
+    EvaluateScript(context, kDateShim, "");
+    EvaluateScript(context, kConsoleShim, "");
+}
+
+void DestroyScriptingContext(ScriptingContextPtr page) {
+    if (!page || !page->context) return;
+    ScriptContextTeardownScope teardown;
+    dom::Window* window = std::exchange(page->window, nullptr);
+    dom::Document& document = *window->GetEventTargetDocument();
+    page->global_handle = nullptr;
+    window->DetachFromContext();
+    window->performance().ForgetWindow();
+    // Listeners hold functions of the heap that goes.
+    document.GetEventListenerTable().Clear();
+    document.SetWindow(nullptr);
+    document.SetScriptingContext(nullptr);
+
+    UninstallClasses(*page);
+    UnregisterScriptingContext(*page);
+    JSContextGroupRef group = JSContextGetGroup(page->context);
+    JSGlobalContextRelease(std::exchange(page->context, nullptr));
+    JSContextGroupRelease(group);
+    window->Release();
+}
+
+}  // namespace qorvex::script

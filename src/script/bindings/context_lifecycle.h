@@ -1,0 +1,27 @@
+// How a page's script context comes and goes.
+#pragma once
+
+#include "core/memory/containers.h"
+#include "script/scripting_context.h"
+
+namespace qorvex::dom {
+class Document;
+class IWindowHost;
+}  // namespace qorvex::dom
+
+namespace qorvex::script {
+
+using ScriptingContextPtr = UniquePtr<ScriptingContext, MemoryTag::General>;
+
+// A context of its own for one document: group, global object, window, constructors. The document then leads
+// to it. `host` and `document` outlive it.
+[[nodiscard]] ScriptingContextPtr CreateScriptingContext(dom::IWindowHost& host, dom::Document& document);
+
+// The engine's own scripts, which come before those of the client.
+void RunPreludeScripts(ScriptingContext& context);
+
+// Ends the context: nothing native refers to its heap afterwards, and every wrapper is finalised. Objects
+// that native code holds live on without a wrapper. Not to be called while script of this context runs.
+void DestroyScriptingContext(ScriptingContextPtr context);
+
+}  // namespace qorvex::script
