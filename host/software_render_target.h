@@ -1,5 +1,7 @@
 #pragma once
 
+#include <fresco/scene.h>
+
 #include <cstdint>
 #include <span>
 #include <vector>
@@ -10,19 +12,21 @@ namespace qorvex::host {
 class SoftwareRenderTarget {
   public:
     SoftwareRenderTarget(std::uint32_t width, std::uint32_t height) { Resize(width, height); }
+    SoftwareRenderTarget(const SoftwareRenderTarget&) = delete;
+    SoftwareRenderTarget& operator=(const SoftwareRenderTarget&) = delete;
 
     // Drops the pixels; all become transparent.
     void Resize(std::uint32_t width, std::uint32_t height) {
         width_ = width;
         height_ = height;
         pixels_.assign(std::size_t{4} * width * height, 0);
+        surface_ = {pixels_.data(), width, height, width * 4};
     }
 
     [[nodiscard]] std::uint32_t Width() const { return width_; }
     [[nodiscard]] std::uint32_t Height() const { return height_; }
-    [[nodiscard]] std::uint32_t RowPitch() const { return width_ * 4; }
-    // For ViewRenderer::SetRenderTarget.
-    [[nodiscard]] void* Color() { return pixels_.data(); }
+    // The colour target of ViewRenderer::SetRenderTarget; set it again after Resize.
+    [[nodiscard]] void* Color() { return &surface_; }
     [[nodiscard]] std::span<const std::uint8_t> Pixels() const { return pixels_; }
 
     // The pixels laid over an opaque grey level, three bytes each.
@@ -43,6 +47,7 @@ class SoftwareRenderTarget {
     std::uint32_t width_ = 0;
     std::uint32_t height_ = 0;
     std::vector<std::uint8_t> pixels_;
+    fresco::CpuRenderTarget surface_;
 };
 
 }  // namespace qorvex::host

@@ -125,7 +125,7 @@ bool Session::Start(std::string& error) {
     view_ = system_->CreateView(view_settings);
 
     system_renderer_ = system_->CreateSystemRenderer(SystemRendererSettings());
-    system_renderer_->RegisterRenderThread(nullptr);
+    system_renderer_->RegisterRenderThread(nullptr, nullptr, 0);
     view_renderer_ = system_renderer_->CreateViewRenderer(view_);
     SetTarget();
     stats_->SetEnabled(view_, true);
@@ -177,7 +177,6 @@ void Session::SetTarget() {
     RenderTargetDescription description;
     description.Width = target_.Width();
     description.Height = target_.Height();
-    description.RowPitch = target_.RowPitch();
     view_renderer_->SetRenderTarget(target_.Color(), nullptr, &description);
 }
 

@@ -46,10 +46,12 @@ int main(int count, char** arguments) {
     view_settings.CallbackUserData = &frame;
     View* view = system->CreateView(view_settings);
     SystemRenderer* system_renderer = system->CreateSystemRenderer({});
-    system_renderer->RegisterRenderThread(nullptr);
+    system_renderer->RegisterRenderThread(nullptr, nullptr, 0);
     ViewRenderer* renderer = system_renderer->CreateViewRenderer(view);
     host::SoftwareRenderTarget target(640, 360);
-    const RenderTargetDescription description = {0, 640, 360, 1, target.RowPitch(), 0};
+    RenderTargetDescription description;
+    description.Width = 640;
+    description.Height = 360;
     renderer->SetRenderTarget(target.Color(), nullptr, &description);
 
     // 4. The game's loop. A real game runs it until the player leaves, and gives the resource work to its own

@@ -10,6 +10,7 @@
 #include "core/main_thread.h"
 #include "core/memory/thread_scope.h"
 #include "core/render/system_renderer_impl.h"
+#include "core/unavailable.h"
 #include "core/view_impl.h"
 
 namespace qorvex {
@@ -66,7 +67,7 @@ void SystemImpl::StartInspector(const SystemSettings& settings) {
     else if (settings.InspectorPort == 0 || settings.InspectorPort > kLastPort)
         LogDebug("Inspector port is not valid, remote debugging disabled.");
     else
-        LogWarning("The inspector is not available in this build");
+        LogUnavailable("System::EnableInspector");
 }
 
 void SystemImpl::CreateFontManager(const SystemSettings& settings) {

@@ -8,6 +8,7 @@
 #include "dom/document.h"
 #include "dom/document_host.h"
 #include "dom/style_engine.h"
+#include "layout/fonts/font_manager.h"
 
 namespace qorvex::dom {
 
@@ -50,6 +51,8 @@ void Document::RebuildLayoutTree() {
         return;
     }
     Node& root = *html_;
+    layout::FontManager* fonts = host_->GetFontManager();
+    layout_tree_.SetFonts(fonts ? &fonts->Service() : nullptr);
     root.layout_node_ = layout_tree_.CreateRoot({.style = root.style_,
                                                  .display = root.display_element_,
                                                  .link = root.GetLayoutLink(),

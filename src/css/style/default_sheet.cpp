@@ -6,7 +6,8 @@ namespace {
 // The initial display is block, so only what differs from a block is told here. Elements without a picture of
 // their own stay out of the layout; phrasing tags are inline; headings, emphasis, lists and quotes get the
 // usual sizes, weights and margins of the HTML standard's rendering section in moderation (there are no
-// markers, tables or rules to draw). Every selector is a single tag, which the rule index finds without
+// markers, tables or rules to draw). A generic family on the root is what brings the game's own default font to
+// pages that name none. Every selector is a single tag, which the rule index finds without
 // matching.
 constexpr std::string_view kText = R"css(
 head, style, script, title, meta, link, base, template, noscript, param, source, track, datalist { display: none }
@@ -14,6 +15,7 @@ head, style, script, title, meta, link, base, template, noscript, param, source,
 a, abbr, acronym, b, bdi, bdo, big, cite, code, del, dfn, em, font, i, ins, kbd, label, mark, output, q, rb, rp, rt,
 rtc, ruby, s, samp, small, span, strike, strong, sub, sup, time, tt, u, var, br, wbr, nobr { display: inline }
 
+html { font-family: sans-serif }
 body { margin: 8px }
 p, blockquote, figure, dl, ol, ul, menu, dir, pre, listing, xmp { margin-top: 1em; margin-bottom: 1em }
 blockquote, figure { margin-left: 40px; margin-right: 40px }

@@ -4,6 +4,8 @@
 
 #include "core/logging/log.h"
 #include "script/bindings/bound_classes.h"
+#include "script/bindings/window.h"
+#include "script/bindings/window_host.h"
 #include "script/member_callbacks.h"
 
 namespace qorvex::dom {
@@ -49,15 +51,22 @@ bool JoinArguments(const ScriptCall& call, size_t first, String& line) {
     return true;
 }
 
+// The host may want the page's lines apart from the engine's own.
+void Emit(JSContextRef context, Logging::Severity severity, std::string_view line) {
+    const ScriptingContext* page = GetScriptingContext(context);
+    const bool taken = page && page->window && page->window->host().OnConsoleLine(severity, line);
+    if (!taken) Log(severity, line);
+}
+
 template <Logging::Severity kSeverity>
 void WriteLine(Console&, ScriptCall& call) {
     String line;
-    if (JoinArguments(call, 0, line)) Log(kSeverity, line.view());
+    if (JoinArguments(call, 0, line)) Emit(call.context, kSeverity, line);
 }
 
 void Assert(Console&, ScriptCall& call, bool condition) {
     String line;
-    if (!condition && JoinArguments(call, 1, line)) Log(Logging::Assert, line.view());
+    if (!condition && JoinArguments(call, 1, line)) Emit(call.context, Logging::Assert, line);
 }
 
 void Time(Console& console, ScriptCall& call, std::string_view label) {
