@@ -16,6 +16,22 @@ inline uint32_t Over(uint32_t src, uint32_t dst) {
     return src + ScalePixel(dst, 255 - (src >> 24));
 }
 
+void FillPixels(uint32_t* dst, int count, uint32_t color) {
+    int i = 0;
+#if defined(__SSE2__)
+    const __m128i four = _mm_set1_epi32(int(color));
+    for (; i + 16 <= count; i += 16) {
+        auto* out = reinterpret_cast<__m128i*>(dst + i);
+        _mm_storeu_si128(out, four);
+        _mm_storeu_si128(out + 1, four);
+        _mm_storeu_si128(out + 2, four);
+        _mm_storeu_si128(out + 3, four);
+    }
+#endif
+    for (; i < count; ++i)
+        dst[i] = color;
+}
+
 #if defined(__SSE2__)
 // 16-bit lanes: a * b / 255, rounded.
 inline __m128i MulDiv255(__m128i a, __m128i b) {
@@ -51,10 +67,7 @@ inline void SpreadCoverage(const uint8_t* mask, __m128i* low, __m128i* high) {
 void BlendSolid(uint32_t* dst, int count, uint32_t color, uint8_t coverage) {
     if (coverage != 255) color = ScalePixel(color, coverage);
     const uint32_t alpha = color >> 24;
-    if (alpha == 255) {
-        std::fill(dst, dst + count, color);
-        return;
-    }
+    if (alpha == 255) return FillPixels(dst, count, color);
     if (color == 0) return;
     int i = 0;
 #if defined(__SSE2__)
@@ -98,6 +111,7 @@ void BlendRow(uint32_t* dst, const uint32_t* src, int count, const uint8_t* mask
     int i = 0;
 #if defined(__SSE2__)
     const __m128i zero = _mm_setzero_si128();
+    const __m128i opaque = _mm_set1_epi8(-1);
     __m128i coverLow = _mm_set1_epi16(coverage), coverHigh = coverLow;
     for (; i + 4 <= count; i += 4) {
         const __m128i s = _mm_loadu_si128(reinterpret_cast<const __m128i*>(src + i));
@@ -106,6 +120,14 @@ void BlendRow(uint32_t* dst, const uint32_t* src, int count, const uint8_t* mask
             std::memcpy(&any, mask + i, 4);
             if (any == 0) continue;
             SpreadCoverage(mask + i, &coverLow, &coverHigh);
+        } else if (coverage == 255) {
+            // Opaque and blank pixels are most of any layer or picture.
+            const int alphas = _mm_movemask_epi8(_mm_cmpeq_epi8(s, opaque)) & 0x8888;
+            if (alphas == 0x8888) {
+                _mm_storeu_si128(reinterpret_cast<__m128i*>(dst + i), s);
+                continue;
+            }
+            if (_mm_movemask_epi8(_mm_cmpeq_epi8(s, zero)) == 0xFFFF) continue;
         }
         const __m128i d = _mm_loadu_si128(reinterpret_cast<const __m128i*>(dst + i));
         const __m128i sLow = MulDiv255(_mm_unpacklo_epi8(s, zero), coverLow);

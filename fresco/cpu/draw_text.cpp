@@ -41,7 +41,7 @@ bool CpuBackend::DrawColorGlyph(const FontFace& face, uint32_t glyph, float size
     }
     const Rect target{at.x + picture->left * size, at.y + picture->top * size, 0, picture->emWidth * size,
                       picture->emHeight * size};
-    DrawTexture(texture, target, {.target = target}, paint);
+    DrawTexture(texture, target, {.source = {}, .target = target}, paint);
     return true;
 }
 

@@ -1,5 +1,9 @@
 #include "fresco/cpu/sources.h"
 
+#if defined(__SSE2__)
+#include <emmintrin.h>
+#endif
+
 namespace fresco::cpu {
 namespace {
 
@@ -27,12 +31,38 @@ void WalkRow(const Homography& h, int x, int y, int count, Use use) {
     }
 }
 
+#if !defined(__SSE2__)
 // Weights of 8 bits between two and then two pixels.
 inline uint32_t Lerp(uint32_t a, uint32_t b, uint32_t weight) {
     const uint32_t inverse = 256 - weight;
     const uint32_t even = ((a & 0x00FF00FF) * inverse + (b & 0x00FF00FF) * weight + 0x00800080) >> 8;
     const uint32_t odd = ((a >> 8) & 0x00FF00FF) * inverse + ((b >> 8) & 0x00FF00FF) * weight + 0x00800080;
     return (even & 0x00FF00FF) | (odd & 0xFF00FF00);
+}
+#endif
+
+// Two by two texels, weights of 8 bits: between the rows first, then between the columns. The vector form
+// rounds as the scalar one does.
+inline uint32_t Bilinear(const uint32_t* upper, const uint32_t* lower, int x0, int x1, uint32_t wu,
+                         uint32_t wv) {
+#if defined(__SSE2__)
+    const __m128i zero = _mm_setzero_si128(), half = _mm_set1_epi16(128);
+    const auto pair = [&](const uint32_t* row) {
+        const __m128i texels =
+            _mm_unpacklo_epi32(_mm_cvtsi32_si128(int(row[x0])), _mm_cvtsi32_si128(int(row[x1])));
+        return _mm_unpacklo_epi8(texels, zero);
+    };
+    const auto weigh = [&](__m128i a, __m128i b, uint32_t weight) {
+        const __m128i sum = _mm_add_epi16(_mm_mullo_epi16(a, _mm_set1_epi16(short(256 - weight))),
+                                          _mm_mullo_epi16(b, _mm_set1_epi16(short(weight))));
+        return _mm_srli_epi16(_mm_add_epi16(sum, half), 8);
+    };
+    const __m128i columns = weigh(pair(upper), pair(lower), wv);
+    const __m128i pixel = weigh(columns, _mm_srli_si128(columns, 8), wu);
+    return uint32_t(_mm_cvtsi128_si32(_mm_packus_epi16(pixel, zero)));
+#else
+    return Lerp(Lerp(upper[x0], lower[x0], wv), Lerp(upper[x1], lower[x1], wv), wu);
+#endif
 }
 
 }  // namespace
@@ -168,8 +198,45 @@ uint32_t ImageSource::Sample(double u, double v) const {
     };
     const int x0 = index(fu, firstX, lastX, wrapX_), x1 = index(fu + 1, firstX, lastX, wrapX_);
     const int y0 = index(fv, firstY, lastY, wrapY_), y1 = index(fv + 1, firstY, lastY, wrapY_);
-    const uint32_t *a = level_->Row(y0), *b = level_->Row(y1);
-    return Lerp(Lerp(a[x0], a[x1], wu), Lerp(b[x0], b[x1], wu), wv);
+    return Bilinear(level_->Row(y0), level_->Row(y1), x0, x1, wu, wv);
+}
+
+// Without repeats the position is held inside of the source, so that truncation is floor and no index can
+// leave.
+void ImageSource::FetchClamped(int x, int y, int count, uint32_t* out) {
+    const double firstX = std::floor(left_), lastX = std::ceil(right_) - 1;
+    const double firstY = std::floor(top_), lastY = std::ceil(bottom_) - 1;
+    const int endX = int(lastX), endY = int(lastY);
+    const auto locate = [](double at, double first, double last, int end) {
+        const uint32_t fixed = uint32_t(std::min(std::max(at - 0.5, first), last) * 256 + 0.5);
+        const int low = int(fixed >> 8);
+        return Axis{low, std::min(low + 1, end), fixed & 255};
+    };
+    if (toTexels_.IsScaleTranslate()) {
+        const Axis v = locate(toTexels_.yy * (y + 0.5) + toTexels_.y0, firstY, lastY, endY);
+        const uint32_t *upper = level_->Row(v.low), *lower = level_->Row(v.high);
+        // A row comes in pieces (edges, middle), the next row in the same ones: keep the columns of all of
+        // them.
+        const int known = columnsX_ + int(columns_.size());
+        if (columns_.empty() || x < columnsX_ || x + count > known) {
+            const int first = columns_.empty() ? x : std::min(x, columnsX_);
+            const int end = columns_.empty() ? x + count : std::max(x + count, known);
+            columnsX_ = first;
+            columns_.resize(size_t(end - first));
+            WalkRow(toTexels_, first, y, end - first,
+                    [&](int i, double at, double) { columns_[size_t(i)] = locate(at, firstX, lastX, endX); });
+        }
+        const Axis* columns = columns_.data() + (x - columnsX_);
+        for (int i = 0; i < count; ++i) {
+            const Axis& u = columns[i];
+            out[i] = Bilinear(upper, lower, u.low, u.high, u.weight, v.weight);
+        }
+        return;
+    }
+    WalkRow(toTexels_, x, y, count, [&](int i, double atX, double atY) {
+        const Axis u = locate(atX, firstX, lastX, endX), v = locate(atY, firstY, lastY, endY);
+        out[i] = Bilinear(level_->Row(v.low), level_->Row(v.high), u.low, u.high, u.weight, v.weight);
+    });
 }
 
 void ImageSource::FetchAligned(int u, int v, int count, uint32_t* out) const {
@@ -186,6 +253,8 @@ void ImageSource::FetchAligned(int u, int v, int count, uint32_t* out) const {
 void ImageSource::Fetch(int x, int y, int count, uint32_t* out) {
     if (aligned_) {
         FetchAligned(x + int(std::lround(toTexels_.x0)), y + int(std::lround(toTexels_.y0)), count, out);
+    } else if (periodX_ == 0 && periodY_ == 0) {
+        FetchClamped(x, y, count, out);
     } else {
         WalkRow(toTexels_, x, y, count, [&](int i, double u, double v) { out[i] = Sample(u, v); });
     }

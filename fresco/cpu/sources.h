@@ -52,8 +52,15 @@ class ImageSource final : public PixelSource {
 
   private:
     uint32_t Sample(double u, double v) const;
+    void FetchClamped(int x, int y, int count, uint32_t* out);
     void FetchAligned(int u, int v, int count, uint32_t* out) const;
 
+    struct Axis {
+        int low, high;  // the two texels
+        uint32_t weight;
+    };
+    Vector<Axis> columns_;  // of the last row, from columnsX_ on
+    int columnsX_ = 0;
     const PixelBuffer* level_ = nullptr;
     Homography toTexels_;
     double left_, top_, right_, bottom_;  // of the source in texels of the level
