@@ -8,6 +8,10 @@
 #include "window.h"
 
 int main(int count, char** arguments) {
+    if (count == 2 && std::string(arguments[1]) == "--help") {
+        std::fputs(player::UsageText(), stdout);
+        return player::kExitFine;
+    }
     std::string error;
     const std::optional<player::Options> options = player::ParseOptions(count, arguments, error);
     if (!options) {
