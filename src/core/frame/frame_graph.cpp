@@ -61,7 +61,6 @@ TaskPtr MakeSignalTask(const FrameDataPtr& frame) {
 
 TaskPtr MakeSyncTreesTask(const FrameDataPtr& frame) {
     return MakeTask("SyncTrees", [frame](TaskFamilyHandle) {
-        LogTrace("Synchronizing layout tree to main");
         layout::SyncTrees(*frame->update);
     });
 }
