@@ -1,5 +1,6 @@
 // Many threads at once; meant for ThreadSanitizer above all.
 #include <atomic>
+#include <chrono>
 #include <memory>
 #include <thread>
 #include <vector>
@@ -91,6 +92,25 @@ TEST_F(TaskThreadsTest, ClosingWaitsForWhatRunsAndDropsTheRest) {
         EXPECT_EQ(destroyed, 20) << "nothing of a closed family is left";
         owned.reset();
     }
+}
+
+TEST_F(TaskThreadsTest, ClosingFromInsideATaskWaitsForTheOthersAlone) {
+    tasks_->OpenChannel(TaskChannels::Resources, 5);
+    std::atomic<int> started{0};
+    std::atomic<int> ended{0};
+    Serve(WorkType::Resources, 0, 2);
+    tasks_->Push(5, TaskChannels::Resources, MakeTask("Slow", [&] {
+                     ++started;
+                     std::this_thread::sleep_for(std::chrono::milliseconds(20));
+                     ++ended;
+                 }));
+    tasks_->Push(5, TaskChannels::Resources, MakeTask("Close", [&] {
+                     WaitFor(started, 1);
+                     tasks_->CloseChannel(TaskChannels::Resources, 5);
+                     EXPECT_EQ(ended, 1);
+                     ++ended;
+                 }));
+    WaitFor(ended, 2);
 }
 
 TEST_F(TaskThreadsTest, WakesTheThreadThatWaitsForJustThisFamily) {
