@@ -3,6 +3,7 @@
 #include <sys/syscall.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <ctime>
 
 namespace qorvex {
@@ -30,7 +31,7 @@ void DefaultLogHandler::WriteLog(Logging::Severity severity, const char* text, u
     stream_.WriteNumber(CurrentThreadId());
     stream_ << " Time: ";
     stream_.WriteNumber(static_cast<int64_t>(std::time(nullptr)));
-    stream_ << ' ' << kSeverityLetters[severity < 6 ? severity : 5] << " | ";
+    stream_ << ' ' << kSeverityLetters[std::min<uint32_t>(severity, 5)] << " | ";
     stream_ << std::string_view(text, length ? length - 1 : 0) << '\n';
 
     const std::string_view line = stream_.view();

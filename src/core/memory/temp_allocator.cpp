@@ -24,27 +24,19 @@ void TempAllocator::AddBlock(size_t capacity) {
 
 void* TempAllocator::AllocateInNewBlock(size_t size, size_t alignment) {
     AddBlock(std::max(limits::kTempBlockBytes, size + alignment));
+    used_before_ += blocks_[current_].used;
     current_ = blocks_.size() - 1;
     return Allocate(size, alignment);
 }
 
-size_t TempAllocator::Mark() const {
-    size_t used = 0;
-    for (const Block& block : blocks_)
-        used += block.used;
-    return used;
-}
-
-void TempAllocator::Release(size_t mark) {
+void TempAllocator::ReleaseBlocks(size_t mark) {
     // A mark on the border of two blocks lies at the end of the earlier one: the later one can go.
-    uint32_t index = 0;
-    while (index < current_ && mark > blocks_[index].used)
-        mark -= blocks_[index++].used;
-    for (uint32_t i = index + 1; i < blocks_.size(); ++i)
-        GetAllocator()->Deallocate(blocks_[i].memory, MemoryTag::Temporary);
-    blocks_.truncate(index + 1);
-    blocks_[index].used = std::min(blocks_[index].used, mark);
-    current_ = index;
+    while (current_ && mark <= used_before_) {
+        GetAllocator()->Deallocate(blocks_[current_].memory, MemoryTag::Temporary);
+        blocks_.pop_back();
+        used_before_ -= blocks_[--current_].used;
+    }
+    blocks_[current_].used = std::min(blocks_[current_].used, mark - used_before_);
 }
 
 TempAllocator& CurrentTempAllocator() {

@@ -32,9 +32,14 @@ class TempAllocator {
     }
 
     /// Bytes used in all blocks up to the current one.
-    size_t Mark() const;
+    size_t Mark() const { return used_before_ + blocks_[current_].used; }
     /// Frees the blocks behind the one that the mark lies in and resets that one.
-    void Release(size_t mark);
+    void Release(size_t mark) {
+        if (mark < used_before_ || (current_ && mark == used_before_)) [[unlikely]]
+            return ReleaseBlocks(mark);
+        Block& block = blocks_[current_];
+        if (mark - used_before_ < block.used) block.used = mark - used_before_;
+    }
     size_t BlockCount() const { return blocks_.size(); }
 
     TempAllocator* next_free = nullptr;
@@ -48,9 +53,11 @@ class TempAllocator {
     };
     [[gnu::noinline]] void* AllocateInNewBlock(size_t size, size_t alignment);
     void AddBlock(size_t capacity);
+    [[gnu::noinline]] void ReleaseBlocks(size_t mark);
 
     qsl::Vector<Block, TaggedStdAllocator<Block, MemoryTag::General>> blocks_;
     uint32_t current_ = 0;
+    size_t used_before_ = 0;  ///< In the blocks before the current one.
 };
 
 /// The calling thread's arena.

@@ -4,7 +4,19 @@
 
 namespace qorvex {
 
-constinit std::atomic<int32_t> Task::next_id_{0};
+namespace {
+
+constexpr int32_t kIdsPerBlock = 64;
+constinit std::atomic<int32_t> g_next_id{0};
+
+}  // namespace
+
+constinit thread_local Task::IdBlock Task::t_ids_;
+
+void Task::IdBlock::Refill() {
+    next = g_next_id.fetch_add(kIdsPerBlock, std::memory_order_relaxed);
+    end = next + kIdsPerBlock;
+}
 
 Task::~Task() {
     ClearHandle();

@@ -55,11 +55,13 @@ void TaskChannel::Close(uint32_t family) {
         FamilyQueue* queue;
         while ((queue = Find(family)) && queue->in_flight > own) {
             LogDebug("Waiting for in-progress tasks on channel on family ", family);
+            ++queue->closers;
             queue->idle->Wait(lock);
+            if ((queue = Find(family))) --queue->closers;
         }
         if (!queue) return;
         left.swap(queue->queue);
-        pending_.fetch_sub(left.size(), std::memory_order_release);
+        CountPending(-static_cast<int32_t>(left.size()));
         idle = std::move(queue->idle);
         families_.erase(queue);
         if (next_queue_ >= families_.size()) next_queue_ = families_.empty() ? 0 : families_.size() - 1;
@@ -81,7 +83,7 @@ void TaskChannel::Put(uint32_t family, TaskPtr task) {
             return;
         }
         queue->queue.push_back(std::move(task));
-        pending_.fetch_add(1, std::memory_order_relaxed);
+        CountPending(+1);
         if (IsAnnounced() && (!HasWorkers(*queue) || number_ == TaskChannels::Resources)) on_pushed_(family);
         if (!waiters_) return;
         // One signal could reach a thread that waits for another family and be lost with it.
@@ -96,12 +98,12 @@ void TaskChannel::Run(bool blocking, const std::atomic<uint32_t>* stop_flag, uin
     Register(family, +1);
     while (!stopped()) {
         if (quit_.load(std::memory_order_relaxed)) return Leave(family, false);
-        if (family != kAllTaskFamilies && !Find(family)) {
+        FamilyQueue* queue = Choose(family);
+        if (!queue && family != kAllTaskFamilies && !Find(family)) {
             // The placeholder is part of the text.
             LogDebug("Trying to do tasks on a family (%d) channel that is closed", family);
             return Leave(family, false);
         }
-        FamilyQueue* queue = Choose(family);
         if (!queue) {
             if (!blocking) return Leave(family, false);
             WaitForWork(lock, family);
@@ -116,13 +118,14 @@ void TaskChannel::Run(bool blocking, const std::atomic<uint32_t>* stop_flag, uin
             TempMark mark;
             LogTrace("Executing task ", task->name());
             task->Execute({from, system_});
-            on_finished_(from, task);
+            // A task that nobody waits for, like most, ends without asking.
+            if (!task->StandsAlone() || !on_finished_) on_finished_(from, task);
             // The task goes before it stops counting as in flight: once a family is closed nothing of it is
             // left.
             task.reset();
         }
-        pending_.fetch_sub(1, std::memory_order_release);
         lock.Lock();
+        CountPending(-1);
         NoteFinished(from);
     }
     Leave(family, true);
@@ -166,6 +169,12 @@ void TaskChannel::Register(uint32_t family, int change) {
     if (queue && (change > 0 || queue->workers)) queue->workers += change;
 }
 
+void TaskChannel::CountPending(int32_t change) {
+    // Written under the mutex only, so readers need an atomic but the count no read-modify-write.
+    pending_.store(pending_.load(std::memory_order_relaxed) + static_cast<uint32_t>(change),
+                   std::memory_order_release);
+}
+
 bool TaskChannel::HasWorkers(const FamilyQueue& queue) const {
     return queue.workers || all_workers_;
 }
@@ -186,7 +195,9 @@ void TaskChannel::NoteFinished(uint32_t family) {
         LogWarning("A family (%d) channel was closed while there were still tasks in-flight!", family);
         return;
     }
-    if (--queue->in_flight <= 0) queue->idle->Broadcast();
+    --queue->in_flight;
+    // Not only at zero: one that closes from inside its own task waits for all others but itself.
+    if (queue->closers) queue->idle->Broadcast();
 }
 
 void TaskChannel::WaitForWork(qsl::MutexLock& lock, uint32_t family) {

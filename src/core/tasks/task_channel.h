@@ -33,7 +33,8 @@ class TaskChannel {
     /// or the flag is set.
     void Run(bool blocking, const std::atomic<uint32_t>* stop_flag, uint32_t family) QSL_EXCLUDES(mutex_);
     void Quit() QSL_EXCLUDES(mutex_);
-    /// Tasks that are queued or running. A task that another one pushes counts before that one stops counting.
+    /// Tasks that are queued or running. A task that another one pushes counts before that one stops
+    /// counting.
     uint32_t GetPending() const { return pending_.load(std::memory_order_acquire); }
 
   private:
@@ -44,6 +45,8 @@ class TaskChannel {
         /// Apart, because waiters must not move with the entry.
         UniquePtr<qsl::Condition, MemoryTag::Tasks> idle;
         int32_t in_flight = 0;
+        /// Threads that wait on `idle`.
+        uint32_t closers = 0;
         uint32_t workers = 0;
     };
     class RunFrame;
@@ -51,6 +54,7 @@ class TaskChannel {
     FamilyQueue* Find(uint32_t family) QSL_REQUIRES(mutex_);
     FamilyQueue* Choose(uint32_t family) QSL_REQUIRES(mutex_);
     void Register(uint32_t family, int change) QSL_REQUIRES(mutex_);
+    void CountPending(int32_t change) QSL_REQUIRES(mutex_);
     bool HasWorkers(const FamilyQueue& queue) const QSL_REQUIRES(mutex_);
     void Leave(uint32_t family, bool stopped) QSL_REQUIRES(mutex_);
     void NoteFinished(uint32_t family) QSL_REQUIRES(mutex_);
