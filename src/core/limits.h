@@ -46,15 +46,16 @@ inline constexpr size_t kMaxDocumentDepth = 512;
 /// of this (5,000 take 20 ms, 100,000 take 17 s).
 inline constexpr size_t kMaxSourceNesting = 4096;
 
-/// Loads that finish inside the request for them may run a script that asks for the next one; deeper than this
-/// they wait for the next frame.
+/// Loads that finish inside the request for them may run a script that asks for the next one; deeper than
+/// this they wait for the next frame.
 inline constexpr uint32_t kMaxNestedResourceEvents = 16;
 
-/// Frame ids of a view that wait for Paint. A client that never paints keeps the newest so many; at 60 frames a
-/// second a client that paints late has four seconds.
+/// Frame ids of a view that wait for Paint. A client that never paints keeps the newest so many; at 60 frames
+/// a second a client that paints late has four seconds.
 inline constexpr size_t kMaxWaitingFrames = 256;
-/// Bytes of a value whose variables were replaced by their text: custom properties that name each other can grow
-/// with every level.
+
+/// Bytes of a value whose variables were replaced by their text: custom properties that name each other can
+/// grow with every level.
 inline constexpr size_t kSubstitutedTextBytes = 1024 * 1024;
 
 /// Parsed selectors of script queries that are kept for the next query with the same text.
@@ -68,8 +69,21 @@ inline constexpr size_t kMaxShadowSurfaceSide = 8192;
 /// one.
 inline constexpr size_t kMaxGradientTiles = 4096;
 
-/// Font sizes in pixels between which font-fit-mode looks: smaller text cannot be read, larger text has no screen.
+/// Font sizes in pixels between which font-fit-mode looks: smaller text cannot be read, larger text has no
+/// screen.
 inline constexpr float kSmallestFitSize = 6;
 inline constexpr float kLargestFitSize = 8192;
+
+/// Parentheses open at once in a CSS value or selector; beyond it a parse ends with "memory exhausted". Each
+/// level stands for two entries of a parser stack of 10,000.
+inline constexpr size_t kMaxCssNesting = 5000;
+
+/// Rulesets that the comma-separated queries of @media blocks may add to one sheet by copying a block's
+/// rules: some 30 MB of selectors. Further queries are left out.
+inline constexpr size_t kMaxMediaRuleCopies = 256 * 1024;
+
+/// Values that the @keyframes rules of one sheet may hold; a block gives one per selector and declaration, so
+/// their number can grow with the square of the text.
+inline constexpr size_t kMaxKeyframeValues = 64 * 1024;
 
 }  // namespace qorvex::limits

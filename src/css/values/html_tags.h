@@ -10,32 +10,35 @@
 // T(Name, "TEXT"): the text is what nodeName answers.
 #define QORVEX_HTML_TAGS(T)                                                                                                                                  \
     T(Html, "HTML")                                                                                                                                          \
-    T(Head, "HEAD") T(Title, "TITLE") T(Base, "BASE") T(Link, "LINK") T(Meta, "META") T(Style, "STYLE") T(                                                   \
-        Script, "SCRIPT") T(NoScript, "NOSCRIPT") T(Template, "TEMPLATE") T(Body, "BODY")                                                                    \
-        T(Article, "ARTICLE") T(Section, "SECTION") T(Nav, "NAV") T(Aside, "ASIDE") T(H1, "H1") T(                                                           \
-            H2, "H2") T(H3, "H3") T(H4, "H4") T(H5, "H5") T(H6, "H6") T(HGroup, "HGROUP")                                                                    \
-            T(Header, "HEADER") T(Footer, "FOOTER") T(Address, "ADDRESS") T(P, "P") T(Hr, "HR") T(                                                           \
+    T(Head, "HEAD")                                                                                                                                          \
+    T(Title, "TITLE")                                                                                                                                        \
+    T(Base, "BASE") T(Link, "LINK") T(Meta, "META") T(Style, "STYLE") T(Script, "SCRIPT") T(                                                                 \
+        NoScript, "NOSCRIPT") T(Template, "TEMPLATE") T(Body, "BODY") T(Article, "ARTICLE")                                                                  \
+        T(Section, "SECTION") T(Nav, "NAV") T(Aside, "ASIDE") T(H1, "H1") T(H2, "H2") T(H3, "H3") T(                                                         \
+            H4, "H4") T(H5, "H5") T(H6, "H6") T(HGroup, "HGROUP") T(Header, "HEADER") T(Footer, "FOOTER")                                                    \
+            T(Address, "ADDRESS") T(P, "P") T(Hr, "HR") T(                                                                                                   \
                 Pre,                                                                                                                                         \
                 "PRE") T(BlockQuote,                                                                                                                         \
-                         "BLOCKQUOTE") T(Ol, "OL") T(Ul,                                                                                                     \
-                                                     "UL") T(Li,                                                                                             \
-                                                             "LI") T(Dl,                                                                                     \
-                                                                     "DL") T(Dt,                                                                             \
-                                                                             "DT") T(Dd,                                                                     \
-                                                                                     "DD") T(Figure,                                                         \
-                                                                                             "FIGURE") T(FigCaption,                                         \
-                                                                                                         "F"                                                 \
-                                                                                                         "I"                                                 \
-                                                                                                         "G"                                                 \
-                                                                                                         "C"                                                 \
-                                                                                                         "A"                                                 \
-                                                                                                         "P"                                                 \
-                                                                                                         "T"                                                 \
-                                                                                                         "I"                                                 \
-                                                                                                         "O"                                                 \
-                                                                                                         "N") T(Main,                                        \
-                                                                                                                "MAIN") T(Div,                               \
-                                                                                                                          "DIV")                             \
+                         "BLOCKQUOTE") T(Ol,                                                                                                                 \
+                                         "OL") T(Ul,                                                                                                         \
+                                                 "UL") T(Li,                                                                                                 \
+                                                         "LI") T(Dl,                                                                                         \
+                                                                 "DL") T(Dt,                                                                                 \
+                                                                         "DT") T(Dd,                                                                         \
+                                                                                 "DD") T(Figure,                                                             \
+                                                                                         "FIGURE") T(FigCaption,                                             \
+                                                                                                     "F"                                                     \
+                                                                                                     "I"                                                     \
+                                                                                                     "G"                                                     \
+                                                                                                     "C"                                                     \
+                                                                                                     "A"                                                     \
+                                                                                                     "P"                                                     \
+                                                                                                     "T"                                                     \
+                                                                                                     "I"                                                     \
+                                                                                                     "O"                                                     \
+                                                                                                     "N") T(Main,                                            \
+                                                                                                            "MAIN") T(Div,                                   \
+                                                                                                                      "DIV")                                 \
                 T(A, "A") T(Em, "EM") T(Strong, "STRONG") T(Small, "SMALL") T(S, "S") T(Cite, "CITE") T(Q, "Q") T(                                           \
                     Dfn,                                                                                                                                     \
                     "DFN") T(Abbr,                                                                                                                           \
@@ -51,13 +54,20 @@
                                                            "RP") T(Bdi, "BDI")                                                                               \
                         T(Bdo, "BDO") T(Span, "SPAN") T(Br, "BR") T(Wbr, "WBR") T(Ins, "INS") T(                                                             \
                             Del, "DEL") T(Image, "IMAGE")                                                                                                    \
-                            T(Img, "IMG") T(IFrame, "IFRAME") T(Embed, "EMBED") T(Object, "OBJECT") T(                                                       \
-                                Param, "PARAM") T(Video, "VIDEO")                                                                                            \
-                                T(Audio, "AUDIO") T(Source, "SOURCE") T(                                                                                     \
-                                    Track, "TRACK") T(Canvas, "CANVAS")                                                                                      \
-                                    T(Map, "MAP") T(Area, "AREA") T(Math, "MATH") T(Mi, "MI") T(Mo, "MO") T(                                                 \
-                                        Mn,                                                                                                                  \
-                                        "MN") T(Ms, "MS")                                                                                                    \
+                            T(Img, "IMG") T(IFrame, "IFRAME") T(                                                                                             \
+                                Embed,                                                                                                                       \
+                                "EMBED") T(Object,                                                                                                           \
+                                           "OBJECT") T(Param, "PARAM")                                                                                       \
+                                T(Video, "VIDEO") T(                                                                                                         \
+                                    Audio, "AUDIO") T(Source, "SOURCE")                                                                                      \
+                                    T(Track, "TRACK") T(Canvas, "CANVAS") T(                                                                                 \
+                                        Map,                                                                                                                 \
+                                        "MAP") T(Area,                                                                                                       \
+                                                 "AREA") T(Math,                                                                                             \
+                                                           "MATH") T(Mi,                                                                                     \
+                                                                     "MI") T(Mo,                                                                             \
+                                                                             "MO") T(Mn,                                                                     \
+                                                                                     "MN") T(Ms, "MS")                                                       \
                                         T(MText, "MTEXT") T(MGlyph, "MGLYPH") T(MAlignMark, "MALIGNMARK") T(                                                 \
                                             AnnotationXml, "ANNOTATION_XML") T(Svg, "SVG")                                                                   \
                                             T(ForeignObject, "FOREIGNOBJECT") T(Desc, "DESC") T(                                                             \
@@ -90,46 +100,62 @@
                                                                                                                                      "ACRONYM") T(BgSound,   \
                                                                                                                                                   "BGSOUND") \
                                                                                     T(Dir, "DIR") T(                                                         \
-                                                                                        Frame, "FRAME")                                                      \
-                                                                                        T(FrameSet, "FRAMES"                                                 \
-                                                                                                    "ET") T(                                                 \
-                                                                                            NoFrames,                                                        \
-                                                                                            "NOFRAMES")                                                      \
-                                                                                            T(                                                               \
-                                                                                                IsIndex,                                                     \
-                                                                                                "ISINDEX") T(Listing,                                        \
-                                                                                                             "LISTING")                                      \
-                                                                                                T(Xmp,                                                       \
-                                                                                                  "XMP") T(NextId,                                           \
-                                                                                                           "NEXTID") T(NoEmbed,                              \
-                                                                                                                       "NOEMBED")                            \
-                                                                                                    T(PlainText,                                             \
-                                                                                                      "PLAI"                                                 \
-                                                                                                      "NTEX"                                                 \
-                                                                                                      "T") T(Rb,                                             \
-                                                                                                             "RB") T(Strike,                                 \
-                                                                                                                     "STRIKE") T(BaseFont,                   \
-                                                                                                                                 "BASEFONT") T(Big,          \
-                                                                                                                                               "BIG")        \
+                                                                                        Frame,                                                               \
+                                                                                        "FRAME") T(FrameSet,                                                 \
+                                                                                                   "FRAMES"                                                  \
+                                                                                                   "ET") T(NoFrames,                                         \
+                                                                                                           "NOFRAM"                                          \
+                                                                                                           "ES")                                             \
+                                                                                        T(IsIndex,                                                           \
+                                                                                          "ISINDEX") T(Listing,                                              \
+                                                                                                       "L"                                                   \
+                                                                                                       "I"                                                   \
+                                                                                                       "S"                                                   \
+                                                                                                       "T"                                                   \
+                                                                                                       "I"                                                   \
+                                                                                                       "N"                                                   \
+                                                                                                       "G")                                                  \
+                                                                                            T(Xmp, "XMP") T(                                                 \
+                                                                                                NextId,                                                      \
+                                                                                                "NEXTID")                                                    \
+                                                                                                T(NoEmbed,                                                   \
+                                                                                                  "NOEMBE"                                                   \
+                                                                                                  "D") T(PlainText,                                          \
+                                                                                                         "P"                                                 \
+                                                                                                         "L"                                                 \
+                                                                                                         "A"                                                 \
+                                                                                                         "I"                                                 \
+                                                                                                         "N"                                                 \
+                                                                                                         "T"                                                 \
+                                                                                                         "E"                                                 \
+                                                                                                         "X"                                                 \
+                                                                                                         "T")                                                \
+                                                                                                    T(Rb,                                                    \
+                                                                                                      "R"                                                    \
+                                                                                                      "B") T(Strike,                                         \
+                                                                                                             "STRIKE") T(BaseFont,                           \
+                                                                                                                         "BASEFONT") T(Big,                  \
+                                                                                                                                       "BIG")                \
                                                                                                         T(Blink,                                             \
                                                                                                           "BLINK") T(Center,                                 \
                                                                                                                      "CENTER") T(Font,                       \
                                                                                                                                  "FONT")                     \
                                                                                                             T(Marquee,                                       \
                                                                                                               "MARQUEE") T(MultiCol,                         \
-                                                                                                                           "MULTICOL") T(Nobr,               \
-                                                                                                                                         "NOBR")             \
-                                                                                                                T(Spacer,                                    \
-                                                                                                                  "SPACER")                                  \
-                                                                                                                    T(Tt,                                    \
-                                                                                                                      "TT")                                  \
-                                                                                                                        T(Rtc,                               \
-                                                                                                                          "RTC") T(Unknown,                  \
-                                                                                                                                   "<unknown>")              \
-                                                                                                                            T(Any,                           \
-                                                                                                                              "*")                           \
-                                                                                                                                T(Custom,                    \
-                                                                                                                                  "<custom>")
+                                                                                                                           "MULTICOL")                       \
+                                                                                                                T(Nobr,                                      \
+                                                                                                                  "NOBR")                                    \
+                                                                                                                    T(Spacer,                                \
+                                                                                                                      "SPACER")                              \
+                                                                                                                        T(Tt,                                \
+                                                                                                                          "TT") T(Rtc,                       \
+                                                                                                                                  "RTC")                     \
+                                                                                                                            T(Unknown,                       \
+                                                                                                                              "<unknown>")                   \
+                                                                                                                                T(Any,                       \
+                                                                                                                                  "*")                       \
+                                                                                                                                    T(Custom,                \
+                                                                                                                                      "<custom>")
 
 namespace qorvex::css {
 

@@ -17,14 +17,17 @@
 #define QORVEX_CSS_POSITION(W) \
     W(Static, "static")        \
     W(Relative, "relative") W(Absolute, "absolute") W(Fixed, "fixed") W(Inherit, "inherit")
-#define QORVEX_CSS_FLEX_DIRECTION(W)                                                    \
-    W(Row, "row")                                                                       \
-    W(RowReverse, "row-reverse") W(Column, "column") W(ColumnReverse, "column-reverse") \
-        W(Inherit, "inherit")
-#define QORVEX_CSS_JUSTIFY_CONTENT(W)                                           \
-    W(FlexStart, "flex-start")                                                  \
-    W(FlexEnd, "flex-end") W(Center, "center") W(SpaceBetween, "space-between") \
-        W(SpaceAround, "space-around") W(Inherit, "inherit")
+#define QORVEX_CSS_FLEX_DIRECTION(W)                                  \
+    W(Row, "row")                                                     \
+    W(RowReverse, "row-reverse")                                      \
+    W(Column, "column") W(ColumnReverse, "column-reverse") W(Inherit, \
+                                                             "inheri" \
+                                                             "t")
+#define QORVEX_CSS_JUSTIFY_CONTENT(W)                                                                       \
+    W(FlexStart, "flex-start")                                                                              \
+    W(FlexEnd, "flex-end")                                                                                  \
+    W(Center, "center") W(SpaceBetween, "space-between") W(SpaceAround, "space-around") W(Inherit, "inheri" \
+                                                                                                   "t")
 #define QORVEX_CSS_ALIGN_SELF(W) \
     W(Auto, "auto")              \
     W(FlexStart, "flex-start") W(Center, "center") W(FlexEnd, "flex-end") W(Stretch, "stretch")
@@ -35,13 +38,14 @@
     W(None, "none") W(Hidden, "hidden") W(Dotted, "dotted") W(Dashed, "dashed") W(Solid, "solid")
 #define QORVEX_CSS_VISIBILITY(W) \
     W(Hidden, "hidden") W(Visible, "visible") W(Initial, "initial") W(Inherit, "inherit")
-#define QORVEX_CSS_BLEND_MODE(W)                                                                      \
-    W(Normal, "normal")                                                                               \
-    W(Multiply, "multiply") W(Screen, "screen") W(Overlay, "overlay") W(Darken, "darken")             \
-        W(Lighten, "lighten") W(ColorDodge, "color-dodge") W(ColorBurn, "color-burn")                 \
-            W(HardLight, "hard-light") W(SoftLight, "soft-light") W(Difference, "difference")         \
-                W(Exclusion, "exclusion") W(Hue, "hue") W(Saturation, "saturation") W(Color, "color") \
-                    W(Luminosity, "luminosity") W(Additive, "additive")
+#define QORVEX_CSS_BLEND_MODE(W)                                                                            \
+    W(Normal, "normal")                                                                                     \
+    W(Multiply, "multiply")                                                                                 \
+    W(Screen, "screen")                                                                                     \
+    W(Overlay, "overlay") W(Darken, "darken") W(Lighten, "lighten") W(ColorDodge, "color-dodge")            \
+        W(ColorBurn, "color-burn") W(HardLight, "hard-light") W(SoftLight, "soft-light")                    \
+            W(Difference, "difference") W(Exclusion, "exclusion") W(Hue, "hue") W(Saturation, "saturation") \
+                W(Color, "color") W(Luminosity, "luminosity") W(Additive, "additive")
 #define QORVEX_CSS_ISOLATION(W) W(Auto, "auto") W(Isolate, "isolate")
 #define QORVEX_CSS_USER_SELECT(W) W(None, "none") W(Auto, "auto") W(Text, "text")
 #define QORVEX_CSS_POINTER_EVENTS(W) W(None, "none") W(Auto, "auto") W(Inherit, "inherit")
@@ -51,18 +55,20 @@
 #define QORVEX_CSS_FONT_STYLE(W) \
     W(Inherit, "inherit") W(Normal, "normal") W(Italic, "italic") W(Oblique, "oblique")
 // The number is the weight in hundreds.
-#define QORVEX_CSS_FONT_WEIGHT(W)                                                                  \
-    W(Inherit, "inherit")                                                                          \
-    W(W100, "100") W(W200, "200") W(W300, "300") W(Normal, "normal") W(W500, "500") W(W600, "600") \
-        W(Bold, "bold") W(W800, "800") W(W900, "900") W(Bolder, "bolder") W(Lighter, "lighter")
+#define QORVEX_CSS_FONT_WEIGHT(W)                                                                   \
+    W(Inherit, "inherit")                                                                           \
+    W(W100, "100")                                                                                  \
+    W(W200, "200")                                                                                  \
+    W(W300, "300") W(Normal, "normal") W(W500, "500") W(W600, "600") W(Bold, "bold") W(W800, "800") \
+        W(W900, "900") W(Bolder, "bolder") W(Lighter, "lighter")
 #define QORVEX_CSS_FONT_FIT_MODE(W) W(None, "none") W(Fit, "fit") W(Shrink, "shrink")
 #define QORVEX_CSS_FONT_SDF(W) W(Auto, "auto") W(Off, "off") W(On, "on")
 #define QORVEX_CSS_TEXT_OVERFLOW(W) \
     W(Clip, "clip") W(Ellipsis, "ellipsis") W(Initial, "initial") W(Inherit, "inherit")
-#define QORVEX_CSS_TEXT_TRANSFORM(W)                                                                      \
-    W(None, "none")                                                                                       \
-    W(Capitalize, "capitalize") W(Uppercase, "uppercase") W(Lowercase, "lowercase") W(Initial, "initial") \
-        W(Inherit, "inherit")
+#define QORVEX_CSS_TEXT_TRANSFORM(W) \
+    W(None, "none")                  \
+    W(Capitalize, "capitalize")      \
+    W(Uppercase, "uppercase") W(Lowercase, "lowercase") W(Initial, "initial") W(Inherit, "inherit")
 #define QORVEX_CSS_OVERFLOW_WRAP(W) \
     W(Normal, "normal")             \
     W(BreakWord, "break-word") W(Anywhere, "anywhere") W(Initial, "initial") W(Inherit, "inherit")
@@ -71,10 +77,12 @@
     W(NoWrap, "nowrap") W(Pre, "pre") W(PreWrap, "pre-wrap") W(Initial, "initial") W(Inherit, "inherit")
 #define QORVEX_CSS_TRANSFORM_STYLE(W) W(Flat, "flat") W(Preserve3D, "preserve-3d")
 #define QORVEX_CSS_MASK_MODE(W) W(Auto, "auto") W(Alpha, "alpha") W(Luminance, "luminance")
-#define QORVEX_CSS_MASK_CLIP(W)                                                        \
-    W(ContentBox, "content-box")                                                       \
-    W(PaddingBox, "padding-box") W(BorderBox, "border-box") W(MarginBox, "margin-box") \
-        W(FillBox, "fill-box") W(StrokeBox, "stroke-box") W(ViewBox, "view-box") W(NoClip, "no-clip")
+#define QORVEX_CSS_MASK_CLIP(W)                                                                         \
+    W(ContentBox, "content-box")                                                                        \
+    W(PaddingBox, "padding-box")                                                                        \
+    W(BorderBox, "border-box")                                                                          \
+    W(MarginBox, "margin-box") W(FillBox, "fill-box") W(StrokeBox, "stroke-box") W(ViewBox, "view-box") \
+        W(NoClip, "no-clip")
 #define QORVEX_CSS_ANIMATION_FILL(W) \
     W(None, "none") W(Forwards, "forwards") W(Backwards, "backwards") W(Both, "both")
 #define QORVEX_CSS_ANIMATION_DIRECTION(W) \
@@ -83,17 +91,18 @@
 #define QORVEX_CSS_ANIMATION_PLAY_STATE(W) W(Running, "running") W(Paused, "paused")
 #define QORVEX_CSS_CURSOR(W)                                                                               \
     W(Alias, "alias")                                                                                      \
-    W(AllScroll, "all-scroll") W(Auto, "auto") W(Cell, "cell") W(ContextMenu, "context-menu")              \
-        W(ColResize, "col-resize") W(Copy, "copy") W(Crosshair, "crosshair") W(Default, "default")         \
-            W(EResize, "e-resize") W(EWResize, "ew-resize") W(Grab, "grab") W(Grabbing, "grabbing")        \
-                W(Help, "help") W(Move, "move") W(NResize, "n-resize") W(NEResize, "ne-resize")            \
-                    W(NESWResize, "nesw-resize") W(NSResize, "ns-resize") W(NWResize, "nw-resize")         \
-                        W(NWSEResize, "nwse-resize") W(NoDrop, "no-drop") W(None, "none")                  \
-                            W(NotAllowed, "not-allowed") W(Pointer, "pointer") W(Progress, "progress")     \
-                                W(RowResize, "row-resize") W(SResize, "s-resize") W(SEResize, "se-resize") \
-                                    W(SWResize, "sw-resize") W(Text, "text") W(Url, "URL")                 \
-                                        W(VerticalText, "vertical-text") W(WResize, "w-resize")            \
-                                            W(Wait, "wait") W(ZoomIn, "zoom-in") W(ZoomOut, "zoom-out")
+    W(AllScroll, "all-scroll")                                                                             \
+    W(Auto, "auto")                                                                                        \
+    W(Cell, "cell") W(ContextMenu, "context-menu") W(ColResize, "col-resize") W(Copy, "copy")              \
+        W(Crosshair, "crosshair") W(Default, "default") W(EResize, "e-resize") W(EWResize, "ew-resize")    \
+            W(Grab, "grab") W(Grabbing, "grabbing") W(Help, "help") W(Move, "move") W(NResize, "n-resize") \
+                W(NEResize, "ne-resize") W(NESWResize, "nesw-resize") W(NSResize, "ns-resize")             \
+                    W(NWResize, "nw-resize") W(NWSEResize, "nwse-resize") W(NoDrop, "no-drop")             \
+                        W(None, "none") W(NotAllowed, "not-allowed") W(Pointer, "pointer")                 \
+                            W(Progress, "progress") W(RowResize, "row-resize") W(SResize, "s-resize")      \
+                                W(SEResize, "se-resize") W(SWResize, "sw-resize") W(Text, "text")          \
+                                    W(Url, "URL") W(VerticalText, "vertical-text") W(WResize, "w-resize")  \
+                                        W(Wait, "wait") W(ZoomIn, "zoom-in") W(ZoomOut, "zoom-out")
 // Words that occur inside larger values.
 #define QORVEX_CSS_REPEAT_MODE(W) \
     W(Repeat, "repeat") W(Space, "space") W(Round, "round") W(NoRepeat, "no-repeat")

@@ -1,0 +1,171 @@
+// Declaration blocks and values.
+#include "core/limits.h"
+#include "css/parser/grammar.h"
+#include "css/values/custom_property.h"
+
+namespace qorvex::css {
+
+bool Grammar::ParseBlock(SyntaxList<DeclarationSyntax>& out) {
+    if (!Expect('{')) return false;
+    SkipSpace();
+    while (!token_.Is('}')) {
+        if (token_.kind == TokenKind::End) return Fail();
+        if (token_.Is(';')) {
+            Advance();
+            SkipSpace();
+            continue;
+        }
+        Outcome outcome = ParseDeclaration(out);
+        if (outcome == Outcome::Exhausted) return Fail("memory exhausted");
+        if (outcome == Outcome::Good) continue;
+        Fail();
+        while (token_.kind != TokenKind::End && !token_.Is(';') && !token_.Is('}'))
+            Advance();
+    }
+    Advance();
+    SkipSpace();
+    return true;
+}
+
+// Appended only when what follows may follow a declaration.
+Grammar::Outcome Grammar::ParseDeclaration(SyntaxList<DeclarationSyntax>& out) {
+    if (token_.kind != TokenKind::Ident && token_.kind != TokenKind::CustomIdent) return Outcome::Bad;
+    std::string_view name = token_.text;
+    Advance();
+    SkipSpace();
+    if (!token_.Is(':')) return Outcome::Bad;
+    Advance();
+    SkipSpace();
+    std::string_view value;
+    uint8_t flags = 0;
+    Outcome outcome = ParseValue(value, flags);
+    if (outcome != Outcome::Good) return outcome;
+    if (token_.kind == TokenKind::Important) {
+        flags |= kImportant;
+        Advance();
+        SkipSpace();
+    }
+    if (!token_.Is(';') && !token_.Is('}')) return Outcome::Bad;
+    DeclarationSyntax* declaration = arena_.Make<DeclarationSyntax>();
+    declaration->name = name;
+    declaration->value = value;
+    declaration->flags = flags;
+    out.Append(declaration);
+    return Outcome::Good;
+}
+
+bool Grammar::StartsTerm() const {
+    switch (token_.kind) {
+        case TokenKind::Number:
+        case TokenKind::Percentage:
+        case TokenKind::Numeric:
+        case TokenKind::String:
+        case TokenKind::Ident:
+        case TokenKind::CustomIdent:
+        case TokenKind::Uri:
+        case TokenKind::Hash:
+        case TokenKind::Function:
+            return true;
+        default:
+            return token_.Is('(');
+    }
+}
+
+namespace {
+
+// Builds the normalised text of a value. As long as that equals the text as written it is a slice of it;
+// copying into the arena starts with the first difference.
+class ValueText {
+  public:
+    explicit ValueText(ParserArena& arena) : arena_(arena) {}
+
+    void Append(std::string_view piece) {
+        if (!copied_ && (slice_.empty() || slice_.data() + slice_.size() == piece.data())) {
+            slice_ = slice_.empty() ? piece : std::string_view(slice_.data(), slice_.size() + piece.size());
+            return;
+        }
+        StartCopy();
+        arena_.AppendText(piece);
+    }
+    // One space, then the piece.
+    void AppendTerm(std::string_view piece) {
+        const char* end = slice_.data() + slice_.size();
+        if (!copied_ && end + 1 == piece.data() && *end == ' ') {
+            slice_ = {slice_.data(), slice_.size() + 1 + piece.size()};
+            return;
+        }
+        StartCopy();
+        arena_.AppendText(" ");
+        arena_.AppendText(piece);
+    }
+    std::string_view Finish() { return copied_ ? arena_.FinishText() : slice_; }
+
+  private:
+    void StartCopy() {
+        if (copied_) return;
+        copied_ = true;
+        arena_.BeginText();
+        arena_.AppendText(slice_);
+    }
+
+    ParserArena& arena_;
+    std::string_view slice_;
+    bool copied_ = false;
+};
+
+bool IsOperator(const Token& token) {
+    return token.Is('/') || token.Is(',') || token.Is('+') || token.Is('-') || token.Is('*');
+}
+
+}  // namespace
+
+// Terms and operators in turn. Parentheses and functions only raise a counter: whatever they hold has the
+// same form, and behind a ")" the same may follow as behind any term.
+Grammar::Outcome Grammar::ParseValue(std::string_view& text, uint8_t& flags) {
+    enum class State { NeedsTerm, FunctionOpened, AfterTerm } state = State::NeedsTerm;
+    ValueText value(arena_);
+    size_t depth = 0;
+    bool signPending = false;
+    for (;; Advance()) {
+        if (token_.kind == TokenKind::Space) {
+            signPending = false;
+            continue;
+        }
+        if (StartsTerm()) {
+            if (state == State::AfterTerm)
+                value.AppendTerm(token_.text);
+            else
+                value.Append(token_.text);
+            signPending = false;
+            state = State::AfterTerm;
+            if (token_.kind == TokenKind::Function) {
+                if (token_.text.find("var(") != std::string_view::npos) flags |= kHasVar;
+                if (token_.text.find("calc(") != std::string_view::npos) flags |= kHasCalc;
+                state = State::FunctionOpened;
+            } else if (token_.Is('(')) {
+                state = State::NeedsTerm;
+            }
+            if (state != State::AfterTerm && ++depth > limits::kMaxCssNesting) return Outcome::Exhausted;
+        } else if (token_.Is(')') && depth > 0) {
+            if (state == State::NeedsTerm) return Outcome::Bad;
+            value.Append(token_.text);
+            --depth;
+            state = State::AfterTerm;
+        } else if (IsOperator(token_) && state == State::AfterTerm) {
+            value.Append(token_.text);
+            state = State::NeedsTerm;
+        } else if ((token_.Is('+') || token_.Is('-')) && state != State::AfterTerm && !signPending) {
+            // A sign of its own before a term.
+            value.Append(token_.text);
+            signPending = true;
+            state = State::NeedsTerm;
+        } else {
+            break;
+        }
+    }
+    if (state != State::AfterTerm || depth > 0) return Outcome::Bad;
+    text = value.Finish();
+    return Outcome::Good;
+}
+
+}  // namespace qorvex::css

@@ -1,0 +1,233 @@
+// Sheets as data: what stands after a parse, where it ends, and what is logged.
+#include "css/parser/sheet_dump.h"
+#include "support/scoped_library_state.h"
+
+namespace qorvex::css {
+namespace {
+
+using test::QorvexTest;
+
+class SheetTest : public QorvexTest {
+  protected:
+    std::string Parse(std::string_view text) { return Dump(*MakeStylesheet(text, "", *strings_)); }
+
+    std::unique_ptr<StringPool> strings_ = std::make_unique<StringPool>();
+};
+
+struct Case {
+    const char* text;
+    const char* expected;
+};
+
+constexpr Case kCases[] = {
+    // Selectors
+    {"DIV.a#b, * > p + my-tag ~ .c .d {top:0}", "DIV.a#b{top:0px;}.d .c~<my-tag>+P>*{top:0px;}"},
+    {"[Data-X][a~='b c'][d|=e i] {top:0}", "[data:x][a~=b c][d|=e i]{top:0px;}"},
+    {"[a=b x], b {top:0}", "B{top:0px;}"},
+    {"a:HOVER:root::selection{color:red; width:1px}",
+     "A:hover:root::selection{selection-color:rgba(255, 0, 0, 1.000000);}"},
+    {"x-y::selection, b { Color: red; background-COLOR: blue; top: 0 }",
+     "<x-y>::selection{selection-color:rgba(255, 0, 0, 1.000000);selection-background-color:rgba(0, 0, 255, "
+     "1.000000);}B{top:0px;}"},
+    {"a:visited, b {top:0} :not(.a:nth-child(odd) > b) {top:0} c{top:0}", "B{top:0px;}"},
+    {"a:visited{top:0} div{top:0}", "DIV{top:0px;}"},
+    {"bogus, b{top:0}", "B{top:0px;}"},
+    // Declarations
+    {"a{color:red;;width:1px!important}", "A{color:rgba(255, 0, 0, 1.000000);width:1px!;}"},
+    {"a { color: red; @media x }", "A{color:rgba(255, 0, 0, 1.000000);}"},
+    {"a { 5: x; top: 0; left }", "A{top:0px;}"},
+    {"a { font-family: only; top: 0 }", "A{top:0px;}"},
+    {"a { width: 1e3px; top: 0 }", "A{top:0px;}"},
+    {"a { Color: red; color: RED }", "A{color:rgba(255, 0, 0, 1.000000);}"},
+    {"a { top: 1px) ; left: 2px }", "A{left:2px;}"},
+    {"a { top: ; left: 2px !important x; right: 0 }", "A{right:0px;}"},
+    {"a { display: block; display: inline-block }", "A{display:block;}"},
+    {"a { top: 1px // x; left: 2px\n; right: 3px /* ; */ }", "A{top:1px;right:3px;}"},
+    {"a { margin:1px  2px }", "A{margin-bottom:1px;margin-left:2px;margin-right:2px;margin-top:1px;}"},
+    {"a { transform : translate( 1px , 2px )  rotate(3deg) }",
+     "A{transform:translate3d(1px, 2px, 0px) rotateZ(3deg);}"},
+    {"a { border-radius: 1px / 2px }",
+     "A{border-top-left-radius:1px 2px;border-top-right-radius:1px 2px;border-bottom-left-radius:1px 2px;"
+     "border-bottom-right-radius:1px 2px;}"},
+    {"a { width: calc( 1px + var(--x) ) !important }", "A{width:calc(1px+var(--x))!;}"},
+    {"a { margin: var(--x); top: 0 }", "A{top:0px;}"},
+    {"a { }", ""},
+    {"a { color: bogus }", ""},
+    // Sheets
+    {"\xEF\xBB\xBF@charset \"x\"; <!-- @import url(a) ; a{top:0} --> b{top:0}", "A{top:0px;}B{top:0px;}"},
+    {"a{top:0} @import 'a.css'; b{top:0}", "A{top:0px;}"},
+    {"@import 'a'; @import 'b'; a{top:0}", ""},
+    {"a, b!! { color: red } c { color: blue }", ""},
+    {"a{top:0} @-webkit-keyframes x { } b{top:0}", "A{top:0px;}"},
+    {"@page :left { margin: 1px } a{top:0}", "A{top:0px;}"},
+    {"a{top:0} b{left:0", "A{top:0px;}"},
+    {"a{top:0} }b{left:0}", "A{top:0px;}"},
+    {"a{x:{y:1} z:2} b{left:0}", ""},
+    // Media
+    {"@media (min-width: 100px), (max-width: 50px) and (orientation:landscape) { a{top:0} }",
+     "@media(3,){A{top:0px;}}@media(4,7,){A{top:0px;}}"},
+    {"a{top:0} @media screen { a{top:0} } b{top:0}", "A{top:0px;}"},
+    {"@media (bogus: 1) { a{top:0} } b{top:0}", "B{top:0px;}"},
+    {"@media (min-aspect-ratio: 16/9) { } b{top:0}", ""},
+    {"@media (min-height: 1px) { @media (min-height: 1px) { a{top:0} } }", ""},
+    {"@media (aspect-ratio: 0) { a{top:0} } b{top:0}", "B{top:0px;}"},
+};
+
+TEST_F(SheetTest, StandsAfterAParse) {
+    for (const Case& c : kCases)
+        EXPECT_EQ(Parse(c.text), c.expected) << c.text;
+}
+
+TEST_F(SheetTest, SaysWhatIsWrong) {
+    static const struct {
+        const char* text;
+        const char* message;
+        Logging::Severity severity;
+    } kMessages[] = {
+        {"a{top:0} !", "CSS parsing error \"syntax error\" near text: !", Logging::Debug},
+        {"@media screen {a{top:0}}", "Media queries with media type are unsupported", Logging::Debug},
+        {"bogus{top:0}", "Unsupported CSS selector encountered: bogus", Logging::Warning},
+        {"a:visited{top:0}", "Unsupported pseudo CSS selector encountered: visited", Logging::Warning},
+        {"a::before{top:0}", "Unsupported pseudo CSS element encountered: before", Logging::Warning},
+        {"a{Color:red}", "Unsupported CSS property detected: Color", Logging::Trace},
+        {"a{top:x}", "Unable to parse declaration: ", Logging::Warning},
+        {"a{margin:x}", "Unable to parse shorthand declaration: ", Logging::Warning},
+        {"a{margin:var(--x)}",
+         "Custom CSS expressions are not supported in shorthand declaration: margin. Please use the long "
+         "versions of "
+         "the CSS property.",
+         Logging::Warning},
+        {"@media (aspect-ratio:1/0){a{top:0}}", "Unable to parse media aspect ratio: 1/0", Logging::Warning},
+        {"@media (min-width:1){a{top:0}}", "Unable to parse media length: 1", Logging::Warning},
+        {"@media (orientation:up){a{top:0}}", "Unable to parse media orientation: up", Logging::Warning},
+        {"@media (Width:1px){a{top:0}}", "Unable to parse media feature: Width", Logging::Warning},
+        {"@font-face{font-family:x;src:local(a)}", "Unable to parse src string for @font-face: local(a)",
+         Logging::Warning},
+        {"@font-face{font-weight:1001}",
+         "font-weight descriptor in @font-face declaration accepts only specific", Logging::Warning},
+        {"@keyframes k{from{width:1px}to{width:2%}}",
+         "Keyframe animations must use the same unit for the same property in all blocks - k-width: 2%",
+         Logging::Warning},
+    };
+    for (const auto& c : kMessages) {
+        log_.Clear();
+        Parse(c.text);
+        size_t found = 0;
+        for (const auto& line : log_.Lines())
+            found += line.severity == c.severity && line.text.find(c.message) != std::string::npos;
+        EXPECT_EQ(found, 1u) << c.text;
+    }
+}
+
+TEST_F(SheetTest, ReadsCustomPropertiesOnce) {
+    StylesheetPtr sheet = MakeStylesheet(
+        "a, b { --x: 1px  calc(2px); --x: 2px !important; --x: 3px; --: 1; --y:var(--x) }", "", *strings_);
+    ASSERT_EQ(sheet->rules.size(), 2u);
+    const CustomPropertyMap& map = sheet->rules[1].customProperties();
+    ASSERT_EQ(map.size(), 2u);
+    EXPECT_EQ((*map.get(strings_->Intern("x")))->text, "2px");
+    const CustomProperty& y = **map.get(strings_->Intern("y"));
+    EXPECT_EQ(y.flags, kHasVar);
+    ASSERT_EQ(y.references.size(), 1u);
+    EXPECT_EQ(y.references[0].length, y.text.size());
+}
+
+TEST_F(SheetTest, EditingOneRulesetLeavesItsSiblings) {
+    StylesheetPtr sheet = MakeStylesheet("a, b { top: 1px }", "", *strings_);
+    sheet->rules[0].MutableBlock().declarations.clear();
+    EXPECT_EQ(Dump(*sheet), "A{}B{top:1px;}");
+}
+
+TEST_F(SheetTest, KeyframesAndFontFaces) {
+    StylesheetPtr sheet = MakeStylesheet(
+        "@keyframes 'k' { from, 50% { margin: 1px; bogus: 1 } 50% { margin-top: 2px } to { margin-top: 3px } "
+        "}"
+        "@font-face { font-family: \"A B\"; src: local(x), url(f/a.ttf) format('x'); font-weight: bold; "
+        "font-style: italic }",
+        "ui://ui/css/main.css", *strings_);
+    ASSERT_EQ(sheet->keyframes.size(), 1u);
+    const KeyframesRule& rule = sheet->keyframes[0];
+    EXPECT_EQ(rule.name, "k");
+    ASSERT_EQ(rule.tracks.size(), 4u);
+    const KeyframeTrack& top = rule.tracks[3];
+    ASSERT_EQ(top.property, PropertyId::MarginTop);
+    ASSERT_EQ(top.frames.size(), 3u);
+    EXPECT_EQ(top.frames[1].offset, 0.5f);
+    EXPECT_EQ(top.frames[1].value.Get<PropertyId::MarginTop>().value, 2);
+    EXPECT_EQ(top.frames[2].offset, 1);
+    ASSERT_EQ(sheet->fontFaces.size(), 1u);
+    const FontFace& face = sheet->fontFaces[0];
+    EXPECT_EQ(face.family, "A B");
+    EXPECT_EQ(face.url, "ui://ui/css/f/a.ttf");
+    EXPECT_EQ(face.weight, 700);
+    EXPECT_EQ(face.style, FontStyle::Italic);
+}
+
+TEST_F(SheetTest, ImageUrlsBecomeAbsolute) {
+    StylesheetPtr sheet = MakeStylesheet(
+        "a { background-image: url(../i/a.png), url('data:image/png;base64,AA'); mask-image: "
+        "url(http://x/b.png) }",
+        "ui://ui/css/main.css", *strings_);
+    EXPECT_EQ(sheet->imageUrls.size(), 3u);
+    EXPECT_TRUE(sheet->imageUrls.contains("ui://ui/i/a.png"));
+    EXPECT_TRUE(sheet->imageUrls.contains("data:image/png;base64,AA"));
+    EXPECT_TRUE(sheet->imageUrls.contains("http://x/b.png"));
+}
+
+TEST_F(SheetTest, InlineStylesSelectorsAndMediaTexts) {
+    auto inlineText = [&](std::string_view text) {
+        return std::string(ConvertInlineStyle(*ParseInlineStyle(text), "", *strings_).ToText().view());
+    };
+    EXPECT_EQ(inlineText("width:1px; width : 2px;--a:b"), "width: 2px; --a: b; ");
+    EXPECT_EQ(inlineText("width:1px!important;width:2px"), "width: 1px !important; ");
+    EXPECT_EQ(inlineText("/* x */"), "");
+    EXPECT_EQ(inlineText(""), "");
+    EXPECT_EQ(inlineText("top:0} b{left:0"), "");
+    EXPECT_FALSE(ParseInlineStyle("top:0")->HasError());
+
+    auto selectors = [&](std::string_view text) {
+        std::string out;
+        auto list = ConvertSelector(*ParseSelector(text), *strings_);
+        if (!list) return std::string("invalid");
+        for (const ComplexSelector& selector : *list)
+            out += Dump(selector) + ";";
+        return out;
+    };
+    EXPECT_EQ(selectors(" a > b , .c"), "B>A;.c;");
+    EXPECT_EQ(selectors(""), "invalid");
+    EXPECT_EQ(selectors("a{top:0} b"), "invalid");
+    EXPECT_EQ(selectors("a{"), "invalid");
+    EXPECT_EQ(selectors(":visited"), "invalid");
+
+    auto media = ConvertMediaQuery(*ParseMediaQuery("(min-width: 10vw) and (bogus: 1)"));
+    ASSERT_TRUE(media);
+    ASSERT_EQ(media->size(), 1u);
+    EXPECT_EQ((*media)[0].length.value, 10);
+    for (const char* text : {"", "all", "(bogus: 1)", "(min-width"})
+        EXPECT_FALSE(ConvertMediaQuery(*ParseMediaQuery(text))) << text;
+}
+
+TEST_F(SheetTest, SpecificityOutranksByKind) {
+    auto of = [&](std::string_view text) {
+        return (*ConvertSelector(*ParseSelector(text), *strings_))[0].specificity.AsNumber();
+    };
+    EXPECT_EQ(of("#a.b[c]:hover p *"), 0x00010301u);
+    EXPECT_GT(of("#a"), of(".a.b.c p"));
+    std::string many;
+    for (int i = 0; i < 300; ++i)
+        many += ".a";
+    EXPECT_LT(of(many), of("#a"));
+    EXPECT_TRUE((*ConvertSelector(*ParseSelector("my-tag"), *strings_))[0].IsQuick());
+    EXPECT_FALSE((*ConvertSelector(*ParseSelector("[a]"), *strings_))[0].IsQuick());
+}
+
+TEST_F(SheetTest, MakesSingleDeclarations) {
+    auto width = MakeDeclaration(PropertyId::Width, " calc(1px + 2px) ", *strings_);
+    ASSERT_TRUE(width);
+    EXPECT_EQ(width->kind(), DeclarationKind::CustomExpression);
+    EXPECT_FALSE(MakeDeclaration(PropertyId::Margin, "1px", *strings_));
+    EXPECT_EQ(log_.Count("You can't create css declarations from short hand"), 1u);
+}
+
+}  // namespace
+}  // namespace qorvex::css
