@@ -1,0 +1,139 @@
+// What a solve costs, by counting the work and the memory; nothing here is timed.
+#include <set>
+
+#include "css/style/style_fixture.h"
+#include "dom/character_data.h"
+
+namespace qorvex::css::test {
+namespace {
+
+class WorkCount : public StyleTest {};
+
+std::string Rows(int count) {
+    std::string body;
+    for (int i = 0; i < count; ++i)
+        body += "<div class='row'><span class='cell'>text</span></div>";
+    return body;
+}
+constexpr std::string_view kSheet =
+    ".row { width: 50px; background-color: red } .cell { padding-left: 2px; color: blue } .on { width: 60px }"
+    ".big { font-size: 20px }";
+
+TEST_F(WorkCount, EqualElementsShareTheirGroups) {
+    Load(Rows(500), kSheet);
+    const StyleCounters first = Counted([&] { Solve(); });
+    EXPECT_GE(first.stylesShared, 990u);
+    std::set<const void*> layouts, visuals, texts, textNodeVisuals;
+    for (dom::Node* node = &Body(); node; node = node->GetNextInTree(&Body())) {
+        const LayoutStyleRefs& style = node->GetStyle();
+        layouts.insert(style.layout.get());
+        texts.insert(style.text.get());
+        (node->IsText() ? textNodeVisuals : visuals).insert(style.visual.get());
+    }
+    EXPECT_LE(layouts.size(), 4u);  // body, row, cell, text
+    EXPECT_LE(visuals.size(), 2u);
+    EXPECT_LE(texts.size(), 2u);
+    EXPECT_EQ(textNodeVisuals.size(), 1u);
+}
+
+TEST_F(WorkCount, OneChangeCostsTheSameInALargePage) {
+    StyleCounters work[2];
+    for (const int rows : {50, 2000}) {
+        Load(Rows(rows), kSheet);
+        Solve();
+        auto& row = static_cast<dom::Element&>(*Body().GetFirstChild());
+        work[rows > 50] = Counted([&] {
+            row.AddClass("on");
+            Solve();
+        });
+        EXPECT_EQ(Computed(row, "width"), "60px");
+    }
+    EXPECT_EQ(work[1].elementsMatched, 1u);
+    EXPECT_EQ(work[0].elementsMatched, work[1].elementsMatched);
+    EXPECT_EQ(work[0].propertiesApplied, work[1].propertiesApplied);
+    EXPECT_EQ(work[1].propertiesChanged, 1u);
+}
+
+TEST_F(WorkCount, AnEqualValueCopiesNoGroup) {
+    Load("<p id='a' class='cell'></p><p id='b' class='cell'></p>", kSheet);
+    Solve();
+    const void* group = Find("a").GetStyle().text.get();
+    const StyleCounters work = Counted([&] {
+        Find("a").SetAttribute("style", "color: blue");
+        Solve();
+    });
+    EXPECT_EQ(work.propertiesChanged, 0u);
+    EXPECT_EQ(Find("a").GetStyle().text.get(), group);
+    EXPECT_EQ(Find("b").GetStyle().text.get(), group);
+}
+
+TEST_F(WorkCount, AnInheritedChangeChangesOnlyWhoHasNoValueOfItsOwn) {
+    Load("<div id='top'>" + Rows(300) + "</div>", kSheet);
+    Solve();
+    const StyleCounters work = Counted([&] {
+        Find("top").SetAttribute("style", "color: green");
+        Solve();
+    });
+    EXPECT_EQ(work.elementsMatched, 1u);
+    EXPECT_LE(work.propertiesApplied, 601u + 20u);
+    EXPECT_EQ(work.propertiesChanged, 301u);  // the top and its rows; the cells have their own colour
+}
+
+TEST_F(WorkCount, AColourChangeDoesNotLayOutText) {
+    Load("<div id='top'>text</div>", kSheet);
+    Solve();
+    document_->UpdateLayoutStyles(false);
+    Solve();
+    document_->UpdateLayoutStyles(false);
+    Find("top").SetAttribute("style", "color: green");
+    Solve();
+    EXPECT_EQ(document_->UpdateLayoutStyles(false), layout::LayoutWork::VisualStyle);
+    Find("top").SetAttribute("style", "color: green; letter-spacing: 2px");
+    Solve();
+    EXPECT_EQ(document_->UpdateLayoutStyles(false), layout::LayoutWork::Layout);
+    Find("top").SetAttribute("style", "color: green; letter-spacing: 2px; transform: translateX(1px)");
+    Solve();
+    EXPECT_EQ(document_->UpdateLayoutStyles(false), layout::LayoutWork::Transforms);
+}
+
+TEST_F(WorkCount, ASteadyPageAllocatesNothing) {
+    Load(Rows(200), kSheet);
+    Solve();
+    const Atom on = host_->strings.Intern("on");
+    auto& row = static_cast<dom::Element&>(*Body().GetFirstChild());
+    const auto toggle = [&] {
+        if (row.HasClass(on)) {
+            row.RemoveClass("on");
+        } else {
+            row.AddClass("on");
+        }
+        Solve();
+        document_->GetStyleRunLists().Clear();
+    };
+    for (int i = 0; i < 8; ++i)
+        toggle();
+    const uint64_t before = allocator_.Allocations();
+    for (int i = 0; i < 8; ++i)
+        toggle();
+    EXPECT_EQ(allocator_.Allocations(), before);
+
+    document_->RequestFullStyleSolve();
+    Solve();
+    const uint64_t beforeFull = allocator_.Allocations();
+    document_->RequestFullStyleSolve();
+    Solve();
+    EXPECT_EQ(allocator_.Allocations(), beforeFull);
+}
+
+TEST_F(WorkCount, QuickRefusalTriesNoRuleOfOtherIdsAndTags) {
+    std::string sheet;
+    for (int i = 0; i < 200; ++i)
+        sheet += "#n" + std::to_string(i) + ":hover { width: 1px } ";
+    Load("<p id='n7'></p>", sheet);
+    host_->hovered = &Find("n7");
+    EXPECT_EQ(Computed("n7", "width"), "1px");
+    EXPECT_EQ(engine_->GetAuthorRules().GetComplexKeys().size(), 200u);
+}
+
+}  // namespace
+}  // namespace qorvex::css::test
