@@ -62,22 +62,11 @@ void ClipToPaddingBox(const LayoutNode& node, const PaintContext& context, Comma
     }
 }
 
-// The areas of the children: cut by the node's clip, or all that a filter may spread into view.
+// The areas of the children: those of the node, cut by its clip.
 class ChildAreas {
   public:
-    ChildAreas(const LayoutNode& node, const PaintContext& context, Areas areas) {
-        const css::VisualStyle& visual = *node.style.visual;
-        // Neither the filter nor the client's effect says which pixels it needs, so it gets all of them.
-        if (!visual.filter.empty() || !visual.customEffectName.empty()) {
-            rects_[count_++] = node.visualAabb;
-            areas = {rects_.data(), 1};
-        }
-        if (!node.flags.shouldOverflowClip) {
-            if (count_ == 0)
-                count_ = static_cast<uint32_t>(std::copy(areas.begin(), areas.end(), rects_.begin()) -
-                                               rects_.begin());
-            return;
-        }
+    ChildAreas(const LayoutNode& node, const PaintContext& context, Areas areas) : areas_(areas) {
+        if (!node.flags.shouldOverflowClip) return;
         const Rect clip =
             layout::RoundOut(layout::MapBounds(node.world, ClipBox(node, context.snapToPixels)));
         uint32_t kept = 0;
@@ -85,14 +74,19 @@ class ChildAreas {
             const Rect cut = layout::Intersection(area, clip);
             if (!layout::IsEmpty(cut)) rects_[kept++] = cut;
         }
-        count_ = kept;
+        areas_ = {rects_.data(), kept};
     }
-    Areas Get() const { return {rects_.data(), count_}; }
+    Areas Get() const { return areas_; }
 
   private:
     std::array<Rect, DirtyRegion::kScissorCount> rects_;
-    uint32_t count_ = 0;
+    Areas areas_;
 };
+
+// Neither a filter nor the client's effect says which pixels it needs for those in sight.
+bool NeedsWholeContent(const LayoutNode& node) {
+    return !node.style.visual->filter.empty() || !node.style.visual->customEffectName.empty();
+}
 
 void PushChildState(const LayoutNode& node, const PaintContext& context, StateScope& scope,
                     CommandBuffer& buffer) {
@@ -159,7 +153,7 @@ void RecordNode(const LayoutNode& node, PaintContext& context, Areas areas, Comm
         context.lengths.em = node.style.text->computedFontSize;
         buffer = OpenLayer(node, context, buffer);
     }
-    RecordContent(node, context, areas, *buffer);
+    RecordContent(node, context, NeedsWholeContent(node) ? Areas(&node.visualAabb, 1) : areas, *buffer);
     if (hasLayer) buffer = CloseLayer(node, buffer);
     if (node.local) buffer->PopState();
 }

@@ -63,8 +63,10 @@ void PaintOuterShadow(PaintContext& context, const BoxShape& shape, const Resolv
         FillRounded(*target, {margin, margin, 0, rect.width, rect.height}, radii, SolidPaint(color));
         target->ApplyBlur(shadow.blur);
     }
-    const Rect source{0, 0, 0, static_cast<float>(surface.width), static_cast<float>(surface.height)};
-    const Rect destination{rect.x - margin, rect.y - margin, 0, source.width, source.height};
+    // Not the whole surface, whose size was rounded up: the blur may reach into the rest, but the bounds of
+    // the node do not.
+    const Rect source{0, 0, 0, rect.width + 2 * margin, rect.height + 2 * margin};
+    const Rect destination = Grown(rect, margin);
     buffer.DrawSurface(surface.surface, source, destination, fresco::Paint());
 }
 
