@@ -151,6 +151,7 @@ class Element : public Node {
     Element(ForDocument, Document& document);
 
   private:
+    void InstallHandlerAttribute(Atom name, Atom value);
     enum class Store { Id, Class, Style, Plain };
     static Store StoreOf(Atom name);
     void SetId(Atom id);

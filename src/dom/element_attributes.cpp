@@ -10,7 +10,9 @@
 #include "dom/node_list.h"
 #include "dom/observer_hooks.h"
 #include "dom/style_engine.h"
+#include "script/inline_handler_attribute.h"
 #include "script/make_handle.h"
+#include "script/scripting_context.h"
 
 namespace qorvex::dom {
 
@@ -193,8 +195,11 @@ void Element::RemoveAttribute(std::string_view name) {
     if (document.inspector) document.inspector->OnAttributeRemoved(*this, name);
 }
 
-void Element::AttributeChanged(AttributeName name, std::optional<Atom> old_value, std::optional<Atom>) {
+void Element::AttributeChanged(AttributeName name, std::optional<Atom> old_value,
+                               std::optional<Atom> new_value) {
     Document& document = *GetDocument();
+    if (new_value && !name.is_data && script::IsInlineHandlerName(name.name.view()))
+        InstallHandlerAttribute(name.name, *new_value);
     const IStyleEngine& style = document.GetStyleEngine();
     if (IsInDocument() &&
         (name.is_data ? style.IsSelectorDataAttribute(name.name) : style.IsSelectorAttribute(name.name)))
@@ -208,6 +213,17 @@ void Element::AttributeChanged(AttributeName name, std::optional<Atom> old_value
         }
         document.mutationRegistry->QueueAttribute(*this, full, old_value);
     }
+}
+
+// onclick="...": the handler is a property of the element's script object.
+void Element::InstallHandlerAttribute(Atom name, Atom value) {
+    const script::ScriptingContext* page = GetDocument()->GetDocumentContext();
+    if (!page || !page->context) return;
+    JSValueRef wrapper = nullptr;
+    GetOrCreateWrapper(page->context, &wrapper);
+    if (wrapper)
+        script::InstallInlineHandler(page->context, const_cast<JSObjectRef>(wrapper), name.view(),
+                                     value.view());
 }
 
 size_t Element::GetAttributeCount() const {

@@ -1,9 +1,15 @@
 #include "dom/event.h"
 
+#include "dom/event_target.h"
+
 namespace qorvex::dom {
 
 Event::Event(Document* document, Atom type, bool bubbles, bool cancelable)
     : type_(type), bubbles_(bubbles), cancelable_(cancelable), document_(document) {}
+
+EventTarget* Event::GetTarget() const {
+    return target_ ? target_ : last_target_.get();
+}
 
 // https://dom.spec.whatwg.org/#dom-event-initevent
 void Event::InitEvent(Atom type, bool bubbles, bool cancelable) {

@@ -21,8 +21,8 @@ class Event : public script::ScriptingHandleEnabledRefCounted {
     bool GetCancelable() const { return cancelable_; }
     bool GetDefaultPrevented() const { return default_prevented_; }
     EventPhase GetPhase() const { return phase_; }
-    // Neither is counted: both are as dispatch left them.
-    EventTarget* GetTarget() const { return target_; }
+    // The target stays known after dispatch as long as it lives; the current target is none then.
+    EventTarget* GetTarget() const;
     EventTarget* GetCurrentTarget() const { return current_target_; }
     Document* GetDocument() const { return document_; }
     // What the client passed with the input that caused the event.
@@ -49,7 +49,8 @@ class Event : public script::ScriptingHandleEnabledRefCounted {
     bool default_prevented_ = false;
     bool script_constructed_ = false;  // such an event never reaches the client's callbacks
     EventPhase phase_ = EventPhase::None;
-    EventTarget* target_ = nullptr;
+    EventTarget* target_ = nullptr;  // while dispatched
+    script::WeakHandle<EventTarget> last_target_;
     EventTarget* current_target_ = nullptr;
     Document* document_ = nullptr;
     void* user_data_ = nullptr;

@@ -23,7 +23,8 @@ bool EventDispatcher::Dispatch() {
     if (!node_ || !event_.propagation_stopped_) AtTarget();
     if (node_ && event_.bubbles_ && !event_.propagation_stopped_) Bubble();
     RunDefaultActions();
-    event_.target_ = &target_;
+    event_.target_ = nullptr;
+    event_.last_target_ = &target_;
     event_.current_target_ = nullptr;
     event_.phase_ = EventPhase::None;
     return !event_.default_prevented_;
