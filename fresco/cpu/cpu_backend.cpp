@@ -149,10 +149,12 @@ void CpuBackend::PopState(const PopStateRecord&, const NoneTail&) {
 }
 
 void CpuBackend::CreateSurface(const CreateSurfaceRecord& record, const NoneTail&) {
-    // The stream's own target must not move under it.
-    if (surface_ && shared_.resources.FindSurface(record.surface) == surface_) return;
+    if (record.surface != stream_->GetTarget()) return shared_.resources.CreateSurface(record);
+    // A buffer may make the surface that it draws into: from here on it starts afresh on the new one. Inside
+    // of a layer the target must not move.
+    if (!layers_.empty()) return;
     shared_.resources.CreateSurface(record);
-    if (surface_) surface_ = shared_.resources.FindSurface(stream_->GetTarget());
+    BeginTarget(record.surface);
 }
 
 void CpuBackend::CreateImage(const CreateImageRecord& record, const NoneTail&) {

@@ -2,9 +2,9 @@
 #include <cmath>
 #include <random>
 
+#include <fresco/command_records.h>
 #include <gtest/gtest.h>
 #include "canvas.h"
-#include <fresco/command_records.h>
 #include "fresco/commands/validate.h"
 #include "fresco/cpu/replay.h"
 

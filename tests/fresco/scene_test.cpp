@@ -131,6 +131,11 @@ TEST(Scene, ImagesSurfacesMasksAndTiles) {
     resources->CreateImage(image, {2, 2, PixelFormat::RGBA8, 0, 0, checker});
     resources->CreateSurface(surface, {8, 8, PixelFormat::RGBA8}, 0);
     canvas.Draw(resources);
+    const SurfaceId own = Library::GetSurfaceName();
+    CommandBuffer* makes = Library::CreateBufferForSurface(own, 256, 0);
+    makes->CreateSurface(own, {4, 4, PixelFormat::RGBA8}, 0);
+    makes->FillRect({0, 0, 0, 4, 4}, Solid(0, 0, 1));
+    canvas.Draw(makes);
     CommandBuffer* onSurface = Library::CreateBufferForSurface(surface, 256, 0);
     onSurface->ClearRect({}, 1);
     onSurface->FillRect({0, 0, 0, 8, 4}, Solid(1, 0, 0));
@@ -140,6 +145,7 @@ TEST(Scene, ImagesSurfacesMasksAndTiles) {
     b->DrawImage(image, {0, 0, 0, 2, 2}, {}, Paint{});
     b->DrawImageTiled(image, {10, 0, 0, 6, 6}, {{}, {10, 0, 0, 2, 2}, 0, 0}, Paint{});
     b->DrawSurface(surface, {}, {20, 0, 0, 8, 8}, Paint{});
+    b->DrawSurface(own, {}, {60, 0, 0, 4, 4}, Paint{});
     b->DrawImage(image, {30, 0, 0, 20, 20}, {0, 0, 0, 1, 1},
                  Paint{});  // one texel, stretched: no neighbour bleeds in
     b->BeginLayer(kLayerContent, MakeLayerPaint(1));
@@ -153,6 +159,7 @@ TEST(Scene, ImagesSurfacesMasksAndTiles) {
     EXPECT_EQ(canvas.At(14, 5), kBlue);
     EXPECT_EQ(canvas.At(23, 2), kRed);
     EXPECT_EQ(canvas.At(23, 6), kNone);
+    EXPECT_EQ(canvas.At(61, 1), kBlue);
     EXPECT_EQ(canvas.At(49, 19), kRed);
     EXPECT_EQ(canvas.At(5, 35), kWhite);
     EXPECT_EQ(canvas.At(15, 35), kNone);

@@ -93,7 +93,8 @@ class CommandBuffer {
     virtual void MultiplyTransform(const Matrix4& matrix) = 0;
     virtual void FlattenTransform() = 0;
     virtual void GetTransform(Matrix4* matrix) const = 0;
-    // Flag 1: keep the content when a surface of this id and size exists already.
+    // Flag 1: keep the content when a surface of this id and size exists already. A buffer may create the
+    // surface that it draws into, as its first command.
     virtual void CreateSurface(SurfaceId surface, const SurfaceDescription& description, uint32_t flag) = 0;
     // `source` in pixels of the surface; width 0: all of it.
     virtual void DrawSurface(SurfaceId surface, const Rect& source, const Rect& destination,
