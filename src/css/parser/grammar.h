@@ -54,7 +54,7 @@ class Grammar {
     Outcome ParseValue(std::string_view& text, uint8_t& flags);
     bool StartsTerm() const;
 
-    void Advance() { token_ = scanner_.Next(); }
+    void Advance() { scanner_.Next(token_); }
     void SkipSpace() {
         while (token_.kind == TokenKind::Space)
             Advance();

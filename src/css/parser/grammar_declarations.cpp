@@ -30,7 +30,7 @@ bool Grammar::ParseBlock(SyntaxList<DeclarationSyntax>& out) {
 // Appended only when what follows may follow a declaration.
 Grammar::Outcome Grammar::ParseDeclaration(SyntaxList<DeclarationSyntax>& out) {
     if (token_.kind != TokenKind::Ident && token_.kind != TokenKind::CustomIdent) return Outcome::Bad;
-    std::string_view name = token_.text;
+    std::string_view name = token_.text();
     Advance();
     SkipSpace();
     if (!token_.Is(':')) return Outcome::Bad;
@@ -133,14 +133,14 @@ Grammar::Outcome Grammar::ParseValue(std::string_view& text, uint8_t& flags) {
         }
         if (StartsTerm()) {
             if (state == State::AfterTerm)
-                value.AppendTerm(token_.text);
+                value.AppendTerm(token_.text());
             else
-                value.Append(token_.text);
+                value.Append(token_.text());
             signPending = false;
             state = State::AfterTerm;
             if (token_.kind == TokenKind::Function) {
-                if (token_.text.find("var(") != std::string_view::npos) flags |= kHasVar;
-                if (token_.text.find("calc(") != std::string_view::npos) flags |= kHasCalc;
+                if (token_.text().find("var(") != std::string_view::npos) flags |= kHasVar;
+                if (token_.text().find("calc(") != std::string_view::npos) flags |= kHasCalc;
                 state = State::FunctionOpened;
             } else if (token_.Is('(')) {
                 state = State::NeedsTerm;
@@ -148,15 +148,15 @@ Grammar::Outcome Grammar::ParseValue(std::string_view& text, uint8_t& flags) {
             if (state != State::AfterTerm && ++depth > limits::kMaxCssNesting) return Outcome::Exhausted;
         } else if (token_.Is(')') && depth > 0) {
             if (state == State::NeedsTerm) return Outcome::Bad;
-            value.Append(token_.text);
+            value.Append(token_.text());
             --depth;
             state = State::AfterTerm;
         } else if (IsOperator(token_) && state == State::AfterTerm) {
-            value.Append(token_.text);
+            value.Append(token_.text());
             state = State::NeedsTerm;
         } else if ((token_.Is('+') || token_.Is('-')) && state != State::AfterTerm && !signPending) {
             // A sign of its own before a term.
-            value.Append(token_.text);
+            value.Append(token_.text());
             signPending = true;
             state = State::NeedsTerm;
         } else {

@@ -59,7 +59,7 @@ bool Grammar::ParseSelector(SyntaxList<SelectorSyntax>& selectors) {
 
 bool Grammar::ParseSimpleSelector(CompoundSyntax& compound) {
     SimpleSelectorSyntax* simple = arena_.Make<SimpleSelectorSyntax>();
-    simple->text = token_.text;
+    simple->text = token_.text();
     switch (token_.kind) {
         case TokenKind::Ident:
             simple->kind = SimpleSelectorSyntaxKind::Type;
@@ -76,7 +76,7 @@ bool Grammar::ParseSimpleSelector(CompoundSyntax& compound) {
             simple->kind = SimpleSelectorSyntaxKind::PseudoElement;
             Advance();
             if (token_.kind != TokenKind::Ident) return Fail();
-            simple->text = token_.text;
+            simple->text = token_.text();
             break;
         default:
             if (token_.Is('*')) break;
@@ -91,7 +91,7 @@ bool Grammar::ParseSimpleSelector(CompoundSyntax& compound) {
 bool Grammar::ParsePseudo(SimpleSelectorSyntax& simple) {
     simple.kind = SimpleSelectorSyntaxKind::PseudoClass;
     Advance();
-    simple.text = token_.text;
+    simple.text = token_.text();
     if (token_.kind == TokenKind::Function) return ParsePseudoArgument(simple);
     if (token_.kind != TokenKind::Ident) return Fail();
     Advance();
@@ -105,7 +105,7 @@ bool Grammar::ParsePseudoArgument(SimpleSelectorSyntax& simple) {
     size_t depth = 1;
     Advance();
     SkipSpace();
-    const char* start = token_.text.data();
+    const char* start = token_.text().data();
     bool needsCompound = true;
     while (depth > 0) {
         if (needsCompound ? StartsCompound(token_) : StartsSimple(token_)) {
@@ -138,7 +138,7 @@ bool Grammar::ParsePseudoArgument(SimpleSelectorSyntax& simple) {
             needsCompound = true;
         } else if (token_.Is(')')) {
             --depth;
-            simple.argument = {start, static_cast<size_t>(token_.text.data() - start)};
+            simple.argument = {start, static_cast<size_t>(token_.text().data() - start)};
             Advance();
         } else {
             return Fail();
@@ -152,7 +152,7 @@ bool Grammar::ParseAttribute(SimpleSelectorSyntax& simple) {
     Advance();
     SkipSpace();
     if (token_.kind != TokenKind::Ident) return Fail();
-    simple.text = token_.text;
+    simple.text = token_.text();
     Advance();
     SkipSpace();
     if (!token_.Is(']')) {
@@ -179,11 +179,11 @@ bool Grammar::ParseAttribute(SimpleSelectorSyntax& simple) {
         Advance();
         SkipSpace();
         if (token_.kind != TokenKind::Ident && token_.kind != TokenKind::String) return Fail();
-        simple.value = token_.text;
+        simple.value = token_.text();
         Advance();
         SkipSpace();
         if (token_.kind == TokenKind::Ident) {
-            simple.flag = token_.text;
+            simple.flag = token_.text();
             Advance();
             SkipSpace();
         }

@@ -5,7 +5,7 @@
 namespace qorvex::css {
 
 bool Grammar::Fail(std::string_view message) {
-    LogDebug("CSS parsing error \"", message, "\" near text: ", token_.text);
+    LogDebug("CSS parsing error \"", message, "\" near text: ", token_.text());
     context_.hasError_ = true;
     return false;
 }
@@ -107,7 +107,7 @@ bool Grammar::ParseKeyframes() {
     SkipSpace();
     if (token_.kind != TokenKind::Ident && token_.kind != TokenKind::String) return Fail();
     KeyframesSyntax* keyframes = arena_.Make<KeyframesSyntax>();
-    keyframes->name = token_.text;
+    keyframes->name = token_.text();
     Advance();
     SkipSpace();
     if (!Expect('{')) return false;
@@ -126,7 +126,7 @@ bool Grammar::ParseKeyframeBlock(KeyframesSyntax& keyframes) {
     for (;;) {
         if (token_.kind != TokenKind::Percentage && token_.kind != TokenKind::Ident) return Fail();
         KeyframeSelectorSyntax* selector = arena_.Make<KeyframeSelectorSyntax>();
-        selector->text = token_.text;
+        selector->text = token_.text();
         block->selectors.Append(selector);
         Advance();
         SkipSpace();
@@ -179,7 +179,7 @@ bool Grammar::ParseMediaExpression(MediaQuerySyntax& query) {
     SkipSpace();
     if (token_.kind != TokenKind::Ident) return Fail();
     MediaExpressionSyntax* expression = arena_.Make<MediaExpressionSyntax>();
-    expression->name = token_.text;
+    expression->name = token_.text();
     Advance();
     SkipSpace();
     if (!Expect(':')) return false;

@@ -8,7 +8,14 @@ namespace qorvex::css {
 
 namespace {
 
-enum CharClass : uint8_t { kNameByte = 1, kNameStart = 2, kDigit = 4, kSpace = 8, kUrlByte = 16 };
+enum CharClass : uint8_t {
+    kNameByte = 1,
+    kNameStart = 2,
+    kDigit = 4,
+    kSpace = 8,
+    kUrlByte = 16,
+    kAlone = 32
+};
 
 consteval std::array<uint8_t, 256> BuildClasses() {
     std::array<uint8_t, 256> classes{};
@@ -23,6 +30,8 @@ consteval std::array<uint8_t, 256> BuildClasses() {
         if (c == ' ' || c == '\t' || c == '\n' || c == '\r' || c == '\f') bits |= kSpace;
         bool url = c == '!' || (c >= '#' && c <= '&') || (c >= '*' && c <= '~' && c != '\\') || c >= 128;
         if (url) bits |= kUrlByte;
+        // Bytes that are a token of their own whatever follows.
+        if (c == ';' || c == '{' || c == '}' || c == '(' || c == ')' || c == ',' || c == '>') bits |= kAlone;
         classes[static_cast<size_t>(c)] = bits;
     }
     return classes;
@@ -115,18 +124,12 @@ bool Scanner::FindStringEnd(const char* quote, const char*& end) const {
     return false;
 }
 
-Token Scanner::Take(TokenKind kind, const char* end) {
-    Token token{kind, {at_, static_cast<size_t>(end - at_)}};
-    at_ = end;
-    return token;
-}
-
-Token Scanner::TakeIdent() {
+void Scanner::TakeIdent(Token& out) {
     const char* end = SkipName(at_);
     std::string_view text(at_, static_cast<size_t>(end - at_));
     if (end != end_ && *end == '(') {
-        if (EqualsIgnoreCase(text, "url")) return TakeUri();
-        return Take(TokenKind::Function, end + 1);
+        if (EqualsIgnoreCase(text, "url")) return TakeUri(out);
+        return Take(TokenKind::Function, end + 1, out);
     }
     TokenKind kind = TokenKind::Ident;
     if (text.size() == 3 || text.size() == 4) {
@@ -134,16 +137,16 @@ Token Scanner::TakeIdent() {
         if (EqualsIgnoreCase(text, "not")) kind = TokenKind::Not;
         if (EqualsIgnoreCase(text, "only")) kind = TokenKind::Only;
     }
-    return Take(kind, end);
+    return Take(kind, end, out);
 }
 
 // url( spaces, a string or unquoted bytes, spaces, ). What was looked at is part of the token, closed or not.
-Token Scanner::TakeUri() {
+void Scanner::TakeUri(Token& out) {
     const char* end = at_ + 4;
     while (end != end_ && Has(*end, kSpace))
         ++end;
     if (end != end_ && (*end == '"' || *end == '\'')) {
-        if (!FindStringEnd(end, end)) return Take(TokenKind::BadUri, end);
+        if (!FindStringEnd(end, end)) return Take(TokenKind::BadUri, end, out);
     } else {
         while (end != end_) {
             if (Has(*end, kUrlByte)) {
@@ -157,11 +160,11 @@ Token Scanner::TakeUri() {
     }
     while (end != end_ && Has(*end, kSpace))
         ++end;
-    if (end == end_ || *end != ')') return Take(TokenKind::BadUri, end);
-    return Take(TokenKind::Uri, end + 1);
+    if (end == end_ || *end != ')') return Take(TokenKind::BadUri, end, out);
+    return Take(TokenKind::Uri, end + 1, out);
 }
 
-Token Scanner::TakeNumber() {
+void Scanner::TakeNumber(Token& out) {
     const char* end = at_ + (*at_ == '+' || *at_ == '-' ? 1 : 0);
     while (end != end_ && Has(*end, kDigit))
         ++end;
@@ -170,15 +173,15 @@ Token Scanner::TakeNumber() {
         while (end != end_ && Has(*end, kDigit))
             ++end;
     }
-    if (end != end_ && *end == '%') return Take(TokenKind::Percentage, end + 1);
-    if (!StartsIdent(end)) return Take(TokenKind::Number, end);
+    if (end != end_ && *end == '%') return Take(TokenKind::Percentage, end + 1, out);
+    if (!StartsIdent(end)) return Take(TokenKind::Number, end, out);
     const char* unit = end;
     end = SkipName(end);
     bool known = IsUnit({unit, static_cast<size_t>(end - unit)});
-    return Take(known ? TokenKind::Numeric : TokenKind::Dimension, end);
+    return Take(known ? TokenKind::Numeric : TokenKind::Dimension, end, out);
 }
 
-Token Scanner::TakeAtWord() {
+void Scanner::TakeAtWord(Token& out) {
     struct AtWord {
         std::string_view text;
         TokenKind kind;
@@ -189,12 +192,12 @@ Token Scanner::TakeAtWord() {
         {"@keyframes", TokenKind::Keyframes}, {"@font-face", TokenKind::FontFace},
     };
     for (const AtWord& word : kWords)
-        if (Matches(word.text)) return Take(word.kind, at_ + word.text.size());
-    return Take(TokenKind::Delimiter, at_ + 1);
+        if (Matches(word.text)) return Take(word.kind, at_ + word.text.size(), out);
+    return TakeDelimiter(out);
 }
 
 // "!", white space and comments, "important"; otherwise only the "!" is taken.
-Token Scanner::TakeImportant() {
+void Scanner::TakeImportant(Token& out) {
     const char* start = at_++;
     for (;;) {
         if (at_ != end_ && Has(*at_, kSpace))
@@ -202,83 +205,90 @@ Token Scanner::TakeImportant() {
         else if (Peek() != '/' || !SkipComment())
             break;
     }
-    bool matches = Matches("important");
-    const char* end = matches ? at_ + 9 : start + 1;
+    const char* end = Matches("important") ? at_ + 9 : nullptr;
     at_ = start;
-    return Take(matches ? TokenKind::Important : TokenKind::Delimiter, end);
+    if (!end) return TakeDelimiter(out);
+    Take(TokenKind::Important, end, out);
 }
 
-Token Scanner::TakeDelimiter() {
+void Scanner::TakePunctuation(Token& out) {
     if (Peek(1) == '=') {
         switch (*at_) {
             case '~':
-                return Take(TokenKind::Includes, at_ + 2);
+                return Take(TokenKind::Includes, at_ + 2, out);
             case '|':
-                return Take(TokenKind::DashMatch, at_ + 2);
+                return Take(TokenKind::DashMatch, at_ + 2, out);
             case '^':
-                return Take(TokenKind::PrefixMatch, at_ + 2);
+                return Take(TokenKind::PrefixMatch, at_ + 2, out);
             case '$':
-                return Take(TokenKind::SuffixMatch, at_ + 2);
+                return Take(TokenKind::SuffixMatch, at_ + 2, out);
             case '*':
-                return Take(TokenKind::SubstrMatch, at_ + 2);
+                return Take(TokenKind::SubstrMatch, at_ + 2, out);
         }
     }
-    if (*at_ == ':' && Peek(1) == ':') return Take(TokenKind::DoubleColon, at_ + 2);
-    return Take(TokenKind::Delimiter, at_ + 1);
+    if (*at_ == ':' && Peek(1) == ':') return Take(TokenKind::DoubleColon, at_ + 2, out);
+    return TakeDelimiter(out);
 }
 
-Token Scanner::Next() {
+void Scanner::Next(Token& out) {
     while (at_ != end_ && *at_ == '/' && SkipComment()) {
     }
-    if (at_ == end_) return {TokenKind::End, {end_, 0}};
+    if (at_ == end_) return Take(TokenKind::End, end_, out);
     ++count_;
     const char c = *at_;
     if (Has(c, kSpace)) {
         const char* end = at_ + 1;
         while (end != end_ && Has(*end, kSpace))
             ++end;
-        return Take(TokenKind::Space, end);
+        return Take(TokenKind::Space, end, out);
     }
-    if (Has(c, kNameStart)) return TakeIdent();
-    if (Has(c, kDigit)) return TakeNumber();
+    if (Has(c, kNameStart)) return TakeIdent(out);
+    if (Has(c, kDigit)) return TakeNumber(out);
+    if (Has(c, kAlone)) return TakeDelimiter(out);
+    TakeSpecial(out);
+}
+
+// What starts with a byte that begins several kinds of tokens.
+void Scanner::TakeSpecial(Token& out) {
+    const char c = *at_;
     const char next = Peek(1);
     switch (c) {
         case '.':
-            if (Has(next, kDigit)) return TakeNumber();
-            if (StartsIdent(at_ + 1)) return Take(TokenKind::Class, SkipName(at_ + 1));
+            if (Has(next, kDigit)) return TakeNumber(out);
+            if (StartsIdent(at_ + 1)) return Take(TokenKind::Class, SkipName(at_ + 1), out);
             break;
         case '+':
         case '-':
-            if (Has(next, kDigit) || (next == '.' && Has(Peek(2), kDigit))) return TakeNumber();
+            if (Has(next, kDigit) || (next == '.' && Has(Peek(2), kDigit))) return TakeNumber(out);
             if (c == '+') break;
-            if (StartsIdent(at_)) return TakeIdent();
-            if (Matches("-->")) return Take(TokenKind::Cdc, at_ + 3);
+            if (StartsIdent(at_)) return TakeIdent(out);
+            if (Matches("-->")) return Take(TokenKind::Cdc, at_ + 3, out);
             if (next == '-' && SkipName(at_ + 2) != at_ + 2)
-                return Take(TokenKind::CustomIdent, SkipName(at_ + 2));
+                return Take(TokenKind::CustomIdent, SkipName(at_ + 2), out);
             break;
         case '\\':
-            if (StartsIdent(at_)) return TakeIdent();
+            if (StartsIdent(at_)) return TakeIdent(out);
             break;
         case '#':
-            if (SkipName(at_ + 1) != at_ + 1) return Take(TokenKind::Hash, SkipName(at_ + 1));
+            if (SkipName(at_ + 1) != at_ + 1) return Take(TokenKind::Hash, SkipName(at_ + 1), out);
             break;
         case '"':
         case '\'': {
             const char* end;
             bool closed = FindStringEnd(at_, end);
-            return Take(closed ? TokenKind::String : TokenKind::BadString, end);
+            return Take(closed ? TokenKind::String : TokenKind::BadString, end, out);
         }
         case '@':
-            return TakeAtWord();
+            return TakeAtWord(out);
         case '!':
-            return TakeImportant();
+            return TakeImportant(out);
         case '<':
-            if (Matches("<!--")) return Take(TokenKind::Cdo, at_ + 4);
+            if (Matches("<!--")) return Take(TokenKind::Cdo, at_ + 4, out);
             break;
         default:
             break;
     }
-    return TakeDelimiter();
+    TakePunctuation(out);
 }
 
 }  // namespace qorvex::css

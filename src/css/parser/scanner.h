@@ -45,19 +45,25 @@ enum class TokenKind : uint8_t {
     Delimiter,
 };
 
+// Begin and size are read one by one: as a view of two words a token would be read in one piece right after
+// it was written in two, which stalls.
 struct Token {
+    const char* begin = nullptr;
+    uint32_t size = 0;
     TokenKind kind = TokenKind::End;
-    std::string_view text;
+    char delimiter = '\0';  // of a Delimiter the byte itself
 
-    bool Is(char delimiter) const { return kind == TokenKind::Delimiter && text[0] == delimiter; }
+    std::string_view text() const { return {begin, size}; }
+    bool Is(char byte) const { return delimiter == byte && kind == TokenKind::Delimiter; }
 };
 
 class Scanner {
   public:
     explicit Scanner(std::string_view text) : at_(text.data()), end_(text.data() + text.size()) {}
 
-    // Each byte is looked at a bounded number of times, whatever the text.
-    Token Next();
+    // Each byte is looked at a bounded number of times, whatever the text. The token is written where it is
+    // used: handing it back by value costs more than finding it.
+    void Next(Token& out);
     uint64_t count() const { return count_; }
 
   private:
@@ -71,13 +77,25 @@ class Scanner {
     bool SkipComment();
     bool FindStringEnd(const char* quote, const char*& end) const;
 
-    Token Take(TokenKind kind, const char* end);
-    Token TakeIdent();
-    Token TakeNumber();
-    Token TakeUri();
-    Token TakeAtWord();
-    Token TakeImportant();
-    Token TakeDelimiter();
+    void Take(TokenKind kind, const char* end, Token& out) {
+        out.kind = kind;
+        out.delimiter = '\0';
+        out.begin = at_;
+        out.size = static_cast<uint32_t>(end - at_);
+        at_ = end;
+    }
+    void TakeDelimiter(Token& out) {
+        const char byte = *at_;
+        Take(TokenKind::Delimiter, at_ + 1, out);
+        out.delimiter = byte;
+    }
+    void TakeIdent(Token& out);
+    void TakeNumber(Token& out);
+    void TakeUri(Token& out);
+    void TakeAtWord(Token& out);
+    void TakeImportant(Token& out);
+    void TakePunctuation(Token& out);
+    void TakeSpecial(Token& out);
 
     const char* at_;
     const char* end_;

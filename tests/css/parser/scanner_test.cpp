@@ -16,10 +16,11 @@ std::string Scan(std::string_view text) {
         "::",  "!",   "num+u", "dim",  "%",    "num",   "uri", "bad-uri", "fn",  "c"};
     Scanner scanner(text);
     std::string out;
-    for (Token token = scanner.Next(); token.kind != TokenKind::End; token = scanner.Next()) {
+    Token token;
+    for (scanner.Next(token); token.kind != TokenKind::End; scanner.Next(token)) {
         if (!out.empty()) out += ' ';
         out += kKinds[static_cast<int>(token.kind)];
-        if (token.kind != TokenKind::Space) out += "<" + std::string(token.text) + ">";
+        if (token.kind != TokenKind::Space) out += "<" + std::string(token.text()) + ">";
     }
     return out;
 }
