@@ -23,8 +23,8 @@ inline constexpr size_t kTempBlockBytes = 512 * 1024;
 /// Bytes of all font family names of a process; a page cannot make more of them than this holds.
 inline constexpr size_t kFamilyNameBytes = 1024;
 
-/// Seconds of processor time that one entry into script may take before it is stopped. A page that needs longer
-/// has frozen the game; a page that loads slowly under a debugger or a sanitizer stays well below.
+/// Seconds of processor time that one entry into script may take before it is stopped. A page that needs
+/// longer has frozen the game; a page that loads slowly under a debugger or a sanitizer stays well below.
 inline constexpr double kScriptTimeLimitSeconds = 10;
 
 /// Smallest block of the string pool.

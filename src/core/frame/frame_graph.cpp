@@ -60,9 +60,7 @@ TaskPtr MakeSignalTask(const FrameDataPtr& frame) {
 }
 
 TaskPtr MakeSyncTreesTask(const FrameDataPtr& frame) {
-    return MakeTask("SyncTrees", [frame](TaskFamilyHandle) {
-        layout::SyncTrees(*frame->update);
-    });
+    return MakeTask("SyncTrees", [frame](TaskFamilyHandle) { layout::SyncTrees(*frame->update); });
 }
 
 TaskPtr MakeUnblockTask(const FrameDataPtr& frame) {

@@ -6,9 +6,8 @@ namespace {
 // The initial display is block, so only what differs from a block is told here. Elements without a picture of
 // their own stay out of the layout; phrasing tags are inline; headings, emphasis, lists and quotes get the
 // usual sizes, weights and margins of the HTML standard's rendering section in moderation (there are no
-// markers, tables or rules to draw). A generic family on the root is what brings the game's own default font to
-// pages that name none. Every selector is a single tag, which the rule index finds without
-// matching.
+// markers, tables or rules to draw). A generic family on the root is what brings the game's own default font
+// to pages that name none. Every selector is a single tag, which the rule index finds without matching.
 constexpr std::string_view kText = R"css(
 head, style, script, title, meta, link, base, template, noscript, param, source, track, datalist { display: none }
 

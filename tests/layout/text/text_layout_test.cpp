@@ -151,7 +151,8 @@ TEST_F(TextLayoutTest, BadUtf8AndMissingFontsAreBounded) {
     EXPECT_TRUE(info.lines.empty());
     // A megabyte in one node is one pass.
     std::string large;
-    for (int i = 0; i < 200000; ++i) large += "word ";
+    for (int i = 0; i < 200000; ++i)
+        large += "word ";
     EXPECT_GT(Lay(large, 300).lines.size(), 1000u);
 }
 
