@@ -9,20 +9,18 @@
 
 namespace qorvex::css {
 
-#define QORVEX_CSS_RECORD_TYPES(V)                                                                        \
-    V(Extent)                                                                                             \
-    V(Length)                                                                                             \
-    V(BorderWidth)                                                                                        \
-    V(CSSFlexValue) V(Containment) V(BorderRadius) V(Opacity) V(FloatParam) V(StringParam) V(Color)       \
-        V(BorderColor) V(ImageValue) V(ImageValueList) V(BackgroundSize) V(BackgroundSizeListType)        \
-            V(BackgroundPosition) V(BackgroundRepeatType) V(BackgroundRepeatList) V(BorderImageSliceType) \
-                V(BorderImageWidthType) V(BorderImageOutsetType) V(BorderImageRepeatType) V(ClipPathType) \
-                    V(BoxShadowListType) V(TextShadowListType) V(FilterListType) V(CursorProperty)        \
-                        V(FontFamily) V(LetterSpacing) V(LineHeight) V(Transform) V(TransformOrigin)      \
-                            V(PerspectiveOrigin) V(Perspective) V(ZIndex) V(AnimationName) V(TimeList)    \
-                                V(AnimationIterationCount) V(AnimationFillMode) V(AnimationDirection)     \
-                                    V(TimingFunctionList) V(AnimationPlayState) V(TransitionProperty)     \
-                                        V(MaskModeType) V(MaskClipType) V(FontWeight)
+// clang-format off
+#define QORVEX_CSS_RECORD_TYPES(V) \
+    V(Extent) V(Length) V(BorderWidth) V(CSSFlexValue) V(Containment) V(BorderRadius) V(Opacity) \
+    V(FloatParam) V(StringParam) V(Color) V(BorderColor) V(ImageValue) V(ImageValueList) \
+    V(BackgroundSize) V(BackgroundSizeListType) V(BackgroundPosition) V(BackgroundRepeatType) \
+    V(BackgroundRepeatList) V(BorderImageSliceType) V(BorderImageWidthType) V(BorderImageOutsetType) \
+    V(BorderImageRepeatType) V(ClipPathType) V(BoxShadowListType) V(TextShadowListType) \
+    V(FilterListType) V(CursorProperty) V(FontFamily) V(LetterSpacing) V(LineHeight) V(Transform) \
+    V(TransformOrigin) V(PerspectiveOrigin) V(Perspective) V(ZIndex) V(AnimationName) V(TimeList) \
+    V(AnimationIterationCount) V(AnimationFillMode) V(AnimationDirection) V(TimingFunctionList) \
+    V(AnimationPlayState) V(TransitionProperty) V(MaskModeType) V(MaskClipType) V(FontWeight)
+// clang-format on
 
 #define QORVEX_DECLARE(type) [[nodiscard]] bool Parse(std::string_view text, type& out);
 QORVEX_CSS_RECORD_TYPES(QORVEX_DECLARE)
