@@ -18,7 +18,8 @@
     T(BlockQuote, "BLOCKQUOTE") T(Ol, "OL") T(Ul, "UL") T(Li, "LI") T(Dl, "DL") T(Dt, "DT") T(Dd, "DD") \
     T(Figure, "FIGURE") T(FigCaption, "FIGCAPTION") T(Main, "MAIN") T(Div, "DIV") T(A, "A") T(Em, "EM") \
     T(Strong, "STRONG") T(Small, "SMALL") T(S, "S") T(Cite, "CITE") T(Q, "Q") T(Dfn, "DFN") T(Abbr, "ABBR") \
-    T(Data, "DATA") T(Time, "TIME") T(Code, "CODE") T(Var, "VAR") T(Samp, "SAMP") T(Kbd, "KBD") T(Sub, "SUB") \
+    T(Data, "DATA") T(Time, "TIME") T(Code, "CODE") T(Var, "VAR") T(Samp, "SAMP") T(Kbd, "KBD") \
+    T(Sub, "SUB") \
     T(Sup, "SUP") T(I, "I") T(B, "B") T(U, "U") T(Mark, "MARK") T(Ruby, "RUBY") T(Rt, "RT") T(Rp, "RP") \
     T(Bdi, "BDI") T(Bdo, "BDO") T(Span, "SPAN") T(Br, "BR") T(Wbr, "WBR") T(Ins, "INS") T(Del, "DEL") \
     T(Image, "IMAGE") T(Img, "IMG") T(IFrame, "IFRAME") T(Embed, "EMBED") T(Object, "OBJECT") \
@@ -33,7 +34,8 @@
     T(TextArea, "TEXTAREA") T(KeyGen, "KEYGEN") T(Output, "OUTPUT") T(Progress, "PROGRESS") \
     T(Meter, "METER") T(Details, "DETAILS") T(Summary, "SUMMARY") T(Menu, "MENU") T(MenuItem, "MENUITEM") \
     T(Applet, "APPLET") T(Acronym, "ACRONYM") T(BgSound, "BGSOUND") T(Dir, "DIR") T(Frame, "FRAME") \
-    T(FrameSet, "FRAMESET") T(NoFrames, "NOFRAMES") T(IsIndex, "ISINDEX") T(Listing, "LISTING") T(Xmp, "XMP") \
+    T(FrameSet, "FRAMESET") T(NoFrames, "NOFRAMES") T(IsIndex, "ISINDEX") T(Listing, "LISTING") \
+    T(Xmp, "XMP") \
     T(NextId, "NEXTID") T(NoEmbed, "NOEMBED") T(PlainText, "PLAINTEXT") T(Rb, "RB") T(Strike, "STRIKE") \
     T(BaseFont, "BASEFONT") T(Big, "BIG") T(Blink, "BLINK") T(Center, "CENTER") T(Font, "FONT") \
     T(Marquee, "MARQUEE") T(MultiCol, "MULTICOL") T(Nobr, "NOBR") T(Spacer, "SPACER") T(Tt, "TT") \

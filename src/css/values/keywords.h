@@ -91,7 +91,8 @@
     W(SWResize, "sw-resize") W(Text, "text") W(Url, "URL") W(VerticalText, "vertical-text") \
     W(WResize, "w-resize") W(Wait, "wait") W(ZoomIn, "zoom-in") W(ZoomOut, "zoom-out")
 // Words that occur inside larger values.
-#define QORVEX_CSS_REPEAT_MODE(W) W(Repeat, "repeat") W(Space, "space") W(Round, "round") W(NoRepeat, "no-repeat")
+#define QORVEX_CSS_REPEAT_MODE(W) \
+    W(Repeat, "repeat") W(Space, "space") W(Round, "round") W(NoRepeat, "no-repeat")
 #define QORVEX_CSS_BORDER_IMAGE_REPEAT_MODE(W) \
     W(Stretch, "stretch") W(Repeat, "repeat") W(Round, "round") W(Space, "space")
 #define QORVEX_CSS_CLIP_BOX(W) \
@@ -102,7 +103,7 @@
     W(ClosestSide, "closest-side") W(FarthestSide, "farthest-side") W(ClosestCorner, "closest-corner") \
     W(FarthestCorner, "farthest-corner")
 
-// E(EnumName, table): the enums whose whole value is one word; each is the value type of at least one property or
+// E(EnumName, table): the enums whose whole value is one word; each is the type of a property or
 // an item of a list.
 #define QORVEX_CSS_KEYWORD_ENUMS(E) \
     E(CSSDisplay, QORVEX_CSS_DISPLAY) \
