@@ -149,4 +149,42 @@ TEST(FrameCycle, PaintOfADiscardedFrameDrawsNothing) {
     EXPECT_EQ(client.renderer->Paint(frame, true), qorvex::PaintStatus::FrameMissing);
 }
 
+TEST(FrameCycle, RenderThreadPaintsBesideTheMainThread) {
+    Options options;
+    options.dedicated_layout = true;
+    options.layout_threads = 1;
+    options.resource_threads = 2;
+    options.severity = qorvex::Logging::Warning;
+    Client client(options);
+    client.Load(kPage);
+    std::atomic<uint32_t> published{client.last_frame};
+    std::atomic<bool> done{false};
+    std::thread render([&, next = client.last_frame]() mutable {
+        while (!done || next < published) {
+            if (next == published) {
+                std::this_thread::yield();
+                continue;
+            }
+            client.renderer->Paint(next, next % 2 == 0);
+            if (next % 11 == 0) client.renderer->FreeRenderingResources();
+            ++next;
+        }
+    });
+    for (int i = 0; i < 60; ++i) {
+        const std::string left = std::to_string(i % 40);
+        client.view->ExecuteScript(("document.getElementById('box').style.left = '" + left + "px'").c_str());
+        client.view->Advance(client.time += 16);
+        published = ++client.last_frame;
+    }
+    done = true;
+    render.join();
+    client.view->ExecuteScript("document.getElementById('box').style.left = '20px'");
+    client.renderer->FreeRenderingResources();
+    for (int i = 0; i < 4; ++i)
+        client.Frame();
+    EXPECT_EQ(client.Pixel(22, 12), kBlue);
+    EXPECT_EQ(client.Pixel(12, 40), kRed);
+    EXPECT_EQ(client.log.Lines(qorvex::Logging::Error), std::vector<std::string>());
+}
+
 }  // namespace

@@ -1,6 +1,8 @@
 // Pages on their way into a view, and what goes wrong there.
 #include <gtest/gtest.h>
 
+#include <algorithm>
+
 #include "core/frame/client.h"
 
 namespace {
@@ -124,6 +126,57 @@ TEST(Loading, EmptyBinaryAndCutPagesDoNoHarm) {
         client.Load(page);
         EXPECT_EQ(client.listener.events.back(), "loaded coui://page/index.html");
     }
+}
+
+TEST(Loading, OneSheetAskedForTwiceIsOneRequest) {
+    Client client;
+    client.files.Put("coui://page/s.css", "body{background-color:#00ff00;margin:0}");
+    client.files.Put("coui://page/index.html",
+                     "<html><head><script async src=\"a.js\"></script></head><body></body></html>");
+    client.files.Put("coui://page/a.js",
+                     "for (const n of [1, 2]) { const link = document.createElement('link');"
+                     "link.addEventListener('load', () => console.log('sheet'));"
+                     "link.setAttribute('rel', 'stylesheet'); link.setAttribute('href', 's.css');"
+                     "document.head.appendChild(link); }");
+    client.view->LoadURL("coui://page/index.html");
+    client.RunUntilLoaded();
+    const auto& requests = client.files.requests;
+    EXPECT_EQ(std::count(requests.begin(), requests.end(), "coui://page/s.css"), 1);
+    EXPECT_EQ(client.log.Matching({"sheet "}).size(), 2u);
+    EXPECT_EQ(client.Pixel(40, 40), 0x00ff00u);
+}
+
+TEST(Loading, AsyncScriptsDoNotHoldTheBuildingUp) {
+    Client client;
+    client.files.Put("coui://page/a.js", "console.log('async')");
+    client.files.Put("coui://page/index.html",
+                     "<html><head><script async src=\"a.js\"></script></head>"
+                     "<body><script>console.log('inline')</script></body></html>");
+    client.files.SetDeferred(true);
+    client.view->LoadURL("coui://page/index.html");
+    client.files.AnswerAll();
+    for (int i = 0; i < 3; ++i)
+        client.Frame();
+    EXPECT_TRUE(client.log.Contains("inline "));
+    EXPECT_FALSE(client.log.Contains("Paused DOM building"));
+    EXPECT_EQ(client.listener.events.back(), "built") << "the load waits for the script";
+    client.files.AnswerAll();
+    client.files.SetDeferred(false);
+    client.RunUntilLoaded();
+    EXPECT_TRUE(client.log.Contains("async "));
+}
+
+TEST(Loading, ScriptsThatLoadScriptsNestOnlySoDeep) {
+    Client client;
+    for (int i = 0; i < 100; ++i) {
+        const std::string next = std::to_string(i + 1);
+        client.files.Put("coui://page/" + std::to_string(i) + ".js",
+                         "{ const s = document.createElement('script'); s.setAttribute('src', '" + next +
+                             ".js'); document.body.appendChild(s); }");
+    }
+    client.files.Put("coui://page/100.js", "console.log('the end')");
+    client.Load("<html><body><script src=\"0.js\"></script></body></html>");
+    EXPECT_TRUE(client.log.Contains("the end "));
 }
 
 }  // namespace
