@@ -71,9 +71,10 @@ class Run {
         events_.Feed(count_, *session_.View());
         const std::uint32_t id = session_.RunFrame(++count_ * options_.frame_milliseconds);
         qorvex::FrameStats stats;
-        if (!session_.Stats()->GetFrame(session_.View(), id, &stats)) return true;
-        if (!options_.stats_file.empty()) stats_.push_back(stats);
-        return stats.Restyled > 0 || stats.LaidOut > 0 || stats.Recorded > 0;
+        if (!options_.stats_file.empty() && session_.Stats()->GetFrame(session_.View(), id, &stats)) {
+            stats_.push_back(stats);
+        }
+        return session_.Debug()->HasChanged(session_.View());
     }
 
     void AskForCapture() {

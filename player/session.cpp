@@ -87,7 +87,8 @@ bool Session::Start(std::string& error) {
         return false;
     }
 
-    font_options_ = FontOptions(options_.fonts);
+    engine_options_ = FontOptions(options_.fonts);
+    if (!options_.stats_file.empty()) engine_options_ = engine_options_ + ' ' + kCountAllocationsOption;
     LibraryParams params;
     params.Allocator = &allocator_;
     params.LoggingSeverity = options_.log_severity;
@@ -97,7 +98,7 @@ bool Session::Start(std::string& error) {
     params.OnWorkAvailable = host::WorkerPool::OnWorkAvailable;
     params.OnWorkAvailableUserData = &pool_;
     params.DefaultFontFamily = options_.default_font.empty() ? kDefaultFamily : options_.default_font.c_str();
-    params.AdditionalOptions = font_options_.c_str();
+    params.AdditionalOptions = engine_options_.c_str();
     library_ = Library::Initialize(params);
     if (!library_) {
         error = "the engine did not start";

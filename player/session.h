@@ -71,7 +71,7 @@ class Session final : public qorvex::IViewListener {
     const Options options_;
     const bool real_clock_;
     std::string page_url_;
-    std::string font_options_;
+    std::string engine_options_;
     std::string load_error_;
     double time_ = 0;
     std::chrono::steady_clock::time_point start_ = std::chrono::steady_clock::now();
