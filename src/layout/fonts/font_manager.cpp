@@ -108,12 +108,19 @@ void FontManager::ResolveTypefaces(const css::FontFamily& families, css::FontSty
     for (const css::CssString& family : families) {
         const Atom name = strings_.Intern(family.view());
         uint32_t found = css::kNoTypeface;
-        SearchWeights(weight, [&](uint8_t candidate) {
-            const FontDescription description{name, styleCode, candidate};
-            const fresco::IFont* font = GetFont(description, waiter);
-            if (font != nullptr) found = font->GetId();
-            return font != nullptr || pending_.contains(description);
-        });
+        bool pending = false;
+        const auto search = [&](uint8_t code) {
+            SearchWeights(weight, [&](uint8_t candidate) {
+                const FontDescription description{name, code, candidate};
+                const fresco::IFont* font = GetFont(description, waiter);
+                if (font != nullptr) found = font->GetId();
+                pending = font == nullptr && pending_.contains(description);
+                return font != nullptr || pending;
+            });
+        };
+        search(styleCode);
+        // A family without slanted faces shows its upright ones (CSS Fonts Module Level 4, 5.2, step 4).
+        if (found == css::kNoTypeface && !pending && styleCode != kNormalStyle) search(kNormalStyle);
         out.push_back(found);
     }
     out.push_back(fallback_);
