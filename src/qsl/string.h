@@ -234,8 +234,6 @@ class basic_string {
 
     void SetSize(size_t size) {
         if (is_short()) {
-            // Told to g++, which otherwise sees a write behind the array at -O3.
-            if (size > kInlineCapacity) __builtin_unreachable();
             bytes_.short_form.tag = static_cast<unsigned char>(size << 1 | 1);
             bytes_.short_form.text[size] = '\0';
         } else {
