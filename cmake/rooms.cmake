@@ -38,5 +38,7 @@ function(qorvex_shared_library)
     endforeach()
     target_include_directories(qorvex PUBLIC "$<BUILD_INTERFACE:${CMAKE_SOURCE_DIR}/include>"
                                "$<BUILD_INTERFACE:${CMAKE_SOURCE_DIR}/fresco/include>" "$<INSTALL_INTERFACE:include>")
+    # Yoga marks its functions as exported; from this library they are not.
+    target_link_options(qorvex PRIVATE -Wl,--exclude-libs,libdeps_yoga.a)
     set_target_properties(qorvex PROPERTIES VERSION 1.14.1 SOVERSION 1)
 endfunction()
