@@ -1,6 +1,6 @@
 #!/usr/bin/env bash
-# One page, the same pixels in every thread mode: synchronous, one layout thread, one layout and three resource
-# threads. Usage: modes.sh PLAYER PAGE [RUNS]
+# One page, the same pixels in every thread mode: synchronous, one layout thread, one layout and one
+# resource thread, one layout and three resource threads. Usage: modes.sh PLAYER PAGE [RUNS]
 set -euo pipefail
 player=$1
 page=$2
@@ -10,7 +10,7 @@ trap 'rm -rf "$work"' EXIT
 
 expected=
 for ((run = 1; run <= runs; ++run)); do
-    for mode in "--sync-layout --workers 0" "--workers 1" "--workers 3"; do
+    for mode in "--sync-layout --workers 0" "--workers 0" "--workers 1" "--workers 3"; do
         # shellcheck disable=SC2086
         "$player" --size 800x600 --strict $mode --png "$work/out.png" "$page" >"$work/out.txt" 2>"$work/err.txt" || {
             echo "run $run, mode $mode failed:"
@@ -24,4 +24,4 @@ for ((run = 1; run <= runs; ++run)); do
         expected=$sum
     done
 done
-echo "$runs runs in 3 modes: the same pixels and the same console lines"
+echo "$runs runs in 4 modes: the same pixels and the same console lines"

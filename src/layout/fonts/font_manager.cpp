@@ -1,6 +1,7 @@
 #include "layout/fonts/font_manager.h"
 
 #include <algorithm>
+#include <memory>
 
 #include "core/logging/log.h"
 #include "layout/dom_tasks.h"
@@ -36,6 +37,12 @@ bool IsCollection(std::string_view url) {
     const std::string_view extension = url.substr(dot + 1);
     return extension == "ttc" || extension == "otc";
 }
+
+// Closes the stream with the task that reads it, also when that task is dropped.
+struct StreamCloser {
+    void operator()(fresco::IStreamReader* reader) const { reader->Close(); }
+};
+using StreamPtr = std::unique_ptr<fresco::IStreamReader, StreamCloser>;
 
 // Tells a node that a font it waits for has come.
 struct FontArrived : DOMTaskData {};
@@ -130,13 +137,17 @@ void FontManager::AddFontDescription(const FontDescription& description, const U
     if (loaded_.contains(description)) return;
     const bool isNew = pending_.try_emplace(description).second;
     if (!isNew && description.IsExplicit()) return;
-    family_.Push(TaskChannels::Resources, loader_.RequestFont(url, [this, description, url,
-                                                                    useSDF](fresco::IStreamReader* reader) {
+    // The answer may come when the manager has gone: until the task runs, which only an open family does,
+    // nothing here looks at it.
+    FontManager* manager = this;
+    auto answer = [manager, family = family_, description, url, useSDF](fresco::IStreamReader* reader) {
         // Reading and parsing a face takes long, and this may be the main thread.
-        family_.Push(TaskChannels::Resources, MakeTask("LoadFontFaces", [=, this] {
-                         LoadFaces(service_, family_, *this, reader, description, url, ToSdfMode(useSDF));
-                     }));
-    }));
+        family.Push(TaskChannels::Resources, MakeTask("LoadFontFaces", [=, stream = StreamPtr(reader)] {
+                        LoadFaces(manager->service_, family, *manager, stream.get(), description, url,
+                                  ToSdfMode(useSDF));
+                    }));
+    };
+    family_.Push(TaskChannels::Resources, loader_.RequestFont(url, std::move(answer)));
 }
 
 void FontManager::LoadFaces(fresco::IFontService& service, TaskFamilyHandle family, FontManager& manager,
@@ -155,7 +166,6 @@ void FontManager::LoadFaces(fresco::IFontService& service, TaskFamilyHandle fami
             ++usable;
             post([&manager, id, description] { manager.OnFaceLoaded(id, description, description); });
         }
-        reader->Close();
     }
     if (usable > 0) return;
     LogWarning("Unable to load font ", url.GetText().view(), " with given stream reader!");
