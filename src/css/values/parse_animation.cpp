@@ -173,7 +173,7 @@ bool Parse(std::string_view text, TransitionProperty& out) {
         if (target.property != PropertyId::kUnknown)
             target.kind = TransitionTargetKind::Property;
         else
-            LogWarning("Transition property ", item, " is not recognized.");
+            LogDebug("Transition property ", item, " is not recognized.");
         return true;
     });
 }

@@ -56,17 +56,30 @@ bool ParseName(std::string_view text, CssString& out) {
     return !out.empty();
 }
 
+// Words that mean something else when they stand alone without quotes.
+bool IsReserved(std::string_view name) {
+    return EqualsIgnoreCase(name, "none") || EqualsIgnoreCase(name, "inherit") ||
+           EqualsIgnoreCase(name, "initial");
+}
+
+void SerialiseQuoted(std::string_view name, CssString& out) {
+    const char quote = QuoteFor(name);
+    out.push_back(quote);
+    out.append(name);
+    out.push_back(quote);
+}
+
 void SerialiseName(std::string_view name, CssString& out) {
-    bool plain = !name.empty() && !name.starts_with(' ') && !name.ends_with(' ') &&
+    bool plain = !name.empty() && !IsReserved(name) && !name.starts_with(' ') && !name.ends_with(' ') &&
                  name.find("  ") == std::string_view::npos;
     WordReader words(name);
     std::string_view word;
     while (plain && words.Next(word))
         plain = IsIdentifier(word);
-    char quote = name.find('"') == std::string_view::npos ? '"' : '\'';
-    if (!plain) out.push_back(quote);
-    out.append(name);
-    if (!plain) out.push_back(quote);
+    if (plain)
+        out.append(name);
+    else
+        SerialiseQuoted(name, out);
 }
 
 bool ParseSpacing(std::string_view text, SpacingKind& kind, Length& length) {
@@ -136,8 +149,10 @@ void Serialise(const AnimationName& value, CssString& out) {
     SerialiseList(value, "none", out, [](const CssString& name, CssString& text) {
         if (name.empty())
             text.append("none");
+        else if (IsIdentifier(name) && !IsReserved(name))
+            text.append(name);
         else
-            SerialiseName(name, text);
+            SerialiseQuoted(name, text);
     });
 }
 

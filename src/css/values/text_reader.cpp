@@ -21,6 +21,14 @@ bool StartsWithIgnoreCase(std::string_view text, std::string_view prefix) {
     return text.size() >= prefix.size() && EqualsIgnoreCase(text.substr(0, prefix.size()), prefix);
 }
 
+bool HoldsUnescaped(std::string_view text, char c) {
+    for (size_t i = 0; i < text.size(); ++i) {
+        if (text[i] == c) return true;
+        if (text[i] == '\\') ++i;
+    }
+    return false;
+}
+
 bool TakeFunction(std::string_view text, std::string_view name, std::string_view& arguments) {
     if (text.size() < name.size() + 2 || text[name.size()] != '(' || text.back() != ')') return false;
     if (!StartsWithIgnoreCase(text, name)) return false;

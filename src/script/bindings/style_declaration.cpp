@@ -6,6 +6,7 @@
 #include "core/logging/log.h"
 #include "core/memory/atoms.h"
 #include "css/parser/convert.h"
+#include "css/style/computed_serializer.h"
 #include "css/values/property_values.h"
 #include "css/values/value_text.h"
 #include "dom/document.h"
@@ -110,7 +111,7 @@ JSValueRef ReadStyleProperty(StyleHolder& holder, ScriptCall& call, PropertyId i
     if (!css::IsLonghand(id)) return JSValueMakeNull(call.context);
     css::CssString text;
     if (holder.IsComputed()) {
-        css::SerialiseValue(id, holder.element().GetStyle().Field(id), text);
+        css::SerialiseComputed(id, holder.element().GetStyle(), text);
         return ToScript(call.context, text.view());
     }
     const css::StyleDeclarationSet* style = holder.element().GetInlineStyle();

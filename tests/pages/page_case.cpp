@@ -1,0 +1,79 @@
+#include "pages/page_case.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <fstream>
+#include <sstream>
+
+namespace qorvex::pages {
+namespace {
+
+constexpr const char* kNames[] = {"view", "file", "expect", "same",   "feed", "none",
+                                  "box",  "js",   "script", "resize", "log",  "nolog"};
+
+bool IsName(const std::string& word) {
+    for (const char* name : kNames) {
+        if (word == name) return true;
+    }
+    return false;
+}
+
+// The lines of a file inside the page, up to "end".
+std::string ReadFile(std::istream& lines, int& number) {
+    std::string text;
+    for (std::string line; std::getline(lines, line);) {
+        ++number;
+        if (Trim(line) == "end") break;
+        text += line + "\n";
+    }
+    return text;
+}
+
+}  // namespace
+
+std::string Trim(const std::string& text) {
+    const size_t first = text.find_first_not_of(" \t\r\n");
+    return first == std::string::npos ? "" : text.substr(first, text.find_last_not_of(" \t\r\n") - first + 1);
+}
+
+std::pair<std::string, std::string> SplitAt(const std::string& text, char separator) {
+    const size_t at = text.find(separator);
+    if (at == std::string::npos) return {Trim(text), ""};
+    return {Trim(text.substr(0, at)), Trim(text.substr(at + 1))};
+}
+
+PageCase ReadPageCase(const std::string& path) {
+    PageCase page;
+    std::stringstream whole;
+    whole << std::ifstream(path, std::ios::binary).rdbuf();
+    page.html = whole.str();
+    std::istringstream lines(page.html);
+    int number = 0;
+    bool inComment = false;
+    for (std::string line; std::getline(lines, line);) {
+        ++number;
+        if (line.starts_with("<!--")) {
+            inComment = true;
+            continue;
+        }
+        if (line.starts_with("-->")) inComment = false;
+        if (!inComment) continue;
+        const auto [word, rest] = SplitAt(line, ' ');
+        if (!IsName(word)) {
+            // Prose is welcome, a directive with a typing error is not: prose has no braces and bars.
+            EXPECT_EQ(line.find_first_of("{|"), std::string::npos) << path << ":" << number << ": " << line;
+            continue;
+        }
+        if (word == "file") {
+            page.files.emplace_back(rest, ReadFile(lines, number));
+        } else if (word == "view") {
+            EXPECT_EQ(std::sscanf(rest.c_str(), "%ux%u", &page.width, &page.height), 2) << line;
+        } else {
+            page.directives.push_back({word, rest, number});
+        }
+    }
+    return page;
+}
+
+}  // namespace qorvex::pages
