@@ -38,8 +38,11 @@ std::string Trim(const std::string& text) {
 }
 
 std::pair<std::string, std::string> SplitAt(const std::string& text, char separator) {
-    const size_t at = text.find(separator);
-    if (at == std::string::npos) return {Trim(text), ""};
+    size_t at = 0;
+    for (char quote = 0; at < text.size() && (quote || text[at] != separator); ++at) {
+        if (quote ? text[at] == quote : text[at] == '"') quote = quote ? '\0' : '"';
+    }
+    if (at == text.size()) return {Trim(text), ""};
     return {Trim(text.substr(0, at)), Trim(text.substr(at + 1))};
 }
 
@@ -50,15 +53,11 @@ PageCase ReadPageCase(const std::string& path) {
     page.html = whole.str();
     std::istringstream lines(page.html);
     int number = 0;
-    bool inComment = false;
+    EXPECT_TRUE(page.html.starts_with("<!--")) << path;
     for (std::string line; std::getline(lines, line);) {
         ++number;
-        if (line.starts_with("<!--")) {
-            inComment = true;
-            continue;
-        }
-        if (line.starts_with("-->")) inComment = false;
-        if (!inComment) continue;
+        if (line.starts_with("<!--")) continue;
+        if (line.starts_with("-->")) break;
         const auto [word, rest] = SplitAt(line, ' ');
         if (!IsName(word)) {
             // Prose is welcome, a directive with a typing error is not: prose has no braces and bars.

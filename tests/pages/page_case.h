@@ -1,5 +1,5 @@
-// A page with its expectations in it: an HTML file whose comments hold directives, one a line, carried out in
-// order once the page has loaded.
+// A page with its expectations in it: an HTML file that starts with a comment of directives, one a line,
+// carried out in order once the page has loaded.
 //
 //   view WxH                    size before loading (1000x500)
 //   file NAME ... end           a file beside the page, for links
@@ -40,7 +40,7 @@ struct PageCase {
 [[nodiscard]] PageCase ReadPageCase(const std::string& path);
 
 std::string Trim(const std::string& text);
-// At the first `separator`, both sides trimmed; the second is empty without one.
+// At the first `separator` outside of double quotes, both sides trimmed; the second is empty without one.
 std::pair<std::string, std::string> SplitAt(const std::string& text, char separator);
 
 }  // namespace qorvex::pages

@@ -183,7 +183,7 @@ class CaseRunner {
 
         bool Fits(const std::string& other_level, const std::string& line) const {
             if (level != other_level) return false;
-            if (!text.ends_with("...")) return line == text;
+            if (!text.ends_with("...")) return Trim(line) == text;
             return line.starts_with(text.substr(0, text.size() - 3));
         }
     };

@@ -18,17 +18,6 @@ void Serialise(const FontWeight& value, CssString& out) {
 
 namespace {
 
-bool IsNameByte(char c) {
-    return IsDigit(c) || (ToLower(c) >= 'a' && ToLower(c) <= 'z') || c == '-' || c == '_' || c == '\\' ||
-           static_cast<unsigned char>(c) >= 128;
-}
-
-bool IsIdentifier(std::string_view word) {
-    if (word.empty() || IsDigit(word[0])) return false;
-    if (word[0] == '-' && (word.size() == 1 || IsDigit(word[1]))) return false;
-    return std::all_of(word.begin(), word.end(), IsNameByte);
-}
-
 bool IsQuoted(std::string_view text) {
     return text.size() >= 2 && (text[0] == '"' || text[0] == '\'') && text.back() == text[0];
 }
