@@ -58,6 +58,7 @@ PageCase ReadPageCase(const std::string& path) {
         ++number;
         if (line.starts_with("<!--")) continue;
         if (line.starts_with("-->")) break;
+        EXPECT_EQ(line.find("-->"), std::string::npos) << path << ":" << number << " ends the comment";
         const auto [word, rest] = SplitAt(line, ' ');
         if (!IsName(word)) {
             // Prose is welcome, a directive with a typing error is not: prose has no braces and bars.

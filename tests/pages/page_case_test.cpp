@@ -1,5 +1,5 @@
-// Runs the pages below cases/ through the public interfaces alone: a game loads each one and asks for computed
-// styles. A directive is told in page_case.h; adding a case is adding a file.
+// Runs the pages below cases/ through the public interfaces alone: a game loads each one and asks for
+// computed styles. A directive is told in page_case.h; adding a case is adding a file.
 #include "pages/page_case.h"
 
 #include <gtest/gtest.h>
@@ -81,8 +81,8 @@ class CaseRunner {
         for (std::string rest = block.substr(0, block.size() - 1); !Trim(rest).empty();) {
             const auto [declaration, more] = SplitAt(rest, ';');
             const std::pair<std::string, std::string> wanted = SplitAt(declaration, ':');
-            const auto found =
-                std::find_if(style.begin(), style.end(), [&](const auto& e) { return e.first == wanted.first; });
+            const auto found = std::find_if(style.begin(), style.end(),
+                                            [&](const auto& e) { return e.first == wanted.first; });
             if (found == style.end())
                 ADD_FAILURE() << "no longhand " << wanted.first;
             else
@@ -150,8 +150,7 @@ class CaseRunner {
         const size_t bar = text.rfind(" |");
         ASSERT_NE(bar, std::string::npos);
         console_.clear();
-        client_.view->ExecuteScript(
-            ("console.log('=' + (" + text.substr(0, bar) + "))").c_str());
+        client_.view->ExecuteScript(("console.log('=' + (" + text.substr(0, bar) + "))").c_str());
         EXPECT_EQ(Trim(console_), "=" + Trim(text.substr(bar + 2)));
     }
 
@@ -211,12 +210,14 @@ class CaseRunner {
     std::vector<ExpectedLine> expected_;
 };
 
-// One test a folder, so that a run of a single theme is a filter; the folders are known when tests are listed.
+// One test a folder, so that a run of a single theme is a filter; the folders are known when tests are
+// listed.
 class PageCases : public testing::TestWithParam<std::string> {};
 
 TEST_P(PageCases, ComputeWhatTheySay) {
     std::vector<fs::path> files;
-    for (const auto& entry : fs::directory_iterator(fs::path(QORVEX_SOURCE_DIR "/tests/pages/cases") / GetParam()))
+    for (const auto& entry :
+         fs::directory_iterator(fs::path(QORVEX_SOURCE_DIR "/tests/pages/cases") / GetParam()))
         files.push_back(entry.path());
     std::sort(files.begin(), files.end());
     const char* only = std::getenv("QORVEX_CASE");  // a part of a name, to run one page by hand

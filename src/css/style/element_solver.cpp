@@ -160,14 +160,14 @@ class ElementSolver {
 
     PropertyInputs MakeInputs() const {
         const dom::Element* html = run_.document.GetHtmlElement();
-        PropertyInputs inputs{
-            style_,
-            parent_,
-            match_,
-            ActiveOrNull(element_.animatedProperties.get()),
-            ActiveOrNull(element_.transitionProperties.get()),
-            element_.timesSolved < 2,
-            {&parent_, html ? &html->GetStyle() : nullptr, run_.metrics.vw, run_.metrics.vh}};
+        PropertyInputs inputs{style_,
+                              parent_,
+                              match_,
+                              ActiveOrNull(element_.animatedProperties.get()),
+                              ActiveOrNull(element_.transitionProperties.get()),
+                              element_.timesSolved < 2,
+                              {&parent_, html ? &html->GetStyle() : nullptr, run_.metrics.vw, run_.metrics.vh,
+                               &run_.document.GetURL()}};
         if (IsLandmark(parentNode_)) {
             inputs.parentRoot = &run_.rootStyles;
             inputs.parentIsHtml = &parentNode_ == html;

@@ -35,6 +35,7 @@ bool RefuseComputed(const StyleHolder& holder, const ScriptCall& call, const cha
 }
 
 void SetDeclaration(dom::Element& element, Declaration declaration) {
+    css::ResolveImageUrls(declaration, element.GetDocument()->GetURL());
     if (element.EnsureInlineStyle().Set(std::move(declaration))) MarkInlineStyleChanged(element);
 }
 
