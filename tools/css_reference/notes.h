@@ -10,8 +10,10 @@ namespace qorvex::css {
 constexpr std::string_view NoteOf(PropertyId id) {
     switch (id) {
         case PropertyId::Display:
-            return "There is no `inline-block`, `grid` or `table`. Every box is a flex item: a `block` lays its "
-                   "children out as a column, an `inline` as a row. `simple` is the engine's own fast mode, see "
+            return "There is no `inline-block`, `grid` or `table`. Every box is a flex item: a `block` lays "
+                   "its "
+                   "children out as a column, an `inline` as a row. `simple` is the engine's own fast mode, "
+                   "see "
                    "above. `initial` is not taken";
         case PropertyId::OverflowX:
         case PropertyId::OverflowY:
@@ -30,7 +32,8 @@ constexpr std::string_view NoteOf(PropertyId id) {
             return "`auto` is 0. Margins do not collapse";
         case PropertyId::Width:
         case PropertyId::Height:
-            return "Padding and border are part of the size: boxes are sized as with `box-sizing: border-box`";
+            return "Padding and border are part of the size: boxes are sized as with `box-sizing: "
+                   "border-box`";
         case PropertyId::BorderTopStyle:
         case PropertyId::BorderRightStyle:
         case PropertyId::BorderBottomStyle:
@@ -50,7 +53,8 @@ constexpr std::string_view NoteOf(PropertyId id) {
         case PropertyId::SelectionColor:
             return "What `::selection` sets";
         case PropertyId::FontSize:
-            return "Resolved where it is declared; children inherit pixels. 0 and below give the parent's size";
+            return "Resolved where it is declared; children inherit pixels. 0 and below give the parent's "
+                   "size";
         case PropertyId::FontWeight:
             return "Also any whole number from 1 to 1000, taken as the nearest hundred";
         case PropertyId::FontFitMode:

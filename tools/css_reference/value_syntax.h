@@ -40,20 +40,23 @@ QORVEX_SYNTAX(BackgroundPosition,
               "one or two of `left` `center` `right`, `top` `center` `bottom` and *lengths*")
 QORVEX_SYNTAX(BackgroundPositionList,
               "a list of *lengths*, `center`, and `left` `right` for x, `top` `bottom` for y")
-QORVEX_SYNTAX(BackgroundRepeatType,
-              "`repeat-x`, `repeat-y`, or one or two of `repeat` `round` `no-repeat` (`space` becomes `round`)")
-QORVEX_SYNTAX(BackgroundRepeatList,
-              "a list of `repeat-x`, `repeat-y`, or one or two of `repeat` `round` `no-repeat` (`space` becomes "
-              "`round`)")
+QORVEX_SYNTAX(
+    BackgroundRepeatType,
+    "`repeat-x`, `repeat-y`, or one or two of `repeat` `round` `no-repeat` (`space` becomes `round`)")
+QORVEX_SYNTAX(
+    BackgroundRepeatList,
+    "a list of `repeat-x`, `repeat-y`, or one or two of `repeat` `round` `no-repeat` (`space` becomes "
+    "`round`)")
 QORVEX_SYNTAX(BorderImageSliceType, "one to four *numbers* or *percentages* not below 0, and `fill`")
 QORVEX_SYNTAX(BorderImageWidthType, "one to four of `auto`, *numbers* and *lengths* not below 0")
 QORVEX_SYNTAX(BorderImageOutsetType, "one to four *numbers* or *lengths* not below 0")
 QORVEX_SYNTAX(BorderImageRepeatType, "one or two of `stretch` `repeat` `round` (`space` becomes `repeat`)")
 QORVEX_SYNTAX(ClipPathType,
               "`none`, a *shape*, one of `margin-box` `border-box` `padding-box` `content-box`, or both")
-QORVEX_SYNTAX(BoxShadowListType,
-              "`none`, or a list of: two to four *lengths* (x, y, blur, spread), a *color* or `currentColor`, "
-              "`inset`")
+QORVEX_SYNTAX(
+    BoxShadowListType,
+    "`none`, or a list of: two to four *lengths* (x, y, blur, spread), a *color* or `currentColor`, "
+    "`inset`")
 QORVEX_SYNTAX(TextShadowListType,
               "`none`, or a list of: two or three *lengths* (x, y, blur), a *color* or `currentColor`")
 QORVEX_SYNTAX(FilterListType,
@@ -63,10 +66,11 @@ QORVEX_SYNTAX(FilterListType,
 QORVEX_SYNTAX(FontFamily, "a list of names, in quotes or as words")
 QORVEX_SYNTAX(LetterSpacing, "`normal`, a *length*")
 QORVEX_SYNTAX(LineHeight, "`normal`, a *number* (times the font size), a *length*")
-QORVEX_SYNTAX(Transform,
-              "`none`, or up to 16 of `translate()` `translateX()` `translateY()` `translateZ()` "
-              "`translate3d()` `rotate()` `rotateX()` `rotateY()` `rotateZ()` `rotate3d()` `scale()` `scaleX()` "
-              "`scaleY()` `scaleZ()` `scale3d()` `skewX()` `skewY()` `matrix()` `matrix3d()`")
+QORVEX_SYNTAX(
+    Transform,
+    "`none`, or up to 16 of `translate()` `translateX()` `translateY()` `translateZ()` "
+    "`translate3d()` `rotate()` `rotateX()` `rotateY()` `rotateZ()` `rotate3d()` `scale()` `scaleX()` "
+    "`scaleY()` `scaleZ()` `scale3d()` `skewX()` `skewY()` `matrix()` `matrix3d()`")
 QORVEX_SYNTAX(TransformOrigin,
               "one or two of `left` `center` `right` `top` `bottom` and *lengths*, then a *length* for z")
 QORVEX_SYNTAX(PerspectiveOrigin, "one or two of `left` `center` `right` `top` `bottom` and *lengths*")
