@@ -61,6 +61,15 @@ TEST_F(BoxPaintTest, RoundBordersOfSeveralColoursClipEachSide) {
     EXPECT_EQ(CountOf(lines, "PushState"), CountOf(lines, "PopState"));
 }
 
+TEST_F(BoxPaintTest, RoundBordersKeepTheColoursOfSidesThatDoNotMeet) {
+    LayoutHandle* box = page.Add(page.body, kBox);
+    page.Change(box, "border-top: 2px solid red; border-bottom: 4px solid blue; border-radius: 10px");
+    const auto lines = Frame();
+    EXPECT_EQ(CountOf(lines, "ClipQuad"), 2u);
+    EXPECT_EQ(CountOf(lines, "FillPath #ff0000ff"), 1u);
+    EXPECT_EQ(CountOf(lines, "FillPath #0000ffff"), 1u);
+}
+
 TEST_F(BoxPaintTest, EqualShadowsShareOneSurface) {
     page.Add(page.body, std::string(kBox) + "box-shadow: 3px 4px 5px 2px black; background-color: white");
     page.Add(page.body,

@@ -9,16 +9,6 @@
 namespace qorvex::pages {
 namespace {
 
-constexpr const char* kNames[] = {"view", "file", "expect", "same",   "feed", "none",
-                                  "box",  "js",   "script", "resize", "log",  "nolog"};
-
-bool IsName(const std::string& word) {
-    for (const char* name : kNames) {
-        if (word == name) return true;
-    }
-    return false;
-}
-
 // The lines of a file inside the page, up to "end".
 std::string ReadFile(std::istream& lines, int& number) {
     std::string text;
@@ -46,7 +36,7 @@ std::pair<std::string, std::string> SplitAt(const std::string& text, char separa
     return {Trim(text.substr(0, at)), Trim(text.substr(at + 1))};
 }
 
-PageCase ReadPageCase(const std::string& path) {
+PageCase ReadPageCase(const std::string& path, bool (*isDirective)(const std::string& word)) {
     PageCase page;
     std::stringstream whole;
     whole << std::ifstream(path, std::ios::binary).rdbuf();
@@ -60,17 +50,15 @@ PageCase ReadPageCase(const std::string& path) {
         if (line.starts_with("-->")) break;
         EXPECT_EQ(line.find("-->"), std::string::npos) << path << ":" << number << " ends the comment";
         const auto [word, rest] = SplitAt(line, ' ');
-        if (!IsName(word)) {
-            // Prose is welcome, a directive with a typing error is not: prose has no braces and bars.
-            EXPECT_EQ(line.find_first_of("{|"), std::string::npos) << path << ":" << number << ": " << line;
-            continue;
-        }
         if (word == "file") {
             page.files.emplace_back(rest, ReadFile(lines, number));
         } else if (word == "view") {
             EXPECT_EQ(std::sscanf(rest.c_str(), "%ux%u", &page.width, &page.height), 2) << line;
-        } else {
+        } else if (isDirective(word)) {
             page.directives.push_back({word, rest, number});
+        } else {
+            // Prose is welcome, a directive with a typing error is not: prose has no braces and bars.
+            EXPECT_EQ(line.find_first_of("{|"), std::string::npos) << path << ":" << number << ": " << line;
         }
     }
     return page;

@@ -8,6 +8,7 @@
 //   feed SELECTOR               every longhand's text, set on a fresh sibling, gives the same style again
 //   none SELECTOR               nothing matches
 //   box SELECTOR | X Y W H      of the first match with an id: its place on the page
+//   pixel X Y | RRGGBB          over white
 //   js EXPRESSION | TEXT        what the page's script makes of it
 //   script STATEMENTS           runs, then a frame
 //   resize WxH                  and a frame
@@ -37,7 +38,7 @@ struct PageCase {
     unsigned height = 500;
 };
 
-[[nodiscard]] PageCase ReadPageCase(const std::string& path);
+[[nodiscard]] PageCase ReadPageCase(const std::string& path, bool (*isDirective)(const std::string& word));
 
 std::string Trim(const std::string& text);
 // At the first `separator` outside of double quotes, both sides trimmed; the second is empty without one.

@@ -30,6 +30,8 @@ class CaseRunner {
             &console_);
     }
 
+    static bool IsDirective(const std::string& word) { return Handlers().count(word) > 0; }
+
     void Run() {
         for (const auto& [name, text] : page_.files)
             client_.files.Put(kFolder + name, text);
@@ -38,7 +40,7 @@ class CaseRunner {
         for (const Directive& directive : page_.directives) {
             SCOPED_TRACE("line " + std::to_string(directive.line) + ": " + directive.name + " " +
                          directive.text);
-            (this->*HandlerOf(directive.name))(directive.text);
+            (this->*Handlers().at(directive.name))(directive.text);
             ++checks;
         }
         EXPECT_GT(checks, 0u) << "a case without expectations";
@@ -55,13 +57,13 @@ class CaseRunner {
         return options;
     }
 
-    static Handler HandlerOf(const std::string& name) {
+    static const std::map<std::string, Handler>& Handlers() {
         static const std::map<std::string, Handler> kHandlers = {
             {"expect", &CaseRunner::Expect}, {"same", &CaseRunner::Same},     {"feed", &CaseRunner::Feed},
-            {"none", &CaseRunner::None},     {"box", &CaseRunner::Box},       {"js", &CaseRunner::Evaluate},
-            {"script", &CaseRunner::Script}, {"resize", &CaseRunner::Resize}, {"log", &CaseRunner::NoteLog},
-            {"nolog", &CaseRunner::NoLog}};
-        return kHandlers.at(name);
+            {"none", &CaseRunner::None},     {"box", &CaseRunner::Box},       {"pixel", &CaseRunner::Pixel},
+            {"js", &CaseRunner::Evaluate},   {"script", &CaseRunner::Script}, {"resize", &CaseRunner::Resize},
+            {"log", &CaseRunner::NoteLog},   {"nolog", &CaseRunner::NoLog}};
+        return kHandlers;
     }
 
     Style Computed(const std::string& selector) {
@@ -146,6 +148,16 @@ class CaseRunner {
         EXPECT_EQ(boxes_[id], wanted);
     }
 
+    void Pixel(const std::string& text) {
+        const auto [place, wanted] = SplitAt(text, '|');
+        unsigned x = 0, y = 0;
+        ASSERT_EQ(std::sscanf(place.c_str(), "%u %u", &x, &y), 2);
+        const uint32_t rgba = client_.Pixel(x, y);
+        char color[8];
+        std::snprintf(color, sizeof color, "%02x%02x%02x", rgba & 255, rgba >> 8 & 255, rgba >> 16 & 255);
+        EXPECT_EQ(color, wanted);
+    }
+
     void Evaluate(const std::string& text) {
         const size_t bar = text.rfind(" |");
         ASSERT_NE(bar, std::string::npos);
@@ -224,7 +236,7 @@ TEST_P(PageCases, ComputeWhatTheySay) {
     for (const fs::path& file : files) {
         if (only && file.string().find(only) == std::string::npos) continue;
         SCOPED_TRACE(file.lexically_relative(QORVEX_SOURCE_DIR).string());
-        const PageCase page = ReadPageCase(file.string());
+        const PageCase page = ReadPageCase(file.string(), CaseRunner::IsDirective);
         CaseRunner(page).Run();
     }
 }
