@@ -1,5 +1,5 @@
-// Pages that mean harm, or were cut and scrambled on the way: a game loads them, goes on, and what was sound in
-// them works. Sizes shrink under sanitizers, which take ten times as long.
+// Pages that mean harm, or were cut and scrambled on the way: a game loads them, goes on, and what was sound
+// in them works. Sizes shrink under sanitizers, which take ten times as long.
 #include <gtest/gtest.h>
 #include <qorvex/debug_interface.h>
 
@@ -51,9 +51,7 @@ class HostilePages : public testing::Test {
         Style style;
         Debug()->VisitComputedStyle(
             client_.view, selector.c_str(),
-            [](void* out, const char* name, const char* value) {
-                (*static_cast<Style*>(out))[name] = value;
-            },
+            [](void* out, const char* name, const char* value) { (*static_cast<Style*>(out))[name] = value; },
             &style);
         return style;
     }
@@ -107,9 +105,23 @@ TEST_F(HostilePages, SheetsOfManyRules) {
     // The same as media rules of which one in two holds.
     sheet.clear();
     for (size_t i = 0; i < count / 10; ++i)
-        sheet += std::string("@media (m") + (i % 2 ? "in" : "ax") + "-width:10px){#a{left:" + std::to_string(i) + "px}}";
+        sheet += std::string("@media (m") + (i % 2 ? "in" : "ax") +
+                 "-width:10px){#a{left:" + std::to_string(i) + "px}}";
     Load(PageWith(sheet, "<p id=a></p>"));
     EXPECT_EQ(Computed("#a")["left"], std::to_string(count / 10 - 1) + "px");
+}
+
+TEST_F(HostilePages, VariablesByTheHundredThousand) {
+    const size_t count = 100000 / kShrink;
+    std::string block, rules;
+    for (size_t i = 0; i < count; ++i) {
+        const std::string declaration = "--v" + std::to_string(i) + ":" + std::to_string(i) + "px;";
+        block += declaration;
+        if (i % 4 == 0) rules += "#a{" + declaration + "}";
+    }
+    Load(PageWith("p{" + block + "}" + rules + "p{width:var(--v" + std::to_string(count - 1) + ")}",
+                  "<p id=a></p><p style='" + block + "'></p>"));
+    EXPECT_EQ(Computed("#a")["width"], std::to_string(count - 1) + "px");
 }
 
 TEST_F(HostilePages, SelectorsOf64Kilobytes) {
@@ -121,9 +133,11 @@ TEST_F(HostilePages, SelectorsOf64Kilobytes) {
     const std::string list = Repeat("i,", size / 2) + "p";
     const std::string attributes = Repeat("[x]", size / 3);
     const std::string name = "." + std::string(size, 'n');
-    const std::string body = Repeat("<div>", 30) + "<p></p><p></p><p id=a class=a x=1></p>" + Repeat("</div>", 30);
-    Load(PageWith(compound + "{width:1px}" + children + "{height:1px}" + descendants + "{height:1px}" + siblings +
-                      "{height:1px}" + list + "{left:2px}" + attributes + "{top:3px}" + name + "{height:1px}",
+    const std::string body =
+        Repeat("<div>", 30) + "<p></p><p></p><p id=a class=a x=1></p>" + Repeat("</div>", 30);
+    Load(PageWith(compound + "{width:1px}" + children + "{height:1px}" + descendants + "{height:1px}" +
+                      siblings + "{height:1px}" + list + "{left:2px}" + attributes + "{top:3px}" + name +
+                      "{height:1px}",
                   body));
     Style style = Computed("#a");
     EXPECT_EQ(style["width"], "1px");
@@ -161,11 +175,11 @@ TEST_F(HostilePages, NestingOfValues) {
         chain += "--v" + std::to_string(i) + ":var(--v" + std::to_string(i + 1) + ");";
     chain += "--v" + std::to_string(levels) + ":9px;width:var(--v0)}";
     const std::string fields = Repeat("a(", levels) + Repeat(")", levels);
-    Load(PageWith("#a{width:calc" + sum + ";height:4px}#b{width:" + calcs + ";height:4px}" + chain + "#d{width:" +
-                      fields + ";transform:" + fields + ";background:" + sum + ";filter:blur" + sum +
-                      ";height:4px}#e{width:" + Repeat("(", levels * 2) + ";height:5px}#f{width:4px}",
-                  "<p id=a></p><p id=b></p><p id=c></p><p id=d></p><p id=f style='width:" + Repeat("calc(", levels) +
-                      "'></p>"));
+    Load(PageWith("#a{width:calc" + sum + ";height:4px}#b{width:" + calcs + ";height:4px}" + chain +
+                      "#d{width:" + fields + ";transform:" + fields + ";background:" + sum + ";filter:blur" +
+                      sum + ";height:4px}#e{width:" + Repeat("(", levels * 2) + ";height:5px}#f{width:4px}",
+                  "<p id=a></p><p id=b></p><p id=c></p><p id=d></p><p id=f style='width:" +
+                      Repeat("calc(", levels) + "'></p>"));
     EXPECT_EQ(Computed("#a")["width"], "1px");
     EXPECT_EQ(Computed("#b")["width"], std::to_string(levels / 2 + 1) + "px");
     EXPECT_EQ(Computed("#c")["width"], "9px");
@@ -175,9 +189,21 @@ TEST_F(HostilePages, NestingOfValues) {
 // Every longhand with each of these texts, from a sheet and from script.
 TEST_F(HostilePages, NumbersWithoutMeasure) {
     const std::string digits(400, '9');
-    const std::string numbers[] = {
-        "1e999", digits, "-" + digits, "0." + digits, digits + "." + digits, "." + std::string(400, '0') + "1", "1e-999",
-        "3e38", "340282350000000000000000000000000000000", "-0", "+.5", "2147483648", "-2147483649", "NaN", "Infinity"};
+    const std::string numbers[] = {"1e999",
+                                   digits,
+                                   "-" + digits,
+                                   "0." + digits,
+                                   digits + "." + digits,
+                                   "." + std::string(400, '0') + "1",
+                                   "1e-999",
+                                   "3e38",
+                                   "340282350000000000000000000000000000000",
+                                   "-0",
+                                   "+.5",
+                                   "2147483648",
+                                   "-2147483649",
+                                   "NaN",
+                                   "Infinity"};
     std::vector<std::string> names;
     Load(PageWith("", "<p id=a></p>"));
     for (const auto& [name, value] : Computed("#a"))
@@ -185,9 +211,10 @@ TEST_F(HostilePages, NumbersWithoutMeasure) {
     ASSERT_EQ(names.size(), 118u);
     std::string sheet, script = "const s = document.getElementById('a').style;";
     for (const std::string& number : numbers) {
-        for (const char* form : {"%", "%px", "%%", "%em", "%vmax", "%deg", "%s", "%ms", "rgb(%,%,%)", "calc(% * %px)",
-                                 "translate(%px,%em)", "scale(%)", "matrix(%,%,%,%,%,%)", "blur(%px)", "%px %px %px red",
-                                 "circle(%px)", "linear-gradient(%deg,red %px,blue)", "cubic-bezier(0,%,1,%)", "steps(%)"}) {
+        for (const char* form :
+             {"%", "%px", "%%", "%em", "%vmax", "%deg", "%s", "%ms", "rgb(%,%,%)", "calc(% * %px)",
+              "translate(%px,%em)", "scale(%)", "matrix(%,%,%,%,%,%)", "blur(%px)", "%px %px %px red",
+              "circle(%px)", "linear-gradient(%deg,red %px,blue)", "cubic-bezier(0,%,1,%)", "steps(%)"}) {
             std::string value;
             for (const char c : std::string_view(form)) {
                 if (c == '%' && value.ends_with(number) && std::string_view(form) == "%%") {
@@ -219,9 +246,9 @@ TEST_F(HostilePages, BytesThatAreNoText) {
     const std::string wrong = "\xFF\xFE\x80\xC0\xAF\xED\xA0\x80\xF5\x80\x80\x80\xE2\x82";
     Load("<html><head><style>#a{width:1px;qor-composition-id:\"" + wrong + "\";} .\xFF\xC3{left:2px} " + nul +
          "#b{width:2px}</style><style>#c{width:3px}#d{--x" + wrong + ":4px;width:var(--x" + wrong +
-         ")}</style></head><body " + wrong + "=1 " + nul + "x=2><p id=a " + nul + "></p><p id=c class='\xFF\xC3" + nul +
-         "' data-" + wrong + "=7 style='top:5px" + nul + ";left:6px'>" + wrong + nul + "</p><p id=d></p>" + nul +
-         "</body></html>");
+         ")}</style></head><body " + wrong + "=1 " + nul + "x=2><p id=a " + nul +
+         "></p><p id=c class='\xFF\xC3" + nul + "' data-" + wrong + "=7 style='top:5px" + nul +
+         ";left:6px'>" + wrong + nul + "</p><p id=d></p>" + nul + "</body></html>");
     EXPECT_EQ(Computed("#a")["width"], "1px");
     EXPECT_EQ(Computed("#c")["width"], "3px");
     EXPECT_EQ(Computed("#d")["width"], "4px");
@@ -236,13 +263,20 @@ TEST_F(HostilePages, BytesThatAreNoText) {
 }
 
 const std::string kWholePage =
-    "<!DOCTYPE html><html lang=en><head><title>t</title><link rel=stylesheet href=x.css media='(min-width: 1px)'><style>"
-    "@charset \"x\"; #a, .b > p:hover [c|=\"d\" i] + * { margin: 1px 2%; color: rgba(1, 2, 3, .5) !important; --x: var(--y);"
-    "background: url('a.png') no-repeat 1px / cover, linear-gradient(45deg, red 1px, blue) } @media (orientation: landscape) and"
-    " (max-width: 5em) { q::selection { color: red } } @keyframes k { from, 50% { top: calc(1px + 2vw) } to { top: 3px } }"
-    "@font-face { font-family: f; src: url(f.ttf) } /* c */ // d\n</style><script>var x = '<p>';</script></head><body class='a "
-    "b'><!-- c --><p id=a style=\"width: calc(1px * 3); transform: rotate(3deg) scale(2)\">text &amp; &#65; &eacute;<br>more"
-    "</p><svg><path d='M0 0'/></svg><table><tr><td>1</table><input value=\"v\"><div data-l10n-id=k onclick=\"x()\">z</div></body>"
+    "<!DOCTYPE html><html lang=en><head><title>t</title><link rel=stylesheet href=x.css media='(min-width: "
+    "1px)'><style>"
+    "@charset \"x\"; #a, .b > p:hover [c|=\"d\" i] + * { margin: 1px 2%; color: rgba(1, 2, 3, .5) "
+    "!important; --x: var(--y);"
+    "background: url('a.png') no-repeat 1px / cover, linear-gradient(45deg, red 1px, blue) } @media "
+    "(orientation: landscape) and"
+    " (max-width: 5em) { q::selection { color: red } } @keyframes k { from, 50% { top: calc(1px + 2vw) } to "
+    "{ top: 3px } }"
+    "@font-face { font-family: f; src: url(f.ttf) } /* c */ // d\n</style><script>var x = "
+    "'<p>';</script></head><body class='a "
+    "b'><!-- c --><p id=a style=\"width: calc(1px * 3); transform: rotate(3deg) scale(2)\">text &amp; &#65; "
+    "&eacute;<br>more"
+    "</p><svg><path d='M0 0'/></svg><table><tr><td>1</table><input value=\"v\"><div data-l10n-id=k "
+    "onclick=\"x()\">z</div></body>"
     "</html>";
 
 TEST_F(HostilePages, PagesCutAnywhere) {
@@ -254,12 +288,75 @@ TEST_F(HostilePages, PagesCutAnywhere) {
 
 // Pieces of pages in any order: nothing is asked of them but that the game goes on.
 TEST_F(HostilePages, PiecesInAnyOrder) {
-    const std::vector<std::string> pieces = {
-        "{", "}", "(", ")", "[", "]", ";", ":", ",", "\"", "'", "/*", "*/", "<!--", "-->", "@media", "@keyframes k", "@font-face", "from",
-        "50%", "#a", ".b", "*", "p", ">", "+", "~", "::selection", ":hover", "[x=y]", "width", "color", "margin", "flex", "transform",
-        "background", "font", "animation", "mask", "border-image", "--x", "var(--x)", "calc(", "1px", "2em", "3%", "-4", ".5", "red",
-        "rgb(1,2,3)", "url(a.png)", "linear-gradient(red,blue)", "!important", "inherit", "initial", "auto", "none", "and",
-        "(min-width:1px)", " ", "\n", "//", "\\", "\xC3\xA9", "translate(1px)", "blur(1px)", "polygon(0 0,1px 1px)", "ease", "1s"};
+    const std::vector<std::string> pieces = {"{",
+                                             "}",
+                                             "(",
+                                             ")",
+                                             "[",
+                                             "]",
+                                             ";",
+                                             ":",
+                                             ",",
+                                             "\"",
+                                             "'",
+                                             "/*",
+                                             "*/",
+                                             "<!--",
+                                             "-->",
+                                             "@media",
+                                             "@keyframes k",
+                                             "@font-face",
+                                             "from",
+                                             "50%",
+                                             "#a",
+                                             ".b",
+                                             "*",
+                                             "p",
+                                             ">",
+                                             "+",
+                                             "~",
+                                             "::selection",
+                                             ":hover",
+                                             "[x=y]",
+                                             "width",
+                                             "color",
+                                             "margin",
+                                             "flex",
+                                             "transform",
+                                             "background",
+                                             "font",
+                                             "animation",
+                                             "mask",
+                                             "border-image",
+                                             "--x",
+                                             "var(--x)",
+                                             "calc(",
+                                             "1px",
+                                             "2em",
+                                             "3%",
+                                             "-4",
+                                             ".5",
+                                             "red",
+                                             "rgb(1,2,3)",
+                                             "url(a.png)",
+                                             "linear-gradient(red,blue)",
+                                             "!important",
+                                             "inherit",
+                                             "initial",
+                                             "auto",
+                                             "none",
+                                             "and",
+                                             "(min-width:1px)",
+                                             " ",
+                                             "\n",
+                                             "//",
+                                             "\\",
+                                             "\xC3\xA9",
+                                             "translate(1px)",
+                                             "blur(1px)",
+                                             "polygon(0 0,1px 1px)",
+                                             "ease",
+                                             "1s"};
     std::mt19937 random(7);
     for (size_t round = 0; round < 300 / kShrink; ++round) {
         SCOPED_TRACE("round " + std::to_string(round));
