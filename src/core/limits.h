@@ -46,14 +46,6 @@ inline constexpr size_t kMaxDocumentDepth = 512;
 /// of this (5,000 take 20 ms, 100,000 take 17 s).
 inline constexpr size_t kMaxSourceNesting = 4096;
 
-/// Attributes of one tag that the HTML parser sees: it compares each with all before it (50,000 take 20 s).
-inline constexpr size_t kMaxSourceAttributes = 8192;
-
-/// Such comparisons, as the square of the attributes, over the tags of a source: a part of a second. Tags
-/// behind it keep so many attributes as any page of sense has.
-inline constexpr size_t kMaxSourceAttributeWork = size_t{1} << 25;
-inline constexpr size_t kUsualAttributes = 64;
-
 /// Loads that finish inside the request for them may run a script that asks for the next one; deeper than
 /// this they wait for the next frame.
 inline constexpr uint32_t kMaxNestedResourceEvents = 16;

@@ -14,7 +14,6 @@ struct Tag {
     size_t start = 0;
     size_t end = 0;  // behind the ">"
     TagId id = TagId::Unknown;
-    size_t surplus = 0;  // where the attributes beyond the limit start; 0 without
     bool closing = false;
     bool self_closing = false;
 };
@@ -112,40 +111,20 @@ class TagScanner {
             ++end;
         }
         tag.id = css::TagLookup({upper, length});
-        SkipAttributes(tag, end);
-        tag.self_closing = end < source_.size() && source_[end - 1] == '/';
-        tag.end = position_ = std::min(end + 1, source_.size());
-        if (!closing && HoldsRawText(tag.id)) SkipRawText(std::string_view(upper, length));
-    }
-
-    // Up to the ">". An attribute starts where something other than "=" or a value follows space or "/".
-    void SkipAttributes(Tag& tag, size_t& end) {
-        const bool spent = work_ > limits::kMaxSourceAttributeWork;
-        const size_t most = spent ? limits::kUsualAttributes : limits::kMaxSourceAttributes;
-        tag.surplus = 0;
-        size_t count = 0;
-        bool between = true, value_follows = false;
-        for (char quote = 0; end < source_.size(); ++end) {
+        char quote = 0;
+        for (; end < source_.size(); ++end) {
             const char c = source_[end];
             if (quote) {
                 if (c == quote) quote = 0;
-                between = quote == 0;
             } else if (c == '>') {
                 break;
-            } else if (IsAsciiSpace(c) || c == '/') {
-                between = true;
-            } else if (value_follows) {
-                if (c == '"' || c == '\'') quote = c;
-                value_follows = between = false;
-            } else if (c == '=') {
-                value_follows = true;
-            } else if (between) {
-                between = false;
-                if (++count == most + 1) tag.surplus = end;
+            } else if ((c == '"' || c == '\'') && source_[end - 1] == '=') {
+                quote = c;
             }
         }
-        count = std::min(count, most);
-        work_ += count * count;
+        tag.self_closing = end < source_.size() && source_[end - 1] == '/';
+        tag.end = position_ = std::min(end + 1, source_.size());
+        if (!closing && HoldsRawText(tag.id)) SkipRawText(std::string_view(upper, length));
     }
 
     // Stops in front of the end tag.
@@ -159,7 +138,6 @@ class TagScanner {
 
     std::string_view source_;
     size_t position_ = 0;
-    size_t work_ = 0;  // squares of the attributes so far
 };
 
 }  // namespace
@@ -172,13 +150,7 @@ bool FlattenNesting(std::string_view source, TaggedString<MemoryTag::DOM>& rewri
     size_t open = 0;
     size_t blanked = 0;  // start tags whose end tags have to go too
     bool changed = false;
-    const auto blank = [&](size_t from, size_t to) {
-        if (!changed) rewritten = source;
-        changed = true;
-        std::fill(rewritten.data() + from, rewritten.data() + to, ' ');
-    };
     while (scanner.Next(tag)) {
-        if (tag.surplus) blank(tag.surplus, source[tag.end - 1] == '>' ? tag.end - 1 : tag.end);
         // Content of raw text must not turn into text of the page.
         if (!StaysOpen(tag) || tag.self_closing || HoldsRawText(tag.id)) continue;
         if (tag.closing) {
@@ -193,7 +165,9 @@ bool FlattenNesting(std::string_view source, TaggedString<MemoryTag::DOM>& rewri
         } else {
             ++blanked;
         }
-        blank(tag.start, tag.end);
+        if (!changed) rewritten = source;
+        changed = true;
+        std::fill(rewritten.data() + tag.start, rewritten.data() + tag.end, ' ');
     }
     return changed;
 }

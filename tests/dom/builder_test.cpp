@@ -1,6 +1,5 @@
 #include <qorvex/text_services.h>
 
-#include "core/limits.h"
 #include "dom/dom_fixture.h"
 #include "dom/html_script_element.h"
 
@@ -253,22 +252,6 @@ TEST_F(BuilderTest, ManyAttributesAndLongTexts) {
     EXPECT_EQ(Find("a").GetAttributeCount(), 5001u);
     EXPECT_EQ(Find("a").GetAttribute("a4999")->view(), "4999");
     EXPECT_EQ(Find("a").GetTextContent().size(), size_t{10} << 20);
-}
-
-TEST_F(BuilderTest, AttributesWithoutEndAreCut) {
-    std::string attributes;
-    for (int i = 0; i < 20000; ++i)
-        attributes += " a" + std::to_string(i) + (i % 2 ? "= \">\"" : "");
-    Load("<p id=a" + attributes + ">x</p>");
-    EXPECT_EQ(Find("a").GetAttributeCount(), limits::kMaxSourceAttributes);
-    EXPECT_EQ(Find("a").GetAttribute("a8189")->view(), ">");
-    EXPECT_EQ(Find("a").GetTextContent().view(), "x");
-    // When many tags do so, the later ones keep few.
-    std::string page;
-    for (int i = 0; i < 3; ++i)
-        page += "<p id=b" + std::to_string(i) + attributes + "></p>";
-    Load(page);
-    EXPECT_EQ(Find("b2").GetAttributeCount(), limits::kUsualAttributes);
 }
 
 TEST_F(BuilderTest, ParsedPagesAreSharedAndGiveTheirSourceBack) {

@@ -111,8 +111,8 @@ TEST_F(HostilePages, SheetsOfManyRules) {
     EXPECT_EQ(Computed("#a")["left"], std::to_string(count / 10 - 1) + "px");
 }
 
-TEST_F(HostilePages, VariablesByTheHundredThousand) {
-    const size_t count = 100000 / kShrink;
+TEST_F(HostilePages, VariablesByTheThousand) {
+    const size_t count = 20000 / kShrink;
     std::string block, rules;
     for (size_t i = 0; i < count; ++i) {
         const std::string declaration = "--v" + std::to_string(i) + ":" + std::to_string(i) + "px;";

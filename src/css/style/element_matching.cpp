@@ -82,25 +82,12 @@ void ElementMatcher::OfferRule(const IndexedRule& rule, Element& element) {
         OfferCustom(entry.first, entry.second, specificity, element);
 }
 
-ElementMatcher::Offers::CustomOffer* ElementMatcher::FindCustomOffer(Atom name) {
-    constexpr size_t kMostSearched = 16;
-    auto& offers = offers_.custom;
-    if (offers.size() <= kMostSearched) {
-        auto* known =
-            std::find_if(offers.begin(), offers.end(), [&](const auto& o) { return o.name == name; });
-        return known == offers.end() ? nullptr : known;
-    }
-    for (uint32_t i = static_cast<uint32_t>(offers_.customIndex.size()); i < offers.size(); ++i)
-        offers_.customIndex.insert_or_assign(offers[i].name, i);
-    const uint32_t* place = offers_.customIndex.get(name);
-    return place ? &offers[*place] : nullptr;
-}
-
 void ElementMatcher::OfferCustom(Atom name, const CustomPropertyPtr& record, uint32_t specificity,
                                  Element& element) {
     const bool important = (record->flags & kImportant) != 0;
-    auto* known = FindCustomOffer(name);
-    if (!known) {
+    auto* known = std::find_if(offers_.custom.begin(), offers_.custom.end(),
+                               [&](const auto& offer) { return offer.name == name; });
+    if (known == offers_.custom.end()) {
         offers_.custom.push_back({name, specificity, important});
     } else {
         if (known->important && !important) return;
@@ -118,7 +105,6 @@ bool ElementMatcher::Apply(RuleIndex& index, Element& element, MatchContext& con
     offers_.recorded.Clear();
     offers_.important.Clear();
     offers_.custom.clear();
-    if (!offers_.customIndex.empty()) offers_.customIndex.clear();
     for (const MatchedRule& matched : candidates_)
         OfferRule(*matched.rule, element);
     return !candidates_.empty();

@@ -36,7 +36,6 @@ class ElementMatcher {
             bool important;
         };
         CssSmallVector<CustomOffer, 4> custom;
-        CssHashMap<Atom, uint32_t> customIndex;  // of `custom`, once it is too long to be searched
     };
 
     bool Apply(RuleIndex& index, dom::Element& element, MatchContext& context);
@@ -44,7 +43,6 @@ class ElementMatcher {
     void CollectQuick(const RuleIndex& index, const RuleIndex::Indices* indices);
     void Consider(const IndexedRule& rule, dom::Element& element, MatchContext& context, bool record);
     void OfferRule(const IndexedRule& rule, dom::Element& element);
-    Offers::CustomOffer* FindCustomOffer(Atom name);
     void OfferCustom(Atom name, const CustomPropertyPtr& record, uint32_t specificity, dom::Element& element);
     static void StoreSet(const StyleDeclarationSet& set, dom::Element& element, bool respectImportant);
 
