@@ -52,6 +52,8 @@ PageCase ReadPageCase(const std::string& path, bool (*isDirective)(const std::st
         const auto [word, rest] = SplitAt(line, ' ');
         if (word == "file") {
             page.files.emplace_back(rest, ReadFile(lines, number));
+        } else if (word == "simple") {
+            page.complexSelectors = false;
         } else if (word == "view") {
             EXPECT_EQ(std::sscanf(rest.c_str(), "%ux%u", &page.width, &page.height), 2) << line;
         } else if (isDirective(word)) {

@@ -2,6 +2,7 @@
 // carried out in order once the page has loaded.
 //
 //   view WxH                    size before loading (1000x500)
+//   simple selectors            a game that switched the restyling of combinators off
 //   file NAME ... end           a file beside the page, for links
 //   expect SELECTOR { property: value; ... }   the computed style of the first match
 //   same SELECTOR | SELECTOR    all longhands alike
@@ -36,6 +37,7 @@ struct PageCase {
     std::vector<Directive> directives;
     unsigned width = 1000;
     unsigned height = 500;
+    bool complexSelectors = true;
 };
 
 [[nodiscard]] PageCase ReadPageCase(const std::string& path, bool (*isDirective)(const std::string& word));

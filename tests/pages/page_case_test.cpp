@@ -54,6 +54,7 @@ class CaseRunner {
         client::Options options;
         options.width = page.width;
         options.height = page.height;
+        options.complex_selectors = page.complexSelectors;
         return options;
     }
 
