@@ -25,6 +25,7 @@ constexpr std::string_view kBuilders = R"((function() {
             Object.defineProperties(result, { prototype: fixed(prototype), name: fixed(name) });
             Object.defineProperty(prototype, 'constructor',
                 { value: result, writable: true, enumerable: false, configurable: true });
+            Object.defineProperty(prototype, Symbol.toStringTag, { value: name, configurable: true });
             if (parent) Object.setPrototypeOf(result, parent);
             if (global) {
                 const inherited = Function.prototype[Symbol.hasInstance];
@@ -32,6 +33,13 @@ constexpr std::string_view kBuilders = R"((function() {
                     fixed(function(value) { return value === global || inherited.call(this, value); }));
             }
             return result;
+        },
+        // Sixteen objects that inherit from `prototype`, handed over in one call.
+        blanksOf(prototype, take) {
+            function Blank() {}
+            Blank.prototype = prototype;
+            return () => take(new Blank, new Blank, new Blank, new Blank, new Blank, new Blank, new Blank, new Blank,
+                              new Blank, new Blank, new Blank, new Blank, new Blank, new Blank, new Blank, new Blank);
         },
         tag(target, name) {
             Object.defineProperty(target, Symbol.toStringTag, { value: name, configurable: true });
@@ -57,6 +65,7 @@ class Installer {
         constant_ = Function(object, "constant");
         constructor_of_ = Function(object, "constructorOf");
         tag_ = Function(object, "tag");
+        blanks_of_ = Function(object, "blanksOf");
         invalid_constructor_ = JSObjectMakeFunctionWithCallback(context_, nullptr, InvalidConstructor);
     }
 
@@ -68,6 +77,9 @@ class Installer {
             JSObjectSetPropertyAtIndex(context_, page_.prototype_keeper, static_cast<unsigned>(i),
                                        page_.prototypes[i], nullptr);
         }
+        JSObjectSetPropertyAtIndex(context_, page_.prototype_keeper,
+                                   static_cast<unsigned>(2 * kScriptClassCount), blanks_of_, nullptr);
+        page_.blanks_of = blanks_of_;
         // Constructors need a second pass with parents first; the keeper holds them behind the prototypes,
         // and the array on this stack keeps them for the while.
         for (size_t i = 0; i < kScriptClassCount; ++i)
@@ -160,6 +172,7 @@ class Installer {
     JSObjectRef constant_ = nullptr;
     JSObjectRef constructor_of_ = nullptr;
     JSObjectRef tag_ = nullptr;
+    JSObjectRef blanks_of_ = nullptr;
     JSObjectRef invalid_constructor_ = nullptr;
     // Index kScriptClassCount stands for "no class" and stays null.
     std::array<JSObjectRef, kScriptClassCount + 1> constructors_{};
@@ -176,6 +189,7 @@ void UninstallClasses(ScriptingContext& page) {
     if (page.prototype_keeper) UnprotectUnlessTeardown(page.context, page.prototype_keeper);
     page.prototype_keeper = nullptr;
     page.prototypes = {};
+    page.blanks_of = nullptr;
 }
 
 }  // namespace qorvex::script

@@ -11,6 +11,7 @@
 #include <string_view>
 
 #include "script/class_table.h"
+#include "script/wrapper_table.h"
 
 namespace qorvex::dom {
 class Window;
@@ -30,15 +31,18 @@ struct ScriptingContext {
     // The global object, and the window as the handle that calls on it act on.
     JSObjectRef global_object = nullptr;
     ScriptingHandleEnabled* global_handle = nullptr;
-    // The prototype of each class in this context, all held by `prototype_keeper`.
+    // The prototype of each class in this context, all held by `prototype_keeper`, as are the functions that
+    // make blank objects; `blanks_of` makes those.
     std::array<JSObjectRef, kScriptClassCount> prototypes{};
     JSObjectRef prototype_keeper = nullptr;
+    JSObjectRef blanks_of = nullptr;
+    WrapperTable wrappers;
     // Chain of the thread's contexts, see GetScriptingContext.
     ScriptingContext* next = nullptr;
 };
 
-// Puts a context whose `context` field is set among those that GetScriptingContext finds, or takes it out.
-// To be called on the context's own thread.
+// Puts a context whose `context` field is set among those that GetScriptingContext finds, or takes it out,
+// which parts all wrappers from their natives. To be called on the context's own thread.
 void RegisterScriptingContext(ScriptingContext& context);
 void UnregisterScriptingContext(ScriptingContext& context);
 
