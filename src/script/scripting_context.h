@@ -21,6 +21,10 @@ namespace qorvex::script {
 
 class ScriptingHandleEnabled;
 
+// The script functions that make classes.
+enum class ClassBuilder : uint8_t { Lazy, PrototypeOf, Members, ConstructorOf, BlanksOf, TagGlobal };
+inline constexpr size_t kClassBuilderCount = 6;
+
 struct ScriptingContext {
     // Error raised by native code that has no exception out-parameter at hand; protected while it stands
     // here. Set by RaiseError, moved out by HandOverPendingException.
@@ -31,11 +35,10 @@ struct ScriptingContext {
     // The global object, and the window as the handle that calls on it act on.
     JSObjectRef global_object = nullptr;
     ScriptingHandleEnabled* global_handle = nullptr;
-    // The prototype of each class in this context, all held by `prototype_keeper`, as are the functions that
-    // make blank objects; `blanks_of` makes those.
+    // What has been made of the bound classes (class_installation.h), all held by `class_keeper`.
     std::array<JSObjectRef, kScriptClassCount> prototypes{};
-    JSObjectRef prototype_keeper = nullptr;
-    JSObjectRef blanks_of = nullptr;
+    std::array<JSObjectRef, kClassBuilderCount> builders{};
+    JSObjectRef class_keeper = nullptr;
     WrapperTable wrappers;
     // Chain of the thread's contexts, see GetScriptingContext.
     ScriptingContext* next = nullptr;

@@ -2,6 +2,7 @@
 
 #include <JavaScriptCore/JavaScript.h>
 
+#include "script/class_installation.h"
 #include "script/native_private.h"
 #include "script/scripting_context.h"
 #include "script/scripting_handle_enabled.h"
@@ -60,7 +61,7 @@ void WrapperTable::Stop() {
 }
 
 JSObjectRef WrapperTable::Add(ScriptClass script_class, const void* packed) {
-    if (!page_ || !page_->prototypes[static_cast<size_t>(script_class)]) return nullptr;
+    if (!page_ || !GetPrototype(*page_, script_class)) return nullptr;
     Slot* slot =
         HasPropertyRules(script_class) ? MakeWithRules(script_class, packed) : TakeBlank(script_class);
     if (!slot) return nullptr;
@@ -197,15 +198,16 @@ void WrapperTable::MakeBlanks(ScriptClass script_class) {
     Blanks& blanks = blanks_[index];
     filling_ = &blanks;
     JSValueRef exception = nullptr;
-    if (!blanks.maker && page_->blanks_of) {
+    if (!blanks.maker) {
         const JSValueRef arguments[] = {page_->prototypes[index],
                                         JSObjectMakeFunctionWithCallback(context, nullptr, AcceptBlanks)};
         const JSValueRef maker =
-            JSObjectCallAsFunction(context, page_->blanks_of, nullptr, 2, arguments, &exception);
+            JSObjectCallAsFunction(context, page_->builders[static_cast<size_t>(ClassBuilder::BlanksOf)],
+                                   nullptr, 2, arguments, &exception);
         if (AsObject(context, maker)) {
             blanks.maker = const_cast<JSObjectRef>(maker);
-            JSObjectSetPropertyAtIndex(context, page_->prototype_keeper,
-                                       static_cast<unsigned>(kScriptClassCount + index), maker, nullptr);
+            JSObjectSetPropertyAtIndex(context, page_->class_keeper,
+                                       static_cast<unsigned>(kClassKeeperUses + index), maker, nullptr);
         }
     }
     if (blanks.maker) JSObjectCallAsFunction(context, blanks.maker, nullptr, 0, nullptr, &exception);

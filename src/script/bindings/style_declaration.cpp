@@ -11,6 +11,7 @@
 #include "dom/document.h"
 #include "dom/document_host.h"
 #include "dom/style_engine.h"
+#include "script/class_installation.h"
 #include "script/member_callbacks.h"
 
 namespace qorvex::script {
@@ -91,10 +92,9 @@ JSValueRef MakeStyleDeclaration(JSContextRef context, dom::Element& element, Sty
     auto* holder = New<StyleHolder, MemoryTag::DOM>(element, form);
     const JSObjectRef object =
         JSObjectMake(context, style_class, PackPrivate(holder, StyleHolder::kScriptClass, false));
-    const ScriptingContext* page = GetScriptingContext(context);
-    if (page) {
-        JSObjectSetPrototype(context, object,
-                             page->prototypes[static_cast<size_t>(StyleHolder::kScriptClass)]);
+    if (ScriptingContext* page = GetScriptingContext(context)) {
+        if (const JSObjectRef prototype = GetPrototype(*page, StyleHolder::kScriptClass))
+            JSObjectSetPrototype(context, object, prototype);
     }
     return object;
 }
