@@ -32,6 +32,7 @@ void JSContextGroupAddHeapFinalizer(JSContextGroupRef group, JSHeapFinalizer fin
 OpaqueJSWeak* JSWeakCreate(JSContextGroupRef group, JSObjectRef object);
 void JSWeakRelease(JSContextGroupRef group, OpaqueJSWeak* reference);
 JSObjectRef JSWeakGetObject(OpaqueJSWeak* reference);
+void JSReportExtraMemoryCost(JSContextRef context, size_t bytes);
 void JSLock(JSContextRef context);
 void JSUnlock(JSContextRef context);
 }
@@ -175,6 +176,10 @@ ScriptEngineLock::ScriptEngineLock(JSContextRef context) : context_(context) {
 }
 ScriptEngineLock::~ScriptEngineLock() {
     JSUnlock(context_);
+}
+
+void ReportNativeMemory(JSContextRef context, size_t bytes) {
+    JSReportExtraMemoryCost(context, bytes);
 }
 
 ScriptEngineMemory GetScriptEngineMemory(JSContextRef context) {

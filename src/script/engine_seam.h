@@ -77,6 +77,10 @@ class ScriptEngineLock {
     JSContextRef context_;
 };
 
+// Native memory that lives as long as script objects do: the engine collects the earlier for it. It may
+// collect within this call.
+void ReportNativeMemory(JSContextRef context, size_t bytes);
+
 struct ScriptEngineMemory {
     size_t heap_size = 0;      // live objects, bytes
     size_t heap_capacity = 0;  // reserved for objects, bytes

@@ -11,6 +11,10 @@ namespace qorvex::script {
 
 namespace {
 
+// What the native behind a wrapper takes at least: an event 192 bytes, an element 600 and more. Script alone
+// would count 64, and a loop that makes elements could hold a hundred megabytes before the first collection.
+constexpr size_t kNativeBytes = 256;
+
 template <class F>
 decltype(auto) WithHandle(const void* packed, F&& use) {
     const NativePrivate found = UnpackPrivate(packed);
@@ -212,7 +216,7 @@ void WrapperTable::MakeBlanks(ScriptClass script_class) {
     }
     if (blanks.maker) JSObjectCallAsFunction(context, blanks.maker, nullptr, 0, nullptr, &exception);
     filling_ = nullptr;
-    if (blanks.first) return;
+    if (blanks.first) return ReportNativeMemory(context, kBlanksAtOnce * kNativeBytes);
     // The engine runs no script now: out of stack, or being stopped.
     const JSObjectRef object = JSObjectMake(context, nullptr, nullptr);
     JSObjectSetPrototype(context, object, page_->prototypes[index]);

@@ -76,7 +76,8 @@ class WrapperTable final : private IHeapObserver {
         const void* packed = nullptr;
         Slot* slot = nullptr;
     };
-    // Blank objects of one class, made ahead: one call into script makes a handful.
+    // Blank objects of one class, made ahead: one call into script makes a handful (class_installation.cpp).
+    static constexpr size_t kBlanksAtOnce = 16;
     struct Blanks {
         Slot* first = nullptr;
         JSObjectRef maker = nullptr;

@@ -84,12 +84,12 @@ const char* UnitName(LengthUnit unit) {
 }  // namespace
 
 void StyleHolder::Release() {
-    if (count_.fetch_sub(1, std::memory_order_acq_rel) == 1) Delete<MemoryTag::DOM>(this);
+    if (count_.fetch_sub(1, std::memory_order_acq_rel) == 1) delete this;
 }
 
 JSValueRef MakeStyleDeclaration(JSContextRef context, dom::Element& element, StyleForm form) {
     const JSClassRef style_class = GetScriptClassTable()[StyleHolder::kScriptClass];
-    auto* holder = New<StyleHolder, MemoryTag::DOM>(element, form);
+    auto* holder = new StyleHolder(element, form);
     const JSObjectRef object =
         JSObjectMake(context, style_class, PackPrivate(holder, StyleHolder::kScriptClass, false));
     if (ScriptingContext* page = GetScriptingContext(context)) {
