@@ -12,6 +12,7 @@
 #include "dom/document.h"
 #include "dom/document_host.h"
 #include "dom/style_engine.h"
+#include "script/class_installation.h"
 #include "script/member_callbacks.h"
 
 namespace qorvex::script {
@@ -85,18 +86,17 @@ const char* UnitName(LengthUnit unit) {
 }  // namespace
 
 void StyleHolder::Release() {
-    if (count_.fetch_sub(1, std::memory_order_acq_rel) == 1) Delete<MemoryTag::DOM>(this);
+    if (count_.fetch_sub(1, std::memory_order_acq_rel) == 1) delete this;
 }
 
 JSValueRef MakeStyleDeclaration(JSContextRef context, dom::Element& element, StyleForm form) {
     const JSClassRef style_class = GetScriptClassTable()[StyleHolder::kScriptClass];
-    auto* holder = New<StyleHolder, MemoryTag::DOM>(element, form);
+    auto* holder = new StyleHolder(element, form);
     const JSObjectRef object =
         JSObjectMake(context, style_class, PackPrivate(holder, StyleHolder::kScriptClass, false));
-    const ScriptingContext* page = GetScriptingContext(context);
-    if (page) {
-        JSObjectSetPrototype(context, object,
-                             page->prototypes[static_cast<size_t>(StyleHolder::kScriptClass)]);
+    if (ScriptingContext* page = GetScriptingContext(context)) {
+        if (const JSObjectRef prototype = GetPrototype(*page, StyleHolder::kScriptClass))
+            JSObjectSetPrototype(context, object, prototype);
     }
     return object;
 }
