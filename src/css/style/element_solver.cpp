@@ -94,7 +94,8 @@ class ElementSolver {
 
     bool InheritDirtiness() {
         PropertySet added;
-        if (parentNode_.IsElement()) {
+        // Above the root stand the initial values, which do not change.
+        if (!parentNode_.Is(dom::kIsDocument)) {
             const PropertySet& parentDirty = static_cast<Element&>(parentNode_).GetDirtyProperties();
             if (!parentDirty.Empty()) {
                 added = (parentDirty & kInheritedProperties) | (parentDirty & match_.inheriting());
