@@ -174,7 +174,7 @@ class Element : public Node {
     css::MatchStatePtr match_state_;
     Vector<AttributePair, MemoryTag::DOM> attributes_;
     Atom id_;
-    Vector<Atom, MemoryTag::DOM> classes_;
+    SmallVector<Atom, 1, MemoryTag::DOM> classes_;
 };
 
 template <class Visitor>

@@ -51,8 +51,8 @@ const layout::LayoutResult* Node::GetLayoutResult() const {
 layout::ScrollPosition Node::ClampScroll(layout::ScrollPosition wanted) const {
     const layout::LayoutResult* box = GetLayoutResult();
     if (!box) return wanted;
-    const float width = box->width - box->border.left - box->border.right;
-    const float height = box->height - box->border.top - box->border.bottom;
+    const float width = box->width - box->edges.border().left - box->edges.border().right;
+    const float height = box->height - box->edges.border().top - box->edges.border().bottom;
     const float max_x = std::max(0.0f, box->scrollSize.width - width);
     const float max_y = std::max(0.0f, box->scrollSize.height - height);
     return {std::clamp(wanted.x, 0.0f, max_x), std::clamp(wanted.y, 0.0f, max_y)};

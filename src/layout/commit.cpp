@@ -16,7 +16,7 @@ namespace qorvex::layout {
 
 namespace {
 
-bool Written(const css::LayoutStyleRefs& style, css::StyleGroup group) {
+bool Written(const css::LaidOutStyle& style, css::StyleGroup group) {
     return style.written[static_cast<size_t>(group)] != 0;
 }
 
@@ -33,8 +33,7 @@ void Sever(LayoutHandle& handle) {
     node.depth = 0;
     node.absoluteBelow = false;
     node.paintBounds = node.visualAabb = {};
-    if (YGNode* owner = YGNodeGetOwner(node.flex)) YGNodeRemoveChild(owner, node.flex);
-    YGNodeRemoveAllChildren(node.flex);
+    handle.store().FreeFlexNode(node);
 }
 
 void CopyToLayoutSide(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
@@ -55,7 +54,7 @@ void CopyToLayoutSide(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
     node.visualChanged = node.visualChanged || data.changed || Written(data.style, css::StyleGroup::Layout) ||
                          Written(data.style, css::StyleGroup::Transform);
     // Text, its font or its element changed: the cached size may be wrong.
-    if (data.changed && YGNodeHasMeasureFunc(node.flex)) YGNodeMarkDirty(node.flex);
+    if (data.changed && node.flex && YGNodeHasMeasureFunc(node.flex)) YGNodeMarkDirty(node.flex);
     data.changed = false;
     data.style.written.fill(0);
     if (!SameChildren(node.children, data.children)) {
@@ -88,7 +87,7 @@ void LayoutTree::Commit(LayoutUpdateData& update, dsp::DirtyRegion* dirty, Debug
         const LayoutHandle* parent = handle.node().parent;
         if (parent == nullptr || !changed_.Contains(parent)) UpdateDepths(handle, changed_);
     });
-    changed_.ForEach([](LayoutHandle& handle) { SyncFlexChildren(handle); });
+    changed_.ForEach([&](LayoutHandle& handle) { SyncFlexChildren(handle, changed_); });
     removed_.ForEach([](LayoutHandle& handle) { Sever(handle); });
     changed_.ForEach([](LayoutHandle& handle) { dsp::MarkForTransform(handle); });
     // Two commits may meet before one layout ran; nothing of the first may be lost.

@@ -45,15 +45,50 @@ struct NodeFlags {
     bool measuredByDisplayElement = false;
 };
 
+// An immutable record of the layout side that several nodes and both halves hold.
+template <class Value>
+struct SharedRecord : AtomicRefCounted<SharedRecord<Value>, MemoryTag::LayoutNodes> {
+    explicit SharedRecord(const Value& value) : value(value) {}
+    Value value;
+};
+
+// Border, padding and margin of a box; without a record all of them are zero.
+class SharedEdges {
+  public:
+    const Edges& border() const { return Get().border; }
+    const Edges& padding() const { return Get().padding; }
+    const Edges& margin() const { return Get().margin; }
+    void Set(const BoxEdges& edges);
+
+  private:
+    static constexpr BoxEdges kNone{};
+    const BoxEdges& Get() const { return record_ ? record_->value : kNone; }
+    qsl::RefPtr<const SharedRecord<BoxEdges>> record_;
+};
+
+// A node's world matrix. The node that has another one than its parent owns a record and writes it in place; all
+// below it that add nothing hold the same one. Without a record it is the identity.
+class WorldMatrix {
+  public:
+    const Matrix& Get() const { return record_ ? record_->value : kIdentity; }
+    // True when it may be another matrix now. Another record counts even with the same value: those below, who
+    // hold the former one, must change over before its owner writes it.
+    bool Share(const WorldMatrix& other);
+    bool Set(const Matrix& matrix);
+
+  private:
+    static constexpr Matrix kIdentity{};
+    qsl::RefPtr<SharedRecord<Matrix>> record_;
+    bool owns_ = false;
+};
+
 // The geometry that scripts read. Left and Top are in document coordinates, before transforms and scrolling.
 struct LayoutResult {
     float left = 0;
     float top = 0;
     float width = 0;
     float height = 0;
-    Edges border;
-    Edges padding;
-    Edges margin;
+    SharedEdges edges;
     Rect aabb{};
     Rect visualAabb{};
     Rect viewBox{};  // the box under its transforms and the scrolling of its ancestors, in view coordinates
@@ -63,17 +98,16 @@ struct LayoutResult {
 struct LayoutData {
     LayoutHandle* parent = nullptr;
     HandleVector children;  // DOM order among the siblings that have handles
-    css::LayoutStyleRefs style;
+    css::LaidOutStyle style;
     dsp::DisplayElementPtr display;
     ScrollPosition scroll;
-    Size measuredSize;
+    NodeLinkPtr node;
+    LayoutResult result;
+    int32_t zIndex = 0;
     NodeFlags flags;
     bool establishesStackingContext = false;
     bool isImage = false;
-    int32_t zIndex = 0;
     bool changed = false;  // an edit that the next commit must carry over
-    LayoutResult result;
-    NodeLinkPtr node;
     bool inTree = false;
 };
 
@@ -89,22 +123,16 @@ inline constexpr uint32_t kChildGroup = 64;
 struct LayoutNode {
     LayoutHandle* parent = nullptr;
     HandleVector children;
-    YGNode* flex = nullptr;  // its context points back at the handle
-    css::LayoutStyleRefs style;
+    // Its context points back at the handle. Only of nodes that Yoga lays out: none in a page, or a part of it,
+    // that the simple engine places.
+    YGNode* flex = nullptr;
+    css::LaidOutStyle style;
     dsp::DisplayElementPtr display;
     ScrollPosition scroll;
     ScrollPosition appliedScroll;  // under which the children's matrices were made
-    NodeFlags flags;
-    bool transformDirty = false;
-    bool establishesStackingContext = false;
-    int32_t zIndex = 0;
-    bool previousStacking = false;  // as of the last SyncTrees
-    int32_t previousZIndex = 0;
 
     Rect box{};  // document coordinates; z and the pixel grid play no part yet
-    Edges border;
-    Edges padding;
-    Edges margin;
+    SharedEdges edges;
     Size scrollSize;
     Rect aabb{};           // snapped box and in-flow overflow, document coordinates
     Rect paintBounds{};    // what the node's own content can touch, view coordinates
@@ -112,21 +140,27 @@ struct LayoutNode {
     Rect contentBounds{};  // of the children: their aabb, document coordinates
     // Bounds of kChildGroup children each, kept only by nodes with more children than that.
     Vector<ChildGroup, MemoryTag::LayoutNodes> groups;
-    Matrix world;
+    WorldMatrix world;
     // Present only where the style needs them.
     UniquePtr<Matrix, MemoryTag::LayoutNodes> local;
     UniquePtr<Matrix, MemoryTag::LayoutNodes> perspective;
     UniquePtr<dsp::ResolvedVisuals, MemoryTag::LayoutNodes> visuals;
+
+    int32_t zIndex = 0;
+    int32_t previousZIndex = 0;  // as of the last SyncTrees, like previousStacking
+    // Place among the parent's children, for the bounds that the parent keeps by groups of children.
+    uint32_t index = 0;
+    // Depth below the root, which is 0. Nodes at kMaxLayoutDepth and deeper keep zero boxes.
+    uint32_t depth = 0;
+    NodeFlags flags;
+    bool establishesStackingContext = false;
+    bool previousStacking = false;
 
     // One frame long; SyncTrees clears them.
     bool visualChanged = false;
     bool rectChanged = false;
     bool boxMetricsChanged = false;
 
-    // Place among the parent's children, for the bounds that the parent keeps by groups of children.
-    uint32_t index = 0;
-    // Depth below the root, which is 0. Nodes at kMaxLayoutDepth and deeper keep zero boxes.
-    uint32_t depth = 0;
     // Sticky and conservative: there is an absolute or fixed box below, whose containing block may lie above
     // this node. When it is set here, it is set on all ancestors.
     bool absoluteBelow = false;
@@ -135,6 +169,10 @@ struct LayoutNode {
     bool descendantNeedsTransform = false;
     // The commit gave the node other children, so what their bounds add up to is not known.
     bool childrenChanged = false;
+
+    const Edges& border() const { return edges.border(); }
+    const Edges& padding() const { return edges.padding(); }
+    const Edges& margin() const { return edges.margin(); }
     // Beyond the depth limit a node takes no part in layout, transforms and painting.
     bool IsBeyondLimit() const { return depth >= limits::kMaxLayoutDepth; }
 };

@@ -13,8 +13,6 @@ LayoutStore::LayoutStore() : config_(YGConfigNew()) {
 }
 
 LayoutStore::~LayoutStore() {
-    for (YGNode* node : free_flex_nodes_)
-        YGNodeFree(node);
     YGConfigFree(config_);
 }
 
@@ -25,26 +23,21 @@ HandlePtr LayoutStore::MakeHandle() {
     handle->store_ = this;
     handle->data_ = data_pool_.Make();
     handle->node_ = node_pool_.Make();
-    handle->node_->flex = MakeFlexNode(handle);
     return qsl::AdoptRef(handle);
 }
 
-YGNode* LayoutStore::MakeFlexNode(LayoutHandle* handle) {
-    YGNode* node = nullptr;
-    if (free_flex_nodes_.empty()) {
-        node = YGNodeNewWithConfig(config_);
-    } else {
-        node = free_flex_nodes_.take_back();
-    }
-    YGNodeSetContext(node, handle);
-    return node;
+void LayoutStore::MakeFlexNode(LayoutHandle& handle) {
+    YGNode* node = YGNodeNewWithConfig(config_);
+    YGNodeSetContext(node, &handle);
+    handle.node().flex = node;
 }
 
-void LayoutStore::RecycleFlexNode(YGNode* node) {
-    if (YGNode* owner = YGNodeGetOwner(node)) YGNodeRemoveChild(owner, node);
-    YGNodeRemoveAllChildren(node);
-    YGNodeReset(node);
-    free_flex_nodes_.push_back(node);
+void LayoutStore::FreeFlexNode(LayoutNode& node) noexcept {
+    if (node.flex == nullptr) return;
+    if (YGNode* owner = YGNodeGetOwner(node.flex)) YGNodeRemoveChild(owner, node.flex);
+    YGNodeRemoveAllChildren(node.flex);
+    YGNodeFree(node.flex);
+    node.flex = nullptr;
 }
 
 // Children lose a reference each; those that die with it join a list, so that a page's deep tree costs no
@@ -69,7 +62,7 @@ void LayoutStore::Destroy(LayoutHandle* first) noexcept {
         drop(handle->node_->children, false);
         {
             const std::lock_guard lock(mutex_);
-            RecycleFlexNode(handle->node_->flex);
+            FreeFlexNode(*handle->node_);
         }
         LayoutData* data = handle->data_;
         LayoutNode* node = handle->node_;

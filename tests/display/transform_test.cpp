@@ -15,7 +15,7 @@ using layout::Rect;
 using TransformTest = LayoutTest;
 
 Rect Mapped(const LayoutHandle* handle) {
-    return layout::MapBounds(handle->node().world, handle->node().box);
+    return layout::MapBounds(handle->node().world.Get(), handle->node().box);
 }
 
 void ExpectRect(const Rect& rect, float x, float y, float width, float height) {
@@ -164,7 +164,7 @@ TEST_F(TransformTest, StackingContexts) {
         {"overflow: hidden", false, 0},
         {"position: relative", false, 0},
     };
-    const css::LayoutStyleRefs plain = box->data().style;
+    const css::LaidOutStyle plain = box->data().style;
     for (const Case& c : cases) {
         page.tree.UpdateStyle(*box, plain);
         page.Change(box, c.style);
@@ -217,7 +217,7 @@ std::string Describe(const LayoutHandle* handle) {
     };
     std::snprintf(text, sizeof(text), " scroll %g %g %g %g z %d %d world %g %g %g %g %g %g", n.scroll.x,
                   n.scroll.y, n.scrollSize.width, n.scrollSize.height, n.zIndex, n.establishesStackingContext,
-                  n.world.m[0], n.world.m[1], n.world.m[4], n.world.m[5], n.world.m[12], n.world.m[13]);
+                  n.world.Get().m[0], n.world.Get().m[1], n.world.Get().m[4], n.world.Get().m[5], n.world.Get().m[12], n.world.Get().m[13]);
     return BoxOf(handle) + r(n.box) + r(n.aabb) + r(n.paintBounds) + r(n.visualAabb) + text;
 }
 
