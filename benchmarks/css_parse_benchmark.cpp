@@ -22,7 +22,8 @@ void CssParse(benchmark::State& state) {
 }
 BENCHMARK(CssParse)->Name("css_parse");
 
-// The class of each byte from a table, and how often it changes: what a scanner that knew nothing else would do.
+// The class of each byte from a table, and how often it changes: what a scanner that knew nothing else would
+// do.
 void ScanBytes(benchmark::State& state) {
     const std::string text = bench::PanelSheet(100);
     std::array<uint8_t, 256> classes{};

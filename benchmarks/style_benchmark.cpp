@@ -35,7 +35,8 @@ void StyleFull(benchmark::State& state) {
 }
 BENCHMARK(StyleFull)->Name("style_full");
 
-// One copy of all style groups of each element, to one place: neither side misses the cache more than a solve does.
+// One copy of all style groups of each element, to one place: neither side misses the cache more than a solve
+// does.
 void CopyGroups(benchmark::State& state) {
     StylePage page(bench::PanelMarkup(kElements, kPanels), bench::PanelSheet(kPanels));
     std::vector<const css::LayoutStyleRefs*> styles;
@@ -53,9 +54,12 @@ void CopyGroups(benchmark::State& state) {
             std::memcpy(copy.layout, static_cast<const void*>(style->layout.get()), sizeof copy.layout);
             std::memcpy(copy.visual, static_cast<const void*>(style->visual.get()), sizeof copy.visual);
             std::memcpy(copy.text, static_cast<const void*>(style->text.get()), sizeof copy.text);
-            std::memcpy(copy.transform, static_cast<const void*>(style->transform.get()), sizeof copy.transform);
-            std::memcpy(copy.animation, static_cast<const void*>(style->animation.get()), sizeof copy.animation);
-            std::memcpy(copy.transition, static_cast<const void*>(style->transition.get()), sizeof copy.transition);
+            std::memcpy(copy.transform, static_cast<const void*>(style->transform.get()),
+                        sizeof copy.transform);
+            std::memcpy(copy.animation, static_cast<const void*>(style->animation.get()),
+                        sizeof copy.animation);
+            std::memcpy(copy.transition, static_cast<const void*>(style->transition.get()),
+                        sizeof copy.transition);
             benchmark::DoNotOptimize(copy);
             benchmark::ClobberMemory();
         }
@@ -99,8 +103,8 @@ void StyleInherited(benchmark::State& state) {
     bool on = false;
     const auto change = [&] {
         on = !on;
-        root.EnsureInlineStyle().Set(css::Declaration::Make<css::PropertyId::Color>(
-            on ? css::Color::White() : css::Color::Black()));
+        root.EnsureInlineStyle().Set(
+            css::Declaration::Make<css::PropertyId::Color>(on ? css::Color::White() : css::Color::Black()));
         page.document().MarkSelectorDirty(root);
         page.document().MarkNodeDirty(root);
         page.Solve();
@@ -137,8 +141,8 @@ BENCHMARK(TouchNodes)->Name("style_inherited_baseline");
 
 constexpr int kMatchedRules = 500;
 
-// Rules that no map of single selectors finds. Of ten, nine ask for another id, tag or class; the tenth has to be
-// looked at, and every second of those matches.
+// Rules that no map of single selectors finds. Of ten, nine ask for another id, tag or class; the tenth has
+// to be looked at, and every second of those matches.
 std::string RefusedSheet() {
     std::string sheet;
     for (int i = 0; i < kMatchedRules; ++i) {

@@ -1,5 +1,5 @@
-// A document with the real style engine and no view, and the pages and sheets that the style benchmarks measure:
-// a screen of game panels, styled class by class as such screens are.
+// A document with the real style engine and no view, and the pages and sheets that the style benchmarks
+// measure: a screen of game panels, styled class by class as such screens are.
 #pragma once
 
 #include <memory>

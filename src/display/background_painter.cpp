@@ -96,7 +96,8 @@ void PaintBackgroundImages(PaintContext& context, const LayoutNode& node, const 
 bool PaintBorderImage(const LayoutNode& node, const BoxShape& shape, const ImageSlots* slots,
                       CommandBuffer& buffer) {
     const css::VisualStyle& visual = *node.style.visual;
-    if (!HasBorderImage(visual) || !slots || slots->empty() || slots->front().resource < 0 || !node.visuals) return false;
+    if (!HasBorderImage(visual) || !slots || slots->empty() || slots->front().resource < 0 || !node.visuals)
+        return false;
     const ImageSlot& slot = slots->front();
     const Edges& outset = node.visuals->borderImageOutset;
     const Rect area = layout::Inset(shape.box, {-outset.left, -outset.right, -outset.top, -outset.bottom});

@@ -42,7 +42,8 @@ bool Same(const layout::ScrollPosition& a, const layout::ScrollPosition& b) {
 // What a parent hands down.
 struct Above {
     const Matrix& children;
-    const layout::WorldMatrix* shared;  // what a child without a matrix of its own has; null where it makes its own
+    const layout::WorldMatrix*
+        shared;  // what a child without a matrix of its own has; null where it makes its own
     layout::ScrollPosition scroll;
     Rect clip;   // view coordinates
     bool moved;  // the matrix or the scroll position differs from the last pass
@@ -108,8 +109,8 @@ class TransformPass {
             : aabb(node.aabb),
               paint(node.paintBounds),
               visual(node.visualAabb),
-              scrollSize(node.scrollSize),
-              scroll(node.appliedScroll) {}
+              scrollSize(node.ScrollSize()),
+              scroll(node.below ? node.below->appliedScroll : layout::ScrollPosition()) {}
     };
 
     static bool UpdateWorld(LayoutNode& node, const Above& above) {
@@ -133,12 +134,13 @@ class TransformPass {
 
     bool UpdateChildren(LayoutNode& node, const Above& above, bool matricesChanged) {
         if (node.children.empty()) {
-            node.contentBounds = {};
+            node.below.reset();
             childrenVisual_ = {};
             return false;
         }
-        const bool scrolled = !Same(node.scroll, node.appliedScroll);
-        node.appliedScroll = node.scroll;
+        if (!node.below) node.below = MakeUnique<layout::ChildBounds, MemoryTag::LayoutNodes>();
+        const bool scrolled = !Same(node.scroll, node.below->appliedScroll);
+        node.below->appliedScroll = node.scroll;
         const Matrix children = ChildrenMatrix(node);
         Above below{children, HandsDownWorld(node) ? &node.world : nullptr, node.scroll, above.clip,
                     above.moved || matricesChanged || scrolled};
@@ -150,7 +152,7 @@ class TransformPass {
         Bounds bounds;
         const bool dirty = node.children.size() <= kChildGroup ? UpdateFewChildren(node, below, bounds)
                                                                : UpdateChildGroups(node, below, bounds);
-        node.contentBounds = bounds.content;
+        node.below->content = bounds.content;
         childrenVisual_ = bounds.visual;
         return dirty;
     }
@@ -167,28 +169,29 @@ class TransformPass {
     bool UpdateChildGroups(LayoutNode& node, const Above& below, Bounds& bounds) {
         const uint32_t count = node.children.size();
         const uint32_t groups = (count + kChildGroup - 1) / kChildGroup;
-        const bool all = below.moved || pass_.everything || node.groups.size() != groups;
-        node.groups.resize(groups);
+        auto& known = node.below->groups;
+        const bool all = below.moved || pass_.everything || known.size() != groups;
+        known.resize(groups);
         bool dirty = false;
         for (uint32_t g = 0; g < groups; ++g) {
-            if (all || node.groups[g].dirty) {
+            if (all || known[g].dirty) {
                 Bounds group;
                 const uint32_t end = std::min((g + 1) * kChildGroup, count);
                 for (uint32_t i = g * kChildGroup; i < end; ++i) {
                     dirty = Visit(*node.children[i], below) || dirty;
                     group.Add(node.children[i]->node());
                 }
-                node.groups[g] = {group.content, group.visual, false};
+                known[g] = {group.content, group.visual, false};
             }
-            bounds.Add(node.groups[g]);
+            bounds.Add(known[g]);
         }
         return dirty;
     }
 
     static void UpdateBounds(LayoutNode& node, const Rect& box) {
-        const bool overflows = !node.flags.shouldOverflowClip && !layout::IsEmpty(node.contentBounds);
-        node.aabb = overflows ? layout::Union(box, node.contentBounds) : box;
-        node.scrollSize = {node.contentBounds.width, node.contentBounds.height};
+        const bool overflows =
+            !node.flags.shouldOverflowClip && node.below && !layout::IsEmpty(node.below->content);
+        node.aabb = overflows ? layout::Union(box, node.below->content) : box;
     }
 
     void UpdatePaintBounds(LayoutNode& node, const Rect& box) {
@@ -224,8 +227,9 @@ class TransformPass {
         LayoutNode& node = handle.node();
         const bool stacking =
             node.establishesStackingContext != node.previousStacking || node.zIndex != node.previousZIndex;
-        const bool scrolls = !layout::Near(before.scrollSize.width, node.scrollSize.width) ||
-                             !layout::Near(before.scrollSize.height, node.scrollSize.height) ||
+        const layout::Size scrollSize = node.ScrollSize();
+        const bool scrolls = !layout::Near(before.scrollSize.width, scrollSize.width) ||
+                             !layout::Near(before.scrollSize.height, scrollSize.height) ||
                              !Same(before.scroll, node.scroll);
         const bool paints = node.visualChanged || stacking || moved || node.rectChanged ||
                             node.boxMetricsChanged || !Same(before.paint, node.paintBounds);
@@ -265,8 +269,10 @@ void MarkForTransform(LayoutHandle& handle) {
     for (LayoutHandle* parent = handle.node().parent; parent != nullptr; parent = parent->node().parent) {
         LayoutNode& node = parent->node();
         const uint32_t group = index / kChildGroup;
-        const bool groupKnown = group >= node.groups.size() || node.groups[group].dirty;
-        if (group < node.groups.size()) node.groups[group].dirty = true;
+        ChildGroup* known =
+            node.below && group < node.below->groups.size() ? &node.below->groups[group] : nullptr;
+        const bool groupKnown = !known || known->dirty;
+        if (known) known->dirty = true;
         if (node.descendantNeedsTransform && groupKnown) break;
         node.descendantNeedsTransform = true;
         index = node.index;

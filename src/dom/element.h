@@ -93,7 +93,9 @@ class Element : public Node {
     // Null until first use.
     css::StyleDeclarationSet* GetInlineStyle() const { return inline_style_.get(); }
     css::StyleDeclarationSet& EnsureInlineStyle();
-    css::StyleDeclarationSet* GetExtraStyle() const { return extra_style_.get(); }
+    css::StyleDeclarationSet* GetExtraStyle() const {
+        return GetRareData() ? GetRareData()->extra_style.get() : nullptr;
+    }
     css::StyleDeclarationSet& EnsureExtraStyle();
     // Replaces the inline declarations by those of a style attribute's text.
     void SetInlineStyleText(std::string_view text);
@@ -169,7 +171,6 @@ class Element : public Node {
     qsl::RefPtr<Node> InsertAdjacent(std::string_view position, qsl::RefPtr<Node> node);
 
     UniquePtr<css::StyleDeclarationSet, MemoryTag::DOM> inline_style_;
-    UniquePtr<css::StyleDeclarationSet, MemoryTag::DOM> extra_style_;
     css::PropertySet dirty_properties_;
     css::MatchStatePtr match_state_;
     Vector<AttributePair, MemoryTag::DOM> attributes_;

@@ -29,7 +29,7 @@ void Sever(LayoutHandle& handle) {
     LayoutNode& node = handle.node();
     node.parent = nullptr;
     node.children.clear();
-    node.groups.clear();
+    node.below.reset();
     node.depth = 0;
     node.absoluteBelow = false;
     node.paintBounds = node.visualAabb = {};
@@ -60,7 +60,7 @@ void CopyToLayoutSide(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
     if (!SameChildren(node.children, data.children)) {
         node.children = data.children;
         // The bounds by groups are made anew: any child may have moved to another one.
-        node.groups.clear();
+        if (node.below) node.below->groups.clear();
         node.childrenChanged = true;
     }
 }

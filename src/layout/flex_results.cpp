@@ -2,6 +2,7 @@
 
 #include "core/memory/temp_vector.h"
 #include "display/transforms.h"
+#include "layout/layout_store.h"
 
 #include <yoga/Yoga.h>
 
@@ -27,14 +28,14 @@ void CopyEdges(YGNodeConstRef flex, float (*get)(YGNodeConstRef, YGEdge), Edges&
     out.bottom = Finite(get(flex, YGEdgeBottom));
 }
 
-void CopyMetrics(LayoutNode& node) {
+void CopyMetrics(LayoutNode& node, EdgesCache& cache) {
     node.box.width = Finite(YGNodeLayoutGetWidth(node.flex));
     node.box.height = Finite(YGNodeLayoutGetHeight(node.flex));
     BoxEdges edges;
     CopyEdges(node.flex, YGNodeLayoutGetBorder, edges.border);
     CopyEdges(node.flex, YGNodeLayoutGetPadding, edges.padding);
     CopyEdges(node.flex, YGNodeLayoutGetMargin, edges.margin);
-    node.edges.Set(edges);
+    node.edges.Set(edges, cache);
 }
 
 // The box that a fixed node is placed in: the padding box of its container, or the view.
@@ -59,8 +60,8 @@ void PlaceFixed(LayoutNode& node, const Rect& in, Point origin) {
     if (IsInset(flex, YGEdgeLeft)) {
         node.box.x = in.x + YGNodeStyleGetPosition(flex, YGEdgeLeft).value + node.margin().left;
     } else if (IsInset(flex, YGEdgeRight)) {
-        node.box.x =
-            Right(in) - YGNodeStyleGetPosition(flex, YGEdgeRight).value - node.margin().right - node.box.width;
+        node.box.x = Right(in) - YGNodeStyleGetPosition(flex, YGEdgeRight).value - node.margin().right -
+                     node.box.width;
     }
     if (IsInset(flex, YGEdgeTop)) {
         node.box.y = in.y + YGNodeStyleGetPosition(flex, YGEdgeTop).value + node.margin().top;
@@ -108,7 +109,7 @@ void ReadYogaResults(const FlexReadRoot& root, LayoutPass& pass) {
         const OldBox old(node);
         const bool isNew = YGNodeGetHasNewLayout(node.flex);
         if (isNew) {
-            CopyMetrics(node);
+            CopyMetrics(node, entry.handle->store().recentEdges);
             YGNodeSetHasNewLayout(node.flex, false);
         }
         Place(entry, pass);

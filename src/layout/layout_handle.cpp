@@ -1,6 +1,7 @@
 #include "layout/layout_handle.h"
 
 #include <algorithm>
+#include <bit>
 
 namespace qorvex::layout {
 
@@ -18,9 +19,14 @@ bool Same(const Matrix& a, const Matrix& b) {
 
 }  // namespace
 
-void SharedEdges::Set(const BoxEdges& edges) {
+void SharedEdges::Set(const BoxEdges& edges, EdgesCache& cache) {
     if (Same(edges, Get())) return;
-    record_ = Same(edges, kNone) ? nullptr : MakeRef<SharedRecord<BoxEdges>>(edges);
+    if (Same(edges, kNone)) return record_.reset();
+    const float sum =
+        edges.border.top + 3 * edges.padding.top + 5 * edges.margin.top + 7 * edges.padding.left;
+    EdgesPtr& place = cache[std::bit_cast<uint32_t>(sum) * 0x9E3779B1u >> 28];
+    if (!place || !Same(place->value, edges)) place = MakeRef<SharedRecord<BoxEdges>>(edges);
+    record_ = place;
 }
 
 bool WorldMatrix::Share(const WorldMatrix& other) {

@@ -1,6 +1,5 @@
 #include "layout/layout_store.h"
 
-#include "core/memory/allocator.h"
 #include "display/resolved_visuals.h"
 
 #include <yoga/Yoga.h>
@@ -17,12 +16,10 @@ LayoutStore::~LayoutStore() {
 }
 
 HandlePtr LayoutStore::MakeHandle() {
-    auto* handle = new (GetAllocator()->Allocate(sizeof(LayoutHandle), MemoryTag::General)) LayoutHandle();
     const std::lock_guard lock(mutex_);
+    LayoutHandle* handle = handles_.Make();
     AddRef();
     handle->store_ = this;
-    handle->data_ = data_pool_.Make();
-    handle->node_ = node_pool_.Make();
     return qsl::AdoptRef(handle);
 }
 
@@ -44,33 +41,27 @@ void LayoutStore::FreeFlexNode(LayoutNode& node) noexcept {
 // deep stack. The list runs through the parent links, which mean nothing any more in a dead handle.
 void LayoutStore::Destroy(LayoutHandle* first) noexcept {
     uint32_t died = 0;
-    first->data_->parent = nullptr;
+    first->data_.parent = nullptr;
     for (LayoutHandle* handle = first; handle != nullptr;) {
-        LayoutHandle* next = handle->data_->parent;
+        LayoutHandle* next = handle->data_.parent;
         auto drop = [&](HandleVector& children, bool dataSide) {
             for (HandlePtr& child : children) {
                 LayoutHandle* raw = child.leak();
-                if (dataSide && raw->data_->parent == handle) raw->data_->parent = nullptr;
-                if (!dataSide && raw->node_->parent == handle) raw->node_->parent = nullptr;
+                if (dataSide && raw->data_.parent == handle) raw->data_.parent = nullptr;
+                if (!dataSide && raw->node_.parent == handle) raw->node_.parent = nullptr;
                 if (raw->count_.fetch_sub(1, std::memory_order_acq_rel) != 1) continue;
-                raw->data_->parent = next;
+                raw->data_.parent = next;
                 next = raw;
             }
             children.clear();
         };
-        drop(handle->data_->children, true);
-        drop(handle->node_->children, false);
+        drop(handle->data_.children, true);
+        drop(handle->node_.children, false);
         {
             const std::lock_guard lock(mutex_);
-            FreeFlexNode(*handle->node_);
+            FreeFlexNode(handle->node_);
+            handles_.Recycle(handle);
         }
-        LayoutData* data = handle->data_;
-        LayoutNode* node = handle->node_;
-        handle->~LayoutHandle();
-        GetAllocator()->Deallocate(handle, MemoryTag::General);
-        const std::lock_guard lock(mutex_);
-        data_pool_.Recycle(data);
-        node_pool_.Recycle(node);
         ++died;
         handle = next;
     }

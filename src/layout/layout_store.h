@@ -1,7 +1,7 @@
 // Where the handles of one tree live, and what their layout side shares. Counted: it outlives the tree while
-// any handle lives, so that a released handle always has pools to return to.
+// any handle lives, so that a released handle always has a pool to return to.
 //
-// A handle may be released by the last task of a frame on any thread, so the pools take a lock. Everything
+// A handle may be released by the last task of a frame on any thread, so the pool takes a lock. Everything
 // else here belongs to the layout thread.
 #pragma once
 
@@ -25,8 +25,8 @@ class LayoutStore : public AtomicRefCounted<LayoutStore, MemoryTag::LayoutNodes>
 
     HandlePtr MakeHandle();
     void Destroy(LayoutHandle* handle) noexcept;
-    // Yoga's node is larger than all else that a handle has, so it is made when Yoga first has to lay the node
-    // out, and given back when it has not any more.
+    // Yoga's node is larger than all else that a handle has, so it is made when Yoga first has to lay the
+    // node out, and given back when it has not any more.
     void MakeFlexNode(LayoutHandle& handle);
     void FreeFlexNode(LayoutNode& node) noexcept;
 
@@ -43,6 +43,7 @@ class LayoutStore : public AtomicRefCounted<LayoutStore, MemoryTag::LayoutNodes>
     fresco::IFontService* fonts = nullptr;
     // The warning about the depth limit is given once a tree.
     bool reportedDepth = false;
+    EdgesCache recentEdges;
     // Yoga has nodes whose style was never written.
     bool flexStylesMissing = false;
     // The engine of the last layout; the other one's inputs are stale.
@@ -51,8 +52,7 @@ class LayoutStore : public AtomicRefCounted<LayoutStore, MemoryTag::LayoutNodes>
 
   private:
     std::mutex mutex_;
-    ObjectPool<LayoutData> data_pool_;
-    ObjectPool<LayoutNode> node_pool_;
+    ObjectPool<LayoutHandle> handles_;
     YGConfig* config_;
 };
 

@@ -16,8 +16,7 @@ void SyncTrees(LayoutUpdateData& update) {
         result.width = node.box.width;
         result.height = node.box.height;
         result.edges = node.edges;
-        result.scrollSize = node.scrollSize;
-        result.aabb = node.aabb;
+        result.scrollSize = node.ScrollSize();
         result.visualAabb = node.visualAabb;
         result.viewBox = MapBounds(node.world.Get(), node.box);
         data.scroll = ClampScroll(data.scroll, node);

@@ -3,9 +3,9 @@
 #include "core/memory/temp_vector.h"
 #include "layout/flex_children.h"
 #include "layout/flex_measure.h"
-#include "layout/layout_store.h"
 #include "layout/flex_results.h"
 #include "layout/flex_style.h"
+#include "layout/layout_store.h"
 #include "layout/node_flags.h"
 
 #include <yoga/Yoga.h>
@@ -40,18 +40,18 @@ Rect ContainingBox(const LayoutNode& node, const Containers& in, const LengthCon
     return Inset(Inset(parent.box, parent.border()), parent.padding());
 }
 
-void ResolveEdges(LayoutNode& node, const LayoutStyle& style, const LengthContext& lengths, float base) {
+void ResolveEdges(LayoutHandle& handle, const LayoutStyle& style, const LengthContext& lengths, float base) {
     BoxEdges edges;
     edges.border = ResolveBorders(style, lengths);
     // Stored for scripts; in this engine margins move nothing.
     edges.margin = {ResolveExtent(style.marginLeft, lengths, base, 0),
-                   ResolveExtent(style.marginRight, lengths, base, 0),
-                   ResolveExtent(style.marginTop, lengths, base, 0),
-                   ResolveExtent(style.marginBottom, lengths, base, 0)};
+                    ResolveExtent(style.marginRight, lengths, base, 0),
+                    ResolveExtent(style.marginTop, lengths, base, 0),
+                    ResolveExtent(style.marginBottom, lengths, base, 0)};
     edges.padding = {
         ResolveLength(style.paddingLeft, lengths, base), ResolveLength(style.paddingRight, lengths, base),
         ResolveLength(style.paddingTop, lengths, base), ResolveLength(style.paddingBottom, lengths, base)};
-    node.edges.Set(edges);
+    handle.node().edges.Set(edges, handle.store().recentEdges);
 }
 
 Point PlaceIn(const Rect& in, const LayoutNode& node, const LayoutStyle& style,
@@ -92,7 +92,7 @@ void LayoutSimpleSubtree(LayoutHandle& handle, LayoutPass& pass, LengthContext l
     const OldBox old(node);
     lengths.em = node.style.text->computedFontSize;
     const Rect containing = ContainingBox(node, in, lengths);
-    ResolveEdges(node, style, lengths, containing.width);
+    ResolveEdges(handle, style, lengths, containing.width);
     const Point place = PlaceIn(containing, node, style, lengths);
     node.box.x = place.x;
     node.box.y = place.y;

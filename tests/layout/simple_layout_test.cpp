@@ -69,6 +69,27 @@ TEST_F(SimpleLayoutTest, FlexElementsGetTheirOwnRun) {
     EXPECT_EQ(row->data().result.width, 35);
 }
 
+// Yoga's nodes are most of what a handle costs.
+TEST_F(SimpleLayoutTest, OnlyFlexPartsHaveYogaNodes) {
+    LayoutHandle* row = page.Add(page.body, "display: flex");
+    LayoutHandle* a = page.Add(row, "width: 10px; height: 10px");
+    LayoutHandle* plain = page.Add(page.body, "width: 10px; height: 10px");
+    page.Frame();
+    EXPECT_TRUE(row->node().flex && a->node().flex);
+    EXPECT_FALSE(plain->node().flex || page.body->node().flex);
+    page.Change(row, "display: block");
+    page.Frame();
+    EXPECT_FALSE(row->node().flex || a->node().flex);
+    // What changed while Yoga did not know the part is not lost.
+    page.Change(a, "width: 12px");
+    page.Frame();
+    page.Change(row, "display: flex");
+    LayoutHandle* b = page.Add(row, "width: 20px; height: 30px");
+    page.Frame();
+    EXPECT_EQ(BoxOf(a), "0 0 12 10");
+    EXPECT_EQ(BoxOf(b), "12 0 20 30");
+}
+
 TEST_F(SimpleLayoutTest, MeasuredLeavesHaveNoAvailableSize) {
     RefPtr<FakeText> text = MakeRef<FakeText>(2500.0f, 10.0f);
     LayoutHandle* leaf = page.AddText(page.Add(page.body, "width: 10px"), text);

@@ -19,7 +19,8 @@ void ElementMatcher::CollectBucket(const RuleIndex& index, const RuleBucket& buc
     }
     for (const uint32_t i : bucket.complex) {
         const IndexedRule& rule = index.ComplexRule(i);
-        if (MatchSelector(rule.selector, element, context, record)) candidates_.push_back({rule.position, &rule});
+        if (MatchSelector(rule.selector, element, context, record))
+            candidates_.push_back({rule.position, &rule});
     }
 }
 

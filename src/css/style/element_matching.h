@@ -1,7 +1,8 @@
 // Collects the rules that match an element and finds the winning declaration of each property.
 //
-// Elements that the same rules match, and that have no declarations of their own, get one shared match state: the
-// cascade among those rules is worked out once, and that two elements have the same winners is seen by address.
+// Elements that the same rules match, and that have no declarations of their own, get one shared match state:
+// the cascade among those rules is worked out once, and that two elements have the same winners is seen by
+// address.
 #pragma once
 
 #include <array>
@@ -18,8 +19,8 @@ class ElementMatcher {
   public:
     explicit ElementMatcher(StyleCounters& counters) : counters_(counters) {}
 
-    // The whole order for one element: default sheet, extra style, author sheets, inline style. Marks as dirty
-    // what is won by another declaration than before, and all that the element declares for itself.
+    // The whole order for one element: default sheet, extra style, author sheets, inline style. Marks as
+    // dirty what is won by another declaration than before, and all that the element declares for itself.
     void MatchElementStyle(dom::Element& element, RuleIndex& defaults, RuleIndex& author,
                            MatchContext& context);
 
@@ -40,8 +41,8 @@ class ElementMatcher {
         uint32_t specificity;
         bool important;
     };
-    // What the offers to one element have come to. `recorded`, `important` and the specificities belong to one
-    // index: nothing of them is carried from the default sheet to the author's, so any declaration of the
+    // What the offers to one element have come to. `recorded`, `important` and the specificities belong to
+    // one index: nothing of them is carried from the default sheet to the author's, so any declaration of the
     // author replaces a default one.
     struct Cascade {
         PropertySet properties;

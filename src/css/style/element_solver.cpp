@@ -172,8 +172,8 @@ class ElementSolver {
         mask_ |= maskBefore;
     }
 
-    // A group for which nothing is declared, and which parent and element share with everybody, has its initial
-    // values already, inherited ones included.
+    // A group for which nothing is declared, and which parent and element share with everybody, has its
+    // initial values already, inherited ones included.
     void LeaveOutInitialGroups(PropertySet& properties) const {
         for (const ResetGroup& group : kResetGroups) {
             if (match_.properties().Intersects(group.properties)) continue;

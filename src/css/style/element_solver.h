@@ -7,8 +7,8 @@ namespace qorvex::css {
 
 struct SolvedElement {
     uint32_t changeMask = 0;  // dom::ChangeMask bits; 0 when there was nothing to look at
-    // The children may inherit something new, or were never solved themselves. When it is not set they have to be
-    // looked at only if they are dirty themselves.
+    // The children may inherit something new, or were never solved themselves. When it is not set they have
+    // to be looked at only if they are dirty themselves.
     bool reachesChildren = false;
 };
 

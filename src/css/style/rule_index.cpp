@@ -10,7 +10,10 @@ namespace {
 const SimpleSelector* FindKey(const CompoundSelector& compound) {
     const SimpleSelector* best = nullptr;
     const auto rank = [](SelectorType type) {
-        return type == SelectorType::Id ? 3 : type == SelectorType::Class ? 2 : type == SelectorType::Tag ? 1 : 0;
+        return type == SelectorType::Id      ? 3
+               : type == SelectorType::Class ? 2
+               : type == SelectorType::Tag   ? 1
+                                             : 0;
     };
     for (const SimpleSelector& simple : compound.simple) {
         if (rank(simple.type) > (best ? rank(best->type) : 0)) best = &simple;

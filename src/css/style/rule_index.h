@@ -2,13 +2,14 @@
 // one index for the default sheet and one for the author's.
 //
 // A rule is quick when its selector is a single universal, tag, id or class selector: looking it up under its
-// key is all the matching there is. Every other rule is complex and goes through MatchSelector. Both kinds are
-// filed by what an element must have for them to match: an id, else a class, else a tag of the key compound, so
-// that an element meets only the rules that may concern it.
+// key is all the matching there is. Every other rule is complex and goes through MatchSelector. Both kinds
+// are filed by what an element must have for them to match: an id, else a class, else a tag of the key
+// compound, so that an element meets only the rules that may concern it.
 //
 // Invariants:
 // - positions are unique and decide the cascade; where a rule is stored does not matter;
-// - a searchable rule is in exactly one of quickRules_ and complexRules_; rules of inactive media groups are in
+// - a searchable rule is in exactly one of quickRules_ and complexRules_; rules of inactive media groups are
+// in
 //   neither;
 // - the buckets describe the rule vectors unless indexStale_ is set, and every search refreshes them first;
 // - whatever is remembered about rules is good for one generation.

@@ -77,7 +77,8 @@ inline bool Matches(const CompoundSelector& compound, Element& element, const Ma
 
 inline Element* ParentElement(const Element& element) {
     Node* parent = element.GetParent();
-    if (!parent || (parent->GetFlags() & (dom::kIsElement | dom::kIsDocument)) != dom::kIsElement) return nullptr;
+    if (!parent || (parent->GetFlags() & (dom::kIsElement | dom::kIsDocument)) != dom::kIsElement)
+        return nullptr;
     return static_cast<Element*>(parent);
 }
 

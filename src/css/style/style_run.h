@@ -23,8 +23,8 @@ struct StyleRun {
     TextStyleCache& textStyles;
     RootStyles& rootStyles;
     const MatchState& nothingMatched;  // of an element that was never matched
-    layout::IFontResolver* fonts;  // null without fonts
-    LengthContext metrics;         // viewport units, and the root's font size as it becomes known
+    layout::IFontResolver* fonts;      // null without fonts
+    LengthContext metrics;             // viewport units, and the root's font size as it becomes known
     bool rootFontSizeChanged = false;
 };
 

@@ -7,15 +7,15 @@
 // - one match state means equal values, since evaluating a declaration depends on nothing but the parent's
 //   style, the root's style and the custom properties in force, which are compared by handle;
 // - the two elements had the same style before, so that they changed in the same way: a change mask is shared
-//   too. Handles seen before are compared as bare addresses. None can have been reused: the second element has
-//   held the group since before the run.
+//   too. Handles seen before are compared as bare addresses. None can have been reused: the second element
+//   has held the group since before the run.
 #pragma once
 
 #include <array>
 #include <cstdint>
 
-#include "css/values/layout_style_refs.h"
 #include "css/values/css_containers.h"
+#include "css/values/layout_style_refs.h"
 
 namespace qorvex::dom {
 class Element;
@@ -49,9 +49,9 @@ class StyleSharingTable {
 
   private:
     void Place(const Entry& entry);
-    // A style stands in one of the places of its set; the last comer takes the first. Pages have a few hundred
-    // distinct styles, and a lost entry costs one more cascade. The table grows with what it is asked for, so
-    // that a small page has a small one.
+    // A style stands in one of the places of its set; the last comer takes the first. Pages have a few
+    // hundred distinct styles, and a lost entry costs one more cascade. The table grows with what it is asked
+    // for, so that a small page has a small one.
     static constexpr uint32_t kWays = 2, kFirstEntries = 32, kLastEntries = 1024;
     uint32_t FirstOfSet(uint64_t hash) const {
         return static_cast<uint32_t>(hash) & (entries_.size() - 1) & ~(kWays - 1);

@@ -57,6 +57,7 @@ void StyleSolver::Solve(Document& document, IAnimationSide* animations) {
     UpdateLayoutPresence(document);
     RunAnimations(document, animations);
     lists.Clear();
+    GiveBackRoom();
 }
 
 // --- Who is matched
@@ -99,6 +100,7 @@ void StyleSolver::AddRoots(Document& document, Extent extent) {
     }
     taken_.clear();
     SortByDepth(roots_);
+    widest_ = std::max(widest_, roots_.size());
 }
 
 // Those that the walk has come to from above are done already.
@@ -120,8 +122,28 @@ void StyleSolver::FinishLevel() {
         element->GetDirtyProperties().Clear();
     solvedAbove_.clear();
     solvedAbove_.swap(solved_);
+    widest_ = std::max(widest_, nextLevel_.size());
     level_.swap(nextLevel_);
     nextLevel_.clear();
+}
+
+// A page that was once solved whole and then changes in small steps does not keep the room of that one run;
+// it goes step by step, so that a page with large changes now and then keeps some.
+void StyleSolver::GiveBackRoom() {
+    constexpr uint32_t kSmall = 256;
+    const uint32_t wanted = std::max(std::exchange(widest_, 0u), kSmall);
+    const auto halve = [&](auto& list) {
+        if (list.capacity() / 4 < wanted) return;
+        list.clear();
+        const uint32_t half = list.capacity() / 2;
+        list.shrink_to_fit();
+        list.reserve(half);
+    };
+    halve(roots_);
+    halve(level_);
+    halve(nextLevel_);
+    halve(solved_);
+    halve(solvedAbove_);
 }
 
 // --- Solving

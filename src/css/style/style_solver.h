@@ -3,9 +3,9 @@
 // The walk goes down level by level from the dirty nodes, and below an element only as far as what it changed
 // may reach: a new background on the body costs the body, a new colour on it costs all who inherit it.
 //
-// Invariants: parents are solved before their children; dirty properties stay on an element until its children
-// have read them; the lists below are kept from frame to frame for their memory, so that a steady page
-// allocates nothing here.
+// Invariants: parents are solved before their children; dirty properties stay on an element until its
+// children have read them; the lists below are kept from frame to frame for their memory, so that a steady
+// page allocates nothing here.
 #pragma once
 
 #include "css/style/element_matching.h"
@@ -40,6 +40,7 @@ class StyleSolver {
     void TakeRootsOfLevel(int32_t depth);
     void AddChildren(const dom::Node& node);
     void FinishLevel();
+    void GiveBackRoom();
     void MatchAfresh(dom::Element& element, MatchContext& context);
     bool SolveNode(dom::Node& node, StyleRun& run);
     void SolveText(dom::Node& text, StyleRun& run);
@@ -63,6 +64,8 @@ class StyleSolver {
     // Elements with dirty properties: of the level in hand, and of the one above it.
     CssVector<dom::Element*> solved_;
     CssVector<dom::Element*> solvedAbove_;
+    // The most that any of the lists held in this run.
+    uint32_t widest_ = 0;
     NodeSet<dom::Node*, MemoryTag::DOM> taken_;
 };
 

@@ -1,5 +1,5 @@
-// The winning declarations of an element, filled by selector matching and read by style solving. Elements that
-// the same rules match share one state; it changes no more once it is filled.
+// The winning declarations of an element, filled by selector matching and read by style solving. Elements
+// that the same rules match share one state; it changes no more once it is filled.
 //
 // Declarations are borrowed from rules and from the element's own sets: the owner of a rule re-matches before
 // it dies.
