@@ -65,6 +65,9 @@ inline constexpr size_t kSubstitutedTextBytes = 1024 * 1024;
 /// Parsed selectors of script queries that are kept for the next query with the same text.
 inline constexpr size_t kCachedQueries = 64;
 
+/// Sets of rules whose cascade is remembered for the next element that they match.
+inline constexpr size_t kCachedMatches = 2048;
+
 /// Pixels a side of a surface that holds a blurred shadow: twice a 4K screen; a larger one would be mostly
 /// out of sight.
 inline constexpr size_t kMaxShadowSurfaceSide = 8192;

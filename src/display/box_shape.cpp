@@ -28,10 +28,10 @@ void ReadSides(const LayoutNode& node, BoxShape& shape) {
         float& out;
     };
     const Side sides[] = {
-        {node.border.left, style.borderLeftStyle, visual.borderLeftColor, shape.border.left},
-        {node.border.right, style.borderRightStyle, visual.borderRightColor, shape.border.right},
-        {node.border.top, style.borderTopStyle, visual.borderTopColor, shape.border.top},
-        {node.border.bottom, style.borderBottomStyle, visual.borderBottomColor, shape.border.bottom}};
+        {node.border().left, style.borderLeftStyle, visual.borderLeftColor, shape.border.left},
+        {node.border().right, style.borderRightStyle, visual.borderRightColor, shape.border.right},
+        {node.border().top, style.borderTopStyle, visual.borderTopColor, shape.border.top},
+        {node.border().bottom, style.borderBottomStyle, visual.borderBottomColor, shape.border.bottom}};
     for (uint32_t i = 0; i < 4; ++i) {
         shape.colors[i] = ToFresco(sides[i].color.Resolve(current));
         // Dotted and dashed sides take room but paint nothing.

@@ -372,8 +372,9 @@ css::StyleDeclarationSet& Element::EnsureInlineStyle() {
 }
 
 css::StyleDeclarationSet& Element::EnsureExtraStyle() {
-    if (!extra_style_) extra_style_ = MakeUnique<css::StyleDeclarationSet, MemoryTag::DOM>();
-    return *extra_style_;
+    auto& extra = EnsureRareData().extra_style;
+    if (!extra) extra = MakeUnique<css::StyleDeclarationSet, MemoryTag::DOM>();
+    return *extra;
 }
 
 void Element::SetInlineStyleText(std::string_view text) {

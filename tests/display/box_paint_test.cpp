@@ -11,7 +11,7 @@ constexpr const char* kBox = "position: absolute; left: 100px; top: 50px; width:
 
 TEST_F(BoxPaintTest, BackgroundsAndBorders) {
     LayoutHandle* box = page.Add(page.body, kBox);
-    const css::LayoutStyleRefs plain = box->data().style;
+    const css::LaidOutStyle plain = box->data().style;
     struct Case {
         const char* style;
         const char* records;
