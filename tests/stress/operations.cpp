@@ -1,5 +1,4 @@
 // What a sequence is made of: one row an operation of the public interfaces, with how often it comes.
-#include <cmath>
 #include <limits>
 #include <string>
 
@@ -22,12 +21,11 @@ unsigned AnySize(Random& random) {
     return random.Pick(kSizes);
 }
 
-double AnyTime(Random& random, const ViewSlot& slot) {
-    static constexpr double kSteps[] = {16, 16, 16, 16, 33, 0, 500, 1e7, -5, -1e6};
-    const double now = slot.frames.load() * 16.0;
-    if (random.Chance(1)) return std::numeric_limits<double>::quiet_NaN();
-    if (random.Chance(1)) return std::numeric_limits<double>::infinity();
-    return now + random.Pick(kSteps);
+double AnyTime(Random& random, ViewSlot& slot) {
+    static constexpr double kForward[] = {16, 16, 16, 16, 33, 0, 500, 1e7};
+    static constexpr double kWrong[] = {-5, -1e6, std::numeric_limits<double>::quiet_NaN(),
+                                        std::numeric_limits<double>::infinity()};
+    return random.Chance(5) ? slot.time + random.Pick(kWrong) : slot.time += random.Pick(kForward);
 }
 
 // Runs `body` on a view, if there is one.
@@ -57,16 +55,39 @@ void AdvanceFrames(World& world) {
     }
 }
 
+void PaintFrame(World& world, RendererSlot& slot, std::uint32_t id);
+
+// A page from its request to its pixels, as far as the answers come.
+void ShowPage(World& world) {
+    world.CreateRenderer();
+    RendererSlot* slot = world.AnyRenderer();
+    if (!slot || !slot->view->view) return;
+    ViewSlot& shown = *slot->view;
+    world.Call(shown, [&](View& view) { view.LoadURL(world.Rng().Pick(kPages)); });
+    for (int frame = 0; frame < 12 && !world.IsStopped(); ++frame) {
+        if (!shown.view || !slot->renderer) return;
+        shown.system.handler->Step();
+        shown.system.system->Advance(shown.time);
+        if (!HasResourceThread(world.GetMode())) world.ServeWork();
+        world.Call(shown, [&](View& view) { view.Advance(shown.time += 16); });
+        if (!slot->renderer) return;
+        PaintFrame(world, *slot, shown.frames.load() - static_cast<std::uint32_t>(frame % 2));
+    }
+}
+
 void Paint(World& world) {
     RendererSlot* slot = world.AnyRenderer();
     if (!slot) return;
     // The last frame, an old one, one that was painted before, or one that never was.
     static constexpr std::uint32_t kBack[] = {1, 1, 1, 1, 2, 3, 50, 0, 0x80000000u};
-    const std::uint32_t id = slot->view->frames.load() - world.Rng().Pick(kBack);
+    PaintFrame(world, *slot, slot->view->frames.load() - world.Rng().Pick(kBack));
+}
+
+void PaintFrame(World& world, RendererSlot& slot, std::uint32_t id) {
     const bool may_wait = world.GetMode() == Mode::Sync || world.Render().IsThread();
     const bool wait = may_wait && world.Rng().Chance(50);
     const bool twice = world.Rng().Chance(20);
-    ViewRenderer* renderer = slot->renderer;
+    ViewRenderer* renderer = slot.renderer;
     Witness& log = world.Log();
     world.Render().Post([renderer, id, wait, twice, &log] {
         const PaintStatus first = renderer->Paint(id, wait);
@@ -171,7 +192,8 @@ void UseFonts(System& system, Random& random) {
 
 constexpr Operation kOperations[] = {
     {"Advance", 220, AdvanceFrames},
-    {"LoadURL", 40,
+    {"ShowPage", 30, ShowPage},
+    {"LoadURL", 20,
      [](World& world) { OnView(world, [](View& v, Random& r) { v.LoadURL(r.Pick(kPages)); }); }},
     {"Reload", 8, [](World& world) { OnView(world, [](View& v, Random&) { v.Reload(); }); }},
     {"UnloadDocument", 8, [](World& world) { OnView(world, [](View& v, Random&) { v.UnloadDocument(); }); }},
@@ -197,7 +219,7 @@ constexpr Operation kOperations[] = {
     {"Capture", 8, [](World& world) { OnView(world, Capture); }},
     {"ClearListeners", 1, [](World& world) { OnView(world, [](View& v, Random&) { v.ClearListeners(); }); }},
     {"Paint", 120, Paint},
-    {"FreeRenderingResources", 8, FreeResources},
+    {"FreeRenderingResources", 4, FreeResources},
     {"ServeWork", 30, [](World& world) { world.ServeWork(); }},
     {"SystemCaches", 25, [](World& world) { OnSystem(world, UseSystemCaches); }},
     {"Fonts", 6, [](World& world) { OnSystem(world, UseFonts); }},

@@ -19,6 +19,7 @@ constexpr std::string_view kExpected[] = {
     "Unable to set virtual resolution",
     "Can't use data-bind API when document is not yet created!",
     "View binding is not initialized yet",
+    "Rendering resolution cannot be near-zero!",
 };
 
 template <class List, class Lives>
