@@ -51,7 +51,9 @@ class Run {
             // A capture shows the whole view, so the last frame redraws it; its number must be known ahead.
             if (options_.frames && count_ + 1 == most && !options_.capture_file.empty()) AskForCapture();
             const bool changed = OneFrame();
-            quiet = changed || !session_.IsLoaded() || !script_done_ || events_.Remaining() ? 0 : quiet + 1;
+            const bool busy = changed || !session_.IsLoaded() || !script_done_ || events_.Remaining() ||
+                              session_.HoldsAnswersBack();
+            quiet = busy ? 0 : quiet + 1;
             if (!options_.frames && quiet >= kQuietFrames) break;
         }
         if (!options_.capture_file.empty()) FinishCapture();

@@ -82,6 +82,13 @@ constexpr OptionRow kRows[] = {
      [](std::string_view, Options& o) { return o.synchronous_layout = true; }},
     {"--workers", "N", "worker threads for resources (2)",
      [](std::string_view text, Options& o) { return ReadNumber(text, o.workers) && o.workers <= 64; }},
+    {"--unruly", "SEED", "spoil the answers to the page's requests: late, failed, cut, in pieces",
+     [](std::string_view text, Options& o) {
+         uint64_t seed = 0;
+         if (!ReadNumber(text, seed)) return false;
+         o.unruly_seed = seed;
+         return true;
+     }},
     {"--log", "LEVEL", "trace, debug, info, warning, error, assert or none (warning)",
      [](std::string_view text, Options& o) { return ReadSeverity(text, o.log_severity); }},
     {"--strict", "", "exit 3 when an Error or Assert line was logged",

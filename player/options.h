@@ -26,7 +26,8 @@ struct Options {
     ClockSource clock = ClockSource::Default;
     bool synchronous_layout = false;
     uint32_t workers = 2;
-    uint32_t log_severity = 3;  // Warning
+    std::optional<uint64_t> unruly_seed;  // given: answers come late, cut, twice or not well
+    uint32_t log_severity = 3;            // Warning
     bool strict = false;
     std::vector<std::string> fonts;
     std::string default_font;

@@ -87,6 +87,12 @@ bool Session::Start(std::string& error) {
         return false;
     }
 
+    if (options_.unruly_seed) {
+        unruly_ = std::make_unique<host::UnrulyResourceHandler>(*resources_, *options_.unruly_seed);
+        // Without the page itself there would be nothing to look at.
+        unruly_->Spare(page_url_);
+    }
+
     engine_options_ = FontOptions(options_.fonts);
     if (!options_.stats_file.empty()) engine_options_ = engine_options_ + ' ' + kCountAllocationsOption;
     LibraryParams params;
@@ -111,6 +117,7 @@ bool Session::Start(std::string& error) {
 
     SystemSettings system_settings;
     system_settings.ResourceHandler = resources_.get();
+    if (unruly_) system_settings.ResourceHandler = unruly_.get();
     system_settings.EmbeddedFallbackFont = kLargeFallbackFont;
     system_ = library_->CreateSystem(system_settings);
 
@@ -152,19 +159,21 @@ bool Session::LoadPage(std::string& error) {
 }
 
 void Session::Settle() {
-    // The resource handler answers inside the request, so what is left is work on the pool.
+    // The resource handler answers inside the request, or between two frames, so what is left is work on the
+    // pool.
     pool_.RunResources();
     pool_.WaitUntilIdle();
 }
 
 std::uint32_t Session::RunFrame(double time) {
-    time_ = time;
+    clock_.Set(time);
     system_->Advance(time);
     view_->Advance(time);
     // The frame's id is known when its layout side is done.
     pool_.WaitUntilIdle();
     const std::uint32_t frame = completed_frame_.load(std::memory_order_acquire);
     view_renderer_->Paint(frame, true);
+    if (unruly_) unruly_->Step();
     return frame;
 }
 
@@ -185,6 +194,10 @@ bool Session::IsLoaded() const {
     return debug_->IsLoaded(view_);
 }
 
+bool Session::HoldsAnswersBack() const {
+    return unruly_ && unruly_->Waiting() > 0;
+}
+
 bool Session::SawErrors() const {
     return log_.CountFrom(kErrorSeverity) > 0;
 }
@@ -199,7 +212,7 @@ void Session::OnFrameComplete(void* session, std::uint32_t, std::uint32_t frame,
 
 double Session::CurrentTime(void* session, std::uint32_t) {
     const auto* self = static_cast<Session*>(session);
-    if (!self->real_clock_) return self->time_;
+    if (!self->real_clock_) return self->clock_.Now();
     return std::chrono::duration<double, std::milli>(std::chrono::steady_clock::now() - self->start_).count();
 }
 

@@ -13,8 +13,10 @@
 #include "host/counting_allocator.h"
 #include "host/file_system.h"
 #include "host/folder_resource_handler.h"
+#include "host/manual_clock.h"
 #include "host/print_log_handler.h"
 #include "host/software_render_target.h"
+#include "host/unruly_resource_handler.h"
 #include "host/worker_pool.h"
 #include "options.h"
 
@@ -57,6 +59,8 @@ class Session final : public qorvex::IViewListener {
     [[nodiscard]] bool IsLoaded() const;
     // What OnLoadFailed said; empty while nothing failed.
     [[nodiscard]] const std::string& LoadError() const { return load_error_; }
+    // True while answers are held back on purpose (--unruly).
+    [[nodiscard]] bool HoldsAnswersBack() const;
     // True when an Error or Assert line was logged.
     [[nodiscard]] bool SawErrors() const;
 
@@ -73,7 +77,7 @@ class Session final : public qorvex::IViewListener {
     std::string page_url_;
     std::string engine_options_;
     std::string load_error_;
-    double time_ = 0;
+    qorvex::host::ManualClock clock_;
     std::chrono::steady_clock::time_point start_ = std::chrono::steady_clock::now();
     std::atomic<std::uint32_t> completed_frame_{0};
 
@@ -81,6 +85,7 @@ class Session final : public qorvex::IViewListener {
     qorvex::host::PrintLogHandler log_;
     qorvex::host::FileSystem files_;
     std::unique_ptr<qorvex::host::FolderResourceHandler> resources_;
+    std::unique_ptr<qorvex::host::UnrulyResourceHandler> unruly_;
     qorvex::host::WorkerPool pool_;
     qorvex::host::SoftwareRenderTarget target_;
 

@@ -149,11 +149,11 @@ void CpuBackend::PopState(const PopStateRecord&, const NoneTail&) {
 }
 
 void CpuBackend::CreateSurface(const CreateSurfaceRecord& record, const NoneTail&) {
-    if (record.surface != stream_->GetTarget()) return shared_.resources.CreateSurface(record);
+    if (record.surface != stream_->GetTarget()) return shared_.resources.CreateSurface(record, owner_);
     // A buffer may make the surface that it draws into: from here on it starts afresh on the new one. Inside
     // of a layer the target must not move.
     if (!layers_.empty()) return;
-    shared_.resources.CreateSurface(record);
+    shared_.resources.CreateSurface(record, owner_);
     BeginTarget(record.surface);
 }
 

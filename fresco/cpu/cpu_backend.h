@@ -26,13 +26,15 @@ struct SharedState {
 
 class CpuBackend final : public Backend {
   public:
-    explicit CpuBackend(SharedState& shared) : shared_(shared) {}
+    explicit CpuBackend(SharedState& shared) : shared_(shared), owner_(shared.resources.NewOwner()) {}
 
     void SetRenderTarget(const Bitmap& bitmap) { target_ = bitmap; }
     const Bitmap& GetRenderTarget() const { return target_; }
     void SetCustomCompositor(ICustomCompositor* compositor) { compositor_ = compositor; }
     void SetCustomEffectRenderer(ICustomEffectRenderer* renderer) { effectRenderer_ = renderer; }
     SceneStats& stats() { return stats_; }
+    // Of the surfaces that its streams make.
+    uint32_t owner() const { return owner_; }
 
     void Execute(const StreamSource& stream) override;
     FRESCO_OVERRIDE_COMMANDS
@@ -103,6 +105,7 @@ class CpuBackend final : public Backend {
                           Use use);
 
     SharedState& shared_;
+    const uint32_t owner_;
     Bitmap target_;  // the scene's
     const StreamSource* stream_ = nullptr;
     Texture* surface_ = nullptr;  // the stream's target when it is a surface

@@ -36,6 +36,7 @@ void CpuScene::SetRenderTarget(void* color, void*, const RenderTargetDescription
 }
 
 void CpuScene::ExecuteFrontEnd(CommandBuffer* const* buffers, uint32_t count) {
+    shared_.resources.DropRetired();
     for (uint32_t i = 0; i < count; ++i) {
         if (buffers[i]) backend_.Execute(BufferSource(*buffers[i]));
     }
@@ -123,12 +124,15 @@ void CpuScene::ClearCaches(uint32_t mask) {
 }
 
 void CpuScene::FreeResources() {
+    shared_.resources.DropRetired();
+    shared_.resources.DestroySurfacesOf(backend_.owner());
     shared_.layers.Clear();
     shared_.glyphs.Clear();
     shared_.colorGlyphs.clear();
 }
 
 void CpuScene::Destroy() {
+    shared_.resources.RetireOwner(backend_.owner());
     HeapDelete(this);
 }
 

@@ -141,7 +141,30 @@ void Resources::UpdateImage(const UpdateImageRecord& record, const void* pixels,
     Load(texture, static_cast<const uint8_t*>(pixels), texture.width * pixelSize);
 }
 
-void Resources::CreateSurface(const CreateSurfaceRecord& record) {
+void Resources::DestroySurfacesOf(uint32_t owner) {
+    for (auto entry = surfaces_.begin(); entry != surfaces_.end();)
+        entry = entry->second.owner == owner ? surfaces_.erase(entry) : std::next(entry);
+}
+
+void Resources::RetireOwner(uint32_t owner) {
+    std::lock_guard<std::mutex> lock(mutex_);
+    retired_.push_back(owner);
+    anyRetired_.store(true, std::memory_order_release);
+}
+
+void Resources::DropRetired() {
+    if (!anyRetired_.load(std::memory_order_acquire)) return;
+    Vector<uint32_t> retired;
+    {
+        std::lock_guard<std::mutex> lock(mutex_);
+        retired.swap(retired_);
+        anyRetired_.store(false, std::memory_order_relaxed);
+    }
+    for (const uint32_t owner : retired)
+        DestroySurfacesOf(owner);
+}
+
+void Resources::CreateSurface(const CreateSurfaceRecord& record, uint32_t owner) {
     const SurfaceDescription& d = record.description;
     if (!ValidSize(d.width, d.height)) {
         FRESCO_WARN("Refusing surface %u of %u x %u pixels", record.surface, d.width, d.height);
@@ -151,6 +174,7 @@ void Resources::CreateSurface(const CreateSurfaceRecord& record) {
     if ((record.flag & 1) && old && old->width == d.width && old->height == d.height) return;
     Texture texture;
     texture.width = d.width, texture.height = d.height;
+    texture.owner = owner;
     if (!texture.pixels.Allocate(int(d.width), int(d.height))) {
         FRESCO_WARN("No memory for surface %u of %u x %u pixels", record.surface, d.width, d.height);
         return;

@@ -1,6 +1,11 @@
-// Images and surfaces by id, for all scenes of a library. Render thread only.
+// Images and surfaces by id, for all scenes of a library. Render thread only, but for RetireOwner. Images are
+// shared; a surface belongs to the scene whose buffers made it and goes with it at the latest.
 #pragma once
 #include <fresco/command_records.h>
+
+#include <atomic>
+#include <mutex>
+
 #include "fresco/cpu/pixels.h"
 
 namespace fresco::cpu {
@@ -14,6 +19,7 @@ struct Texture {
     uint32_t sourceFormat = 0;  // PixelFormat of updates
     uint32_t flags = 0;         // ImageFlags
     const UserImage* user = nullptr;
+    uint32_t owner = 0;  // of a surface
     Vector<PixelBuffer> levels;  // half sizes, from the second level on
     bool levelsValid = false;
 
@@ -29,8 +35,14 @@ class Resources {
     void CreateImage(const CreateImageRecord& record, const void* pixels, size_t size);
     void UpdateImage(const UpdateImageRecord& record, const void* pixels, size_t size);
     void DestroyImage(ImageId id) { images_.erase(id); }
-    void CreateSurface(const CreateSurfaceRecord& record);
+    void CreateSurface(const CreateSurfaceRecord& record, uint32_t owner = 0);
     void DestroySurface(SurfaceId id) { surfaces_.erase(id); }
+    // A number for whoever makes surfaces.
+    uint32_t NewOwner() { return nextOwner_.fetch_add(1, std::memory_order_relaxed); }
+    void DestroySurfacesOf(uint32_t owner);
+    // Any thread: the owner has gone, and its surfaces go with the next DropRetired.
+    void RetireOwner(uint32_t owner);
+    void DropRetired();
     void Clear();
     // For replays: pixels as a capture stored them.
     bool RestoreImage(ImageId id, uint32_t format, uint32_t width, uint32_t height, const uint8_t* data);
@@ -41,6 +53,10 @@ class Resources {
 
     HashMap<ImageId, Texture> images_;
     HashMap<SurfaceId, Texture> surfaces_;
+    std::atomic<uint32_t> nextOwner_{1};
+    std::atomic<bool> anyRetired_{false};
+    std::mutex mutex_;
+    Vector<uint32_t> retired_;  // under mutex_
 };
 
 }  // namespace fresco::cpu

@@ -2,6 +2,8 @@
 
 #include <qorvex/file_system.h>
 
+#include <thread>
+
 #include "core/debug/thread_counting_allocator.h"
 #include "core/logging/log.h"
 #include "core/logging/logger.h"
@@ -82,6 +84,7 @@ bool LibraryImpl::Start(const LibraryParams& params, fresco::IRenderingLibrary* 
     settings.on_work_available = params.OnWorkAvailable;
     settings.user_data = params.OnWorkAvailableUserData;
     tasks_ = MakeUnique<TaskSystem, MemoryTag::General>(settings);
+    responses_ = MakeUnique<ClientResponsePool, MemoryTag::Resources>();
 
     TakeFamily();  // the first system gets family 1
     script::CreateScriptClasses();
@@ -155,22 +158,53 @@ void LibraryImpl::Free() {
 System* LibraryImpl::CreateSystem(const SystemSettings& settings) {
     ThreadScope scope;
     if (!CheckMainThread("Library::CreateSystem")) return nullptr;
-    return New<SystemImpl, MemoryTag::General>(*this, settings, TakeFamily());
+    systems_.push_back(New<SystemImpl, MemoryTag::General>(*this, settings, TakeFamily()));
+    return systems_[systems_.size() - 1];
+}
+
+void LibraryImpl::OnSystemDestroyed(SystemImpl* system) {
+    systems_.erase_if([&](SystemImpl* other) { return other == system; });
+}
+
+// False when one of them is at work further up the stack.
+bool LibraryImpl::DestroyForgottenSystems() {
+    for (const SystemImpl* system : systems_) {
+        if (!system->IsInsideOperation()) continue;
+        LogError("Library::Uninitialize must not be called from inside an operation of a view");
+        return false;
+    }
+    while (!systems_.empty()) {
+        LogError("Library::Uninitialize called before its systems were destroyed");
+        systems_[systems_.size() - 1]->Destroy();
+    }
+    return true;
 }
 
 void LibraryImpl::StopWorkers() {
     ThreadScope scope;
     LogTrace("Uninitializing task system...");
     tasks_->Stop();
+    // Frames that wait for a layout thread wait in vain now, and so does a Paint that waits for them.
+    if (!IsMainThread()) return;
+    for (SystemImpl* system : systems_)
+        system->OnWorkersStopped();
 }
 
 void LibraryImpl::Uninitialize(bool shutdown_script_engine) {
+    if (!CheckMainThread("Library::Uninitialize")) return;
     {
         ThreadScope scope;
         if (tasks_->IsRunning()) {
             LogError("You must call StopWorkers before Uninitialize!");
             tasks_->Stop();
         }
+        if (!DestroyForgottenSystems()) return;
+        renderers_.DestroyForgotten();
+        // Threads that StopWorkers has sent home may still be on their way out.
+        while (threads_at_work_.load(std::memory_order_acquire) != 0)
+            std::this_thread::yield();
+        // With it go the requests that the client never finished.
+        responses_.reset();
         tasks_.reset();
         if (adapted_allocator_) {
             LogTrace("Uninitializing Fresco...");
@@ -197,9 +231,12 @@ void* LibraryImpl::GetFeatureInterface(unsigned id) {
 }
 
 void LibraryImpl::ExecuteWork(WorkType type, WorkExecutionMode mode, unsigned task_family) {
-    // The scope comes with the first task: a thread that waits for work holds no temporary memory of others.
-    ThreadScope scope;
-    tasks_->ExecuteWork(type, mode, task_family);
+    threads_at_work_.fetch_add(1, std::memory_order_relaxed);
+    {
+        ThreadScope scope;
+        tasks_->ExecuteWork(type, mode, task_family);
+    }
+    threads_at_work_.fetch_sub(1, std::memory_order_release);
 }
 
 void LibraryImpl::ForwardToRenderingLibrary(uint64_t first, uint64_t second, uint64_t third) {

@@ -12,11 +12,14 @@
 #include "core/debug/debug_interfaces.h"
 #include "core/memory/containers.h"
 #include "core/memory/thread_scope.h"
+#include "core/render/renderer_registry.h"
 #include "core/tasks/task_system.h"
 #include "core/tasks/timer.h"
+#include "resources/client_response.h"
 
 namespace qorvex {
 
+class SystemImpl;
 class ThreadCountingAllocator;
 
 class LibraryImpl final : public Library {
@@ -45,11 +48,15 @@ class LibraryImpl final : public Library {
     // A family id that no system, view or service has.
     uint32_t TakeFamily() { return next_family_.fetch_add(1); }
     DebugInterfaces& GetDebugInterfaces() { return debug_; }
+    ClientResponsePool& GetResponses() { return *responses_; }
+    RendererRegistry& GetRenderers() { return renderers_; }
+    void OnSystemDestroyed(SystemImpl* system);
 
   private:
     bool Start(const LibraryParams& params, fresco::IRenderingLibrary* external);
     bool StartRendering(const LibraryParams& params, fresco::IRenderingLibrary* external);
     void ReadOptions(const char* options);
+    bool DestroyForgottenSystems();
     void Fail();
     void Free();
 
@@ -58,6 +65,11 @@ class LibraryImpl final : public Library {
     UniquePtr<FrescoLogHandler, MemoryTag::Rendering> adapted_log_;
     UniquePtr<FrescoAllocator, MemoryTag::Rendering> adapted_allocator_;
     fresco::IRenderingLibrary* rendering_ = nullptr;
+    UniquePtr<ClientResponsePool, MemoryTag::Resources> responses_;
+    RendererRegistry renderers_;
+    Vector<SystemImpl*> systems_;
+    // In ExecuteWork.
+    std::atomic<uint32_t> threads_at_work_{0};
     DebugInterfaces debug_;
     ThreadCountingAllocator* counting_allocator_ = nullptr;  // null unless asked for
     String default_font_family_;

@@ -54,6 +54,13 @@ inline constexpr size_t kMaxSourceAttributes = 8192;
 /// this they wait for the next frame.
 inline constexpr uint32_t kMaxNestedResourceEvents = 16;
 
+/// Bytes of one resource: what a handler says by mistake must not take all memory. Text lengths have 32 bits.
+inline constexpr size_t kMaxResourceBytes = size_t{1} << 30;
+
+/// Answered requests whose response objects stay as they are, so that a client that finishes one twice, soon
+/// after, touches nothing else: 64 bytes each.
+inline constexpr size_t kFinishedResponses = 256;
+
 /// Frame ids of a view that wait for Paint. A client that never paints keeps the newest so many; at 60 frames
 /// a second a client that paints late has four seconds.
 inline constexpr size_t kMaxWaitingFrames = 256;

@@ -5,6 +5,8 @@
 
 #include <fresco/library.h>
 
+#include <algorithm>
+
 #include "core/library_impl.h"
 #include "core/logging/log.h"
 #include "core/main_thread.h"
@@ -33,7 +35,8 @@ SystemImpl::SystemImpl(LibraryImpl& library, const SystemSettings& settings, uin
     : library_(library),
       family_{family, &library.GetTasks()},
       default_rules_(MakeRef<css::DefaultRules>(strings_)),
-      resources_(MakeRef<ResourceContext>(settings.ResourceHandler, settings.ResourceRequestsOnWorkers)),
+      resources_(MakeRef<ResourceContext>(settings.ResourceHandler, library.GetResponses(),
+                                          settings.ResourceRequestsOnWorkers)),
       html_cache_(family_, *resources_),
       stylesheet_cache_(family_, *resources_, strings_),
       font_loader_(*resources_),
@@ -106,13 +109,23 @@ View* SystemImpl::CreateView(const ViewSettings& settings) {
     services.use_dedicated_layout_thread = library_.UsesDedicatedLayoutThread();
     services.snap_to_pixels = library_.SnapsToPixels();
     services.preload_font_data = library_.PreloadsFontData();
-    View* view = New<ViewImpl, MemoryTag::General>(settings, services, library_.TakeFamily());
+    ViewImpl* view = New<ViewImpl, MemoryTag::General>(settings, services, library_.TakeFamily());
     views_.push_back(view);
     return view;
 }
 
 void SystemImpl::OnViewDestroyed(View* view) {
-    views_.erase_if([&](View* other) { return other == view; });
+    views_.erase_if([&](ViewImpl* other) { return other == view; });
+}
+
+void SystemImpl::OnWorkersStopped() {
+    for (ViewImpl* view : views_)
+        view->WaitUntilLayoutIdle();
+}
+
+bool SystemImpl::IsInsideOperation() const {
+    return destroying_ || std::any_of(views_.begin(), views_.end(),
+                                      [](const ViewImpl* view) { return view->IsInsideOperation(); });
 }
 
 SystemRenderer* SystemImpl::CreateSystemRenderer(const SystemRendererSettings& settings) {
@@ -124,8 +137,8 @@ SystemRenderer* SystemImpl::CreateSystemRenderer(const SystemRendererSettings& s
         return nullptr;
     }
     fresco::Library::EnableDebugNames(settings.EnableDebugNames);
-    return New<SystemRendererImpl, MemoryTag::General>(library_.GetRendering(), settings.EnableDebugNames,
-                                                       false);
+    return New<SystemRendererImpl, MemoryTag::General>(library_.GetRendering(), library_.GetRenderers(),
+                                                       settings.EnableDebugNames, false);
 }
 
 SystemRenderer* SystemImpl::CreateSystemRendererWithExternalRenderingLibrary() {
@@ -136,7 +149,8 @@ SystemRenderer* SystemImpl::CreateSystemRendererWithExternalRenderingLibrary() {
             "Please use CreateSystemRenderer method instead.");
         return nullptr;
     }
-    return New<SystemRendererImpl, MemoryTag::General>(library_.GetRendering(), false, true);
+    return New<SystemRendererImpl, MemoryTag::General>(library_.GetRendering(), library_.GetRenderers(),
+                                                       false, true);
 }
 
 void SystemImpl::Advance(double) {
@@ -148,23 +162,27 @@ void SystemImpl::Advance(double) {
 
 void SystemImpl::Destroy() {
     ThreadScope scope;
+    if (!CheckMainThread("System::Destroy")) return;
+    if (IsInsideOperation()) {
+        LogError("System::Destroy must not be called from inside an operation of one of its views");
+        return;
+    }
+    destroying_ = true;
     // Views stand on the system's caches and strings; none may outlive it.
     while (!views_.empty()) {
         LogError("System::Destroy called before its views were destroyed");
         views_[views_.size() - 1]->Destroy();
     }
-    while (stylesheet_cache_.HasRequestsInFlight()) {
-        // The system's own parsing can be done here, for clients without worker threads; then wait for what
-        // comes.
-        family_.system->Run(TaskChannels::Resources, false, nullptr, family_.family);
-        if (!stylesheet_cache_.HasRequestsInFlight()) break;
-        family_.system->Run(TaskChannels::Main, true, &stylesheet_cache_.GetIdleFlag(), family_.family);
-    }
+    // Nobody is left who wants what is on its way. The client is told and not waited for, since it may never
+    // answer: a late answer finds a closed family.
+    html_cache_.Clear();
+    stylesheet_cache_.AbandonLoads();
     for (TaskChannels channel : kSystemChannels) {
         LogChannel("Closing task channel ", channel, family_.family);
         family_.system->CloseChannel(channel, family_.family);
     }
     fonts_.reset();
+    library_.OnSystemDestroyed(this);
     Delete<MemoryTag::General>(this);
 }
 

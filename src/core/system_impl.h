@@ -18,6 +18,7 @@
 namespace qorvex {
 
 class LibraryImpl;
+class ViewImpl;
 
 class SystemImpl final : public System, public IViewLifetimeTracker {
   public:
@@ -55,7 +56,9 @@ class SystemImpl final : public System, public IViewLifetimeTracker {
 
     void OnViewDestroyed(View* view) override;
 
-    ResourceContext& GetResources() { return *resources_; }
+    void OnWorkersStopped();
+    // An operation of one of its views, or its own end, is on the stack.
+    bool IsInsideOperation() const;
 
   private:
     void CheckParts(const SystemSettings& settings) const;
@@ -76,7 +79,8 @@ class SystemImpl final : public System, public IViewLifetimeTracker {
     ILocalizationManager* localization_;
     ITextTransformationManager* text_transformation_;
     IInternationalizationManager* internationalization_;
-    Vector<View*> views_;
+    Vector<ViewImpl*> views_;
+    bool destroying_ = false;
 };
 
 }  // namespace qorvex

@@ -1,6 +1,8 @@
 // The frame cycle: what Advance does, in order, and what blocks what.
 #include <fresco/scene.h>
 
+#include <cmath>
+
 #include "core/api_call.h"
 #include "core/debug/thread_counting_allocator.h"
 #include "core/frame/frame_graph.h"
@@ -15,6 +17,10 @@ namespace qorvex {
 
 void ViewImpl::Advance(double time) {
     if (!CheckMainThread("View::Advance")) return;
+    if (!services_.tasks->IsRunning()) {
+        LogError("View::Advance called after StopWorkers");
+        return;
+    }
     if (advancing_) {
         LogError("View::Advance called from inside Advance");
         return;
@@ -95,6 +101,11 @@ void ViewImpl::HandleRendererReset() {
 }
 
 void ViewImpl::TakeTime(double time) {
+    // A clock that shows no time would stop every timer for good.
+    if (!std::isfinite(time)) {
+        LogWarning("Time given to Advance is not finite");
+        return;
+    }
     // Compared with the time before the last one, so that one late frame may step back once.
     if (time < previous_time_) {
         LogWarning("Time given to Advance is less than last advance time, last advance time: ",
@@ -144,8 +155,21 @@ void ViewImpl::WaitForPendingFrame() {
 }
 
 void ViewImpl::WaitUntilLayoutIdle() {
-    if (layout_unblocked_.load(std::memory_order_acquire) != 0) return;
-    services_.tasks->Run(TaskChannels::Main, true, &layout_unblocked_, family_.family);
+    while (layout_unblocked_.load(std::memory_order_acquire) == 0) {
+        if (!services_.tasks->IsRunning()) return DropFrameOnLayoutSide();
+        // No thread may be there to serve the layout side (a paused game, a job that has not started yet), and
+        // this one has nothing else to do. The tasks of a frame form a chain: whoever runs one goes on with the
+        // next, so what is not queued now ends without help.
+        services_.tasks->Run(TaskChannels::Layout, false, nullptr, family_.family);
+        services_.tasks->Run(TaskChannels::Main, true, &layout_unblocked_, family_.family);
+    }
+}
+
+// The client has stopped the workers first: what is queued never runs, and what a worker is in must end.
+void ViewImpl::DropFrameOnLayoutSide() {
+    services_.tasks->DestroyFamily(family_.family);
+    frame_queue_.DiscardAll();
+    layout_unblocked_.store(1, std::memory_order_release);
 }
 
 void ViewImpl::CommitFrame(layout::LayoutWork work) {
@@ -180,7 +204,7 @@ RenderFrame& ViewImpl::GetOpenFrame() {
 }
 
 bool ViewImpl::ShouldRecord() const {
-    return rendering_enabled_ && !(wait_for_renderer_ && !has_renderer_.load(std::memory_order_acquire));
+    return rendering_enabled_ && !(wait_for_renderer_ && !link_->HasRenderer());
 }
 
 FrameDataPtr ViewImpl::MakeFrameData() {
@@ -243,6 +267,8 @@ void ViewImpl::PushFrame(layout::LayoutWork work, TaskPtr preload) {
     // A client without worker threads has nobody else to load the glyphs that layout waits for.
     if (has_preload) services_.tasks->Run(TaskChannels::Resources, false, nullptr, family_.family);
     services_.tasks->Run(TaskChannels::Layout, true, &done, family_.family);
+    // A callback has stopped the workers: the frame must not outlive `done`.
+    if (done.load(std::memory_order_acquire) == 0) DropFrameOnLayoutSide();
 }
 
 void ViewImpl::CompleteIdleFrame() {

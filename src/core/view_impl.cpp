@@ -10,6 +10,7 @@
 #include "core/logging/log.h"
 #include "core/main_thread.h"
 #include "layout/fonts/font_manager.h"
+#include "resources/html_cache.h"
 
 namespace qorvex {
 
@@ -41,6 +42,10 @@ bool HasOption(const char* options, std::string_view option) {
 
 ViewImpl::ViewImpl(const ViewSettings& settings, const ViewServices& services, uint32_t family)
     : services_(services),
+      link_(MakeRef<RenderLink>(services.rendering->CreateScene(MakeSceneParams(settings)))),
+      frame_queue_(link_->GetFrames()),
+      stats_(link_->GetStats()),
+      scene_(link_->GetScene()),
       family_{family, services.tasks},
       id_(g_next_view_id++),
       listener_(settings.Listener),
@@ -62,7 +67,6 @@ ViewImpl::ViewImpl(const ViewSettings& settings, const ViewServices& services, u
         LogTrace("Opening task channel ", static_cast<uint32_t>(channel), " on family ", family_.family);
         services_.tasks->OpenChannel(channel, family_.family);
     }
-    scene_ = services_.rendering->CreateScene(MakeSceneParams(settings));
     user_agent_ = std::string_view(Library::GetDefaultUserAgent());
     LogDebug("View created #", id_, " with task family ", family_.family);
     LogDebug("View options: ");
@@ -75,20 +79,25 @@ ViewImpl::~ViewImpl() = default;
 
 void ViewImpl::Destroy() {
     ThreadScope scope;
-    if (api_depth_ != 0) {
+    if (!CheckMainThread("View::Destroy")) return;
+    if (IsInsideOperation()) {
         LogError("View::Destroy must not be called from inside an operation of the view");
         return;
     }
+    // What runs below may call back into the view: nothing new begins, and no second Destroy.
+    ++api_depth_;
+    destroying_ = true;
     timers_.CancelAll();
     UnloadDocumentNow();
+    services_.html_cache->UnsubscribeAll(id_);
     for (TaskChannels channel : kViewChannels)
         LogTrace("Closing task channel ", static_cast<uint32_t>(channel), " on family ", family_.family);
     services_.tasks->DestroyFamily(family_.family);
     open_frame_.reset();
+    // A Paint that waits for the rest of a frame returns.
+    frame_queue_.DiscardAll();
     frame_queue_.ClearFrames();
     render_caches_.ForgetResources();
-    if (scene_) scene_->Destroy();
-    scene_ = nullptr;
     if (services_.lifetime_tracker) services_.lifetime_tracker->OnViewDestroyed(this);
     Delete<MemoryTag::General>(this);
 }

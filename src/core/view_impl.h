@@ -16,9 +16,8 @@
 #include <random>
 
 #include "core/cache_requests.h"
-#include "core/debug/frame_stats_recorder.h"
 #include "core/frame/frame_data.h"
-#include "core/frame/frame_queue.h"
+#include "core/frame/render_link.h"
 #include "core/tasks/timer.h"
 #include "core/url/url.h"
 #include "core/view_services.h"
@@ -136,11 +135,13 @@ class ViewImpl final : public View,
     // --- ITimerClock
     double GetTimerTime() const override { return GetTime(); }
 
-    // --- For the renderer of this view. Render thread.
-    void SetHasRenderer(bool has) { has_renderer_.store(has, std::memory_order_release); }
-    FrameQueue& GetFrameQueue() { return frame_queue_; }
-    fresco::IScene* GetScene() const { return scene_; }
+    // --- For the renderers of this view. Render thread.
+    RenderLink& GetRenderLink() { return *link_; }
     FrameStatsRecorder& GetFrameStats() { return stats_; }
+    // An operation of this view, or its end, is on the stack. Main thread.
+    bool IsInsideOperation() const { return api_depth_ != 0; }
+    // The frame that is on the layout side ends; when the workers have been stopped, it is dropped.
+    void WaitUntilLayoutIdle();
 
     // --- For the debug interfaces and the script globals. Main thread.
     dom::Document* GetDocument() const { return document_.get(); }
@@ -187,13 +188,18 @@ class ViewImpl final : public View,
     void CreateScriptContext();
     void RunInitialScripts();
     void UnloadDocumentNow();
-    void WaitUntilLayoutIdle();
+    void DropFrameOnLayoutSide();
 
     // Reports whether the page may be talked to through the binder.
     bool RequireBinder() const;
     bool RequireDocument() const;
 
     ViewServices services_;
+    // Shared with the renderers; the names below stand for its parts.
+    RefPtr<RenderLink> link_;
+    FrameQueue& frame_queue_;
+    FrameStatsRecorder& stats_;
+    fresco::IScene* const scene_;
     TaskFamilyHandle family_;
     uint32_t id_;
 
@@ -227,6 +233,7 @@ class ViewImpl final : public View,
 
     // Public operations of this view on the stack.
     uint32_t api_depth_ = 0;
+    bool destroying_ = false;
 
     // Frame
     double time_ = 0;
@@ -240,15 +247,11 @@ class ViewImpl final : public View,
     bool force_full_layout_ = false;
     uint32_t requested_frames_ = 0;
     RenderFramePtr open_frame_;
-    FrameQueue frame_queue_;
     dsp::DirtyRegion dirty_region_;
     layout::LayoutUpdatePtr update_;
     layout::FlexAlgorithm flex_algorithm_ = layout::FlexAlgorithm::Yoga;
-    FrameStatsRecorder stats_;
 
     // Rendering
-    std::atomic<bool> has_renderer_{false};
-    fresco::IScene* scene_ = nullptr;
     uint32_t last_rendering_generation_ = 0;
     // Layout thread between commit and the frame's end, main thread while the layout side is idle.
     dsp::RenderCaches render_caches_;

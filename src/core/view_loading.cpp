@@ -29,6 +29,7 @@ void ViewImpl::NavigateTo(const URL& url) {
 }
 
 void ViewImpl::NavigateToURL(std::string_view text) {
+    if (destroying_) return;
     const String copy(text);  // the client's text may not end with a zero, and page code may run below
     if (listener_ && !listener_->OnNavigateTo(copy.c_str())) return;
     URL url;
@@ -138,8 +139,9 @@ void ViewImpl::UnloadDocument() {
 
 void ViewImpl::UnloadDocumentNow() {
     LogDebug("Unloading document from View ", id_);
-    WaitUntilLayoutIdle();
+    // First: answers that come in while this waits belong to loads that were asked for before.
     ++load_number_;
+    WaitUntilLayoutIdle();
     if (document_) {
         document_->GetLoader().StopLoading();
         services_.tasks->Run(TaskChannels::AfterAPICall, false, nullptr, family_.family);

@@ -17,8 +17,15 @@ uint32_t DocumentLoader::LoadAndParseStylesheet(const URL& url, dom::Element& el
     }
     active_stylesheets_.insert_or_assign(id, std::move(waiter));
     const auto document = GetWeakDocument();
-    const bool joined = stylesheet_cache_.Join(absolute, [document, id](RefPtr<css::Stylesheet> sheet) {
-        if (dom::Document* alive = document.get()) GetLoaderOf(*alive).DeliverStylesheet(id, sheet);
+    // The cache speaks inside System::Advance; the page's scripts run inside operations of their view alone.
+    const TaskFamilyHandle family = host_.GetLoaderFamily();
+    const bool joined = stylesheet_cache_.Join(absolute, [family, document,
+                                                          id](RefPtr<css::Stylesheet> loaded) {
+        PushSheet(family, "NewStyleFromFile", std::move(loaded),
+                  [document, id](const RefPtr<css::Stylesheet>& sheet) {
+                      if (dom::Document* alive = document.get())
+                          GetLoaderOf(*alive).DeliverStylesheet(id, sheet);
+                  });
     });
     if (joined) return id;
 
@@ -28,7 +35,7 @@ uint32_t DocumentLoader::LoadAndParseStylesheet(const URL& url, dom::Element& el
         return id;
     }
     if (!IsAllowed(absolute)) {
-        PushSheet(host_.GetLoaderFamily(), "NewStyleFromFile", nullptr,
+        PushSheet(family, "NewStyleFromFile", nullptr,
                   [document, id](const RefPtr<css::Stylesheet>& sheet) {
                       if (dom::Document* alive = document.get())
                           GetLoaderOf(*alive).DeliverStylesheet(id, sheet);

@@ -98,10 +98,26 @@ void HTMLCache::Unsubscribe(uint32_t subscriber, const URL& url) {
 
 void HTMLCache::AbortIfUnwanted(const UrlKey& key, bool was_removed) {
     auto* request = in_flight_.get(key);
-    if (!(*request)->subscribers.empty()) return;
+    if (!request || !(*request)->subscribers.empty()) return;
     if (!was_removed) AssertFailure("Resource request should have been aborted earlier");
-    context_.Abort((*request)->request_id);
+    // Taken out first: the client may answer, or ask for another page, inside the call.
+    const uint32_t id = (*request)->request_id;
     in_flight_.erase(key);
+    context_.Abort(id);
+}
+
+void HTMLCache::AbortUnwanted() {
+    Vector<UrlKey, MemoryTag::Resources> unwanted;
+    for (auto& [key, request] : in_flight_)
+        if (request->subscribers.empty()) unwanted.push_back(key);
+    for (const UrlKey& key : unwanted)
+        AbortIfUnwanted(key, true);
+}
+
+void HTMLCache::UnsubscribeAll(uint32_t subscriber) {
+    for (auto& [key, request] : in_flight_)
+        request->subscribers.erase(subscriber);
+    AbortUnwanted();
 }
 
 bool HTMLCache::Remove(const URL& url) {
@@ -110,13 +126,7 @@ bool HTMLCache::Remove(const URL& url) {
 
 void HTMLCache::Clear() {
     cached_.clear();
-    Vector<UrlKey, MemoryTag::Resources> unwanted;
-    for (auto& [key, request] : in_flight_) {
-        request->subscribers.erase(kPreloadSubscriber);
-        if (request->subscribers.empty()) unwanted.push_back(key);
-    }
-    for (const UrlKey& key : unwanted)
-        AbortIfUnwanted(key, true);
+    UnsubscribeAll(kPreloadSubscriber);
 }
 
 }  // namespace qorvex

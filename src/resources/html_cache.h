@@ -29,6 +29,8 @@ class HTMLCache {
     void Request(const URL& url, uint32_t subscriber, OnLoad on_load, OnError on_error);
     void Preload(const URL& url);
     void Unsubscribe(uint32_t subscriber, const URL& url);
+    // From every request: the subscriber goes.
+    void UnsubscribeAll(uint32_t subscriber);
     bool Remove(const URL& url);
     void Clear();
 
@@ -48,6 +50,7 @@ class HTMLCache {
     void OnParsed(const URL& request_url, const URL& final_url, RefPtr<dom::ParsedHTML> html);
     void OnFailed(const URL& request_url);
     void AbortIfUnwanted(const UrlKey& key, bool was_removed);
+    void AbortUnwanted();
 
     TaskFamilyHandle family_;
     ResourceContext& context_;

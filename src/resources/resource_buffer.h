@@ -18,7 +18,8 @@ class ResourceBuffer : public AtomicRefCounted<ResourceBuffer, MemoryTag::Resour
     explicit ResourceBuffer(bool terminated) : terminated_(terminated) {}
     ~ResourceBuffer();
 
-    // Keeps the old contents up to the smaller size.
+    // Keeps the old contents up to the smaller size. The first size is taken as told; when it grows later it
+    // grows by half, so that an answer in small pieces is not copied over and over.
     uint8_t* Resize(size_t size);
     std::span<const uint8_t> Bytes() const { return {data_, size_}; }
     std::string_view Text() const { return {reinterpret_cast<const char*>(data_), size_}; }
@@ -26,6 +27,7 @@ class ResourceBuffer : public AtomicRefCounted<ResourceBuffer, MemoryTag::Resour
   private:
     uint8_t* data_ = nullptr;
     size_t size_ = 0;
+    size_t capacity_ = 0;
     bool terminated_;
 };
 

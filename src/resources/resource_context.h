@@ -8,6 +8,7 @@
 #include <atomic>
 
 #include "core/tasks/task_system.h"
+#include "resources/client_response.h"
 #include "resources/resource_mapping.h"
 #include "resources/resource_request_job.h"
 #include "resources/resource_stream_request_job.h"
@@ -16,10 +17,12 @@ namespace qorvex {
 
 class ResourceContext : public AtomicRefCounted<ResourceContext, MemoryTag::Resources> {
   public:
-    ResourceContext(IAsyncResourceHandler* handler, bool requests_on_workers)
-        : handler_(handler), requests_on_workers_(requests_on_workers) {}
+    // The pool outlives everything that is requested here.
+    ResourceContext(IAsyncResourceHandler* handler, ClientResponsePool& responses, bool requests_on_workers)
+        : handler_(handler), responses_(responses), requests_on_workers_(requests_on_workers) {}
 
     IAsyncResourceHandler* GetHandler() const { return handler_; }
+    ClientResponsePool& GetResponses() const { return responses_; }
     bool AreRequestsOnWorkers() const { return requests_on_workers_; }
     ResourceMappingTable& GetMappings() { return mappings_; }
     const URL& GetBaseURL() const { return base_url_; }
@@ -43,6 +46,7 @@ class ResourceContext : public AtomicRefCounted<ResourceContext, MemoryTag::Reso
     void CompleteURL(ResourceRequestDescription& description) const;
 
     IAsyncResourceHandler* handler_;
+    ClientResponsePool& responses_;
     ResourceMappingTable mappings_;
     URL base_url_;
     std::atomic<uint32_t> next_id_{0};

@@ -1,7 +1,7 @@
 #include "resources/resource_request_job.h"
 
+#include "core/limits.h"
 #include "core/logging/log.h"
-#include "core/memory/thread_scope.h"
 #include "resources/resource_context.h"
 
 namespace qorvex {
@@ -32,15 +32,13 @@ void ResourceRequestJob::SetCallbacks(ResourceJobCallback on_finished, ResourceJ
 void ResourceRequestJob::Dispatch() {
     LogDebug("Trying to load resource ", GetAbsoluteURL());
     ApplyMapping(context_->GetMappings(), context_->GetBaseURL());
-    AddRef();  // the client's, until Finish
     if (IAsyncResourceHandler* handler = context_->GetHandler())
-        handler->OnResourceRequest(this, this);
+        handler->OnResourceRequest(this, &context_->GetResponses().Open(*this));
     else
         Finish(IAsyncResourceResponse::Status::Failure);
 }
 
 void* ResourceRequestJob::GetSpace(size_t size) {
-    if (finished_) return nullptr;
     if (payload_ == PayloadKind::UserImage) {
         AssertFailure(
             "RecieveUserImage already called. You can use either GetSpace or RecieveUserImage, but not "
@@ -50,6 +48,10 @@ void* ResourceRequestJob::GetSpace(size_t size) {
     if (size == 0 && binary_) {
         buffer_.reset();
         payload_ = PayloadKind::None;
+        return nullptr;
+    }
+    if (size > limits::kMaxResourceBytes) {
+        LogWarning("ResourceRequestJob | Refused ", size, " bytes for ", GetAbsoluteURL());
         return nullptr;
     }
     if (!buffer_) buffer_ = MakeRef<ResourceBuffer>(!binary_);
@@ -68,7 +70,7 @@ void ResourceRequestJob::RecieveUserImage(const UserImageData& image) {
 }
 
 void ResourceRequestJob::SignalDataReceived() {
-    if (on_progress_ && !finished_) on_progress_(*this);
+    if (on_progress_) on_progress_(*this);
 }
 
 void ResourceRequestJob::SetResponseURL(const char* url) {
@@ -86,11 +88,6 @@ void ResourceRequestJob::SetHeader(const char* name, const char* value) {
 }
 
 void ResourceRequestJob::Finish(IAsyncResourceResponse::Status status) {
-    ThreadScope scope;
-    if (finished_.exchange(true)) {
-        LogWarning("ResourceRequestJob | Finished more than once: ", GetAbsoluteURL());
-        return;
-    }
     status_ = status;
     on_finished_(*this);
     if (status == IAsyncResourceResponse::Status::Success)
@@ -100,7 +97,6 @@ void ResourceRequestJob::Finish(IAsyncResourceResponse::Status status) {
     on_finished_ = nullptr;
     on_progress_ = nullptr;
     Discount();
-    Release();
 }
 
 bool ResourceRequestJob::Succeeded() const {

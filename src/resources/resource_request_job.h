@@ -1,8 +1,8 @@
-// One request on its way: what the client reads (the request) and writes (the response) in one object.
+// One request on its way: what the client reads, and what its answer is written to.
 //
-// Invariants: the client holds one reference from the dispatch until Finish; Finish acts once, whatever the
-// client does; the job counts as open work from its making until OnFinished has returned, so that whatever
-// the answer leads to is queued before the job is discounted.
+// Invariants: the client holds one reference from the dispatch until Finish, through a ClientResponse, which
+// sees to it that Finish comes once; the job counts as open work from its making until OnFinished has
+// returned, so that whatever the answer leads to is queued before the job is discounted.
 #pragma once
 
 #include <atomic>
@@ -21,7 +21,6 @@ using ResourceJobPtr = RefPtr<ResourceRequestJob>;
 using ResourceJobCallback = Function<void(ResourceRequestJob&)>;
 
 class ResourceRequestJob final : public AsyncResourceRequest,
-                                 public IAsyncResourceResponse,
                                  public dom::ILoadedResource,
                                  public AtomicRefCounted<ResourceRequestJob, MemoryTag::Resources> {
   public:
@@ -37,14 +36,14 @@ class ResourceRequestJob final : public AsyncResourceRequest,
     // Hands the job to the client's handler; on the main thread, or on a resource thread.
     void Dispatch();
 
-    // --- IAsyncResourceResponse
-    void* GetSpace(size_t size) override;
-    void RecieveUserImage(const UserImageData& image) override;
-    void SignalDataReceived() override;
-    void SetStatus(uint16_t status) override { status_code_ = status; }
-    void SetResponseURL(const char* url) override;
-    void SetHeader(const char* name, const char* value) override;
-    void Finish(IAsyncResourceResponse::Status status) override;
+    // --- The client's answer, as IAsyncResourceResponse tells it. One thread at a time.
+    void* GetSpace(size_t size);
+    void RecieveUserImage(const UserImageData& image);
+    void SignalDataReceived();
+    void SetStatus(uint16_t status) { status_code_ = status; }
+    void SetResponseURL(const char* url);
+    void SetHeader(const char* name, const char* value);
+    void Finish(IAsyncResourceResponse::Status status);
 
     // --- dom::ILoadedResource
     bool Succeeded() const override;
@@ -63,7 +62,6 @@ class ResourceRequestJob final : public AsyncResourceRequest,
   private:
     void Discount();
 
-    std::atomic<bool> finished_{false};
     std::atomic<bool> counted_{true};
     RefPtr<ResourceContext> context_;
     std::optional<uint16_t> status_code_;

@@ -3,7 +3,6 @@
 #include <qorvex/file_system.h>
 
 #include "core/logging/log.h"
-#include "core/memory/thread_scope.h"
 #include "resources/resource_context.h"
 
 namespace qorvex {
@@ -22,7 +21,14 @@ ResourceStreamRequestJob::ResourceStreamRequestJob(ResourceContext& context,
 }
 
 ResourceStreamRequestJob::~ResourceStreamRequestJob() {
+    SetStreamReader(nullptr);
     Discount();
+}
+
+// A reader that is given belongs to the engine, whatever becomes of it.
+void ResourceStreamRequestJob::SetStreamReader(ISyncStreamReader* reader) {
+    if (reader_ && reader_ != reader) reader_->Close();
+    reader_ = reader;
 }
 
 void ResourceStreamRequestJob::Discount() {
@@ -31,19 +37,13 @@ void ResourceStreamRequestJob::Discount() {
 
 void ResourceStreamRequestJob::Dispatch() {
     LogDebug("Trying to load resource stream ", GetAbsoluteURL());
-    AddRef();  // the client's, until Finish
     if (IAsyncResourceHandler* handler = context_->GetHandler())
-        handler->OnResourceStreamRequest(this, this);
+        handler->OnResourceStreamRequest(this, &context_->GetResponses().Open(*this));
     else
         Finish(Status::Failure);
 }
 
 void ResourceStreamRequestJob::Finish(Status status) {
-    ThreadScope scope;
-    if (finished_.exchange(true)) {
-        LogWarning("ResourceRequestJob | Finished more than once: ", GetAbsoluteURL());
-        return;
-    }
     ISyncStreamReader* reader = std::exchange(reader_, nullptr);
     if (reader && status != Status::Success) {
         reader->Close();
@@ -58,7 +58,6 @@ void ResourceStreamRequestJob::Finish(Status status) {
         LogWarning("ResourceRequestJob | Failed loading resource stream: ", GetAbsoluteURL());
     on_finished_ = nullptr;
     Discount();
-    Release();
 }
 
 }  // namespace qorvex

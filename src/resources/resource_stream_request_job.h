@@ -11,9 +11,9 @@ class ResourceContext;
 
 class ResourceStreamRequestJob final
     : public AsyncResourceRequest,
-      public IAsyncResourceStreamResponse,
       public AtomicRefCounted<ResourceStreamRequestJob, MemoryTag::Resources> {
   public:
+    using Status = IAsyncResourceStreamResponse::Status;
     // Gets the reader, which the callee closes when it is done; null after a failure. Any thread.
     using Callback = Function<void(ISyncStreamReader* reader)>;
 
@@ -23,13 +23,13 @@ class ResourceStreamRequestJob final
 
     void Dispatch();
 
-    void SetStreamReader(ISyncStreamReader* reader) override { reader_ = reader; }
-    void Finish(Status status) override;
+    // --- The client's answer, as IAsyncResourceStreamResponse tells it. One thread at a time.
+    void SetStreamReader(ISyncStreamReader* reader);
+    void Finish(Status status);
 
   private:
     void Discount();
 
-    std::atomic<bool> finished_{false};
     std::atomic<bool> counted_{true};
     RefPtr<ResourceContext> context_;
     Callback on_finished_;

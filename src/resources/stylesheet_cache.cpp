@@ -13,8 +13,7 @@ RefPtr<css::Stylesheet> StylesheetCache::Find(const URL& url) const {
 void StylesheetCache::Load(const URL& url) {
     UrlKey key = MakeUrlKey(url);
     if (cached_.contains(key) || in_flight_.contains(key)) return;
-    in_flight_.try_emplace(std::move(key));
-    idle_ = 0;
+    in_flight_.try_emplace(key);
     auto deliver = [this, url](RefPtr<css::Stylesheet> sheet) { OnParsed(url, std::move(sheet)); };
     auto on_finished = [family = family_, &strings = strings_, deliver](ResourceRequestJob& job) {
         const bool loaded = job.Succeeded() && !job.GetData().empty();
@@ -27,24 +26,31 @@ void StylesheetCache::Load(const URL& url) {
         else
             PushSheet(family, "NewStyleFromFile", nullptr, deliver);
     };
-    family_.Push(TaskChannels::Resources,
-                 context_.MakeResourceRequest(DescribeGet(url), std::move(on_finished), {}, false, nullptr));
+    uint32_t id = 0;
+    TaskPtr task = context_.MakeResourceRequest(DescribeGet(url), std::move(on_finished), {}, false, &id);
+    if (InFlightRequest* request = in_flight_.get(key)) request->request_id = id;
+    family_.Push(TaskChannels::Resources, std::move(task));
 }
 
 bool StylesheetCache::Join(const URL& url, OnSheet on_sheet) {
-    auto* waiting = in_flight_.get(MakeUrlKey(url));
-    if (!waiting) return false;
-    waiting->push_back(std::move(on_sheet));
+    InFlightRequest* request = in_flight_.get(MakeUrlKey(url));
+    if (!request) return false;
+    request->waiting.push_back(std::move(on_sheet));
     return true;
+}
+
+void StylesheetCache::AbandonLoads() {
+    const auto abandoned = std::exchange(in_flight_, {});
+    for (const auto& [url, request] : abandoned)
+        context_.Abort(request.request_id);
 }
 
 void StylesheetCache::OnParsed(const URL& url, RefPtr<css::Stylesheet> sheet) {
     UrlKey key = MakeUrlKey(url);
     if (!in_flight_.contains(key)) return;
-    auto waiting = in_flight_.take(key);
-    if (in_flight_.empty()) idle_ = 1;
+    const InFlightRequest request = in_flight_.take(key);
     if (sheet) cached_.insert_or_assign(std::move(key), sheet);
-    for (OnSheet& on_sheet : waiting)
+    for (const OnSheet& on_sheet : request.waiting)
         on_sheet(sheet);
 }
 

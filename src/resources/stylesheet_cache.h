@@ -1,10 +1,9 @@
 // Parsed stylesheets by URL, one cache for each system. Loads that the cache starts itself (preloads) stay in
 // it; a document joins such a load, and otherwise loads for itself.
 //
-// Invariant: main thread only, but for the client's answer, which only pushes ParseCSS.
+// Invariant: main thread only, but for the client's answer, which only pushes ParseCSS; when the cache's family
+// is closed, a late answer reaches nobody.
 #pragma once
-
-#include <atomic>
 
 #include "core/memory/containers.h"
 #include "core/memory/string_pool.h"
@@ -31,19 +30,22 @@ class StylesheetCache {
     bool Remove(const URL& url) { return cached_.erase(MakeUrlKey(url)); }
     void Clear() { cached_.clear(); }
 
-    bool HasRequestsInFlight() const { return !in_flight_.empty(); }
-    // Not 0 while nothing is in flight; a stop flag for TaskSystem::Run.
-    const std::atomic<uint32_t>& GetIdleFlag() const { return idle_; }
+    // Tells the client that nobody wants the sheets that are on their way.
+    void AbandonLoads();
 
   private:
+    struct InFlightRequest {
+        uint32_t request_id = 0;
+        Vector<OnSheet, MemoryTag::Resources> waiting;
+    };
+
     void OnParsed(const URL& url, RefPtr<css::Stylesheet> sheet);
 
     TaskFamilyHandle family_;
     ResourceContext& context_;
     StringPool& strings_;
-    std::atomic<uint32_t> idle_{1};
     HashMap<UrlKey, RefPtr<css::Stylesheet>, MemoryTag::Resources> cached_;
-    HashMap<UrlKey, Vector<OnSheet, MemoryTag::Resources>, MemoryTag::Resources> in_flight_;
+    HashMap<UrlKey, InFlightRequest, MemoryTag::Resources> in_flight_;
 };
 
 }  // namespace qorvex

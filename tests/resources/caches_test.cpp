@@ -86,19 +86,38 @@ TEST_F(CacheTest, SheetsAreJoinedWhileTheyAreOnTheirWay) {
     EXPECT_FALSE(cache.Join(url, [](RefPtr<css::Stylesheet>) {}));
     cache.Load(url);
     cache.Load(url);
-    EXPECT_EQ(cache.GetIdleFlag().load(), 0u);
     EXPECT_TRUE(cache.Join(url, [&](RefPtr<css::Stylesheet> sheet) { joined = sheet.get(); }));
     EXPECT_EQ(files.requests.size(), 1u);
     files.AnswerAll();
     RunTasks();
     ASSERT_NE(joined, nullptr);
     EXPECT_EQ(cache.Find(url).get(), joined);
-    EXPECT_NE(cache.GetIdleFlag().load(), 0u);
     EXPECT_TRUE(cache.Remove(url));
     cache.Load(MakeURL("coui://a/none.css"));
     files.AnswerAll();
     RunTasks();
     EXPECT_EQ(cache.Find(MakeURL("coui://a/none.css")).get(), nullptr);
+}
+
+TEST_F(CacheTest, AbandonedLoadsAreAbortedAndTheirAnswersReachNobody) {
+    StringPool strings;
+    HTMLCache pages(family, *context);
+    StylesheetCache sheets(family, *context, strings);
+    bool joined = false;
+    sheets.Load(MakeURL("coui://a/s.css"));
+    EXPECT_TRUE(sheets.Join(MakeURL("coui://a/s.css"), [&](RefPtr<css::Stylesheet>) { joined = true; }));
+    // A view that asked for several pages, one of them together with another view.
+    for (const char* url : {"coui://a/p.html", "coui://a/q.html"})
+        pages.Request(MakeURL(url), 1, CountLoads(), CountErrors());
+    pages.Request(MakeURL("coui://a/p.html"), 2, CountLoads(), CountErrors());
+    sheets.AbandonLoads();
+    pages.UnsubscribeAll(1);
+    EXPECT_EQ(files.aborted.size(), 2u);
+    files.AnswerAll();
+    RunTasks();
+    EXPECT_FALSE(joined);
+    EXPECT_EQ(sheets.Find(MakeURL("coui://a/s.css")).get(), nullptr);
+    EXPECT_EQ(loads + errors, 1) << "the view that stayed";
 }
 
 }  // namespace

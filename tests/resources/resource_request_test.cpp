@@ -1,4 +1,7 @@
 // The objects that a client's resource handler sees.
+#include <set>
+
+#include "core/limits.h"
 #include "resources/resource_test_support.h"
 
 namespace qorvex {
@@ -19,6 +22,9 @@ class ResourceRequestTest : public ResourceTest {
         files.waiting.pop_back();
         return entry;
     }
+    static ResourceRequestJob& JobOf(const client::Files::Waiting& entry) {
+        return const_cast<ResourceRequestJob&>(static_cast<const ResourceRequestJob&>(*entry.request));
+    }
     std::vector<Status> finished;
     int progress = 0;
 };
@@ -33,14 +39,13 @@ TEST_F(ResourceRequestTest, MappingChangesTheURLAndOffersAlternatives) {
     context->SetBaseURL(MakeURL("coui://ui/index.html"));
     auto entry = Request("images/hero.png");
     EXPECT_EQ(entry.url, "coui://ui/images/hero.dds");
-    auto* job = static_cast<ResourceRequestJob*>(entry.response);
-    const auto alternatives = job->GetAlternativeURLs();
+    const auto alternatives = entry.request->GetAlternativeURLs();
     ASSERT_EQ(alternatives.Count, 2u);
     EXPECT_STREQ(alternatives.URLs[0], "coui://ui/images/hero.ktx");
     EXPECT_STREQ(alternatives.URLs[1], "coui://ui/images/hero.png");
-    job->Finish(Status::Success);
+    entry.response->Finish(Status::Success);
     auto plain = Request("coui://ui/a.txt");
-    EXPECT_EQ(static_cast<ResourceRequestJob*>(plain.response)->GetAlternativeURLs().Count, 0u);
+    EXPECT_EQ(plain.request->GetAlternativeURLs().Count, 0u);
     plain.response->Finish(Status::Success);
 }
 
@@ -54,8 +59,7 @@ TEST_F(ResourceRequestTest, SpaceGrowsShrinksAndEndsWithAZeroForText) {
     EXPECT_STREQ(space, "abcd");
     entry.response->SignalDataReceived();
     EXPECT_EQ(progress, 1);
-    auto* job = static_cast<ResourceRequestJob*>(entry.response);
-    EXPECT_EQ(job->GetData().size(), 4u);
+    EXPECT_EQ(JobOf(entry).GetData().size(), 4u);
     UserImageData image;
     entry.response->RecieveUserImage(image);
     EXPECT_TRUE(log.Contains("GetSpace already called."));
@@ -76,13 +80,58 @@ TEST_F(ResourceRequestTest, SpaceGrowsShrinksAndEndsWithAZeroForText) {
 TEST_F(ResourceRequestTest, FinishActsOnceAndCountsTheOpenRequest) {
     auto entry = Request("coui://a/b.txt");
     EXPECT_EQ(context->GetOpenRequests(), 1u);
-    ResourceJobPtr held(static_cast<ResourceRequestJob*>(entry.response));
     entry.response->Finish(Status::Failure);
     entry.response->Finish(Status::Success);
+    EXPECT_TRUE(log.Contains("ResourceRequestJob | Finished more than once"));
+    EXPECT_EQ(entry.response->GetSpace(8), nullptr);
+    entry.response->SetHeader("a", "b");
+    entry.response->SignalDataReceived();
+    EXPECT_TRUE(log.Contains("ResourceRequestJob | SignalDataReceived after Finish does nothing"));
     EXPECT_EQ(finished, std::vector<Status>{Status::Failure});
     EXPECT_EQ(context->GetOpenRequests(), 0u);
     EXPECT_TRUE(log.Contains("ResourceRequestJob | Failed loading resource: coui://a/b.txt"));
     EXPECT_FALSE(log.Contains("ResourceRequestJob | Loaded resource"));
+}
+
+TEST_F(ResourceRequestTest, FinishedResponsesStayLongAndThenServeOthers) {
+    auto first = Request("coui://a/first.txt");
+    first.response->Finish(Status::Success);
+    std::set<IAsyncResourceResponse*> seen;
+    for (size_t i = 0; i < 4 * limits::kFinishedResponses; ++i) {
+        auto entry = Request("coui://a/b.txt");
+        if (i < limits::kFinishedResponses) {
+            EXPECT_NE(entry.response, first.response);
+        }
+        seen.insert(entry.response);
+        entry.response->Finish(Status::Success);
+    }
+    EXPECT_EQ(seen.size(), limits::kFinishedResponses + 1) << "the oldest comes back, and no more are made";
+    first.response->Finish(Status::Success);
+    EXPECT_EQ(log.Count("Finished more than once"), 1u);
+}
+
+TEST_F(ResourceRequestTest, UnfinishedRequestsGoWithTheLibrary) {
+    const auto entry = Request("coui://a/never.txt");
+    EXPECT_EQ(JobOf(entry).RefCount(), 1u) << "the client's";
+    EXPECT_NE(entry.response->GetSpace(100), nullptr);
+}
+
+// A block for the answer in one-byte pieces is not made anew for each; a length beyond reason is refused.
+TEST_F(ResourceRequestTest, PiecesAndWrongLengths) {
+    auto entry = Request("coui://a/b.txt");
+    constexpr size_t kBytes = 4096;
+    const uint64_t before = allocator.requests();
+    for (size_t i = 1; i <= kBytes; ++i)
+        static_cast<char*>(entry.response->GetSpace(i))[i - 1] = static_cast<char>('a' + i % 26);
+    EXPECT_LT(allocator.requests() - before, 40u);
+    EXPECT_EQ(entry.response->GetSpace(SIZE_MAX), nullptr);
+    EXPECT_EQ(entry.response->GetSpace(limits::kMaxResourceBytes + 1), nullptr);
+    EXPECT_EQ(log.Count("ResourceRequestJob | Refused "), 2u);
+    const auto data = JobOf(entry).GetData();
+    ASSERT_EQ(data.size(), kBytes);
+    EXPECT_EQ(data[kBytes - 1], 'a' + kBytes % 26);
+    EXPECT_EQ(data.data()[kBytes], 0);
+    entry.response->Finish(Status::Success);
 }
 
 TEST_F(ResourceRequestTest, RequestAnswersAsItWasDescribed) {

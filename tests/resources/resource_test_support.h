@@ -28,10 +28,12 @@ class ResourceTest : public testing::Test {
         family = TaskFamilyHandle{1, tasks};
         tasks->OpenChannel(TaskChannels::Main, 1);
         tasks->OpenChannel(TaskChannels::Resources, 1);
-        context = MakeRef<ResourceContext>(&files, false);
+        responses = MakeUnique<ClientResponsePool, MemoryTag::Resources>();
+        context = MakeRef<ResourceContext>(&files, *responses, false);
     }
     ~ResourceTest() override {
         context.reset();
+        responses.reset();
         tasks->DestroyFamily(1);
         Delete<MemoryTag::General>(tasks);
         css::DestroyDefaultStyles();
@@ -59,6 +61,7 @@ class ResourceTest : public testing::Test {
     client::Files files;
     TaskSystem* tasks = nullptr;
     TaskFamilyHandle family;
+    UniquePtr<ClientResponsePool, MemoryTag::Resources> responses;
     RefPtr<ResourceContext> context;
 };
 

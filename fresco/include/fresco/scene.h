@@ -113,10 +113,11 @@ class IScene {
     virtual void SetCustomCompositor(ICustomCompositor* compositor) = 0;
     virtual void SetCustomEffectRenderer(ICustomEffectRenderer* renderer) = 0;
     virtual SceneStats GetStats() const = 0;
-    // Everything that the scene alone holds; the library's images and surfaces stay.
+    // Everything that the scene alone holds, the surfaces that its buffers made included; images stay.
     virtual void FreeResources() = 0;
     // The last call on the render thread: what is in flight is done when it returns.
     virtual void Finish() = 0;
+    // Any thread. What the scene holds goes with it, or with the next work on the render thread.
     virtual void Destroy() = 0;
 
   protected:

@@ -25,7 +25,7 @@ double PaintedArea(const dsp::FrameRecord& record) {
 void ExecutePaint(HeldRecord& held, fresco::IScene& scene, FrameStatsRecorder& stats, uint32_t frame_id) {
     StageTimer timer(stats, frame_id, &FrameStats::Paint);
     dsp::FrameRecord& record = held.record;
-    if (record.buffers.empty() && record.resourceBuffers.empty()) {
+    if (record.Empty()) {
         AssertFailure("Missing command buffer for paint!");
         return;
     }

@@ -4,20 +4,31 @@
 
 #include "core/logging/log.h"
 #include "core/memory/thread_scope.h"
+#include "core/render/renderer_registry.h"
 #include "core/render/view_renderer_impl.h"
 #include "core/view_impl.h"
 
 namespace qorvex {
 
+SystemRendererImpl::SystemRendererImpl(fresco::IRenderingLibrary& rendering, RendererRegistry& registry,
+                                       bool debug_names, bool external)
+    : debug_names_(debug_names),
+      rendering_(rendering),
+      registry_(registry),
+      external_rendering_library_(external) {
+    registry_.Add(this);
+}
+
 ViewRenderer* SystemRendererImpl::CreateViewRenderer(View* view) {
     ThreadScope scope;
     // A rendering library may refuse a scene; such a view cannot be drawn.
-    if (!view || !static_cast<ViewImpl&>(*view).GetScene()) return nullptr;
-    return New<ViewRendererImpl, MemoryTag::General>(static_cast<ViewImpl&>(*view));
+    if (!view || !static_cast<ViewImpl&>(*view).GetRenderLink().GetScene()) return nullptr;
+    return New<ViewRendererImpl, MemoryTag::General>(static_cast<ViewImpl&>(*view), registry_);
 }
 
 void SystemRendererImpl::Destroy() {
     ThreadScope scope;
+    registry_.Remove(this);
     Delete<MemoryTag::General>(this);
 }
 

@@ -11,10 +11,12 @@ class IRenderingLibrary;
 
 namespace qorvex {
 
+class RendererRegistry;
+
 class SystemRendererImpl final : public SystemRenderer {
   public:
-    SystemRendererImpl(fresco::IRenderingLibrary& rendering, bool debug_names, bool external)
-        : debug_names_(debug_names), rendering_(rendering), external_rendering_library_(external) {}
+    SystemRendererImpl(fresco::IRenderingLibrary& rendering, RendererRegistry& registry, bool debug_names,
+                       bool external);
     ~SystemRendererImpl() override = default;
 
     ViewRenderer* CreateViewRenderer(View* view) override;
@@ -25,6 +27,7 @@ class SystemRendererImpl final : public SystemRenderer {
   private:
     bool debug_names_;
     fresco::IRenderingLibrary& rendering_;
+    RendererRegistry& registry_;
     bool external_rendering_library_;
 };
 

@@ -3,9 +3,9 @@
 #include <fresco/library.h>
 #include <fresco/scene.h>
 
-#include "core/frame/frame_queue.h"
 #include "core/logging/log.h"
 #include "core/memory/thread_scope.h"
+#include "core/render/renderer_registry.h"
 #include "core/view_impl.h"
 
 namespace qorvex {
@@ -25,12 +25,14 @@ PaintStatus DrawReadyTasks(RenderFrame& frame, TaskFamilyHandle family, uint32_t
 
 }  // namespace
 
-ViewRendererImpl::ViewRendererImpl(ViewImpl& view)
-    : view_(view),
-      family_(view.GetTaskFamily()),
-      scene_(*view.GetScene()),
-      frame_queue_(view.GetFrameQueue()) {
-    view_.SetHasRenderer(true);
+ViewRendererImpl::ViewRendererImpl(ViewImpl& view, RendererRegistry& registry)
+    : registry_(registry),
+      link_(&view.GetRenderLink()),
+      frame_queue_(link_->GetFrames()),
+      scene_(*link_->GetScene()),
+      family_(view.GetTaskFamily()) {
+    link_->CountRenderer(+1);
+    registry_.Add(this);
 }
 
 PaintStatus ViewRendererImpl::Paint(unsigned frame_id, bool wait_for_completion) {
@@ -98,7 +100,8 @@ void ViewRendererImpl::ReleaseTextures() {
 
 void ViewRendererImpl::Destroy() {
     ThreadScope scope;
-    view_.SetHasRenderer(false);
+    registry_.Remove(this);
+    link_->CountRenderer(-1);
     frame_queue_.ClearFrames();
     ReleaseTextures();
     scene_.SetRenderTarget(nullptr, nullptr, fresco::RenderTargetDescription());

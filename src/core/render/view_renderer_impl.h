@@ -1,24 +1,22 @@
-// Draws the frames of one view. Render thread only. The view outlives it.
+// Draws the frames of one view. Render thread only. It may outlive the view, and then finds no frame.
 #pragma once
 
 #include <fresco/command_buffer.h>
 #include <qorvex/renderers.h>
 
+#include "core/frame/render_link.h"
 #include "core/memory/containers.h"
 #include "core/tasks/task_system.h"
 
-namespace fresco {
-class IScene;
-}
-
 namespace qorvex {
 
-class FrameQueue;
+class RendererRegistry;
 class ViewImpl;
 
 class ViewRendererImpl final : public ViewRenderer {
   public:
-    explicit ViewRendererImpl(ViewImpl& view);
+    // The view has a scene.
+    ViewRendererImpl(ViewImpl& view, RendererRegistry& registry);
     ~ViewRendererImpl() override = default;
 
     void Destroy() override;
@@ -31,10 +29,11 @@ class ViewRendererImpl final : public ViewRenderer {
   private:
     void ReleaseTextures();
 
-    ViewImpl& view_;
-    TaskFamilyHandle family_;
-    fresco::IScene& scene_;
+    RendererRegistry& registry_;
+    RefPtr<RenderLink> link_;
     FrameQueue& frame_queue_;
+    fresco::IScene& scene_;
+    TaskFamilyHandle family_;
     // Images that went while their frame was being drawn.
     Vector<fresco::ImageId, MemoryTag::Rendering> textures_to_release_;
 };

@@ -127,6 +127,7 @@ class Files final : public qorvex::IAsyncResourceHandler {
     struct Waiting {
         unsigned id;
         std::string url;
+        const qorvex::IAsyncResourceRequest* request;  // until the answer
         qorvex::IAsyncResourceResponse* response;
     };
 
@@ -137,7 +138,7 @@ class Files final : public qorvex::IAsyncResourceHandler {
         std::unique_lock<std::mutex> lock(mutex_);
         requests.push_back(request->GetAbsoluteURL());
         if (deferred_) {
-            waiting.push_back({request->GetId(), request->GetAbsoluteURL(), response});
+            waiting.push_back({request->GetId(), request->GetAbsoluteURL(), request, response});
             return;
         }
         const std::string url = request->GetAbsoluteURL();
