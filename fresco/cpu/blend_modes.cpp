@@ -170,4 +170,14 @@ uint32_t BlendPixel(uint32_t mode, uint32_t src, uint32_t dst) {
                      std::min(alpha, join(s.b, d.b, mixed.b)), alpha);
 }
 
+void BlendModeRow(uint32_t mode, uint32_t* dst, const uint32_t* src, int count, const uint8_t* mask,
+                  uint8_t coverage) {
+    for (int i = 0; i < count; ++i) {
+        const uint32_t c = mask ? mask[i] : coverage;
+        if (c == 0) continue;
+        const uint32_t result = BlendPixel(mode, src[i], dst[i]);
+        dst[i] = c == 255 ? result : ScalePixel(result, c) + ScalePixel(dst[i], 255 - c);
+    }
+}
+
 }  // namespace fresco::cpu

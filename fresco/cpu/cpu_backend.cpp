@@ -47,6 +47,17 @@ void CpuBackend::Touch(const IRect& rect) {
     }
 }
 
+bool CpuBackend::IsOutside(const Rect& rect, const Homography& plane) const {
+    const IRect& c = clip_.bounds();
+    if (c.IsEmpty()) return true;
+    if (!plane.IsScaleTranslate()) return false;
+    const Vec2 a = plane.Apply(rect.x, rect.y);
+    const Vec2 b = plane.Apply(double(rect.x) + rect.width, double(rect.y) + rect.height);
+    // A pixel more than needed: what lies on an edge may be rounded onto it.
+    return std::max(a.x, b.x) < c.x0 - 1 || std::min(a.x, b.x) > c.x1 + 1 || std::max(a.y, b.y) < c.y0 - 1 ||
+           std::min(a.y, b.y) > c.y1 + 1;
+}
+
 Ink CpuBackend::SolidInk(const Paint& paint) const {
     Ink ink;
     const float alpha = std::clamp(paint.color.a * paint.opacity, 0.0f, 1.0f);

@@ -64,6 +64,8 @@ class CpuBackend final : public Backend {
     Homography PlaneAt(float z) const { return Homography::FromMatrix(transform_, z); }
     Bitmap CurrentBitmap() const;
     void Touch(const IRect& rect);
+    // True when an upright rectangle lies wholly outside of the clip: most draws of a small repaint end here.
+    bool IsOutside(const Rect& rect, const Homography& plane) const;
 
     // --- drawing
     Ink SolidInk(const Paint& paint) const;

@@ -20,8 +20,8 @@ CornerRadii Outset(const CornerRadii& radii, float by) {
 
 void CpuBackend::DrawRect(const Rect& rect, const Ink& ink) {
     EndScissors();
-    if (ink.DrawsNothing() || clip_.IsEmpty()) return;
     const Homography plane = PlaneAt(rect.z);
+    if (ink.DrawsNothing() || IsOutside(rect, plane)) return;
     IRect aligned;
     if (AlignedRect(rect, plane, &aligned)) return FillAligned(aligned, ink);
     path_.Clear();
@@ -74,14 +74,16 @@ void CpuBackend::FillQuad(const FillQuadRecord& record, const NoneTail&) {
 }
 
 void CpuBackend::FillRoundedRect(const FillRoundedRectRecord& record, const NoneTail&) {
+    const Homography plane = PlaneAt(record.rect.z);
+    if (IsOutside(record.rect, plane)) return EndScissors();
     path_.Clear();
     path_.AddRoundedRect(record.rect, record.radii);
-    DrawOutline(path_, PlaneAt(record.rect.z), kFillNonZero, SolidInk(record.paint));
+    DrawOutline(path_, plane, kFillNonZero, SolidInk(record.paint));
 }
 
 void CpuBackend::StrokeRoundedRect(const StrokeRoundedRectRecord& record, const NoneTail&) {
     const float half = record.paint.strokeWidth / 2;
-    if (!(half > 0)) return;
+    if (!(half > 0) || IsOutside(Outset(record.rect, half), PlaneAt(record.rect.z))) return EndScissors();
     const Rect inner = Outset(record.rect, -half);
     path_.Clear();
     path_.AddRoundedRect(Outset(record.rect, half), Outset(record.radii, half));
@@ -138,10 +140,10 @@ void CpuBackend::DrawGradient(const Rect& rect, const Paint& paint, const StopsT
     const float unit = std::max(std::abs(rect.width), std::abs(rect.height));
     Homography toDevice = PlaneAt(rect.z), place, toUnit;
     place.xx = place.yy = unit, place.x0 = rect.x, place.y0 = rect.y;
-    if (!(unit > 0) || !(toDevice * place).Invert(&toUnit)) return;
-    gradient_.Build(stops.stops, stops.count, std::clamp(paint.color.a * paint.opacity, 0.0f, 1.0f));
+    if (!(unit > 0) || IsOutside(rect, toDevice) || !(toDevice * place).Invert(&toUnit)) return;
     GradientSource source =
         linear ? GradientSource(*linear, toUnit, gradient_) : GradientSource(*radial, toUnit, gradient_);
+    source.SetStops(stops.stops, stops.count, std::clamp(paint.color.a * paint.opacity, 0.0f, 1.0f));
     Ink ink;
     ink.source = &source;
     ink.blend = paint.blend;

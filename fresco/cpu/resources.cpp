@@ -30,8 +30,7 @@ void Halve(const PixelBuffer& from, PixelBuffer* to) {
 
 }  // namespace
 
-const PixelBuffer& Texture::Level(double scale, int* shift) {
-    *shift = 0;
+const PixelBuffer& Texture::Level(double scale) {
     if (!(scale < 0.5)) return pixels;
     if (!levelsValid) {
         levels.clear();
@@ -48,10 +47,8 @@ const PixelBuffer& Texture::Level(double scale, int* shift) {
     }
     // The smallest level that is still shrunk, but by less than one half.
     const PixelBuffer* level = &pixels;
-    while (scale < 0.5 && size_t(*shift) < levels.size()) {
-        level = &levels[size_t((*shift)++)];
-        scale *= 2;
-    }
+    for (size_t i = 0; scale < 0.5 && i < levels.size(); ++i, scale *= 2)
+        level = &levels[i];
     return *level;
 }
 

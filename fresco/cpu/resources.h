@@ -18,7 +18,7 @@ struct Texture {
     bool levelsValid = false;
 
     // The level for a draw that shows `scale` device pixels a texel.
-    const PixelBuffer& Level(double scale, int* shift);
+    const PixelBuffer& Level(double scale);
 };
 
 class Resources {
