@@ -21,6 +21,7 @@ class HudFresco {
     fresco::CommandBuffer* Record(const fresco::Rect* dirty) const;
     void Draw(fresco::CommandBuffer* frame) { scene_->ExecuteBackEnd(&frame, 1); }
     const HudScene& hud() const { return hud_; }
+    fresco::IRenderingLibrary& library() { return *library_; }
     fresco::IScene& scene() { return *scene_; }
     const std::vector<std::uint32_t>& pixels() const { return pixels_; }
 

@@ -3,7 +3,10 @@
 #include <benchmark/benchmark.h>
 #include <fresco/library.h>
 
+#include <condition_variable>
 #include <cstring>
+#include <mutex>
+#include <thread>
 
 #include "hud_cairo.h"
 #include "hud_fresco.h"
@@ -54,11 +57,72 @@ void PaintHud(benchmark::State& state) {
 }
 BENCHMARK(PaintHud)->Name("paint_hud")->Unit(benchmark::kMicrosecond);
 
+// One thread beside the painting one, as a client lends it.
+class OneHelper final : public fresco::IPaintHelpers {
+  public:
+    OneHelper() : thread_([this] { Serve(); }) {}
+    ~OneHelper() override {
+        {
+            const std::lock_guard lock(mutex_);
+            stopping_ = true;
+        }
+        arrived_.notify_one();
+        thread_.join();
+        if (work_) work_->Release();
+    }
+    std::uint32_t GetCount() override { return 1; }
+    void Post(fresco::IPaintWork* work) override {
+        fresco::IPaintWork* old = nullptr;
+        {
+            const std::lock_guard lock(mutex_);
+            old = std::exchange(work_, work);
+        }
+        if (old) old->Release();
+        arrived_.notify_one();
+    }
+
+  private:
+    void Serve() {
+        std::unique_lock lock(mutex_);
+        while (!stopping_) {
+            fresco::IPaintWork* work = std::exchange(work_, nullptr);
+            if (!work) {
+                arrived_.wait(lock);
+                continue;
+            }
+            lock.unlock();
+            work->Run();
+            work->Release();
+            lock.lock();
+        }
+    }
+
+    std::mutex mutex_;
+    std::condition_variable arrived_;
+    fresco::IPaintWork* work_ = nullptr;
+    bool stopping_ = false;
+    std::thread thread_;
+};
+
+void PaintHudHelped(benchmark::State& state) {
+    HudFresco& painter = Fresco();
+    OneHelper helper;
+    painter.library().SetPaintHelpers(&helper);
+    fresco::CommandBuffer* frame = painter.Record(nullptr);
+    for (auto _ : state)
+        painter.Draw(frame);
+    state.counters["target"] = 0.2;
+    frame->Release();
+    painter.library().SetPaintHelpers(nullptr);
+}
+BENCHMARK(PaintHudHelped)->Name("paint_hud_helped")->Unit(benchmark::kMicrosecond)->UseRealTime();
+
 void PaintHudCairo(benchmark::State& state) {
     for (auto _ : state)
         Cairo().Paint();
 }
 BENCHMARK(PaintHudCairo)->Name("paint_hud_baseline")->Unit(benchmark::kMicrosecond);
+BENCHMARK(PaintHudCairo)->Name("paint_hud_helped_baseline")->Unit(benchmark::kMicrosecond)->UseRealTime();
 
 void PaintDirty(benchmark::State& state) {
     HudFresco& painter = Fresco();

@@ -12,7 +12,7 @@ void CpuBackend::BeginTarget(SurfaceId surface) {
         root_ = surface_ ? surface_->pixels.View(0, 0) : Bitmap{};
     }
     transform_ = Matrix4{};
-    clip_ = Clip(root_.bounds);
+    clip_ = Clip(surface == kNoId ? Intersect(root_.bounds, band_) : root_.bounds);
     base_ = clip_;
     scissor_ = false;
     saved_.clear();

@@ -4,6 +4,7 @@
 // Its files: cpu_backend.cpp (targets, state), clip_commands.cpp, draw_shapes.cpp, draw_images.cpp,
 // draw_text.cpp, layers.cpp.
 #pragma once
+#include <fresco/paint_helpers.h>
 #include <fresco/scene.h>
 #include "fresco/backend/backend.h"
 #include "fresco/cpu/clip.h"
@@ -15,23 +16,28 @@
 
 namespace fresco::cpu {
 
-// What all scenes of a library share; render thread only.
+// What all scenes of a library share. Frames change it on the render thread; while several threads paint
+// bands of one, each part takes its own lock.
 struct SharedState {
+    IPaintHelpers* helpers = nullptr;
     FontService fonts;
     Resources resources;
     GlyphCache glyphs;
     LayerPool layers;
-    HashMap<uint64_t, Texture> colorGlyphs;
 };
 
 class CpuBackend final : public Backend {
   public:
     explicit CpuBackend(SharedState& shared) : shared_(shared) {}
 
-    void SetRenderTarget(const Bitmap& bitmap) { target_ = bitmap; }
+    void SetRenderTarget(const Bitmap& bitmap) { target_ = bitmap, band_ = bitmap.bounds; }
+    // Only this part of the target is painted.
+    void SetBand(const IRect& band) { band_ = band; }
     const Bitmap& GetRenderTarget() const { return target_; }
     void SetCustomCompositor(ICustomCompositor* compositor) { compositor_ = compositor; }
     void SetCustomEffectRenderer(ICustomEffectRenderer* renderer) { effectRenderer_ = renderer; }
+    bool HasCustomCompositor() const { return compositor_ != nullptr; }
+    bool HasCustomEffectRenderer() const { return effectRenderer_ != nullptr; }
     SceneStats& stats() { return stats_; }
 
     void Execute(const StreamSource& stream) override;
@@ -81,7 +87,8 @@ class CpuBackend final : public Backend {
 
     // --- text
     void DrawRun(const GlyphRunParams& run, const Glyph* glyphs, uint32_t count, bool stroke);
-    void DrawGlyphBitmap(const FontFace& face, uint32_t glyph, float size, Vec2 at, const Ink& ink);
+    void DrawCachedRun(const FontFace& face, const GlyphRunParams& run, const Glyph* glyphs, uint32_t count,
+                       const Homography& plane, const Ink& ink);
     bool DrawColorGlyph(const FontFace& face, uint32_t glyph, float size, Point at, const Paint& paint);
 
     // --- clips
@@ -106,6 +113,7 @@ class CpuBackend final : public Backend {
 
     SharedState& shared_;
     Bitmap target_;  // the scene's
+    IRect band_;
     const StreamSource* stream_ = nullptr;
     Texture* surface_ = nullptr;  // the stream's target when it is a surface
     Bitmap root_;                 // target of the stream, below all layers
@@ -125,6 +133,7 @@ class CpuBackend final : public Backend {
     Vector<uint32_t> codePoints_, glyphIndices_;
     Vector<float> advances_;
     Vector<Glyph> glyphs_;
+    Vector<PlacedGlyph> placed_;
 
     ICustomCompositor* compositor_ = nullptr;
     ICustomEffectRenderer* effectRenderer_ = nullptr;

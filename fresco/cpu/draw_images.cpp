@@ -10,7 +10,7 @@ void CpuBackend::DrawTexture(Texture& texture, const Rect& area, const ImageSour
     Homography toPlane;
     const Homography plane = PlaneAt(area.z);
     if (!(alpha > 0) || IsOutside(area, plane) || !plane.Invert(&toPlane)) return;
-    ImageSource source(texture, placement, toPlane, alpha);
+    ImageSource source(shared_.resources, texture, placement, toPlane, alpha);
     Ink ink;
     ink.source = &source;
     ink.blend = paint.blend;
@@ -94,7 +94,7 @@ void CpuBackend::WithEffectSource(uint32_t kind, const uint8_t* data, const Homo
             }
             placement.repeatX = pattern.repeat == kRepeatBoth || pattern.repeat == kRepeatX;
             placement.repeatY = pattern.repeat == kRepeatBoth || pattern.repeat == kRepeatY;
-            ImageSource source(*texture, placement, toPlane, opacity);
+            ImageSource source(shared_.resources, *texture, placement, toPlane, opacity);
             // Where a pattern does not repeat there is nothing beside its one row or column.
             WindowSource window(source, toPlane, placement);
             return use(window);
@@ -165,7 +165,7 @@ void CpuBackend::MaskLayer(Texture* texture, const Rect& area, const ImageSource
         }
     };
     if (!visible) return apply(nullptr);
-    ImageSource source(*texture, placement, toPlane, 1);
+    ImageSource source(shared_.resources, *texture, placement, toPlane, 1);
     apply(&source);
 }
 

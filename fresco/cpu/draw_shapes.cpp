@@ -35,9 +35,11 @@ void CpuBackend::ClearRect(const ClearRectRecord& record, const NoneTail&) {
     if (record.flag & 1) {
         EndScissors();
         const Bitmap bitmap = CurrentBitmap();
-        for (int y = bitmap.bounds.y0; y < bitmap.bounds.y1; ++y) {
-            std::memset(bitmap.Row(y) + bitmap.bounds.x0, 0, size_t(bitmap.bounds.Width()) * 4);
-        }
+        const bool onTarget = bitmap.data == target_.data;
+        const IRect area = onTarget ? Intersect(bitmap.bounds, band_) : bitmap.bounds;
+        for (int y = area.y0; y < area.y1; ++y)
+            std::memset(bitmap.Row(y) + area.x0, 0, size_t(area.Width()) * 4);
+        Touch(area);
         return;
     }
     DrawRect(record.rect, ink);

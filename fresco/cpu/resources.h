@@ -1,5 +1,7 @@
-// Images and surfaces by id, for all scenes of a library. Render thread only.
+// Images and surfaces by id, for all scenes of a library. Render thread only, but for what says so.
 #pragma once
+#include <mutex>
+
 #include <fresco/command_records.h>
 #include "fresco/cpu/pixels.h"
 
@@ -16,16 +18,18 @@ struct Texture {
     const UserImage* user = nullptr;
     Vector<PixelBuffer> levels;  // half sizes, from the second level on
     bool levelsValid = false;
-
-    // The level for a draw that shows `scale` device pixels a texel.
-    const PixelBuffer& Level(double scale);
+    uint64_t readIn = 0;  // the frame in which a user image was read last
 };
 
 class Resources {
   public:
-    // Null when absent. User images are read anew.
+    // From here on user images are read anew, each at its first use.
+    void BeginFrame() { ++frame_; }
+    // Null when absent. Any thread that paints.
     Texture* FindImage(ImageId id);
     Texture* FindSurface(SurfaceId id);
+    // The level for a draw that shows `scale` device pixels a texel. Any thread that paints.
+    const PixelBuffer& FindLevel(Texture& texture, double scale);
     void CreateImage(const CreateImageRecord& record, const void* pixels, size_t size);
     void UpdateImage(const UpdateImageRecord& record, const void* pixels, size_t size);
     void DestroyImage(ImageId id) { images_.erase(id); }
@@ -39,6 +43,8 @@ class Resources {
   private:
     void Load(Texture& texture, const uint8_t* pixels, size_t pitch);
 
+    std::mutex mutex_;  // what painting threads change: user images and levels
+    uint64_t frame_ = 1;
     HashMap<ImageId, Texture> images_;
     HashMap<SurfaceId, Texture> surfaces_;
 };

@@ -174,7 +174,7 @@ const uint32_t* GradientSource::Fetch(int x, int y, int count, uint32_t* room) {
     return out;
 }
 
-ImageSource::ImageSource(Texture& texture, const Placement& placement, const Homography& toPlane,
+ImageSource::ImageSource(Resources& resources, Texture& texture, const Placement& placement, const Homography& toPlane,
                          float opacity)
     : alpha_(uint32_t(std::clamp(opacity, 0.0f, 1.0f) * 255 + 0.5f)) {
     Rect source = placement.source;
@@ -189,7 +189,7 @@ ImageSource::ImageSource(Texture& texture, const Placement& placement, const Hom
         Affine(1, -double(source.x), 1, -double(source.y)) * Affine(sx, target.x, sy, target.y) * toPlane;
 
     const double texelsAPixel = toTexels.MaxScale(target.x, target.y);
-    level_ = &texture.Level(1 / std::max(texelsAPixel, 1e-9));
+    level_ = &resources.FindLevel(texture, 1 / std::max(texelsAPixel, 1e-9));
     // Odd sizes round up, so a level's scale is the ratio of the sizes.
     const double levelX = double(level_->width()) / texture.width,
                  levelY = double(level_->height()) / texture.height;
