@@ -16,6 +16,14 @@ CornerRadii Outset(const CornerRadii& radii, float by) {
     return {grow(radii.topLeft), grow(radii.topRight), grow(radii.bottomRight), grow(radii.bottomLeft)};
 }
 
+// Corners that are larger than the box reach out of it.
+Rect BoundsOf(const Rect& rect, const CornerRadii& radii) {
+    float most = 0;
+    for (const Point& r : {radii.topLeft, radii.topRight, radii.bottomRight, radii.bottomLeft})
+        most = std::max({most, r.x, r.y});
+    return most * 2 <= std::min(rect.width, rect.height) ? rect : Outset(rect, most);
+}
+
 }  // namespace
 
 void CpuBackend::DrawRect(const Rect& rect, const Ink& ink) {
@@ -77,7 +85,7 @@ void CpuBackend::FillQuad(const FillQuadRecord& record, const NoneTail&) {
 
 void CpuBackend::FillRoundedRect(const FillRoundedRectRecord& record, const NoneTail&) {
     const Homography plane = PlaneAt(record.rect.z);
-    if (IsOutside(record.rect, plane)) return EndScissors();
+    if (IsOutside(BoundsOf(record.rect, record.radii), plane)) return EndScissors();
     path_.Clear();
     path_.AddRoundedRect(record.rect, record.radii);
     DrawOutline(path_, plane, kFillNonZero, SolidInk(record.paint));
@@ -85,7 +93,8 @@ void CpuBackend::FillRoundedRect(const FillRoundedRectRecord& record, const None
 
 void CpuBackend::StrokeRoundedRect(const StrokeRoundedRectRecord& record, const NoneTail&) {
     const float half = record.paint.strokeWidth / 2;
-    if (!(half > 0) || IsOutside(Outset(record.rect, half), PlaneAt(record.rect.z))) return EndScissors();
+    const Rect reach = Outset(BoundsOf(record.rect, record.radii), half);
+    if (!(half > 0) || IsOutside(reach, PlaneAt(record.rect.z))) return EndScissors();
     const Rect inner = Outset(record.rect, -half);
     path_.Clear();
     path_.AddRoundedRect(Outset(record.rect, half), Outset(record.radii, half));
