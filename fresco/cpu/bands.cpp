@@ -113,9 +113,7 @@ bool CanPaintInBands(CommandBuffer* const* buffers, uint32_t count, const CpuBac
 }
 
 IRect BandJob::BandAt(uint32_t band) const {
-    const auto edge = [&](uint32_t i) {
-        return area_.y0 + int(int64_t(area_.Height()) * i / bands_);
-    };
+    const auto edge = [&](uint32_t i) { return area_.y0 + int(int64_t(area_.Height()) * i / bands_); };
     return {area_.x0, edge(band), area_.x1, edge(band + 1)};
 }
 

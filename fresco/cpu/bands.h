@@ -1,5 +1,5 @@
-// A frame in horizontal bands, painted by several threads. Each band is a partial repaint of the whole stream,
-// and those are exact: so the picture is the same however it is cut and whoever paints.
+// A frame in horizontal bands, painted by several threads. Each band is a partial repaint of the whole
+// stream, and those are exact: so the picture is the same however it is cut and whoever paints.
 #pragma once
 #include <atomic>
 

@@ -51,7 +51,8 @@ class CpuBackend final : public Backend {
     };
     struct Layer {
         PixelBuffer pixels;
-        IRect bounds, touched;
+        IRect bounds, touched, cleared;
+        uint32_t filters = 0;    // how many of its filters apply
         bool collapsed = false;  // without pixels of its own: draws go to the parent
         uint32_t flags = 0;
         LayerPaint paint;
@@ -104,7 +105,8 @@ class CpuBackend final : public Backend {
     void FillWithEffect(Layer& layer, uint32_t kind, const uint8_t* data);
     void RunCustomEffect(Layer& layer, const uint8_t* data, uint32_t size);
     bool Compose(const Layer& layer, float opacity);
-    void MergeLayer(const Layer& layer, uint32_t blend, float opacity);
+    void TakeLayerPixels(Layer& layer, const int outset[4]);
+    void MergeLayer(Layer& layer, uint32_t blend, float opacity);
     void MaskLayer(Texture* texture, const Rect& area, const ImageSource::Placement& placement);
     // Calls `use` with the colour source that a gradient or pattern effect describes.
     template <class Use>

@@ -14,7 +14,8 @@ void CpuBackend::DrawCachedRun(const FontFace& face, const GlyphRunParams& run, 
     {
         GlyphCache::Reader cache(shared_.glyphs);
         for (uint32_t i = 0; i < count; ++i) {
-            const Vec2 at = plane.Apply(run.x + glyphs[i].x + run.letterSpacing * float(i), run.y + glyphs[i].y);
+            const Vec2 at =
+                plane.Apply(run.x + glyphs[i].x + run.letterSpacing * float(i), run.y + glyphs[i].y);
             if (at.y + reach < clip.y0 || at.y - reach > clip.y1 || at.x + reach < clip.x0 ||
                 at.x - reach > clip.x1 || !(std::abs(at.x) < kFar) || !(std::abs(at.y) < kFar))
                 continue;

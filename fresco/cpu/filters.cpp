@@ -1,16 +1,12 @@
 #include "fresco/cpu/filters.h"
 
 #include "fresco/cpu/blend.h"
+#include "fresco/cpu/rows.h"
 
 // https://www.w3.org/TR/filter-effects-1/#ShorthandEquivalents
 
 namespace fresco::cpu {
 namespace {
-
-// Rows r, g, b, a; columns r, g, b, a, constant.
-struct ColorMatrix {
-    float m[20];
-};
 
 ColorMatrix SaturateMatrix(float s) {
     return {{0.213f + 0.787f * s,
@@ -89,49 +85,33 @@ ColorMatrix HueMatrix(float degrees) {
 
 // On colours that are not premultiplied, clamped after.
 void ApplyMatrix(const Bitmap& bitmap, const ColorMatrix& matrix) {
-    const float* m = matrix.m;
-    for (int y = bitmap.bounds.y0; y < bitmap.bounds.y1; ++y) {
-        uint32_t* row = bitmap.Row(y);
-        uint32_t lastIn = 0, lastOut = 0;
-        bool haveLast = false;
-        for (int x = bitmap.bounds.x0; x < bitmap.bounds.x1; ++x) {
-            // Neighbours are often equal, and nothing stays nothing under most matrices: remember one.
-            if (!haveLast || row[x] != lastIn) {
-                lastIn = row[x], haveLast = true;
-                const float a = float(lastIn >> 24) / 255;
-                const float scale = a > 0 ? 1 / (255 * a) : 0;
-                const float c[3] = {float(lastIn & 255) * scale, float(lastIn >> 8 & 255) * scale,
-                                    float(lastIn >> 16 & 255) * scale};
-                float out[4];
-                for (int i = 0; i < 4; ++i) {
-                    const float* r = m + i * 5;
-                    out[i] =
-                        std::clamp(r[0] * c[0] + r[1] * c[1] + r[2] * c[2] + r[3] * a + r[4], 0.0f, 1.0f);
-                }
-                lastOut = PackPixel(out[0] * out[3], out[1] * out[3], out[2] * out[3], out[3]);
-            }
-            row[x] = lastOut;
-        }
-    }
+    for (int y = bitmap.bounds.y0; y < bitmap.bounds.y1; ++y)
+        Rows().ApplyMatrix(bitmap.Row(y) + bitmap.bounds.x0, bitmap.bounds.Width(), matrix);
+}
+
+// Further away than this a shadow is on no screen; it would only make its layer large.
+constexpr float kMaxShadowOffset = 8192;
+
+bool ShadowShows(const float* v, float scale) {
+    return std::abs(v[0] * scale) <= kMaxShadowOffset && std::abs(v[1] * scale) <= kMaxShadowOffset;
 }
 
 void ApplyDropShadow(const Bitmap& bitmap, const float* v, float scale) {
     PixelBuffer shadow;
     const IRect& bounds = bitmap.bounds;
-    if (!shadow.Allocate(bounds.Width(), bounds.Height())) return;
+    if (!ShadowShows(v, scale) || !shadow.Allocate(bounds.Width(), bounds.Height())) return;
     const Bitmap view = shadow.View(bounds.x0, bounds.y0);
     const float alpha = std::clamp(v[6], 0.0f, 1.0f);
     const uint32_t color = PackPixel(v[3] * alpha, v[4] * alpha, v[5] * alpha, alpha);
-    const float limit = 1 << 20;
-    const int dx = int(std::lround(std::clamp(v[0] * scale, -limit, limit)));
-    const int dy = int(std::lround(std::clamp(v[1] * scale, -limit, limit)));
+    const int dx = int(std::lround(v[0] * scale)), dy = int(std::lround(v[1] * scale));
     for (int y = bounds.y0; y < bounds.y1; ++y) {
         if (y - dy < bounds.y0 || y - dy >= bounds.y1) continue;
         const uint32_t* from = bitmap.Row(y - dy);
         uint32_t* to = view.Row(y);
         const int first = std::max(bounds.x0, bounds.x0 + dx), last = std::min(bounds.x1, bounds.x1 + dx);
-        for (int x = first; x < last; ++x)
-            to[x] = ScalePixel(color, from[x - dx] >> 24);
+        if (first >= last) continue;
+        std::fill(to + first, to + last, color);
+        Rows().ScaleByAlpha(to + first, from + first - dx, last - first);
     }
     Blur(view, v[2] * scale, v[2] * scale);
     for (int y = bounds.y0; y < bounds.y1; ++y) {
@@ -208,26 +188,21 @@ void ApplyFilter(const Bitmap& bitmap, const FilterRecord& filter, float scale) 
     }
 }
 
-void FilterOutset(const FilterRecord* filters, uint32_t count, float scale, int outset[4]) {
+void FilterOutset(const FilterRecord& filter, float scale, int outset[4]) {
     const auto grow = [outset](int left, int top, int right, int bottom) {
-        // Layers are cut to what can be seen; the sum only has to stay an int.
-        const int add[4] = {left, top, right, bottom};
-        for (int i = 0; i < 4; ++i)
-            outset[i] = std::min(outset[i] + std::clamp(add[i], 0, 1 << 15), 1 << 16);
+        outset[0] += std::max(left, 0), outset[1] += std::max(top, 0);
+        outset[2] += std::max(right, 0), outset[3] += std::max(bottom, 0);
     };
-    for (uint32_t i = 0; i < count; ++i) {
-        const float* v = filters[i].values;
-        if (filters[i].kind == uint32_t(FilterKind::Blur) ||
-            filters[i].kind == uint32_t(FilterKind::AxisBlur)) {
-            const bool axis = filters[i].kind == uint32_t(FilterKind::AxisBlur);
-            const int x = BlurExtent(v[0] * scale), y = BlurExtent((axis ? v[1] : v[0]) * scale);
-            grow(x, y, x, y);
-        } else if (filters[i].kind == uint32_t(FilterKind::DropShadow)) {
-            const int e = BlurExtent(v[2] * scale);
-            const int dx = int(std::clamp(v[0] * scale, -32768.0f, 32768.0f)),
-                      dy = int(std::clamp(v[1] * scale, -32768.0f, 32768.0f));
-            grow(e - dx + 1, e - dy + 1, e + dx + 1, e + dy + 1);
-        }
+    const float* v = filter.values;
+    if (filter.kind == uint32_t(FilterKind::Blur) || filter.kind == uint32_t(FilterKind::AxisBlur)) {
+        const bool axis = filter.kind == uint32_t(FilterKind::AxisBlur);
+        const int x = BlurExtent(v[0] * scale), y = BlurExtent((axis ? v[1] : v[0]) * scale);
+        grow(x, y, x, y);
+    } else if (filter.kind == uint32_t(FilterKind::DropShadow) && ShadowShows(v, scale)) {
+        const int e = BlurExtent(v[2] * scale);
+        const int dx = int(std::lround(v[0] * scale)), dy = int(std::lround(v[1] * scale));
+        // The blur needs its own reach around every pixel, even where the offset leads away.
+        grow(e + std::max(-dx, 0), e + std::max(-dy, 0), e + std::max(dx, 0), e + std::max(dy, 0));
     }
 }
 

@@ -25,9 +25,7 @@ bool LayerPool::Take(int width, int height, PixelBuffer* buffer) {
     return true;
 }
 
-void LayerPool::GiveBack(PixelBuffer buffer, const IRect& touched) {
-    for (int y = touched.y0; y < touched.y1; ++y)
-        std::memset(buffer.Row(y) + touched.x0, 0, size_t(touched.Width()) * 4);
+void LayerPool::GiveBack(PixelBuffer buffer) {
     const std::lock_guard<std::mutex> lock(mutex_);
     inUse_ -= std::min(inUse_, buffer.bytes());
     free_.push_back(std::move(buffer));

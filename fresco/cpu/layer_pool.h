@@ -12,8 +12,8 @@ class LayerPool {
   public:
     // Zeroed pixels; false when there is no memory or the layers in use would pass the limit.
     bool Take(int width, int height, PixelBuffer* buffer);
-    // `touched` in pixels of the buffer: what is not zero any more.
-    void GiveBack(PixelBuffer buffer, const IRect& touched);
+    // The pixels are zero again.
+    void GiveBack(PixelBuffer buffer);
     void SetLimits(size_t count, size_t bytes);
     size_t maxCount() const { return maxCount_; }
     size_t maxBytes() const { return maxBytes_; }

@@ -174,8 +174,8 @@ const uint32_t* GradientSource::Fetch(int x, int y, int count, uint32_t* room) {
     return out;
 }
 
-ImageSource::ImageSource(Resources& resources, Texture& texture, const Placement& placement, const Homography& toPlane,
-                         float opacity)
+ImageSource::ImageSource(Resources& resources, Texture& texture, const Placement& placement,
+                         const Homography& toPlane, float opacity)
     : alpha_(uint32_t(std::clamp(opacity, 0.0f, 1.0f) * 255 + 0.5f)) {
     Rect source = placement.source;
     if (source.width == 0 || source.height == 0)

@@ -59,8 +59,8 @@ class ImageSource final : public PixelSource {
         bool repeatX = false, repeatY = false;
         float spacingX = 0, spacingY = 0;  // between repeats, in the user's plane
     };
-    ImageSource(Resources& resources, Texture& texture, const Placement& placement,
-                const Homography& toPlane, float opacity);
+    ImageSource(Resources& resources, Texture& texture, const Placement& placement, const Homography& toPlane,
+                float opacity);
     const uint32_t* Fetch(int x, int y, int count, uint32_t* room) override;
 
   private:
