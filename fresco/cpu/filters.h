@@ -2,6 +2,7 @@
 #pragma once
 #include <fresco/effects.h>
 #include "fresco/cpu/pixels.h"
+#include "fresco/paths/matrix.h"
 
 namespace fresco::cpu {
 
@@ -12,9 +13,9 @@ void Blur(const Bitmap& bitmap, float sigmaX, float sigmaY);
 // How far a blur is seen, in pixels.
 int BlurExtent(float sigma);
 
-// The filter in place; lengths times `scale` are device pixels.
-void ApplyFilter(const Bitmap& bitmap, const FilterRecord& filter, float scale);
+// The filter in place; `space` takes its lengths to device pixels.
+void ApplyFilter(const Bitmap& bitmap, const FilterRecord& filter, const Jacobian& space);
 // Adds by how much a filter grows what it is applied to: left, top, right, bottom.
-void FilterOutset(const FilterRecord& filter, float scale, int outset[4]);
+void FilterOutset(const FilterRecord& filter, const Jacobian& space, int outset[4]);
 
 }  // namespace fresco::cpu

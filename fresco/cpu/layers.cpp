@@ -31,7 +31,7 @@ const FilterRecord* Filters(const uint8_t* data, uint32_t* count) {
 }
 
 // How far the filters reach together, and how many of them there is room for.
-uint32_t MeasureFilters(const EffectsTail& effects, float scale, int outset[4]) {
+uint32_t MeasureFilters(const EffectsTail& effects, const Jacobian& space, int outset[4]) {
     uint32_t total = 0;
     bool room = true;
     ForEachEffect(effects, [&](EffectKind kind, const uint8_t* data, uint32_t) {
@@ -40,7 +40,7 @@ uint32_t MeasureFilters(const EffectsTail& effects, float scale, int outset[4]) 
         const FilterRecord* filters = Filters(data, &count);
         for (uint32_t i = 0; i < count && room; ++i) {
             int grown[4] = {outset[0], outset[1], outset[2], outset[3]};
-            FilterOutset(filters[i], scale, grown);
+            FilterOutset(filters[i], space, grown);
             room = *std::max_element(grown, grown + 4) <= kMaxFilterReach;
             if (!room) break;
             std::copy(grown, grown + 4, outset);
@@ -92,7 +92,7 @@ void CpuBackend::OpenLayer(uint32_t flags, const LayerPaint& paint, const Effect
         layer.collapsed = true;
     } else if (!layer.bounds.IsEmpty()) {
         int outset[4] = {};
-        layer.filters = MeasureFilters(effects, float(layer.transform.MeanScale()), outset);
+        layer.filters = MeasureFilters(effects, layer.transform.At(0, 0), outset);
         TakeLayerPixels(layer, outset);
     }
     if (!layer.collapsed) {
@@ -121,7 +121,7 @@ void CpuBackend::RunCustomEffect(Layer& layer, const uint8_t* data, uint32_t siz
 }
 
 void CpuBackend::ApplyEffects(Layer& layer, uint32_t* blend) {
-    const float scale = float(layer.transform.MeanScale());
+    const Jacobian space = layer.transform.At(0, 0);
     uint32_t left = layer.filters;
     ForEachEffect(layer.effects, [&](EffectKind kind, const uint8_t* data, uint32_t size) {
         switch (kind) {
@@ -133,7 +133,7 @@ void CpuBackend::ApplyEffects(Layer& layer, uint32_t* blend) {
                 const FilterRecord* filters = Filters(data, &count);
                 for (uint32_t i = 0; i < count && left > 0; ++i, --left) {
                     int outset[4] = {};
-                    FilterOutset(filters[i], scale, outset);
+                    FilterOutset(filters[i], space, outset);
                     // Only a colour matrix makes something of nothing.
                     const bool fills =
                         filters[i].kind == uint32_t(FilterKind::ColorMatrix) && filters[i].values[19] != 0;
@@ -146,7 +146,7 @@ void CpuBackend::ApplyEffects(Layer& layer, uint32_t* blend) {
                     part.data += size_t(layer.touched.y0 - part.bounds.y0) * part.pitch +
                                  size_t(layer.touched.x0 - part.bounds.x0) * 4;
                     part.bounds = layer.touched;
-                    ApplyFilter(part, filters[i], scale);
+                    ApplyFilter(part, filters[i], space);
                 }
                 break;
             }

@@ -1,5 +1,5 @@
-// Threads that the client lends for painting; the library starts none. What a frame looks like does not depend
-// on how many help, nor on whether any does.
+// Threads that the client lends for painting; the library starts none. What a frame looks like does not
+// depend on how many help, nor on whether any does.
 #pragma once
 #include <cstdint>
 
