@@ -14,6 +14,9 @@ struct ColumnSample {
     uint16_t weights[8];
 };
 
+// Of a Porter-Duff operator: nothing, all, the other one's alpha, what that leaves.
+enum class BlendFactor : uint8_t { Zero, One, Alpha, Inverse };
+
 // Positions along a gradient: u + du * x in entries of the table; for a radial one the distance of (u, v)
 // from 0 is.
 struct GradientWalk {
@@ -38,6 +41,13 @@ struct ColorMatrix {
     X(BlendSolidMask, (uint32_t * dst, int count, uint32_t color, const uint8_t* mask))                      \
     X(BlendRow, (uint32_t * dst, const uint32_t* src, int count, uint32_t alpha))                            \
     X(BlendRowMask, (uint32_t * dst, const uint32_t* src, int count, const uint8_t* mask))                   \
+    /* A CSS blend mode from multiply to exclusion, and a Porter-Duff operator: the source times `source`    \
+       plus the destination times `target`, held at 255. */                                                  \
+    X(BlendSeparable, (uint32_t mode, uint32_t * dst, const uint32_t* src, int count))                       \
+    X(BlendOperator,                                                                                         \
+      (uint32_t * dst, const uint32_t* src, int count, BlendFactor source, BlendFactor target))              \
+    /* Coverage of the source, the rest of the destination. */                                               \
+    X(MixByMask, (uint32_t * dst, const uint32_t* src, int count, const uint8_t* mask))                      \
     /* Every channel times a constant, a coverage, the alpha of another row; in place. */                    \
     X(Scale, (uint32_t * row, int count, uint32_t alpha))                                                    \
     X(ScaleByMask, (uint32_t * row, int count, const uint8_t* mask))                                         \

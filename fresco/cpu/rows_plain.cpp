@@ -56,6 +56,86 @@ void BlendRowMask(uint32_t* dst, const uint32_t* src, int count, const uint8_t* 
         dst[i] = Over(ScalePixel(src[i], mask[i]), dst[i]);
 }
 
+// What a mode makes of one channel where source and destination meet; s and d times their alphas sa and da.
+// https://www.w3.org/TR/compositing-1/#blendingseparable, multiplied by sa * da.
+float Meet(uint32_t mode, float s, float d, float sa, float da) {
+    const float both = sa * da;
+    const float low = (s + s) * d, high = both - (da - d) * (sa - s) * 2;
+    switch (mode) {
+        case kBlendMultiply:
+            return s * d;
+        case kBlendScreen:
+            return s * da + d * sa - s * d;
+        case kBlendOverlay:
+            return d + d <= da ? low : high;
+        case kBlendDarken:
+            return AtMost(s * da, d * sa);
+        case kBlendLighten:
+            return AtLeast(s * da, d * sa);
+        case kBlendColorDodge: {
+            const float dodged = sa - s > 0 ? AtMost(d * sa * sa / (sa - s), both) : both;
+            return d > 0 ? dodged : 0;
+        }
+        case kBlendColorBurn: {
+            const float burnt = s > 0 ? both - AtMost((da - d) * sa * sa / s, both) : 0;
+            return da - d > 0 ? burnt : both;
+        }
+        case kBlendHardLight:
+            return s + s <= sa ? low : high;
+        case kBlendSoftLight: {
+            const float u = d / AtLeast(da, 1e-6f), m = s + s - sa;
+            const float bent = u <= 0.25f ? ((u * 16 - 12) * u + 4) * u : std::sqrt(u);
+            return m <= 0 ? d * (sa + m * (1 - u)) : d * sa + da * m * (bent - u);
+        }
+        case kBlendDifference:
+            return AtLeast(s * da, d * sa) - AtMost(s * da, d * sa);
+        default:
+            return s * da + d * sa - (s + s) * d;
+    }
+}
+
+void BlendSeparable(uint32_t mode, uint32_t* dst, const uint32_t* src, int count) {
+    constexpr float kUnit = 1.0f / 255;
+    for (int i = 0; i < count; ++i) {
+        const float sa = float(src[i] >> 24) * kUnit, da = float(dst[i] >> 24) * kUnit;
+        uint32_t out = ByteOf(sa * (1 - da) + da * (1 - sa) + sa * da) << 24;
+        for (int shift = 0; shift < 24; shift += 8) {
+            const float s = float(src[i] >> shift & 255) * kUnit, d = float(dst[i] >> shift & 255) * kUnit;
+            const uint32_t channel = ByteOf(s * (1 - da) + d * (1 - sa) + Meet(mode, s, d, sa, da));
+            out |= std::min(channel, out >> 24) << shift;
+        }
+        dst[i] = out;
+    }
+}
+
+uint32_t Weighed(uint32_t pixel, uint32_t other, BlendFactor factor) {
+    switch (factor) {
+        case BlendFactor::Zero:
+            return 0;
+        case BlendFactor::One:
+            return pixel;
+        case BlendFactor::Alpha:
+            return ScalePixel(pixel, other >> 24);
+        default:
+            return ScalePixel(pixel, 255 - (other >> 24));
+    }
+}
+
+void BlendOperator(uint32_t* dst, const uint32_t* src, int count, BlendFactor source, BlendFactor target) {
+    for (int i = 0; i < count; ++i) {
+        const uint32_t a = Weighed(src[i], dst[i], source), b = Weighed(dst[i], src[i], target);
+        uint32_t sum = 0;
+        for (int shift = 0; shift < 32; shift += 8)
+            sum |= std::min(255u, (a >> shift & 255) + (b >> shift & 255)) << shift;
+        dst[i] = sum;
+    }
+}
+
+void MixByMask(uint32_t* dst, const uint32_t* src, int count, const uint8_t* mask) {
+    for (int i = 0; i < count; ++i)
+        dst[i] = ScalePixel(src[i], mask[i]) + ScalePixel(dst[i], 255u - mask[i]);
+}
+
 void Scale(uint32_t* row, int count, uint32_t alpha) {
     for (int i = 0; i < count; ++i)
         row[i] = ScalePixel(row[i], alpha);

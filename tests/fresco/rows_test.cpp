@@ -76,6 +76,16 @@ TEST(RowLoops, BlendsAndScalesAreEqualInEveryWay) {
                     [](const RowLoops& l, Sample& r) { l.ScaleByMask(r.dst, r.count, r.mask); });
     ExpectEqualWays("ScaleByAlpha",
                     [](const RowLoops& l, Sample& r) { l.ScaleByAlpha(r.dst, r.src, r.count); });
+    for (uint32_t mode = kBlendMultiply; mode <= kBlendExclusion; ++mode) {
+        ExpectEqualWays("BlendSeparable", [mode](const RowLoops& l, Sample& r) {
+            l.BlendSeparable(mode, r.dst, r.src, r.count);
+        });
+    }
+    ExpectEqualWays("BlendOperator", [](const RowLoops& l, Sample& r) {
+        l.BlendOperator(r.dst, r.src, r.count, BlendFactor(r.random() % 4), BlendFactor(r.random() % 4));
+    });
+    ExpectEqualWays("MixByMask",
+                    [](const RowLoops& l, Sample& r) { l.MixByMask(r.dst, r.src, r.count, r.mask); });
     ExpectEqualWays("Premultiply", [](const RowLoops& l, Sample& r) {
         for (uint32_t& p : r.dst)
             p = r.random();
