@@ -24,6 +24,7 @@ struct SharedState {
     Resources resources;
     GlyphCache glyphs;
     LayerPool layers;
+    MaskBudget clipMasks;
 };
 
 class CpuBackend final : public Backend {

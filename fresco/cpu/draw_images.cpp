@@ -141,6 +141,7 @@ void CpuBackend::MaskLayer(Texture* texture, const Rect& area, const ImageSource
     const IRect touched = layer.touched;
     const Bitmap bitmap = layer.pixels.View(layer.bounds.x0, layer.bounds.y0);
     ClipMaskPtr inside = MakeClipMask(touched);
+    if (!inside) return;
     MaskSink sink(*inside);
     const Homography plane = PlaneAt(area.z);
     Homography toPlane;

@@ -52,6 +52,9 @@ struct ColorMatrix {
     X(Scale, (uint32_t * row, int count, uint32_t alpha))                                                    \
     X(ScaleByMask, (uint32_t * row, int count, const uint8_t* mask))                                         \
     X(ScaleByAlpha, (uint32_t * row, const uint32_t* alphas, int count))                                     \
+    /* Coverage by coverage: of another row, of a constant. */                                               \
+    X(MultiplyMask, (uint8_t * dst, const uint8_t* src, int count))                                          \
+    X(ScaleMask, (uint8_t * dst, const uint8_t* src, int count, uint32_t coverage))                          \
     /* Two rows of texels, `weight` 256ths of the lower one. */                                              \
     X(MixRows, (uint32_t * dst, const uint32_t* upper, const uint32_t* lower, int count, uint32_t weight))   \
     X(SampleColumns,                                                                                         \

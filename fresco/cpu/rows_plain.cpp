@@ -151,6 +151,16 @@ void ScaleByAlpha(uint32_t* row, const uint32_t* alphas, int count) {
         row[i] = ScalePixel(row[i], alphas[i] >> 24);
 }
 
+void MultiplyMask(uint8_t* dst, const uint8_t* src, int count) {
+    for (int i = 0; i < count; ++i)
+        dst[i] = uint8_t(MulDiv255(dst[i], src[i]));
+}
+
+void ScaleMask(uint8_t* dst, const uint8_t* src, int count, uint32_t coverage) {
+    for (int i = 0; i < count; ++i)
+        dst[i] = uint8_t(MulDiv255(src[i], coverage));
+}
+
 void MixRows(uint32_t* dst, const uint32_t* upper, const uint32_t* lower, int count, uint32_t weight) {
     for (int i = 0; i < count; ++i)
         dst[i] = Mix(upper[i], lower[i], weight);

@@ -85,7 +85,7 @@ TEST(Hostile, MatricesOfEveryDegenerateKind) {
     Matrix4 skewed = AffineMatrix(1, 1, 1, 1.0000001f, 0, 0);
     for (const Matrix4& matrix : {zero, flat, edgeOn, behind, through, vast, minute, skewed}) {
         HostileCanvas canvas;
-        for (const float size : {0.0f, 1e-20f, 10.0f, 1e5f, 1e20f}) {
+        for (const float size : {0.0f, 1e-20f, 10.0f, 1e20f}) {
             CommandBuffer* b = Buffer();
             b->PushState(kStateAll);
             b->MultiplyTransform(matrix);
@@ -157,30 +157,41 @@ TEST(Hostile, BlursAndShadowsOfTenThousandPixels) {
 }
 
 TEST(Hostile, ThousandsOfLayersClipsAndStates) {
-    HostileCanvas canvas(640, 480);
+    HostileCanvas canvas(320, 240);
     CommandBuffer* b = Buffer();
     for (int i = 0; i < 1000; ++i) {
         b->PushState(kStateAll);
         if (i % 2)
-            b->ClipEllipse(320, 240, 400, 300, kClipIntersect);
+            b->ClipEllipse(160, 120, 200, 150, kClipIntersect);
         else
-            b->ClipRoundedRect({float(i) / 10, 0, 0, 640, 480}, kRound, kClipIntersect);
+            b->ClipRoundedRect({float(i) / 10, 0, 0, 320, 240}, kRound, kClipIntersect);
         b->BeginLayer(kLayerContent, MakeLayerPaint(1, uint32_t(i) % kBlendModeCount));
-        b->FillRect({0, 0, 0, 640, 480}, Solid(0, 0, 1, 0.1f));
+        b->FillRect({0, 0, 0, 320, 240}, Solid(0, 0, 1, 0.1f));
     }
     for (int i = 0; i < 1000; ++i) {
         b->EndLayer();
         b->PopState();
     }
     canvas.Draw(b);
+    // Clips of a large target come to the end of their room.
+    HostileCanvas wide(1920, 1080);
+    b = Buffer();
+    for (int i = 0; i < 200; ++i) {
+        b->PushState(kStateAll);
+        b->ClipEllipse(960, 540, 1000, 900, kClipIntersect);
+    }
+    b->FillRect({0, 0, 0, 1920, 1080}, Solid(1, 0, 0));
+    wide.Draw(b);
+    EXPECT_LT(wide.allocator.peak, 330 * kMegabyte);
+    EXPECT_EQ(wide.At(960, 540).r, 255);
     // A layer is never larger than its clip, however large the target is.
     b = Buffer();
     b->ClipRect({10, 10, 0, 4, 4}, kClipIntersect);
     for (int i = 0; i < 1000; ++i)
         b->BeginLayer(kLayerContent, MakeLayerPaint(0.5f));
-    b->FillRect({0, 0, 0, 640, 480}, Solid(0, 0, 1));
+    b->FillRect({0, 0, 0, 320, 240}, Solid(0, 0, 1));
     canvas.Draw(b);
-    EXPECT_LT(canvas.allocator.peak, 560 * kMegabyte);
+    EXPECT_LT(canvas.allocator.peak, 300 * kMegabyte);
 }
 
 TEST(Hostile, AHundredThousandDraws) {

@@ -86,6 +86,13 @@ TEST(RowLoops, BlendsAndScalesAreEqualInEveryWay) {
     });
     ExpectEqualWays("MixByMask",
                     [](const RowLoops& l, Sample& r) { l.MixByMask(r.dst, r.src, r.count, r.mask); });
+    ExpectEqualWays("MultiplyMask", [](const RowLoops& l, Sample& r) {
+        l.MultiplyMask(reinterpret_cast<uint8_t*>(r.dst), reinterpret_cast<uint8_t*>(r.src), r.count * 4);
+    });
+    ExpectEqualWays("ScaleMask", [](const RowLoops& l, Sample& r) {
+        l.ScaleMask(reinterpret_cast<uint8_t*>(r.dst), reinterpret_cast<uint8_t*>(r.src), r.count * 4,
+                    r.random() % 256);
+    });
     ExpectEqualWays("Premultiply", [](const RowLoops& l, Sample& r) {
         for (uint32_t& p : r.dst)
             p = r.random();
