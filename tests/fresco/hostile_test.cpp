@@ -157,16 +157,16 @@ TEST(Hostile, BlursAndShadowsOfTenThousandPixels) {
 }
 
 TEST(Hostile, ThousandsOfLayersClipsAndStates) {
-    HostileCanvas canvas(320, 240);
+    HostileCanvas canvas(120, 90);
     CommandBuffer* b = Buffer();
     for (int i = 0; i < 1000; ++i) {
         b->PushState(kStateAll);
         if (i % 2)
-            b->ClipEllipse(160, 120, 200, 150, kClipIntersect);
+            b->ClipEllipse(60, 45, 75, 56, kClipIntersect);
         else
-            b->ClipRoundedRect({float(i) / 10, 0, 0, 320, 240}, kRound, kClipIntersect);
+            b->ClipRoundedRect({float(i) / 50, 0, 0, 120, 90}, kRound, kClipIntersect);
         b->BeginLayer(kLayerContent, MakeLayerPaint(1, uint32_t(i) % kBlendModeCount));
-        b->FillRect({0, 0, 0, 320, 240}, Solid(0, 0, 1, 0.1f));
+        b->FillRect({0, 0, 0, 120, 90}, Solid(0, 0, 1, 0.1f));
     }
     for (int i = 0; i < 1000; ++i) {
         b->EndLayer();
@@ -176,7 +176,7 @@ TEST(Hostile, ThousandsOfLayersClipsAndStates) {
     // Clips of a large target come to the end of their room.
     HostileCanvas wide(1920, 1080);
     b = Buffer();
-    for (int i = 0; i < 200; ++i) {
+    for (int i = 0; i < 140; ++i) {
         b->PushState(kStateAll);
         b->ClipEllipse(960, 540, 1000, 900, kClipIntersect);
     }
@@ -189,7 +189,7 @@ TEST(Hostile, ThousandsOfLayersClipsAndStates) {
     b->ClipRect({10, 10, 0, 4, 4}, kClipIntersect);
     for (int i = 0; i < 1000; ++i)
         b->BeginLayer(kLayerContent, MakeLayerPaint(0.5f));
-    b->FillRect({0, 0, 0, 320, 240}, Solid(0, 0, 1));
+    b->FillRect({0, 0, 0, 120, 90}, Solid(0, 0, 1));
     canvas.Draw(b);
     EXPECT_LT(canvas.allocator.peak, 300 * kMegabyte);
 }
@@ -197,7 +197,7 @@ TEST(Hostile, ThousandsOfLayersClipsAndStates) {
 TEST(Hostile, AHundredThousandDraws) {
     HostileCanvas canvas(320, 240);
     CommandBuffer* b = Buffer();
-    for (int i = 0; i < 100000; ++i) {
+    for (int i = 0; i < 100'000; ++i) {
         const float x = float(i % 311), y = float(i % 233);
         switch (i % 5) {
             case 0:
