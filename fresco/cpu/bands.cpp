@@ -14,14 +14,14 @@ class Survey {
         const uint8_t* end = cursor + buffer.GetStreamSize();
         while (size_t(end - cursor) >= sizeof(RecordHeader)) {
             const auto& header = *reinterpret_cast<const RecordHeader*>(cursor);
-            if (!Accepts(CommandType(header.type), cursor + sizeof(header), header.size)) return false;
+            if (!Accepts(CommandType(header.type), cursor + sizeof(header))) return false;
             cursor += header.size;
         }
         return true;
     }
 
   private:
-    bool Accepts(CommandType type, const uint8_t* body, uint32_t size) {
+    bool Accepts(CommandType type, const uint8_t* body) {
         switch (type) {
             case CommandType::CreateImage:
             case CommandType::UpdateImage:
@@ -31,7 +31,7 @@ class Survey {
                 return false;
             case CommandType::BeginLayerWithEffects:
                 leading_ = false;
-                return !backend_.HasCustomEffectRenderer() || !HasCustomEffect(body, size);
+                return !backend_.HasCustomEffectRenderer() || !HasCustomEffect(body);
             case CommandType::Annotate:
                 return !backend_.HasCustomCompositor() ||
                        reinterpret_cast<const AnnotateRecord*>(body)->kind != kAnnotateCompositionId;
@@ -53,10 +53,9 @@ class Survey {
         }
     }
 
-    static bool HasCustomEffect(const uint8_t* body, uint32_t size) {
+    static bool HasCustomEffect(const uint8_t* body) {
         const auto& record = *reinterpret_cast<const BeginLayerWithEffectsRecord*>(body);
         const uint8_t* cursor = body + sizeof(record);
-        (void)size;
         for (uint32_t i = 0; i < record.count; ++i) {
             const auto& effect = *reinterpret_cast<const EffectHeader*>(cursor);
             if (effect.kind == uint32_t(EffectKind::Custom)) return true;
