@@ -12,7 +12,11 @@
 #include "core/debug/debug_interfaces.h"
 #include "core/memory/containers.h"
 #include "core/memory/thread_scope.h"
+<<<<<<< HEAD
 #include "core/render/renderer_registry.h"
+=======
+#include "core/render/paint_helpers.h"
+>>>>>>> paint
 #include "core/tasks/task_system.h"
 #include "core/tasks/timer.h"
 #include "resources/client_response.h"
@@ -54,6 +58,7 @@ class LibraryImpl final : public Library {
 
   private:
     bool Start(const LibraryParams& params, fresco::IRenderingLibrary* external);
+    void StartPaintHelpers(const char* options);
     bool StartRendering(const LibraryParams& params, fresco::IRenderingLibrary* external);
     void ReadOptions(const char* options);
     bool DestroyForgottenSystems();
@@ -64,6 +69,7 @@ class LibraryImpl final : public Library {
     UniquePtr<TaskSystem, MemoryTag::General> tasks_;
     UniquePtr<FrescoLogHandler, MemoryTag::Rendering> adapted_log_;
     UniquePtr<FrescoAllocator, MemoryTag::Rendering> adapted_allocator_;
+    UniquePtr<PaintHelpers, MemoryTag::Rendering> paint_helpers_;
     fresco::IRenderingLibrary* rendering_ = nullptr;
     UniquePtr<ClientResponsePool, MemoryTag::Resources> responses_;
     RendererRegistry renderers_;

@@ -214,6 +214,7 @@ struct Options {
     unsigned height = 48;
     unsigned severity = qorvex::Logging::Trace;
     bool pools = true;
+    const char* switches = nullptr;
 };
 
 // One library, system, view and renderer; the test's thread is main and render thread.
