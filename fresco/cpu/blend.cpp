@@ -27,27 +27,13 @@ void BlendRow(uint32_t* dst, const uint32_t* src, int count, const uint8_t* mask
 void BlendRowMode(uint32_t mode, uint32_t* dst, const uint32_t* src, int count, const uint8_t* mask,
                   uint8_t coverage) {
     if (mode == kBlendNormal) return BlendRow(dst, src, count, mask, coverage);
-<<<<<<< HEAD
     // Each frame starts with the one and may end with the other, over the whole target.
-    if (!mask && coverage == 255 && mode == kBlendClear) return FillPixels(dst, count, 0);
-    if (!mask && coverage == 255 && mode == kBlendSource) {
-        std::memcpy(dst, src, size_t(count) * sizeof(uint32_t));
-        return;
-    }
-    for (int i = 0; i < count; ++i) {
-        const uint32_t c = mask ? mask[i] : coverage;
-        if (c == 0) continue;
-        const uint32_t result = BlendPixel(mode, src[i], dst[i]);
-        // Coverage is how much of the pixel changes, for every operator.
-        dst[i] = c == 255 ? result : ScalePixel(result, c) + ScalePixel(dst[i], 255 - c);
-=======
     if (!mask && coverage == 255) {
         if (mode == kBlendClear) return Rows().Fill(dst, count, 0);
         if (mode == kBlendSource) {
             std::memcpy(dst, src, size_t(count) * 4);
             return;
         }
->>>>>>> paint
     }
     BlendModeRow(mode, dst, src, count, mask, coverage);
 }

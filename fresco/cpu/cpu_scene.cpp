@@ -42,14 +42,9 @@ void CpuScene::SetRenderTarget(void* color, void*, const RenderTargetDescription
     backend_.SetRenderTarget(bitmap);
 }
 
-<<<<<<< HEAD
-void CpuScene::ExecuteFrontEnd(CommandBuffer* const* buffers, uint32_t count) {
-    shared_.resources.DropRetired();
-=======
 void CpuScene::ExecuteAll(CommandBuffer* const* buffers, uint32_t count) {
     shared_.resources.BeginFrame();
     backend_.SetBand(backend_.GetRenderTarget().bounds);
->>>>>>> paint
     for (uint32_t i = 0; i < count; ++i) {
         if (buffers[i]) backend_.Execute(BufferSource(*buffers[i]));
     }

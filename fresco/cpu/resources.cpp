@@ -150,7 +150,7 @@ void Resources::DestroySurfacesOf(uint32_t owner) {
 }
 
 void Resources::RetireOwner(uint32_t owner) {
-    std::lock_guard<std::mutex> lock(mutex_);
+    std::lock_guard<std::mutex> lock(retiredMutex_);
     retired_.push_back(owner);
     anyRetired_.store(true, std::memory_order_release);
 }
@@ -159,7 +159,7 @@ void Resources::DropRetired() {
     if (!anyRetired_.load(std::memory_order_acquire)) return;
     Vector<uint32_t> retired;
     {
-        std::lock_guard<std::mutex> lock(mutex_);
+        std::lock_guard<std::mutex> lock(retiredMutex_);
         retired.swap(retired_);
         anyRetired_.store(false, std::memory_order_relaxed);
     }

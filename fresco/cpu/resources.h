@@ -1,12 +1,6 @@
-<<<<<<< HEAD
-// Images and surfaces by id, for all scenes of a library. Render thread only, but for RetireOwner. Images are
-// shared; a surface belongs to the scene whose buffers made it and goes with it at the latest.
-=======
-// Images and surfaces by id, for all scenes of a library. Render thread only, but for what says so.
->>>>>>> paint
+// Images and surfaces by id, for all scenes of a library. Render thread only, but for what says so. Images
+// are shared; a surface belongs to the scene whose buffers made it and goes with it at the latest.
 #pragma once
-#include <mutex>
-
 #include <fresco/command_records.h>
 
 #include <atomic>
@@ -25,7 +19,7 @@ struct Texture {
     uint32_t sourceFormat = 0;  // PixelFormat of updates
     uint32_t flags = 0;         // ImageFlags
     const UserImage* user = nullptr;
-    uint32_t owner = 0;  // of a surface
+    uint32_t owner = 0;          // of a surface
     Vector<PixelBuffer> levels;  // half sizes, from the second level on
     bool levelsValid = false;
     uint64_t readIn = 0;  // the frame in which a user image was read last
@@ -34,7 +28,10 @@ struct Texture {
 class Resources {
   public:
     // From here on user images are read anew, each at its first use.
-    void BeginFrame() { ++frame_; }
+    void BeginFrame() {
+        ++frame_;
+        DropRetired();
+    }
     // Null when absent. Any thread that paints.
     Texture* FindImage(ImageId id);
     Texture* FindSurface(SurfaceId id);
@@ -65,8 +62,8 @@ class Resources {
     HashMap<SurfaceId, Texture> surfaces_;
     std::atomic<uint32_t> nextOwner_{1};
     std::atomic<bool> anyRetired_{false};
-    std::mutex mutex_;
-    Vector<uint32_t> retired_;  // under mutex_
+    std::mutex retiredMutex_;
+    Vector<uint32_t> retired_;  // under retiredMutex_
 };
 
 }  // namespace fresco::cpu

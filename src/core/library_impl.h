@@ -12,11 +12,8 @@
 #include "core/debug/debug_interfaces.h"
 #include "core/memory/containers.h"
 #include "core/memory/thread_scope.h"
-<<<<<<< HEAD
-#include "core/render/renderer_registry.h"
-=======
 #include "core/render/paint_helpers.h"
->>>>>>> paint
+#include "core/render/renderer_registry.h"
 #include "core/tasks/task_system.h"
 #include "core/tasks/timer.h"
 #include "resources/client_response.h"
