@@ -29,6 +29,8 @@ else()
 endif()
 
 if(CMAKE_CXX_COMPILER_ID MATCHES "Clang")
+    # A member marked QSL_GUARDED_BY is touched with its lock held.
+    add_compile_options(-Wthread-safety)
     # Lets ccache serve objects that were built with a precompiled header.
     add_compile_options("SHELL:-Xclang -fno-pch-timestamp")
 endif()

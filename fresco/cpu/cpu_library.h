@@ -9,7 +9,7 @@ class CpuLibrary final : public IRenderingLibrary {
   public:
     void RegisterRenderThread(void*, void*, uint64_t) override {}
     void FreeRenderingResources() override;
-    const char* GetBuildIdentifier() const override { return fresco::GetBuildIdentifier(); }
+    const char* GetBuildIdentifier() const override { return kBuildIdentifier.text; }
     // Only fonts that the options name are opened by the library itself.
     void SetFileManipulator(IFileManipulator* files) override { shared_.fonts.SetFiles(files); }
     IFontService* GetFontService() override { return &shared_.fonts; }

@@ -43,7 +43,7 @@ class NullLibrary final : public IRenderingLibrary {
   public:
     void RegisterRenderThread(void*, void*, uint64_t) override {}
     void FreeRenderingResources() override {}
-    const char* GetBuildIdentifier() const override { return fresco::GetBuildIdentifier(); }
+    const char* GetBuildIdentifier() const override { return kBuildIdentifier.text; }
     void SetFileManipulator(IFileManipulator* files) override { fonts_.SetFiles(files); }
     IFontService* GetFontService() override { return &fonts_; }
     IScene* CreateScene(const SceneParams&) override { return HeapNew<NullScene>(); }

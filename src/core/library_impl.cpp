@@ -1,5 +1,6 @@
 #include "core/library_impl.h"
 
+#include <fresco/library.h>
 #include <qorvex/file_system.h>
 
 #include <thread>
@@ -64,7 +65,7 @@ bool LibraryImpl::Start(const LibraryParams& params, fresco::IRenderingLibrary* 
     ThreadScope scope;
     TempMark mark;
     StartLogging(static_cast<Logging::Severity>(params.LoggingSeverity), params.LogHandler);
-    if (external && std::string_view(external->GetBuildIdentifier()) != fresco::GetBuildIdentifier()) {
+    if (external && std::string_view(external->GetBuildIdentifier()) != fresco::kBuildIdentifier.text) {
         LogError("Invalid Rendering Library version provided!");
         return false;
     }
@@ -104,10 +105,14 @@ void LibraryImpl::ReadOptions(const char* options) {
 }
 
 bool LibraryImpl::StartRendering(const LibraryParams& params, fresco::IRenderingLibrary* external) {
+    adapted_log_ = MakeUnique<FrescoLogHandler, MemoryTag::Rendering>(params.LogHandler);
+    adapted_allocator_ = MakeUnique<FrescoAllocator, MemoryTag::Rendering>(*params.Allocator);
     rendering_ = external;
-    if (!rendering_) {
-        adapted_log_ = MakeUnique<FrescoLogHandler, MemoryTag::Rendering>(params.LogHandler);
-        adapted_allocator_ = MakeUnique<FrescoAllocator, MemoryTag::Rendering>(*params.Allocator);
+    rendering_is_external_ = external != nullptr;
+    if (external) {
+        // Command buffers and decoded images are made inside this library, wherever they are drawn.
+        fresco::Library::Start(adapted_allocator_.get(), adapted_log_.get(), params.LoggingSeverity);
+    } else {
         fresco::RenderingLibraryParams rendering;
         rendering.allocator = adapted_allocator_.get();
         rendering.logHandler = adapted_log_.get();
@@ -220,7 +225,9 @@ void LibraryImpl::Uninitialize(bool shutdown_script_engine) {
         // With it go the requests that the client never finished.
         responses_.reset();
         tasks_.reset();
-        if (adapted_allocator_) {
+        if (rendering_is_external_) {
+            fresco::Library::Stop();
+        } else {
             LogTrace("Uninitializing Fresco...");
             rendering_->SetPaintHelpers(nullptr);
             rendering_->Destroy();

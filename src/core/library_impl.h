@@ -41,7 +41,7 @@ class LibraryImpl final : public Library {
     TaskSystem& GetTasks() { return *tasks_; }
     TimerQueue& GetTimers() { return timers_; }
     fresco::IRenderingLibrary& GetRendering() { return *rendering_; }
-    bool IsRenderingLibraryExternal() const { return !adapted_allocator_; }
+    bool IsRenderingLibraryExternal() const { return rendering_is_external_; }
     bool UsesDedicatedLayoutThread() const { return use_dedicated_layout_thread_; }
     bool SnapsToPixels() const { return snap_to_pixels_; }
     bool PreloadsFontData() const { return preload_font_data_; }
@@ -67,6 +67,7 @@ class LibraryImpl final : public Library {
     UniquePtr<FrescoLogHandler, MemoryTag::Rendering> adapted_log_;
     UniquePtr<FrescoAllocator, MemoryTag::Rendering> adapted_allocator_;
     UniquePtr<PaintHelpers, MemoryTag::Rendering> paint_helpers_;
+    bool rendering_is_external_ = false;
     fresco::IRenderingLibrary* rendering_ = nullptr;
     UniquePtr<ClientResponsePool, MemoryTag::Resources> responses_;
     RendererRegistry renderers_;

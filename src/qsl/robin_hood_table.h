@@ -1,16 +1,16 @@
 // The open-addressing table under HashMap and HashSet.
 //
 // A slot is a distance byte and an entry; the byte says how far the entry stands from the slot that its hash
-// asks for, -1 for a free slot. Invariants:
+// asks for, -1 for a free slot, kFar for "that far or further". Invariants:
 //  - on the way from its own slot to where it stands an entry passes only entries that are at least as far
-//  from
-//    theirs, so a search ends at the first slot that is nearer to home than the search is (Robin Hood
+//    from theirs, so a search ends at the first slot that is nearer to home than the search is (Robin Hood
 //    hashing);
 //  - the capacity is a power of two and at most half full; no entry is further than `reach_` - 1 from home,
-//  and
-//    so many slots stand behind the capacity, so that no probe wraps around; a closing slot of distance 0
+//    and so many slots stand behind the capacity, so that no probe wraps around; a closing slot of distance 0
 //    after them ends every search and every walk;
 //  - an empty table points to a shared slot table, owns nothing, and is never written to.
+// A page may make keys whose hashes are all alike. No capacity parts them: then the reach grows instead, and
+// such keys, but no others, cost what they would in a list.
 // Entries move when others come and go: pointers and iterators are good until the next insertion or removal.
 #pragma once
 
@@ -30,6 +30,7 @@ namespace qsl {
 template <class Entry>
 struct RobinHoodSlot {
     static constexpr int8_t kFree = -1;
+    static constexpr int8_t kFar = 126;
 
     int8_t distance = kFree;
     alignas(Entry) unsigned char room[sizeof(Entry)];
@@ -201,11 +202,16 @@ class RobinHoodTable {
     template <class... Args>
     std::pair<iterator, bool> FindOrEmplace(Lookup key, Args&&... args) {
         const uint64_t hash = Hash::Hash(key);
+        if (MayHoldFar()) [[unlikely]] {
+            Slot* known = FindFar(hash, key);
+            if (known) return {iterator(known), false};
+            return {EmplaceNew(hash, std::forward<Args>(args)...), true};
+        }
         Slot* slot = slots_ + Home(hash);
         int distance = 0;
         for (; slot->distance >= distance; ++slot, ++distance)
             if (Hash::Equal(Policy::Key(*slot->entry()), key)) return {iterator(slot), false};
-        if (slot->distance < 0 && distance < reach_ && (size_ + 1) * 2 <= capacity()) {
+        if (slot->distance < 0 && static_cast<uint32_t>(distance) < reach_ && (size_ + 1) * 2 <= capacity()) {
             ConstructAt<Entry>(slot->room, std::forward<Args>(args)...);
             slot->distance = static_cast<int8_t>(distance);
             ++size_;
@@ -215,7 +221,10 @@ class RobinHoodTable {
     }
 
     Slot* FindSlot(Lookup key) const {
-        Slot* slot = slots_ + Home(Hash::Hash(key));
+        const uint64_t hash = Hash::Hash(key);
+        if (MayHoldFar()) [[unlikely]]
+            return FindFar(hash, key);
+        Slot* slot = slots_ + Home(hash);
         for (int distance = 0; slot->distance >= distance; ++slot, ++distance)
             if (Hash::Equal(Policy::Key(*slot->entry()), key)) return slot;
         return nullptr;
@@ -223,8 +232,9 @@ class RobinHoodTable {
 
   private:
     static constexpr size_t kFirstCapacity = 4;
-    static constexpr int kShortestReach = 4;
-    static constexpr int kLongestReach = 126;
+    static constexpr uint32_t kShortestReach = 4;
+    /// As long as no entry is far.
+    static constexpr uint32_t kLongReach = Slot::kFar;
 
     size_t Home(uint64_t hash) const { return static_cast<size_t>((hash * kFibonacci) >> shift_); }
     size_t SlotCount() const { return size_t{mask_} + reach_; }
@@ -234,6 +244,16 @@ class RobinHoodTable {
         while (slot->distance < 0)
             ++slot;
         return slot;
+    }
+
+    bool MayHoldFar() const { return reach_ > kLongReach; }
+
+    /// The search for tables that may hold far entries; apart, so that the usual one stays a tight loop.
+    [[gnu::noinline]] Slot* FindFar(uint64_t hash, Lookup key) const {
+        Slot* slot = slots_ + Home(hash);
+        for (uint32_t distance = 0; slot->distance >= AsByte(distance); ++slot, ++distance)
+            if (Hash::Equal(Policy::Key(*slot->entry()), key)) return slot;
+        return nullptr;
     }
 
     /// Puts an entry in whose key is known to be absent.
@@ -252,71 +272,91 @@ class RobinHoodTable {
     /// them would have to go further than `reach_`.
     Slot* Place(uint64_t hash, Entry& entry) {
         Slot* slot = slots_ + Home(hash);
-        int distance = 0;
-        for (; slot->distance >= distance; ++slot)
+        uint32_t distance = 0;
+        for (; StandsAsFar(slot, distance); ++slot)
             ++distance;
         if (distance >= reach_) return nullptr;
         // The run behind moves on by one slot, which keeps its order and with it the invariant.
         Slot* free = slot;
         while (free->distance >= 0) {
-            if (free == Closing() || free->distance + 1 >= reach_) return nullptr;
+            if (free == Closing() || static_cast<uint32_t>(free->distance) + 1 >= reach_) return nullptr;
             ++free;
         }
         for (; free != slot; --free) {
             std::construct_at(free->raw(), std::move(*free[-1].entry()));
             std::destroy_at(free[-1].entry());
-            free->distance = static_cast<int8_t>(free[-1].distance + 1);
+            free->distance = AsByte(static_cast<uint32_t>(free[-1].distance) + 1);
         }
         std::construct_at(slot->raw(), std::move(entry));
-        slot->distance = static_cast<int8_t>(distance);
+        slot->distance = AsByte(distance);
         return slot;
+    }
+
+    static int8_t AsByte(uint32_t distance) {
+        return distance < uint32_t{Slot::kFar} ? static_cast<int8_t>(distance) : Slot::kFar;
+    }
+
+    /// Exact, since an order among far entries that was only nearly right would not outlive an erasure.
+    bool StandsAsFar(Slot* slot, uint32_t distance) const {
+        if (slot->distance < AsByte(distance)) return false;
+        return distance <= uint32_t{Slot::kFar} || DistanceOf(slot) >= distance;
+    }
+
+    uint32_t DistanceOf(Slot* slot) const {
+        if (slot->distance < Slot::kFar) return static_cast<uint32_t>(slot->distance);
+        return static_cast<uint32_t>(slot - (slots_ + Home(Hash::Hash(Policy::Key(*slot->entry())))));
     }
 
     void EraseSlot(Slot* slot) {
         std::destroy_at(slot->entry());
         // What follows and is not at home moves back by one slot, so no tombstone stays behind.
         for (Slot* next = slot + 1; next != Closing() && next->distance > 0; slot = next++) {
+            const uint32_t distance = DistanceOf(next);
             std::construct_at(slot->raw(), std::move(*next->entry()));
             std::destroy_at(next->entry());
-            slot->distance = static_cast<int8_t>(next->distance - 1);
+            slot->distance = AsByte(distance - 1);
         }
         slot->distance = Slot::kFree;
         --size_;
     }
 
     /// A probe got longer than the table allows: a larger table shortens it, unless the hashes are simply
-    /// alike; then let probes be as long as a distance byte can say before the capacity runs away.
+    /// alike; then probes become longer before the capacity runs away.
     void Lengthen() {
-        if (size_ * 16 < capacity() && reach_ < kLongestReach)
-            RehashTo(capacity(), kLongestReach);
+        if (IsSparse(capacity()))
+            RehashTo(capacity(), LongerReach(reach_));
         else
             Rehash(capacity() * 2);
     }
+    bool IsSparse(size_t capacity) const { return size_t{size_} * 16 < capacity; }
+    static uint32_t LongerReach(uint32_t reach) { return reach < kLongReach ? kLongReach : reach * 4; }
 
     void Rehash(size_t capacity) {
         if (capacity < kFirstCapacity) capacity = kFirstCapacity;
-        const int bits = std::countr_zero(capacity);
-        const int reach = reach_ == kLongestReach ? kLongestReach
-                          : bits < kShortestReach ? kShortestReach
-                                                  : bits;
+        const auto bits = static_cast<uint32_t>(std::countr_zero(capacity));
+        const uint32_t reach = reach_ >= kLongReach ? reach_ : bits < kShortestReach ? kShortestReach : bits;
         RehashTo(capacity, reach);
     }
 
-    [[gnu::noinline]] void RehashTo(size_t capacity, int reach) {
-        for (;; capacity *= 2) {
+    [[gnu::noinline]] void RehashTo(size_t capacity, uint32_t reach) {
+        for (;;) {
             RobinHoodTable fresh;
             fresh.mask_ = static_cast<uint32_t>(capacity - 1);
             fresh.shift_ = static_cast<uint8_t>(64 - std::countr_zero(capacity));
-            fresh.reach_ = static_cast<uint8_t>(reach);
+            fresh.reach_ = reach;
             fresh.slots_ = AllocateArray<Slot, Alloc>(fresh.SlotCount() + 1);
             for (size_t i = 0; i < fresh.SlotCount(); ++i)
                 fresh.slots_[i].distance = Slot::kFree;
             fresh.Closing()->distance = 0;
             swap(fresh);
             if (TakeAll(fresh)) return;
-            // Some run was too long: put everything back together in the next size.
+            // Some run was too long: put everything back together, and give it more room.
             fresh.TakeAll(*this);
             swap(fresh);
+            if (IsSparse(capacity))
+                reach = LongerReach(reach);
+            else
+                capacity *= 2;
         }
     }
 
@@ -344,7 +384,7 @@ class RobinHoodTable {
     uint32_t mask_ = 0;
     // With one bit left of the hash an empty table is asked for one of its two free slots.
     uint8_t shift_ = 63;
-    uint8_t reach_ = 2;
+    uint32_t reach_ = 2;
 };
 
 }  // namespace qsl

@@ -98,7 +98,7 @@ TEST(Font, ThreadsShareAFace) {
 
 TEST(Font, TheNullLibraryMeasuresAndDrawsNothing) {
     IRenderingLibrary* library = CreateNullRenderingLibrary({});
-    EXPECT_STREQ(library->GetBuildIdentifier(), GetBuildIdentifier());
+    EXPECT_STREQ(library->GetBuildIdentifier(), kBuildIdentifier.text);
     EXPECT_EQ(std::strlen(library->GetBuildIdentifier()), 64u);
     MemoryReader reader(ReadFile(kSans));
     const FontId id = library->GetFontService()->LoadFace(&reader, 0, SdfMode::Never);

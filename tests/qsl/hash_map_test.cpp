@@ -79,15 +79,51 @@ struct AlikeHash {
     static bool Equal(int a, int b) { return a == b; }
 };
 
+// More than a distance byte can tell apart.
 TEST(HashMap, HoldsManyKeysOfOneHashWithoutRunawayGrowth) {
-    HashMap<int, int, AlikeHash> map;
-    for (int i = 0; i < 120; ++i)
-        map[i] = -i;
-    EXPECT_LE(map.capacity(), 4096u);
-    for (int i = 0; i < 120; i += 2)
-        EXPECT_TRUE(map.erase(i));
-    for (int i = 0; i < 120; ++i)
-        EXPECT_EQ(map.get_or(i, 1), i % 2 ? -i : 1);
+    for (const int count : {120, 127, 3000}) {
+        HashMap<int, int, AlikeHash> map;
+        for (int i = 0; i < count; ++i)
+            map[i] = -i;
+        EXPECT_LE(map.capacity(), static_cast<size_t>(count) * 64);
+        const HashMap<int, int, AlikeHash> copy = map;
+        for (int i = 0; i < count; i += 2)
+            EXPECT_TRUE(map.erase(i));
+        for (int i = 0; i < count; ++i) {
+            EXPECT_EQ(map.get_or(i, 1), i % 2 ? -i : 1);
+            EXPECT_EQ(copy.get_or(i, 1), -i);
+        }
+        EXPECT_FALSE(map.contains(count));
+    }
+}
+
+// Some keys are made to collide, others are not, and both come and go.
+struct HostileHash {
+    using Lookup = int;
+    static uint64_t Hash(int key) { return key < 2000 ? key % 3 : static_cast<uint64_t>(key) * 8; }
+    static bool Equal(int a, int b) { return a == b; }
+};
+
+TEST(HashMap, AgreesWithAReferenceWhenKeysAreMadeToCollide) {
+    std::mt19937 random(3);
+    HashMap<int, Counting, HostileHash> map;
+    std::unordered_map<int, int> reference;
+    for (int step = 0; step < 30000; ++step) {
+        const auto key = static_cast<int>(random() % 4000);
+        // First mostly growing, then mostly shrinking.
+        if (random() % 4 < (step < 15000 ? 3u : 1u)) {
+            EXPECT_EQ(map.try_emplace(key, step).second, reference.emplace(key, step).second);
+        } else {
+            EXPECT_EQ(map.erase(key), reference.erase(key) != 0);
+        }
+        const auto asked = static_cast<int>(random() % 4000);
+        const Counting* value = map.get(asked);
+        const auto found = reference.find(asked);
+        ASSERT_EQ(value != nullptr, found != reference.end());
+        if (value) EXPECT_EQ(*value->value, found->second);
+    }
+    EXPECT_EQ(Counting::live, static_cast<int>(reference.size()));
+    EXPECT_LE(map.capacity(), 64u * 1024);
 }
 
 TEST(HashMap, ErasesWhileWalking) {

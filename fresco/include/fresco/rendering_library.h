@@ -2,6 +2,7 @@
 // any implementation of this class; two are given here.
 #pragma once
 #include <fresco/allocator.h>
+#include <fresco/build_identifier.h>
 #include <fresco/file_manipulator.h>
 #include <fresco/font.h>
 #include <fresco/logging.h>
@@ -30,7 +31,7 @@ class IRenderingLibrary {
     virtual void RegisterRenderThread(void* device, void* context, uint64_t flags) = 0;
     // Images and surfaces go; ids stay taken. Render thread.
     virtual void FreeRenderingResources() = 0;
-    // 64 hexadecimal digits that change with the interfaces in this folder; see GetBuildIdentifier below.
+    // 64 hexadecimal digits that change with the interfaces in this folder: kBuildIdentifier.text.
     virtual const char* GetBuildIdentifier() const = 0;
     virtual void SetFileManipulator(IFileManipulator* files) = 0;
     virtual IFontService* GetFontService() = 0;
@@ -49,8 +50,5 @@ class IRenderingLibrary {
 
 // Takes every call and draws nothing: for tests, and servers that only want layout. Fonts measure as usual.
 IRenderingLibrary* CreateNullRenderingLibrary(const RenderingLibraryParams& params);
-
-// The identifier of this build of the interfaces, which a client's own implementation returns.
-const char* GetBuildIdentifier();
 
 }  // namespace fresco

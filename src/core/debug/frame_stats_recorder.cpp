@@ -4,14 +4,14 @@ namespace qorvex {
 
 void FrameStatsRecorder::Begin(uint32_t frame_id) {
     if (!IsEnabled()) return;
-    std::lock_guard<std::mutex> lock(mutex_);
+    qsl::MutexLock lock(mutex_);
     FrameStats& slot = slots_[frame_id % slots_.size()];
     slot = FrameStats();
     slot.FrameId = frame_id;
 }
 
 bool FrameStatsRecorder::Get(uint32_t frame_id, FrameStats* out) const {
-    std::lock_guard<std::mutex> lock(mutex_);
+    qsl::MutexLock lock(mutex_);
     const FrameStats& slot = slots_[frame_id % slots_.size()];
     if (slot.FrameId != frame_id) return false;
     *out = slot;

@@ -10,7 +10,8 @@
 #include <array>
 #include <atomic>
 #include <ctime>
-#include <mutex>
+
+#include "qsl/mutex.h"
 
 namespace qorvex {
 
@@ -26,15 +27,15 @@ class FrameStatsRecorder {
     template <class Change>
     void Update(uint32_t frame_id, Change change) {
         if (!IsEnabled()) return;
-        std::lock_guard<std::mutex> lock(mutex_);
+        qsl::MutexLock lock(mutex_);
         FrameStats& slot = slots_[frame_id % slots_.size()];
         if (slot.FrameId == frame_id) change(slot);
     }
 
   private:
     std::atomic<bool> enabled_{false};
-    mutable std::mutex mutex_;
-    std::array<FrameStats, 8> slots_{};
+    mutable qsl::Mutex mutex_;
+    std::array<FrameStats, 8> slots_ QSL_GUARDED_BY(mutex_){};
 };
 
 // Adds the thread CPU time of a scope to one stage of a frame.

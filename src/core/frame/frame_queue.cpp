@@ -7,7 +7,7 @@ namespace qorvex {
 void FrameQueue::RegisterFrame(uint32_t id) {
     LogTrace("Registering frame for painting ", id);
     RenderFramePtr dropped;  // dies after the lock
-    std::lock_guard<std::mutex> lock(mutex_);
+    qsl::MutexLock lock(mutex_);
     // A client that never paints (a server, a minimised window) must not grow the queue for ever: the oldest
     // frame goes, and a later Paint of it finds it missing.
     if (entries_.size() >= limits::kMaxWaitingFrames) {
@@ -19,7 +19,7 @@ void FrameQueue::RegisterFrame(uint32_t id) {
 
 void FrameQueue::SetFrame(uint32_t id, const RenderFramePtr& frame) {
     LogTrace("Setting frame for painting ", id);
-    std::lock_guard<std::mutex> lock(mutex_);
+    qsl::MutexLock lock(mutex_);
     const size_t index = IndexOf(id);
     if (index < entries_.size()) entries_[index].frame = frame;
 }
@@ -28,12 +28,12 @@ void FrameQueue::ClearFrames() {
     LogTrace("Clearing frames for painting");
     Vector<Entry, MemoryTag::Rendering> dropped;  // frames die after the lock
     dropped.reserve(limits::kMaxWaitingFrames);
-    std::lock_guard<std::mutex> lock(mutex_);
+    qsl::MutexLock lock(mutex_);
     dropped.swap(entries_);
 }
 
 bool FrameQueue::Find(uint32_t id, RenderFramePtr* frame) const {
-    std::lock_guard<std::mutex> lock(mutex_);
+    qsl::MutexLock lock(mutex_);
     const size_t index = IndexOf(id);
     if (index >= entries_.size()) return false;
     *frame = entries_[index].frame;
@@ -42,7 +42,7 @@ bool FrameQueue::Find(uint32_t id, RenderFramePtr* frame) const {
 
 void FrameQueue::Remove(uint32_t id) {
     RenderFramePtr dropped;
-    std::lock_guard<std::mutex> lock(mutex_);
+    qsl::MutexLock lock(mutex_);
     const size_t index = IndexOf(id);
     if (index >= entries_.size()) return;
     dropped = std::move(entries_[index].frame);
@@ -50,7 +50,7 @@ void FrameQueue::Remove(uint32_t id) {
 }
 
 void FrameQueue::DiscardAll() {
-    std::lock_guard<std::mutex> lock(mutex_);
+    qsl::MutexLock lock(mutex_);
     for (Entry& entry : entries_) {
         LogDebug("Trying to discard frame ", entry.id);
         if (!entry.frame) continue;

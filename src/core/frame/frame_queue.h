@@ -6,11 +6,11 @@
 #pragma once
 
 #include <atomic>
-#include <mutex>
 
 #include "core/frame/render_frame.h"
 #include "core/limits.h"
 #include "core/memory/containers.h"
+#include "qsl/mutex.h"
 
 namespace qorvex {
 
@@ -42,11 +42,11 @@ class FrameQueue {
 
   private:
     // Returns the position of the id, or the size.
-    size_t IndexOf(uint32_t id) const;
+    size_t IndexOf(uint32_t id) const QSL_REQUIRES(mutex_);
 
     std::atomic<uint32_t> resets_{0};
-    mutable std::mutex mutex_;
-    Vector<Entry, MemoryTag::Rendering> entries_;
+    mutable qsl::Mutex mutex_;
+    Vector<Entry, MemoryTag::Rendering> entries_ QSL_GUARDED_BY(mutex_);
 };
 
 }  // namespace qorvex

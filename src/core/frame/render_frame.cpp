@@ -4,10 +4,10 @@ namespace qorvex {
 
 void RenderFrame::Push(TaskPtr task) {
     {
-        std::lock_guard<std::mutex> lock(mutex_);
+        qsl::MutexLock lock(mutex_);
         tasks_.push_back(std::move(task));
     }
-    task_arrived_.notify_all();
+    task_arrived_.Broadcast();
 }
 
 void RenderFrame::PushClose() {
@@ -23,34 +23,24 @@ void RenderFrame::Close() {
 
 void RenderFrame::Discard() {
     {
-        std::lock_guard<std::mutex> lock(mutex_);
+        qsl::MutexLock lock(mutex_);
         state_.store(State::Discarded, std::memory_order_release);
     }
     // A Paint that waits for the rest of this frame must not wait for ever.
-    task_arrived_.notify_all();
-}
-
-TaskPtr RenderFrame::TakeFront(std::unique_lock<std::mutex>&) {
-    return tasks_.empty() ? TaskPtr() : tasks_.pop_front();
-}
-
-void RenderFrame::DropAll(std::unique_lock<std::mutex>& lock) {
-    while (TaskPtr task = TakeFront(lock)) {
-        lock.unlock();
-        task.reset();
-        lock.lock();
-    }
+    task_arrived_.Broadcast();
 }
 
 bool RenderFrame::ExecuteOne(TaskFamilyHandle family) {
-    std::unique_lock<std::mutex> lock(mutex_);
-    if (GetState() == State::Discarded) {
-        DropAll(lock);
-        return false;
+    TaskQueue dropped;  // goes after the lock
+    TaskPtr task;
+    {
+        qsl::MutexLock lock(mutex_);
+        if (GetState() == State::Discarded)
+            dropped.swap(tasks_);
+        else
+            task = tasks_.pop_front();
     }
-    TaskPtr task = TakeFront(lock);
     if (!task) return false;
-    lock.unlock();
     const int32_t before = executed_count_;
     task->Execute(family);
     ++executed_count_;
@@ -58,24 +48,21 @@ bool RenderFrame::ExecuteOne(TaskFamilyHandle family) {
 }
 
 bool RenderFrame::ExecuteToCompletion(TaskFamilyHandle family) {
-    std::unique_lock<std::mutex> lock(mutex_);
-    for (;;) {
-        if (GetState() == State::Discarded) {
-            DropAll(lock);
-            break;
-        }
-        if (GetState() == State::Closed) break;
-        TaskPtr task = TakeFront(lock);
+    TaskQueue dropped;
+    qsl::MutexLock lock(mutex_);
+    while (GetState() == State::Recording) {
+        TaskPtr task = tasks_.pop_front();
         if (!task) {
-            task_arrived_.wait(lock);
+            task_arrived_.Wait(lock);
             continue;
         }
-        lock.unlock();
+        lock.Unlock();
         task->Execute(family);
         ++executed_count_;
         task.reset();
-        lock.lock();
+        lock.Lock();
     }
+    if (GetState() == State::Discarded) dropped.swap(tasks_);
     return executed_count_ > 0;
 }
 

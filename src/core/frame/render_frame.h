@@ -7,13 +7,12 @@
 #pragma once
 
 #include <atomic>
-#include <condition_variable>
-#include <mutex>
 
 #include "core/memory/containers.h"
 #include "core/memory/pool.h"
 #include "core/tasks/task.h"
 #include "core/tasks/task_queue.h"
+#include "qsl/mutex.h"
 
 namespace qorvex {
 
@@ -40,14 +39,12 @@ class RenderFrame : public MTPoolObject<RenderFrame, MemoryTag::Rendering, 4> {
     bool ExecuteToCompletion(TaskFamilyHandle family);
 
   private:
-    TaskPtr TakeFront(std::unique_lock<std::mutex>& lock);
-    void DropAll(std::unique_lock<std::mutex>& lock);
     void Close();
 
     std::atomic<uint32_t> count_{1};
-    std::mutex mutex_;
-    std::condition_variable task_arrived_;
-    TaskQueue tasks_;
+    qsl::Mutex mutex_;
+    qsl::Condition task_arrived_;
+    TaskQueue tasks_ QSL_GUARDED_BY(mutex_);
     std::atomic<State> state_{State::Recording};
     int32_t executed_count_ = 0;  // without CloseRenderFrame; render thread only
 };

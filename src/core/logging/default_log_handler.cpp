@@ -26,7 +26,7 @@ DefaultLogHandler::~DefaultLogHandler() {
 }
 
 void DefaultLogHandler::WriteLog(Logging::Severity severity, const char* text, unsigned length) {
-    std::lock_guard lock(mutex_);
+    qsl::MutexLock lock(mutex_);
     stream_.Reset();
     stream_.WriteNumber(CurrentThreadId());
     stream_ << " Time: ";

@@ -2,12 +2,12 @@
 #pragma once
 
 #include <cstdio>
-#include <mutex>
 
 #include <qorvex/logging.h>
 
 #include "core/limits.h"
 #include "core/logging/fixed_stream.h"
+#include "qsl/mutex.h"
 
 namespace qorvex {
 
@@ -19,9 +19,9 @@ class DefaultLogHandler final : public Logging::ILogHandler {
     void WriteLog(Logging::Severity severity, const char* text, unsigned length) override;
 
   private:
-    std::mutex mutex_;
-    FixedStream<limits::kDefaultLogBytes> stream_;
-    std::FILE* file_;
+    qsl::Mutex mutex_;
+    FixedStream<limits::kDefaultLogBytes> stream_ QSL_GUARDED_BY(mutex_);
+    std::FILE* const file_;
     bool standard_streams_ = true;
 };
 

@@ -38,7 +38,7 @@ StringPool::~StringPool() {
 Atom StringPool::Intern(std::string_view text, bool copy) {
     if (text.empty()) return Atom();
     const uint64_t hash = HashInterned(text);
-    std::lock_guard lock(mutex_);
+    qsl::MutexLock lock(mutex_);
     if (const AtomEntry* known = atoms_.Find(text, hash)) return Atom(known);
 
     struct Record {
@@ -63,12 +63,12 @@ Atom StringPool::Intern(std::string_view text, bool copy) {
 Atom StringPool::Find(std::string_view text) const {
     if (text.empty()) return Atom();
     const uint64_t hash = HashInterned(text);
-    std::lock_guard lock(mutex_);
+    qsl::MutexLock lock(mutex_);
     return Atom(atoms_.Find(text, hash));
 }
 
 size_t StringPool::size() const {
-    std::lock_guard lock(mutex_);
+    qsl::MutexLock lock(mutex_);
     return atoms_.size();
 }
 

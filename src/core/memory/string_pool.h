@@ -3,12 +3,12 @@
 // compared with atoms::kName by pointer in any pool. All operations may be called from any thread.
 #pragma once
 
-#include <mutex>
 #include <string_view>
 
 #include "core/memory/atom.h"
 #include "core/memory/chained_atom_set.h"
 #include "core/memory/containers.h"
+#include "qsl/mutex.h"
 
 namespace qorvex {
 
@@ -33,11 +33,11 @@ class StringPool {
         size_t used;
         size_t capacity;
     };
-    std::byte* Bump(size_t size, size_t alignment);
+    std::byte* Bump(size_t size, size_t alignment) QSL_REQUIRES(mutex_);
 
-    mutable std::mutex mutex_;
-    Vector<Block> blocks_;
-    ChainedAtomSet atoms_;
+    mutable qsl::Mutex mutex_;
+    Vector<Block> blocks_ QSL_GUARDED_BY(mutex_);
+    ChainedAtomSet atoms_ QSL_GUARDED_BY(mutex_);
 };
 
 }  // namespace qorvex
