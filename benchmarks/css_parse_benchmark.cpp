@@ -22,22 +22,20 @@ void CssParse(benchmark::State& state) {
 }
 BENCHMARK(CssParse)->Name("css_parse");
 
-// The class of each byte from a table, and how often it changes: what a scanner that knew nothing else would
-// do.
+// Each byte through a table, and no more: what the class of a byte then means is all that a scanner adds.
 void ScanBytes(benchmark::State& state) {
     const std::string text = bench::PanelSheet(100);
     std::array<uint8_t, 256> classes{};
     for (size_t c = 0; c < classes.size(); ++c)
-        classes[c] = c <= ' ' ? 0 : c >= '0' && c <= '9' ? 1 : (c | 0x20) >= 'a' && (c | 0x20) <= 'z' ? 2 : 3;
+        classes[c] = c <= ' ' ? 1 : c >= '0' && c <= '9' ? 2 : (c | 0x20) >= 'a' && (c | 0x20) <= 'z' ? 4 : 8;
     for (auto _ : state) {
-        uint64_t tokens = 0;
-        uint8_t last = 0;
+        uint64_t sum = 0;
         for (const char byte : text) {
-            const uint8_t now = classes[static_cast<unsigned char>(byte)];
-            tokens += now != last;
-            last = now;
+            sum += classes[static_cast<unsigned char>(byte)];
+            // Byte by byte: what the compiler makes of it with vectors takes three times as long.
+            asm volatile("" : "+r"(sum));
         }
-        benchmark::DoNotOptimize(tokens);
+        benchmark::DoNotOptimize(sum);
     }
     state.SetBytesProcessed(static_cast<int64_t>(state.iterations() * text.size()));
 }

@@ -55,9 +55,9 @@ class Grammar {
     bool StartsTerm() const;
 
     void Advance() { scanner_.Next(token_); }
+    void AdvanceBeyondSpace() { scanner_.NextBeyondSpace(token_); }
     void SkipSpace() {
-        while (token_.kind == TokenKind::Space)
-            Advance();
+        if (token_.kind == TokenKind::Space) AdvanceBeyondSpace();
     }
     void SkipSpaceAndComments();
     bool Expect(char delimiter);

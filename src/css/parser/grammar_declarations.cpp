@@ -11,8 +11,7 @@ bool Grammar::ParseBlock(SyntaxList<DeclarationSyntax>& out) {
     while (!token_.Is('}')) {
         if (token_.kind == TokenKind::End) return Fail();
         if (token_.Is(';')) {
-            Advance();
-            SkipSpace();
+            AdvanceBeyondSpace();
             continue;
         }
         Outcome outcome = ParseDeclaration(out);
@@ -22,8 +21,7 @@ bool Grammar::ParseBlock(SyntaxList<DeclarationSyntax>& out) {
         while (token_.kind != TokenKind::End && !token_.Is(';') && !token_.Is('}'))
             Advance();
     }
-    Advance();
-    SkipSpace();
+    AdvanceBeyondSpace();
     return true;
 }
 
@@ -31,19 +29,16 @@ bool Grammar::ParseBlock(SyntaxList<DeclarationSyntax>& out) {
 Grammar::Outcome Grammar::ParseDeclaration(SyntaxList<DeclarationSyntax>& out) {
     if (token_.kind != TokenKind::Ident && token_.kind != TokenKind::CustomIdent) return Outcome::Bad;
     std::string_view name = token_.text();
-    Advance();
-    SkipSpace();
+    AdvanceBeyondSpace();
     if (!token_.Is(':')) return Outcome::Bad;
-    Advance();
-    SkipSpace();
+    AdvanceBeyondSpace();
     std::string_view value;
     uint8_t flags = 0;
     Outcome outcome = ParseValue(value, flags);
     if (outcome != Outcome::Good) return outcome;
     if (token_.kind == TokenKind::Important) {
         flags |= kImportant;
-        Advance();
-        SkipSpace();
+        AdvanceBeyondSpace();
     }
     if (!token_.Is(';') && !token_.Is('}')) return Outcome::Bad;
     DeclarationSyntax* declaration = arena_.Make<DeclarationSyntax>();
@@ -126,7 +121,8 @@ Grammar::Outcome Grammar::ParseValue(std::string_view& text, uint8_t& flags) {
     ValueText value(arena_);
     size_t depth = 0;
     bool signPending = false;
-    for (;; Advance()) {
+    // Space matters behind a sign alone.
+    for (;; signPending ? Advance() : AdvanceBeyondSpace()) {
         if (token_.kind == TokenKind::Space) {
             signPending = false;
             continue;

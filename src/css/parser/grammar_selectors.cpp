@@ -21,8 +21,7 @@ bool Grammar::ParseSelectorList(SyntaxList<SelectorSyntax>& selectors) {
     for (;;) {
         if (!ParseSelector(selectors)) return false;
         if (!token_.Is(',')) return true;
-        Advance();
-        SkipSpace();
+        AdvanceBeyondSpace();
     }
 }
 
@@ -45,8 +44,7 @@ bool Grammar::ParseSelector(SyntaxList<SelectorSyntax>& selectors) {
             combinator = token_.Is('>')   ? Combinator::Child
                          : token_.Is('+') ? Combinator::Adjacent
                                           : Combinator::Sibling;
-            Advance();
-            SkipSpace();
+            AdvanceBeyondSpace();
         } else if (spaced && StartsCompound(token_)) {
             combinator = Combinator::Descendant;
         } else {
@@ -103,8 +101,7 @@ bool Grammar::ParsePseudo(SimpleSelectorSyntax& simple) {
 bool Grammar::ParsePseudoArgument(SimpleSelectorSyntax& simple) {
     simple.text.remove_suffix(1);
     size_t depth = 1;
-    Advance();
-    SkipSpace();
+    AdvanceBeyondSpace();
     const char* start = token_.text().data();
     bool needsCompound = true;
     while (depth > 0) {
@@ -119,8 +116,7 @@ bool Grammar::ParsePseudoArgument(SimpleSelectorSyntax& simple) {
             if (token_.kind == TokenKind::Function) {
                 if (++depth > limits::kMaxCssNesting) return Fail("memory exhausted");
                 needsCompound = true;
-                Advance();
-                SkipSpace();
+                AdvanceBeyondSpace();
                 continue;
             }
             if (token_.kind != TokenKind::Ident) return Fail();
@@ -132,8 +128,7 @@ bool Grammar::ParsePseudoArgument(SimpleSelectorSyntax& simple) {
         SkipSpace();
         if (token_.Is('>') || token_.Is('+') || token_.Is('~')) {
             needsCompound = true;
-            Advance();
-            SkipSpace();
+            AdvanceBeyondSpace();
         } else if (spaced && StartsCompound(token_)) {
             needsCompound = true;
         } else if (token_.Is(')')) {
@@ -149,12 +144,10 @@ bool Grammar::ParsePseudoArgument(SimpleSelectorSyntax& simple) {
 
 bool Grammar::ParseAttribute(SimpleSelectorSyntax& simple) {
     simple.kind = SimpleSelectorSyntaxKind::Attribute;
-    Advance();
-    SkipSpace();
+    AdvanceBeyondSpace();
     if (token_.kind != TokenKind::Ident) return Fail();
     simple.text = token_.text();
-    Advance();
-    SkipSpace();
+    AdvanceBeyondSpace();
     if (!token_.Is(']')) {
         switch (token_.kind) {
             case TokenKind::Includes:
@@ -176,16 +169,13 @@ bool Grammar::ParseAttribute(SimpleSelectorSyntax& simple) {
                 if (!token_.Is('=')) return Fail();
                 simple.op = AttributeOperator::Equals;
         }
-        Advance();
-        SkipSpace();
+        AdvanceBeyondSpace();
         if (token_.kind != TokenKind::Ident && token_.kind != TokenKind::String) return Fail();
         simple.value = token_.text();
-        Advance();
-        SkipSpace();
+        AdvanceBeyondSpace();
         if (token_.kind == TokenKind::Ident) {
             simple.flag = token_.text();
-            Advance();
-            SkipSpace();
+            AdvanceBeyondSpace();
         }
     }
     return Expect(']');

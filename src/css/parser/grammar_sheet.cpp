@@ -43,11 +43,9 @@ bool Grammar::ParsePrologue() {
 
 // Accepted and ignored: no sheet is fetched. A second one is a syntax error.
 bool Grammar::ParseImport() {
-    Advance();
-    SkipSpace();
+    AdvanceBeyondSpace();
     if (token_.kind != TokenKind::String && token_.kind != TokenKind::Uri) return Fail();
-    Advance();
-    SkipSpace();
+    AdvanceBeyondSpace();
     SyntaxList<MediaQuerySyntax> ignored;
     if (!token_.Is(';') && !ParseMediaQuery(ignored)) return false;
     if (!Expect(';')) return false;
@@ -81,21 +79,18 @@ bool Grammar::ParseRuleset(SyntaxList<RulesetSyntax>& rulesets) {
 }
 
 bool Grammar::ParsePage() {
-    Advance();
-    SkipSpace();
+    AdvanceBeyondSpace();
     if (token_.Is(':')) {
         Advance();
         if (token_.kind != TokenKind::Ident) return Fail();
-        Advance();
-        SkipSpace();
+        AdvanceBeyondSpace();
     }
     SyntaxList<DeclarationSyntax> ignored;
     return ParseBlock(ignored);
 }
 
 bool Grammar::ParseFontFace() {
-    Advance();
-    SkipSpace();
+    AdvanceBeyondSpace();
     FontFaceSyntax* face = arena_.Make<FontFaceSyntax>();
     if (!ParseBlock(face->declarations)) return false;
     context_.fontFaces_.Append(face);
@@ -103,20 +98,17 @@ bool Grammar::ParseFontFace() {
 }
 
 bool Grammar::ParseKeyframes() {
-    Advance();
-    SkipSpace();
+    AdvanceBeyondSpace();
     if (token_.kind != TokenKind::Ident && token_.kind != TokenKind::String) return Fail();
     KeyframesSyntax* keyframes = arena_.Make<KeyframesSyntax>();
     keyframes->name = token_.text();
-    Advance();
-    SkipSpace();
+    AdvanceBeyondSpace();
     if (!Expect('{')) return false;
     SkipSpace();
     do {
         if (!ParseKeyframeBlock(*keyframes)) return false;
     } while (!token_.Is('}'));
-    Advance();
-    SkipSpace();
+    AdvanceBeyondSpace();
     context_.keyframes_.Append(keyframes);
     return true;
 }
@@ -128,11 +120,9 @@ bool Grammar::ParseKeyframeBlock(KeyframesSyntax& keyframes) {
         KeyframeSelectorSyntax* selector = arena_.Make<KeyframeSelectorSyntax>();
         selector->text = token_.text();
         block->selectors.Append(selector);
-        Advance();
-        SkipSpace();
+        AdvanceBeyondSpace();
         if (!token_.Is(',')) break;
-        Advance();
-        SkipSpace();
+        AdvanceBeyondSpace();
     }
     if (!ParseBlock(block->declarations)) return false;
     keyframes.blocks.Append(block);
@@ -140,22 +130,19 @@ bool Grammar::ParseKeyframeBlock(KeyframesSyntax& keyframes) {
 }
 
 bool Grammar::ParseMedia() {
-    Advance();
-    SkipSpace();
+    AdvanceBeyondSpace();
     MediaSyntax* media = arena_.Make<MediaSyntax>();
     for (;;) {
         if (!ParseMediaQuery(media->queries)) return false;
         if (!token_.Is(',')) break;
-        Advance();
-        SkipSpace();
+        AdvanceBeyondSpace();
     }
     if (!Expect('{')) return false;
     SkipSpace();
     do {
         if (!ParseRuleset(media->rulesets)) return false;
     } while (!token_.Is('}'));
-    Advance();
-    SkipSpace();
+    AdvanceBeyondSpace();
     context_.mediaBlocks_.Append(media);
     return true;
 }
@@ -167,8 +154,7 @@ bool Grammar::ParseMediaQuery(SyntaxList<MediaQuerySyntax>& queries) {
     for (;;) {
         if (!ParseMediaExpression(*query)) return false;
         if (token_.kind != TokenKind::And) break;
-        Advance();
-        SkipSpace();
+        AdvanceBeyondSpace();
     }
     queries.Append(query);
     return true;
@@ -180,8 +166,7 @@ bool Grammar::ParseMediaExpression(MediaQuerySyntax& query) {
     if (token_.kind != TokenKind::Ident) return Fail();
     MediaExpressionSyntax* expression = arena_.Make<MediaExpressionSyntax>();
     expression->name = token_.text();
-    Advance();
-    SkipSpace();
+    AdvanceBeyondSpace();
     if (!Expect(':')) return false;
     SkipSpace();
     uint8_t flags = 0;

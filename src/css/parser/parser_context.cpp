@@ -18,6 +18,7 @@ ParserContextPtr ParseWrapped(std::string_view before, std::string_view text, st
     char* end = whole;
     for (std::string_view piece : {before, text, after})
         end = std::copy(piece.begin(), piece.end(), end);
+    *end = '\0';
     Grammar({whole, size}, *context).ParseSheet();
     return context;
 }

@@ -47,12 +47,24 @@ bool IsLineEnd(char c) {
     return c == '\n' || c == '\r' || c == '\f';
 }
 
+// Up to four letters in one number, in lower case; no byte of a name but a letter has a lower case here.
+constexpr uint32_t PackUnit(std::string_view text) {
+    uint32_t packed = 0;
+    for (const char c : text)
+        packed = packed << 8 | (static_cast<unsigned char>(c) | 0x20);
+    return packed;
+}
+
 bool IsUnit(std::string_view text) {
-    static constexpr std::string_view kUnits[] = {"px", "em",   "rem",  "s",    "ms", "deg", "vw",
-                                                  "vh", "vmin", "vmax", "in",   "pt", "ex",  "cm",
-                                                  "mm", "pc",   "rad",  "grad", "hz", "khz"};
-    for (std::string_view unit : kUnits)
-        if (EqualsIgnoreCase(unit, text)) return true;
+    if (text.size() > 4) return false;
+    static constexpr uint32_t kUnits[] = {
+        PackUnit("px"),  PackUnit("em"),  PackUnit("rem"),  PackUnit("s"),    PackUnit("ms"),
+        PackUnit("deg"), PackUnit("vw"),  PackUnit("vh"),   PackUnit("vmin"), PackUnit("vmax"),
+        PackUnit("in"),  PackUnit("pt"),  PackUnit("ex"),   PackUnit("cm"),   PackUnit("mm"),
+        PackUnit("pc"),  PackUnit("rad"), PackUnit("grad"), PackUnit("hz"),   PackUnit("khz")};
+    const uint32_t packed = PackUnit(text);
+    for (const uint32_t unit : kUnits)
+        if (unit == packed) return true;
     return false;
 }
 
@@ -71,7 +83,13 @@ const char* Scanner::SkipEscape(const char* backslash) const {
     return next;
 }
 
-const char* Scanner::SkipName(const char* from) const {
+inline const char* Scanner::SkipName(const char* from) const {
+    while (Has(*from, kNameByte))
+        ++from;
+    return *from == '\\' ? SkipNameWithEscapes(from) : from;
+}
+
+const char* Scanner::SkipNameWithEscapes(const char* from) const {
     while (from != end_) {
         if (Has(*from, kNameByte)) {
             ++from;
@@ -87,8 +105,7 @@ const char* Scanner::SkipName(const char* from) const {
 }
 
 bool Scanner::StartsIdent(const char* from) const {
-    if (from != end_ && *from == '-') ++from;
-    if (from == end_) return false;
+    if (*from == '-') ++from;
     return Has(*from, kNameStart) || (*from == '\\' && SkipEscape(from) != from);
 }
 
@@ -127,15 +144,15 @@ bool Scanner::FindStringEnd(const char* quote, const char*& end) const {
 void Scanner::TakeIdent(Token& out) {
     const char* end = SkipName(at_);
     std::string_view text(at_, static_cast<size_t>(end - at_));
-    if (end != end_ && *end == '(') {
-        if (EqualsIgnoreCase(text, "url")) return TakeUri(out);
+    if (*end == '(') {
+        if (text.size() == 3 && EqualsIgnoreCase(text, "url")) return TakeUri(out);
         return Take(TokenKind::Function, end + 1, out);
     }
     TokenKind kind = TokenKind::Ident;
     if (text.size() == 3 || text.size() == 4) {
-        if (EqualsIgnoreCase(text, "and")) kind = TokenKind::And;
-        if (EqualsIgnoreCase(text, "not")) kind = TokenKind::Not;
-        if (EqualsIgnoreCase(text, "only")) kind = TokenKind::Only;
+        if ((text[0] | 0x20) == 'a' && EqualsIgnoreCase(text, "and")) kind = TokenKind::And;
+        if ((text[0] | 0x20) == 'n' && EqualsIgnoreCase(text, "not")) kind = TokenKind::Not;
+        if ((text[0] | 0x20) == 'o' && EqualsIgnoreCase(text, "only")) kind = TokenKind::Only;
     }
     return Take(kind, end, out);
 }
@@ -166,14 +183,14 @@ void Scanner::TakeUri(Token& out) {
 
 void Scanner::TakeNumber(Token& out) {
     const char* end = at_ + (*at_ == '+' || *at_ == '-' ? 1 : 0);
-    while (end != end_ && Has(*end, kDigit))
+    while (Has(*end, kDigit))
         ++end;
-    if (end_ - end > 1 && *end == '.' && Has(end[1], kDigit)) {
+    if (*end == '.' && Has(end[1], kDigit)) {
         ++end;
-        while (end != end_ && Has(*end, kDigit))
+        while (Has(*end, kDigit))
             ++end;
     }
-    if (end != end_ && *end == '%') return Take(TokenKind::Percentage, end + 1, out);
+    if (*end == '%') return Take(TokenKind::Percentage, end + 1, out);
     if (!StartsIdent(end)) return Take(TokenKind::Number, end, out);
     const char* unit = end;
     end = SkipName(end);
@@ -231,21 +248,32 @@ void Scanner::TakePunctuation(Token& out) {
 }
 
 void Scanner::Next(Token& out) {
-    while (at_ != end_ && *at_ == '/' && SkipComment()) {
+    while (*at_ == '/' && SkipComment()) {
     }
-    if (at_ == end_) return Take(TokenKind::End, end_, out);
     ++count_;
     const char c = *at_;
+    if (Has(c, kNameStart)) return TakeIdent(out);
     if (Has(c, kSpace)) {
         const char* end = at_ + 1;
-        while (end != end_ && Has(*end, kSpace))
+        while (Has(*end, kSpace))
             ++end;
         return Take(TokenKind::Space, end, out);
     }
-    if (Has(c, kNameStart)) return TakeIdent(out);
     if (Has(c, kDigit)) return TakeNumber(out);
     if (Has(c, kAlone)) return TakeDelimiter(out);
+    if (c == '\0' && at_ == end_) {
+        --count_;
+        return Take(TokenKind::End, end_, out);
+    }
     TakeSpecial(out);
+}
+
+void Scanner::NextBeyondSpace(Token& out) {
+    do {
+        while (Has(*at_, kSpace))
+            ++at_;
+        Next(out);
+    } while (out.kind == TokenKind::Space);
 }
 
 // What starts with a byte that begins several kinds of tokens.

@@ -59,11 +59,14 @@ struct Token {
 
 class Scanner {
   public:
+    // A zero byte must follow the text: it belongs to no kind of bytes, and ends every run of them.
     explicit Scanner(std::string_view text) : at_(text.data()), end_(text.data() + text.size()) {}
 
     // Each byte is looked at a bounded number of times, whatever the text. The token is written where it is
     // used: handing it back by value costs more than finding it.
     void Next(Token& out);
+    // The next one that is no white space.
+    void NextBeyondSpace(Token& out);
     uint64_t count() const { return count_; }
 
   private:
@@ -71,6 +74,7 @@ class Scanner {
         return offset < static_cast<size_t>(end_ - at_) ? at_[offset] : '\0';
     }
     const char* SkipName(const char* from) const;
+    const char* SkipNameWithEscapes(const char* from) const;
     const char* SkipEscape(const char* backslash) const;
     bool StartsIdent(const char* from) const;
     bool Matches(std::string_view lowerCase) const;

@@ -69,6 +69,7 @@ class ElementSolver {
         }
         if (animates && !inherits && ownEmpty) {
             ApplyAll(dirty_ & kAnimatableProperties);
+            UpdateText();
         } else if (!TakeSharedStyle()) {
             FullPath();
         }

@@ -5,9 +5,16 @@
 
 namespace qorvex::css {
 
-PseudoState::PseudoState(const dom::Document& document) : focused_(document.GetFocusedElement()) {
+void PseudoState::Take(const dom::Document& document) {
+    SetFocused(document.GetFocusedElement());
     SetHovered(document.GetHost().GetHoveredNode());
     SetActive(document.GetHost().GetActiveNode());
+}
+
+void PseudoState::Forget() {
+    hoverChain_.clear();
+    activeChain_.clear();
+    focused_ = nullptr;
 }
 
 void PseudoState::FillChain(const dom::Node* node, Chain& chain) {

@@ -26,7 +26,10 @@ enum PseudoBits : uint8_t {
 class PseudoState {
   public:
     PseudoState() = default;
-    explicit PseudoState(const dom::Document& document);
+    explicit PseudoState(const dom::Document& document) { Take(document); }
+    // What holds in the document now. The room for the chains is kept from batch to batch.
+    void Take(const dom::Document& document);
+    void Forget();
 
     // The bits that hold for the element now. `selection` is no state and always holds.
     uint8_t BitsOf(const dom::Element& element) const;

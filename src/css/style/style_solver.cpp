@@ -65,11 +65,12 @@ void StyleSolver::Solve(Document& document, IAnimationSide* animations) {
 void StyleSolver::MatchDirtyElements(Document& document) {
     dom::NodeSet& dirty = document.GetSelectorDirtyElements();
     if (dirty.empty()) return;
-    const PseudoState pseudo(document);
-    MatchContext context(pseudo);
+    pseudo_.Take(document);
+    MatchContext context(pseudo_);
     for (Node* node : dirty)
         matcher_.MatchElementStyle(static_cast<Element&>(*node), rules_.defaults, rules_.author, context);
     dirty.clear();
+    pseudo_.Forget();
 }
 
 // In a full solve every element is matched where it is solved: the walk comes to it once.
@@ -160,8 +161,8 @@ void StyleSolver::SolveBelow(Document& document, Extent extent) {
                  matcher_.GetNothing(),
                  document.GetHost().GetFontResolver(),
                  document.GetLengthContext()};
-    const PseudoState pseudo(document);
-    MatchContext matching(pseudo);
+    if (extent == Extent::All) pseudo_.Take(document);
+    MatchContext matching(pseudo_);
     level_.clear();
     const auto visitFrom = [&](uint32_t first) {
         for (uint32_t i = first; i < level_.size(); ++i) {
@@ -185,6 +186,7 @@ void StyleSolver::SolveBelow(Document& document, Extent extent) {
         depth = roots_[rootsTaken_]->GetDepth() - 1;
     }
     FinishLevel();
+    pseudo_.Forget();
     rootFontSizeChanged_ |= run.rootFontSizeChanged;
 }
 

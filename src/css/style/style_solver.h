@@ -51,6 +51,7 @@ class StyleSolver {
     Rules rules_;
     StyleCounters& counters_;
     ElementMatcher matcher_;
+    PseudoState pseudo_;  // empty outside of a batch
     StyleSharingTable sharing_;
     TextStyleCache textStyles_;
     RootStyles rootStyles_;

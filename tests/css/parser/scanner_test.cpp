@@ -14,7 +14,8 @@ std::string Scan(std::string_view text) {
         "end", "_",   "<!--",  "-->",  "~=",   "|=",    "^=",  "$=",      "*=",  "and", "not", "only",
         "str", "bad", "id",    "--id", "hash", "class", "imp", "pag",     "med", "chs", "key", "fnt",
         "::",  "!",   "num+u", "dim",  "%",    "num",   "uri", "bad-uri", "fn",  "c"};
-    Scanner scanner(text);
+    const std::string ended(text);  // a zero byte behind it
+    Scanner scanner(ended);
     std::string out;
     Token token;
     for (scanner.Next(token); token.kind != TokenKind::End; scanner.Next(token)) {

@@ -284,6 +284,21 @@ TEST_F(Engine, TransitionsShowFromTheSecondSolveOn) {
     EXPECT_EQ(Computed(p, "opacity"), "0.5");
 }
 
+TEST_F(Engine, AnAnimatedFontSizeReachesWhatFollowsIt) {
+    Load("<div id='d' class='em'><p id='p'></p></div>", ".em { letter-spacing: 0.5em }");
+    Solve();
+    dom::Element& element = Find("d");
+    element.animatedProperties = qsl::AdoptRef(New<AnimatedProperties, MemoryTag::CSS>());
+    element.animatedProperties->activeCount[IndexOf(PropertyId::FontSize)] = 1;
+    element.animatedProperties->totalActive = 1;
+    element.animatedProperties->present.fontSize = Length::Pixels(40);
+    element.animatedProperties->dirty.Add(PropertyId::FontSize);
+    document_->MarkNodeDirty(element);
+    EXPECT_EQ(Computed("d", "font-size"), "40px");
+    EXPECT_EQ(Computed("p", "font-size"), "40px");
+    EXPECT_EQ(Computed("p", "letter-spacing"), "20px");
+}
+
 // --- Limits
 
 TEST_F(Engine, GrowingVariablesAreCut) {

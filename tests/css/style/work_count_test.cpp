@@ -79,6 +79,56 @@ TEST_F(WorkCount, AnInheritedChangeChangesOnlyWhoHasNoValueOfItsOwn) {
     EXPECT_EQ(work.propertiesChanged, 301u);  // the top and its rows; the cells have their own colour
 }
 
+// What nobody inherits costs the element alone, however much stands below it.
+TEST_F(WorkCount, AChangeIsFollowedNoFurtherThanItReaches) {
+    Load("<div id='top'>" + Rows(300) + "</div>", kSheet);
+    Solve();
+    StyleCounters work = Counted([&] {
+        Find("top").SetAttribute("style", "background-color: green; width: 70px");
+        Solve();
+    });
+    EXPECT_EQ(work.elementsSolved, 1u);
+    EXPECT_EQ(work.textNodesSolved, 0u);
+    // The same again: matched, and found to be equal.
+    work = Counted([&] {
+        Find("top").SetAttribute("style", "background-color: green; width: 70px");
+        Solve();
+    });
+    EXPECT_EQ(work.propertiesChanged, 0u);
+    EXPECT_EQ(work.elementsSolved, 1u);
+}
+
+TEST_F(WorkCount, OnlyWhatIsWonByAnotherDeclarationIsLookedAt) {
+    Load("<p id='p' class='row cell'></p>", kSheet);
+    Solve();
+    const StyleCounters work = Counted([&] {
+        Find("p").AddClass("on");
+        Solve();
+    });
+    EXPECT_EQ(work.propertiesApplied, 1u);  // width; the other four have the winners that they had
+}
+
+TEST_F(WorkCount, HoverDeepInAPageAllocatesNothing) {
+    std::string body;
+    for (int i = 0; i < 30; ++i)
+        body += "<div class='row'>";
+    Load(body + "<p id='p'></p>", ".row:hover { width: 60px } .row .row:hover { height: 3px }");
+    Solve();
+    const auto hover = [&](dom::Element* element) {
+        dom::Element& deepest = Find("p");
+        host_->hovered = element;
+        deepest.OnHoverChanged();
+        Solve();
+        document_->GetStyleRunLists().Clear();
+    };
+    for (int i = 0; i < 8; ++i)
+        hover(i % 2 ? &Find("p") : nullptr);
+    const uint64_t before = allocator_.Allocations();
+    for (int i = 0; i < 8; ++i)
+        hover(i % 2 ? &Find("p") : nullptr);
+    EXPECT_EQ(allocator_.Allocations(), before);
+}
+
 TEST_F(WorkCount, AColourChangeDoesNotLayOutText) {
     Load("<div id='top'>text</div>", kSheet);
     Solve();
