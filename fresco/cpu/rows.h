@@ -14,6 +14,13 @@ struct ColumnSample {
     uint16_t weights[8];
 };
 
+// Four texels around a point, as offsets from the picture's first one, and the 256ths of the right and of the
+// lower ones.
+struct TexelSample {
+    int32_t upper[2], lower[2];
+    uint16_t right, down;
+};
+
 // Of a Porter-Duff operator: nothing, all, the other one's alpha, what that leaves.
 enum class BlendFactor : uint8_t { Zero, One, Alpha, Inverse };
 
@@ -59,6 +66,7 @@ struct ColorMatrix {
     X(MixRows, (uint32_t * dst, const uint32_t* upper, const uint32_t* lower, int count, uint32_t weight))   \
     X(SampleColumns,                                                                                         \
       (uint32_t * dst, const uint32_t* row, const int32_t* offsets, const ColumnSample* samples, int count)) \
+    X(SampleTexels, (uint32_t * dst, const uint32_t* pixels, const TexelSample* samples, int count))         \
     X(LinearGradient, (uint32_t * dst, int x, int count, const GradientWalk& walk))                          \
     X(RadialGradient, (uint32_t * dst, int x, int count, const GradientWalk& walk))                          \
     /* Premultiplied colours start + step * i, channels 0 to 255. */                                         \

@@ -177,6 +177,14 @@ float Floor(float v) {
     return std::floor(AtLeast(AtMost(v, kBound), -kBound));
 }
 
+void SampleTexels(uint32_t* dst, const uint32_t* pixels, const TexelSample* samples, int count) {
+    for (int i = 0; i < count; ++i) {
+        const TexelSample& s = samples[i];
+        dst[i] = Mix(Mix(pixels[s.upper[0]], pixels[s.lower[0]], s.down),
+                     Mix(pixels[s.upper[1]], pixels[s.lower[1]], s.down), s.right);
+    }
+}
+
 // Positions are single floats, multiplied and added in this order, in every way.
 float TableIndex(float t, const GradientWalk& walk) {
     if (walk.spread == kSpreadRepeat) {

@@ -238,13 +238,28 @@ int ImageSource::Axis::Texel(int index) const {
     return index;
 }
 
-uint32_t ImageSource::Sample(double u, double v) const {
-    int x = 0, y = 0;
-    uint32_t wx = 0, wy = 0;
-    if (!u_.Locate(u, &x, &wx) || !v_.Locate(v, &y, &wy)) return 0;
-    const int x0 = u_.Texel(x), x1 = u_.Texel(x + 1);
-    const uint32_t *upper = level_->Row(v_.Texel(y)), *lower = level_->Row(v_.Texel(y + 1));
-    return Mix(Mix(upper[x0], lower[x0], wy), Mix(upper[x1], lower[x1], wy), wx);
+void ImageSource::FetchTurned(int x, int y, int count, uint32_t* out) {
+    texels_.resize(size_t(count));
+    const int pitch = level_->width();
+    constexpr uint16_t kGap = 256;  // no weight between two texels
+    bool gaps = false;
+    WalkRow(toTexels_, x, y, count, [&](int i, double u, double v) {
+        TexelSample& s = texels_[size_t(i)];
+        int left = 0, top = 0;
+        uint32_t right = 0, down = 0;
+        if (!u_.Locate(u, &left, &right) || !v_.Locate(v, &top, &down)) {
+            s = {{0, 0}, {0, 0}, kGap, 0};
+            gaps = true;
+            return;
+        }
+        const int upper = v_.Texel(top) * pitch, lower = v_.Texel(top + 1) * pitch;
+        const int x0 = u_.Texel(left), x1 = u_.Texel(left + 1);
+        s = {{upper + x0, upper + x1}, {lower + x0, lower + x1}, uint16_t(right), uint16_t(down)};
+    });
+    Rows().SampleTexels(out, level_->pixels(), texels_.data(), count);
+    for (int i = 0; gaps && i < count; ++i) {
+        if (texels_[size_t(i)].right == kGap) out[i] = 0;
+    }
 }
 
 // A row comes in pieces (edges, middle), the next row in the same ones: the columns of all are kept.
@@ -321,7 +336,7 @@ const uint32_t* ImageSource::Fetch(int x, int y, int count, uint32_t* room) {
     } else if (toTexels_.IsScaleTranslate()) {
         FetchUpright(x, y, count, room);
     } else {
-        WalkRow(toTexels_, x, y, count, [&](int i, double u, double v) { room[i] = Sample(u, v); });
+        FetchTurned(x, y, count, room);
     }
     if (alpha_ != 255) Rows().Scale(room, count, alpha_);
     return room;

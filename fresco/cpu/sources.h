@@ -78,7 +78,7 @@ class ImageSource final : public PixelSource {
         int Texel(int index) const;
     };
 
-    uint32_t Sample(double u, double v) const;
+    void FetchTurned(int x, int y, int count, uint32_t* out);
     void FetchUpright(int x, int y, int count, uint32_t* out);
     void LocateColumns(int x, int y, int count);
     const uint32_t* MixedRow(int y);
@@ -98,6 +98,7 @@ class ImageSource final : public PixelSource {
     Vector<uint32_t> mixed_;
     int mixedFirst_ = 0, mixedCount_ = 0, mixedY_ = 0;
     bool hasMixed_ = false;
+    Vector<TexelSample> texels_;  // of a row under a turn or a perspective
 };
 
 // Another source where the user's point lies in a target's row, column or rectangle, and nothing elsewhere.

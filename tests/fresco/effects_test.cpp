@@ -184,6 +184,22 @@ TEST(Effects, TilesRepeatWithTheirSpacing) {
     }
 }
 
+TEST(Effects, TurnedTilesKeepTheirGaps) {
+    Canvas canvas;
+    const uint32_t white[4] = {0xFFFFFFFFu, 0xFFFFFFFFu, 0xFFFFFFFFu, 0xFFFFFFFFu};
+    const ImageId image = Library::GetImageName();
+    CommandBuffer* b = Buffer();
+    b->CreateImage(image, {2, 2, PixelFormat::RGBA8, 0, 0, white});
+    b->MultiplyTransform(Turned());
+    b->DrawImageTiled(image, {0, 0, 0, 60, 40}, {{}, {3, 0, 0, 8, 40}, 6, 0}, Paint{});
+    canvas.Draw(b);
+    ForInside(Turned(), {0, 0, 0, 60, 40}, [&](int x, int y, Vec2 p) {
+        const double at = std::fmod(p.x - 3 + 14, 14);
+        if (at > 0.5 && at < 7.5) EXPECT_EQ(canvas.At(x, y).a, 255) << Name(0, x, y);
+        if (at > 8.5 && at < 13.5) EXPECT_EQ(canvas.At(x, y).a, 0) << Name(1, x, y);
+    });
+}
+
 TEST(Effects, VideoPlanesBecomeColours) {
     Canvas canvas;
     const auto plane = [&](CommandBuffer* b, int size, uint8_t left, uint8_t right,

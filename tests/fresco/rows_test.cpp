@@ -116,6 +116,14 @@ TEST(RowLoops, SamplesAndGradientsAreEqualInEveryWay) {
         }
         l.SampleColumns(r.dst, r.src, offsets, samples, r.count);
     });
+    ExpectEqualWays("SampleTexels", [](const RowLoops& l, Sample& r) {
+        TexelSample samples[kMax];
+        for (TexelSample& s : samples) {
+            const auto at = [&] { return int32_t(r.random() % kMax); };
+            s = {{at(), at()}, {at(), at()}, uint16_t(r.random() % 256), uint16_t(r.random() % 256)};
+        }
+        l.SampleTexels(r.dst, r.src, samples, r.count);
+    });
     const auto walk = [](Sample& r) {
         GradientWalk w{};
         w.colors = r.other, w.last = kMax - 1, w.spread = r.random() % 3;
