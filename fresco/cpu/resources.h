@@ -19,7 +19,7 @@ struct Texture {
     uint32_t sourceFormat = 0;  // PixelFormat of updates
     uint32_t flags = 0;         // ImageFlags
     const UserImage* user = nullptr;
-    uint32_t owner = 0;  // of a surface
+    uint32_t owner = 0;          // of a surface
     Vector<PixelBuffer> levels;  // half sizes, from the second level on
     bool levelsValid = false;
 

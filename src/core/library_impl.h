@@ -56,7 +56,7 @@ class LibraryImpl final : public Library {
     bool Start(const LibraryParams& params, fresco::IRenderingLibrary* external);
     bool StartRendering(const LibraryParams& params, fresco::IRenderingLibrary* external);
     void ReadOptions(const char* options);
-    bool DestroyForgottenSystems();
+    void DestroyForgottenSystems();
     void Fail();
     void Free();
 
