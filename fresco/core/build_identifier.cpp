@@ -7,7 +7,7 @@ namespace {
 
 #define FRESCO_TEXT(name, tail, fields) #name #tail #fields ";"
 #define FRESCO_FIELD(type, field)
-constexpr char kShape[] = FRESCO_COMMANDS(FRESCO_TEXT, FRESCO_FIELD) "interfaces 1";
+constexpr char kShape[] = FRESCO_COMMANDS(FRESCO_TEXT, FRESCO_FIELD) "interfaces 2";
 #undef FRESCO_TEXT
 #undef FRESCO_FIELD
 

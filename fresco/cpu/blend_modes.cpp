@@ -2,6 +2,7 @@
 
 #include <fresco/paint.h>
 #include "fresco/cpu/pixels.h"
+#include "fresco/cpu/rows.h"
 
 namespace fresco::cpu {
 namespace {
@@ -9,46 +10,6 @@ namespace {
 struct Rgb {
     float r, g, b;
 };
-
-float HardLight(float s, float d) {
-    return s <= 0.5f ? d * 2 * s : d + (2 * s - 1) - d * (2 * s - 1);
-}
-
-float SoftLight(float s, float d) {
-    if (s <= 0.5f) return d - (1 - 2 * s) * d * (1 - d);
-    const float g = d <= 0.25f ? ((16 * d - 12) * d + 4) * d : std::sqrt(d);
-    return d + (2 * s - 1) * (g - d);
-}
-
-// Colours that are not premultiplied, source over backdrop.
-float Separable(uint32_t mode, float s, float d) {
-    switch (mode) {
-        case kBlendMultiply:
-            return s * d;
-        case kBlendScreen:
-            return s + d - s * d;
-        case kBlendOverlay:
-            return HardLight(d, s);
-        case kBlendDarken:
-            return std::min(s, d);
-        case kBlendLighten:
-            return std::max(s, d);
-        case kBlendColorDodge:
-            return d <= 0 ? 0 : s >= 1 ? 1 : std::min(1.0f, d / (1 - s));
-        case kBlendColorBurn:
-            return d >= 1 ? 1 : s <= 0 ? 0 : 1 - std::min(1.0f, (1 - d) / s);
-        case kBlendHardLight:
-            return HardLight(s, d);
-        case kBlendSoftLight:
-            return SoftLight(s, d);
-        case kBlendDifference:
-            return std::abs(s - d);
-        case kBlendExclusion:
-            return s + d - 2 * s * d;
-        default:
-            return s;
-    }
-}
 
 float Luminosity(Rgb c) {
     return 0.3f * c.r + 0.59f * c.g + 0.11f * c.b;
@@ -97,77 +58,78 @@ Rgb NonSeparable(uint32_t mode, Rgb s, Rgb d) {
     }
 }
 
-struct Operator {
-    // Factors of source and destination: 0, 1, alpha of the other, or its complement.
-    enum Factor : uint8_t { Zero, One, Alpha, Inverse } source, destination;
-};
-
-constexpr Operator kOperators[] = {
-    {Operator::Zero, Operator::Zero},        // clear
-    {Operator::One, Operator::Zero},         // source
-    {Operator::Alpha, Operator::Zero},       // source in
-    {Operator::Inverse, Operator::Zero},     // source out
-    {Operator::Alpha, Operator::Inverse},    // source atop
-    {Operator::Inverse, Operator::One},      // destination over
-    {Operator::Zero, Operator::Alpha},       // destination in
-    {Operator::Zero, Operator::Inverse},     // destination out
-    {Operator::Inverse, Operator::Alpha},    // destination atop
-    {Operator::Inverse, Operator::Inverse},  // xor
-};
-
-uint32_t Weigh(Operator::Factor factor, uint32_t pixel, uint32_t otherAlpha) {
-    switch (factor) {
-        case Operator::Zero:
-            return 0;
-        case Operator::One:
-            return pixel;
-        case Operator::Alpha:
-            return ScalePixel(pixel, otherAlpha);
-        default:
-            return ScalePixel(pixel, 255 - otherAlpha);
-    }
-}
-
-// Channel by channel, held at 255: rounding of two products may reach 256.
-uint32_t AddSaturated(uint32_t a, uint32_t b) {
-    uint32_t sum = 0;
-    for (int shift = 0; shift < 32; shift += 8) {
-        sum |= std::min(255u, ((a >> shift) & 255) + ((b >> shift) & 255)) << shift;
-    }
-    return sum;
-}
-
 float Channel(uint32_t pixel, int shift) {
     return float((pixel >> shift) & 255) / 255;
 }
 
-}  // namespace
-
-uint32_t BlendPixel(uint32_t mode, uint32_t src, uint32_t dst) {
-    if (mode == kBlendNormal || mode >= kBlendModeCount) return src + ScalePixel(dst, 255 - (src >> 24));
-    if (mode == kBlendAdditive) return AddSaturated(src, dst);
-    if (mode >= kBlendClear) {
-        const Operator& op = kOperators[mode - kBlendClear];
-        return AddSaturated(Weigh(op.source, src, dst >> 24), Weigh(op.destination, dst, src >> 24));
-    }
+// Hue, saturation, colour, luminosity: the channels depend on each other.
+uint32_t BlendNonSeparable(uint32_t mode, uint32_t src, uint32_t dst) {
     const float sa = Channel(src, 24), da = Channel(dst, 24);
     if (sa == 0) return dst;
     if (da == 0) return src;
     const Rgb s{Channel(src, 0), Channel(src, 8), Channel(src, 16)};
     const Rgb d{Channel(dst, 0), Channel(dst, 8), Channel(dst, 16)};
-    const Rgb us{s.r / sa, s.g / sa, s.b / sa}, ud{d.r / da, d.g / da, d.b / da};
-    Rgb mixed;
-    if (mode >= kBlendHue) {
-        mixed = NonSeparable(mode, us, ud);
-    } else {
-        mixed = {Separable(mode, us.r, ud.r), Separable(mode, us.g, ud.g), Separable(mode, us.b, ud.b)};
-    }
+    const Rgb mixed = NonSeparable(mode, {s.r / sa, s.g / sa, s.b / sa}, {d.r / da, d.g / da, d.b / da});
     const auto join = [&](float sc, float dc, float m) {
         return sc * (1 - da) + dc * (1 - sa) + sa * da * m;
     };
     const float alpha = sa + da - sa * da;
     return PackPixel(std::min(alpha, join(s.r, d.r, mixed.r)), std::min(alpha, join(s.g, d.g, mixed.g)),
                      std::min(alpha, join(s.b, d.b, mixed.b)), alpha);
+}
+
+struct Operator {
+    BlendFactor source, target;
+};
+
+// From kBlendAdditive on.
+constexpr Operator kOperators[] = {
+    {BlendFactor::One, BlendFactor::One},          // additive
+    {BlendFactor::Zero, BlendFactor::Zero},        // clear
+    {BlendFactor::One, BlendFactor::Zero},         // source
+    {BlendFactor::Alpha, BlendFactor::Zero},       // source in
+    {BlendFactor::Inverse, BlendFactor::Zero},     // source out
+    {BlendFactor::Alpha, BlendFactor::Inverse},    // source atop
+    {BlendFactor::Inverse, BlendFactor::One},      // destination over
+    {BlendFactor::Zero, BlendFactor::Alpha},       // destination in
+    {BlendFactor::Zero, BlendFactor::Inverse},     // destination out
+    {BlendFactor::Inverse, BlendFactor::Alpha},    // destination atop
+    {BlendFactor::Inverse, BlendFactor::Inverse},  // xor
+};
+static_assert(sizeof(kOperators) / sizeof(Operator) == kBlendModeCount - kBlendAdditive);
+
+// Full coverage.
+void BlendWhole(uint32_t mode, uint32_t* dst, const uint32_t* src, int count) {
+    if (mode == kBlendNormal || mode >= kBlendModeCount) return Rows().BlendRow(dst, src, count, 255);
+    if (mode >= kBlendAdditive) {
+        const Operator& op = kOperators[mode - kBlendAdditive];
+        return Rows().BlendOperator(dst, src, count, op.source, op.target);
+    }
+    if (mode < kBlendHue) return Rows().BlendSeparable(mode, dst, src, count);
+    for (int i = 0; i < count; ++i)
+        dst[i] = BlendNonSeparable(mode, src[i], dst[i]);
+}
+
+}  // namespace
+
+uint32_t BlendPixel(uint32_t mode, uint32_t src, uint32_t dst) {
+    BlendWhole(mode, &dst, &src, 1);
+    return dst;
+}
+
+void BlendModeRow(uint32_t mode, uint32_t* dst, const uint32_t* src, int count, const uint8_t* mask,
+                  uint8_t coverage) {
+    if (!mask && coverage == 255) return BlendWhole(mode, dst, src, count);
+    constexpr int kPiece = 256;
+    uint32_t blended[kPiece];
+    uint8_t constant[kPiece];
+    if (!mask) std::memset(constant, coverage, sizeof(constant));
+    for (int at = 0; at < count; at += kPiece) {
+        const int length = std::min(kPiece, count - at);
+        std::memcpy(blended, dst + at, size_t(length) * 4);
+        BlendWhole(mode, blended, src + at, length);
+        Rows().MixByMask(dst + at, blended, length, mask ? mask + at : constant);
+    }
 }
 
 }  // namespace fresco::cpu

@@ -1,5 +1,7 @@
 #include "fresco/cpu/clip.h"
 
+#include "fresco/cpu/rows.h"
+
 namespace fresco::cpu {
 namespace {
 
@@ -7,6 +9,7 @@ namespace {
 constexpr size_t kMaxRegionRects = 64;
 // Spans that pass a mask are handled in pieces of this length.
 constexpr int kPiece = 512;
+constexpr size_t kMaskAlignment = 64;
 
 // What of `a` lies outside of `b`, as at most four rectangles.
 void Subtract(const IRect& a, const IRect& b, Vector<IRect>* out) {
@@ -23,12 +26,47 @@ void Subtract(const IRect& a, const IRect& b, Vector<IRect>* out) {
 
 }  // namespace
 
-ClipMaskPtr MakeClipMask(const IRect& bounds) {
+ClipMask::ClipMask(const IRect& area, MaskBudget* counted) : bounds(area), budget(counted) {
+    coverage = static_cast<uint8_t*>(HeapAllocate(size(), kMaskAlignment));
+    if (coverage) std::memset(coverage, 0, size());
+    if (budget) budget->used.fetch_add(size(), std::memory_order_relaxed);
+}
+
+ClipMask::~ClipMask() {
+    HeapFree(coverage, kMaskAlignment);
+    if (budget) budget->used.fetch_sub(size(), std::memory_order_relaxed);
+}
+
+ClipMaskPtr MakeClipMask(const IRect& bounds, MaskBudget* budget) {
     if (bounds.IsEmpty()) return nullptr;
-    auto mask = std::allocate_shared<ClipMask>(StdAllocator<ClipMask>());
-    mask->bounds = bounds;
-    mask->coverage.assign(size_t(bounds.Width()) * size_t(bounds.Height()), 0);
-    return mask;
+    auto mask = std::allocate_shared<ClipMask>(StdAllocator<ClipMask>(), bounds, budget);
+    return mask->coverage ? mask : nullptr;
+}
+
+void ClipMask::CopyRow(int y, int x0, int x1, uint8_t* out) const {
+    const int a = std::clamp(bounds.x0, x0, x1), b = std::clamp(bounds.x1, a, x1);
+    if (y < bounds.y0 || y >= bounds.y1 || a == b) {
+        std::memset(out, outside, size_t(x1 - x0));
+        return;
+    }
+    std::memset(out, outside, size_t(a - x0));
+    std::memcpy(out + (a - x0), Row(y) + a, size_t(b - a));
+    std::memset(out + (b - x0), outside, size_t(x1 - b));
+}
+
+void ClipMask::MultiplyRow(int y, int x0, int x1, uint8_t* out) const {
+    const int a = std::clamp(bounds.x0, x0, x1), b = std::clamp(bounds.x1, a, x1);
+    const bool inside = y >= bounds.y0 && y < bounds.y1 && a < b;
+    if (inside) Rows().MultiplyMask(out + (a - x0), Row(y) + a, b - a);
+    if (outside != 0) return;
+    std::memset(out, 0, size_t((inside ? a : x1) - x0));
+    if (inside) std::memset(out + (b - x0), 0, size_t(x1 - b));
+}
+
+bool ClipMask::IsFull() const {
+    // Most masks tell by their corners.
+    if (coverage[0] != 255 || coverage[size() - 1] != 255) return false;
+    return std::memcmp(coverage, coverage + 1, size() - 1) == 0;
 }
 
 void Clip::SetRects(Vector<IRect> rects) {
@@ -52,7 +90,7 @@ void Clip::ToMask(const IRect& bounds) {
         for (int y = visible.y0; y < visible.y1; ++y)
             Filter(y, visible.x0, visible.x1, 255, sink);
     }
-    bounds_ = bounds;
+    bounds_ = flat ? bounds : IRect{};
     rects_ = nullptr;
     mask_ = flat;
 }
@@ -86,7 +124,8 @@ void Clip::AddRect(const IRect& rect) {
     if (rect.IsEmpty()) return;
     if (mask_) {
         ClipMaskPtr added = MakeClipMask(rect);
-        std::memset(added->coverage.data(), 255, added->coverage.size());
+        if (!added) return;
+        std::memset(added->coverage, 255, added->size());
         return AddMask(added);
     }
     Vector<IRect> rects, pieces, rest;
@@ -116,18 +155,15 @@ void Clip::IntersectMask(ClipMaskPtr mask) {
         // The product of both, over where at least one of them says something of its own.
         IRect area = bounds_;
         if (mask->outside && mask_->outside) area = Intersect(bounds_, Unite(mask->bounds, mask_->bounds));
-        ClipMaskPtr product = MakeClipMask(area);
-        if (!product) return;
+        ClipMaskPtr product = MakeClipMask(area, mask->budget);
+        if (!product) {
+            *this = Clip();
+            return;
+        }
         product->outside = mask->outside & mask_->outside;
         for (int y = area.y0; y < area.y1; ++y) {
-            uint8_t* out = product->Row(y);
-            const auto at = [y](const ClipMask& m, int x) -> uint32_t {
-                const bool inside =
-                    y >= m.bounds.y0 && y < m.bounds.y1 && x >= m.bounds.x0 && x < m.bounds.x1;
-                return inside ? m.Row(y)[x] : m.outside;
-            };
-            for (int x = area.x0; x < area.x1; ++x)
-                out[x] = uint8_t(MulDiv255(at(*mask, x), at(*mask_, x)));
+            mask->CopyRow(y, area.x0, area.x1, product->Row(y) + area.x0);
+            mask_->MultiplyRow(y, area.x0, area.x1, product->Row(y) + area.x0);
         }
         mask_ = product;
         return;
@@ -137,8 +173,9 @@ void Clip::IntersectMask(ClipMaskPtr mask) {
 
 void Clip::ExcludeMask(const ClipMaskPtr& mask) {
     if (!mask) return;
-    ClipMaskPtr complement = MakeClipMask(mask->bounds);
-    for (size_t i = 0; i < complement->coverage.size(); ++i)
+    ClipMaskPtr complement = MakeClipMask(mask->bounds, mask->budget);
+    if (!complement) return;
+    for (size_t i = 0; i < complement->size(); ++i)
         complement->coverage[i] = uint8_t(255 - mask->coverage[i]);
     complement->outside = 255;
     IntersectMask(std::move(complement));
@@ -147,6 +184,7 @@ void Clip::ExcludeMask(const ClipMaskPtr& mask) {
 void Clip::AddMask(const ClipMaskPtr& mask) {
     if (!mask) return;
     ToMask(Unite(bounds_, mask->bounds));
+    if (!mask_) return;
     auto sum = std::const_pointer_cast<ClipMask>(mask_);  // fresh from ToMask: nobody else has it
     for (int y = mask->bounds.y0; y < mask->bounds.y1; ++y) {
         const uint8_t* from = mask->Row(y);
@@ -189,9 +227,8 @@ void Clip::FilterMasked(int y, int x0, int x1, const uint8_t* coverage, uint8_t 
         if (!coverage && constant == 255) {
             out.Mask(y, x, row + x, count);
         } else {
-            for (int i = 0; i < count; ++i) {
-                product[i] = uint8_t(MulDiv255(row[x + i], coverage ? coverage[x + i] : constant));
-            }
+            Rows().ScaleMask(product, row + x, count, coverage ? 255 : constant);
+            if (coverage) Rows().MultiplyMask(product, coverage + x, count);
             out.Mask(y, x, product, count);
         }
         x += count;

@@ -1,29 +1,54 @@
 // The clip of the CPU back end: a region of whole pixels, and a coverage mask where edges are not pixel
 // edges. A clip is a value that is cheap to copy: rectangles and masks are shared and never change once made.
 #pragma once
+#include <atomic>
 #include <memory>
 
 #include "fresco/cpu/rasterizer.h"
 
 namespace fresco::cpu {
 
+// What the masks of all clips may hold together: nested states each keep theirs. Any thread that paints.
+struct MaskBudget {
+    static constexpr size_t kBytes = size_t(256) << 20;
+    std::atomic<size_t> used{0};
+
+    bool HasRoom(const IRect& bounds) const {
+        return used.load(std::memory_order_relaxed) + size_t(bounds.Width()) * size_t(bounds.Height()) <=
+               kBytes;
+    }
+};
+
 // Coverage over `bounds`; everywhere else it is `outside` (0 or 255).
 struct ClipMask {
     IRect bounds;
     uint8_t outside = 0;
-    Vector<uint8_t> coverage;
+    uint8_t* coverage = nullptr;
+    MaskBudget* budget = nullptr;
+
+    // Zeroed; without coverage when there is no memory.
+    ClipMask(const IRect& area, MaskBudget* counted);
+    ~ClipMask();
+    ClipMask(const ClipMask&) = delete;
+    ClipMask& operator=(const ClipMask&) = delete;
+    size_t size() const { return size_t(bounds.Width()) * size_t(bounds.Height()); }
+
+    // What the mask says from x0 to x1, its bounds or not: into a row, and times a row.
+    void CopyRow(int y, int x0, int x1, uint8_t* out) const;
+    void MultiplyRow(int y, int x0, int x1, uint8_t* out) const;
+    // All of it is 255: the bounds say as much.
+    bool IsFull() const;
 
     const uint8_t* Row(int y) const {
-        return coverage.data() + size_t(y - bounds.y0) * size_t(bounds.Width()) - bounds.x0;
+        return coverage + size_t(y - bounds.y0) * size_t(bounds.Width()) - bounds.x0;
     }
-    uint8_t* Row(int y) {
-        return coverage.data() + size_t(y - bounds.y0) * size_t(bounds.Width()) - bounds.x0;
-    }
+    uint8_t* Row(int y) { return coverage + size_t(y - bounds.y0) * size_t(bounds.Width()) - bounds.x0; }
 };
 using ClipMaskPtr = std::shared_ptr<ClipMask>;
 
-// Zeroed coverage; null when there is nothing inside the bounds.
-ClipMaskPtr MakeClipMask(const IRect& bounds);
+// Zeroed coverage; null when there is nothing inside the bounds, or no memory. Counted in the budget when
+// there is one.
+ClipMaskPtr MakeClipMask(const IRect& bounds, MaskBudget* budget = nullptr);
 
 // Collects coverage into a mask.
 class MaskSink final : public CoverageSink {

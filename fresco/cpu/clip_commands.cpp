@@ -1,4 +1,5 @@
 // Clip records. Rectangles on pixel edges stay rectangles; everything else becomes coverage.
+#include "fresco/core/log.h"
 #include "fresco/cpu/cpu_backend.h"
 
 namespace fresco::cpu {
@@ -66,12 +67,20 @@ void CpuBackend::ApplyClip(const PathView& path, const Homography& plane, FillRu
     // Only what the clip can let through needs coverage.
     const IRect limit = mode == kClipSet || mode == kClipAdd ? base_.bounds() : clip_.bounds();
     const IRect bounds = Intersect(device, limit);
-    ClipMaskPtr mask = MakeClipMask(bounds);
+    if (!shared_.clipMasks.HasRoom(bounds)) {
+        FRESCO_WARN("No room for a clip of %d x %d pixels, clipping to its box", bounds.Width(),
+                    bounds.Height());
+        if (mode != kClipExclude) ApplyClipRect(bounds, mode);
+        return;
+    }
+    ClipMaskPtr mask = MakeClipMask(bounds, &shared_.clipMasks);
     if (mask) {
         MaskSink sink(*mask);
         rasterizer_.Begin(bounds);
         builder_.AddFill(path, plane, rasterizer_);
         rasterizer_.Sweep(rule, sink);
+        // Inside of the shape, as a small repaint often is: nothing to test for each span.
+        if (mode != kClipAdd && mask->IsFull()) return ApplyClipRect(bounds, mode);
     }
     switch (mode) {
         case kClipExclude:
@@ -83,6 +92,7 @@ void CpuBackend::ApplyClip(const PathView& path, const Homography& plane, FillRu
             Clip added = base_;
             added.IntersectMask(mask);
             ClipMaskPtr visible = MakeClipMask(bounds);
+            if (!visible) return;
             MaskSink sink(*visible);
             for (int y = bounds.y0; y < bounds.y1; ++y)
                 added.Filter(y, bounds.x0, bounds.x1, 255, sink);

@@ -12,7 +12,7 @@ void CpuBackend::BeginTarget(SurfaceId surface) {
         root_ = surface_ ? surface_->pixels.View(0, 0) : Bitmap{};
     }
     transform_ = Matrix4{};
-    clip_ = Clip(root_.bounds);
+    clip_ = Clip(surface == kNoId ? Intersect(root_.bounds, band_) : root_.bounds);
     base_ = clip_;
     scissor_ = false;
     saved_.clear();
@@ -45,6 +45,17 @@ void CpuBackend::Touch(const IRect& rect) {
         layer.touched = Unite(layer.touched, rect);
         return;
     }
+}
+
+bool CpuBackend::IsOutside(const Rect& rect, const Homography& plane) const {
+    const IRect& c = clip_.bounds();
+    if (c.IsEmpty()) return true;
+    if (!plane.IsScaleTranslate()) return false;
+    const Vec2 a = plane.Apply(rect.x, rect.y);
+    const Vec2 b = plane.Apply(double(rect.x) + rect.width, double(rect.y) + rect.height);
+    // A pixel more than needed: what lies on an edge may be rounded onto it.
+    return std::max(a.x, b.x) < c.x0 - 1 || std::min(a.x, b.x) > c.x1 + 1 || std::max(a.y, b.y) < c.y0 - 1 ||
+           std::min(a.y, b.y) > c.y1 + 1;
 }
 
 Ink CpuBackend::SolidInk(const Paint& paint) const {

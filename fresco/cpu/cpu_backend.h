@@ -4,6 +4,7 @@
 // Its files: cpu_backend.cpp (targets, state), clip_commands.cpp, draw_shapes.cpp, draw_images.cpp,
 // draw_text.cpp, layers.cpp.
 #pragma once
+#include <fresco/paint_helpers.h>
 #include <fresco/scene.h>
 #include "fresco/backend/backend.h"
 #include "fresco/cpu/clip.h"
@@ -15,23 +16,29 @@
 
 namespace fresco::cpu {
 
-// What all scenes of a library share; render thread only.
+// What all scenes of a library share. Frames change it on the render thread; while several threads paint
+// bands of one, each part takes its own lock.
 struct SharedState {
+    IPaintHelpers* helpers = nullptr;
     FontService fonts;
     Resources resources;
     GlyphCache glyphs;
     LayerPool layers;
-    HashMap<uint64_t, Texture> colorGlyphs;
+    MaskBudget clipMasks;
 };
 
 class CpuBackend final : public Backend {
   public:
     explicit CpuBackend(SharedState& shared) : shared_(shared), owner_(shared.resources.NewOwner()) {}
 
-    void SetRenderTarget(const Bitmap& bitmap) { target_ = bitmap; }
+    void SetRenderTarget(const Bitmap& bitmap) { target_ = bitmap, band_ = bitmap.bounds; }
+    // Only this part of the target is painted.
+    void SetBand(const IRect& band) { band_ = band; }
     const Bitmap& GetRenderTarget() const { return target_; }
     void SetCustomCompositor(ICustomCompositor* compositor) { compositor_ = compositor; }
     void SetCustomEffectRenderer(ICustomEffectRenderer* renderer) { effectRenderer_ = renderer; }
+    bool HasCustomCompositor() const { return compositor_ != nullptr; }
+    bool HasCustomEffectRenderer() const { return effectRenderer_ != nullptr; }
     SceneStats& stats() { return stats_; }
     // Of the surfaces that its streams make.
     uint32_t owner() const { return owner_; }
@@ -47,7 +54,8 @@ class CpuBackend final : public Backend {
     };
     struct Layer {
         PixelBuffer pixels;
-        IRect bounds, touched;
+        IRect bounds, touched, cleared;
+        uint32_t filters = 0;    // how many of its filters apply
         bool collapsed = false;  // without pixels of its own: draws go to the parent
         uint32_t flags = 0;
         LayerPaint paint;
@@ -66,6 +74,8 @@ class CpuBackend final : public Backend {
     Homography PlaneAt(float z) const { return Homography::FromMatrix(transform_, z); }
     Bitmap CurrentBitmap() const;
     void Touch(const IRect& rect);
+    // True when an upright rectangle lies wholly outside of the clip: most draws of a small repaint end here.
+    bool IsOutside(const Rect& rect, const Homography& plane) const;
 
     // --- drawing
     Ink SolidInk(const Paint& paint) const;
@@ -81,7 +91,8 @@ class CpuBackend final : public Backend {
 
     // --- text
     void DrawRun(const GlyphRunParams& run, const Glyph* glyphs, uint32_t count, bool stroke);
-    void DrawGlyphBitmap(const FontFace& face, uint32_t glyph, float size, Vec2 at, const Ink& ink);
+    void DrawCachedRun(const FontFace& face, const GlyphRunParams& run, const Glyph* glyphs, uint32_t count,
+                       const Homography& plane, const Ink& ink);
     bool DrawColorGlyph(const FontFace& face, uint32_t glyph, float size, Point at, const Paint& paint);
 
     // --- clips
@@ -97,7 +108,8 @@ class CpuBackend final : public Backend {
     void FillWithEffect(Layer& layer, uint32_t kind, const uint8_t* data);
     void RunCustomEffect(Layer& layer, const uint8_t* data, uint32_t size);
     bool Compose(const Layer& layer, float opacity);
-    void MergeLayer(const Layer& layer, uint32_t blend, float opacity);
+    void TakeLayerPixels(Layer& layer, const int outset[4]);
+    void MergeLayer(Layer& layer, uint32_t blend, float opacity);
     void MaskLayer(Texture* texture, const Rect& area, const ImageSource::Placement& placement);
     // Calls `use` with the colour source that a gradient or pattern effect describes.
     template <class Use>
@@ -107,6 +119,7 @@ class CpuBackend final : public Backend {
     SharedState& shared_;
     const uint32_t owner_;
     Bitmap target_;  // the scene's
+    IRect band_;
     const StreamSource* stream_ = nullptr;
     Texture* surface_ = nullptr;  // the stream's target when it is a surface
     Bitmap root_;                 // target of the stream, below all layers
@@ -126,6 +139,7 @@ class CpuBackend final : public Backend {
     Vector<uint32_t> codePoints_, glyphIndices_;
     Vector<float> advances_;
     Vector<Glyph> glyphs_;
+    Vector<PlacedGlyph> placed_;
 
     ICustomCompositor* compositor_ = nullptr;
     ICustomEffectRenderer* effectRenderer_ = nullptr;

@@ -11,7 +11,6 @@ void CpuLibrary::FreeRenderingResources() {
     shared_.resources.Clear();
     shared_.layers.Clear();
     shared_.glyphs.Clear();
-    shared_.colorGlyphs.clear();
 }
 
 IScene* CpuLibrary::CreateScene(const SceneParams&) {

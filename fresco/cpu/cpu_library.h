@@ -14,6 +14,7 @@ class CpuLibrary final : public IRenderingLibrary {
     void SetFileManipulator(IFileManipulator* files) override { shared_.fonts.SetFiles(files); }
     IFontService* GetFontService() override { return &shared_.fonts; }
     IScene* CreateScene(const SceneParams& params) override;
+    void SetPaintHelpers(IPaintHelpers* helpers) override { shared_.helpers = helpers; }
     void Forward(uint64_t first, uint64_t second, uint64_t third) override;
     void Destroy() override;
 

@@ -2,11 +2,18 @@
 
 #include "fresco/commands/capture.h"
 #include "fresco/core/log.h"
+#include "fresco/cpu/bands.h"
 
 namespace fresco::cpu {
 namespace {
 
 constexpr size_t kGlyphCacheBytes = size_t(16) << 20;
+// Below this a frame is done before a helper wakes up.
+constexpr int64_t kMinBandedPixels = 1 << 17;
+// Every band walks the whole stream, and a few of them for each thread even out what they hold.
+constexpr int kMinBandHeight = 32;
+constexpr uint32_t kBandsAThread = 4;
+constexpr uint32_t kMaxHelpers = 15;
 constexpr size_t kCaptureAlignment = 16;
 
 }  // namespace
@@ -35,16 +42,54 @@ void CpuScene::SetRenderTarget(void* color, void*, const RenderTargetDescription
     backend_.SetRenderTarget(bitmap);
 }
 
-void CpuScene::ExecuteFrontEnd(CommandBuffer* const* buffers, uint32_t count) {
-    shared_.resources.DropRetired();
+void CpuScene::ExecuteAll(CommandBuffer* const* buffers, uint32_t count) {
+    shared_.resources.BeginFrame();
+    backend_.SetBand(backend_.GetRenderTarget().bounds);
     for (uint32_t i = 0; i < count; ++i) {
         if (buffers[i]) backend_.Execute(BufferSource(*buffers[i]));
     }
 }
 
+void CpuScene::ExecuteFrontEnd(CommandBuffer* const* buffers, uint32_t count) {
+    ExecuteAll(buffers, count);
+}
+
+// False when the frame is not worth it or must be painted in one go.
+bool CpuScene::PaintInBands(CommandBuffer* const* buffers, uint32_t count) {
+    const uint32_t helping = shared_.helpers ? std::min(shared_.helpers->GetCount(), kMaxHelpers) : 0;
+    IRect area;
+    if (helping == 0 || !CanPaintInBands(buffers, count, backend_, &area)) return false;
+    if (int64_t(area.Width()) * area.Height() < kMinBandedPixels) return false;
+    const uint32_t bands = std::min(uint32_t(area.Height() / kMinBandHeight), (helping + 1) * kBandsAThread);
+    if (bands < 2) return false;
+    while (helpers_.size() < helping) {
+        helpers_.emplace_back(HeapNew<CpuBackend>(shared_));
+        if (!helpers_.back()) return helpers_.pop_back(), false;
+    }
+    CpuBackend* painters[kMaxHelpers + 1] = {&backend_};
+    for (uint32_t i = 0; i < helping; ++i) {
+        painters[i + 1] = helpers_[i].get();
+        painters[i + 1]->SetRenderTarget(backend_.GetRenderTarget());
+        painters[i + 1]->stats() = {};
+    }
+    auto* job = HeapNew<BandJob>(buffers, count, area, bands, painters);
+    if (!job) return false;
+    shared_.resources.BeginFrame();
+    for (uint32_t i = 0; i < helping; ++i) {
+        job->AddRef();
+        shared_.helpers->Post(job);
+    }
+    job->Run();
+    job->Wait();
+    job->Release();
+    for (uint32_t i = 0; i < helping; ++i)
+        backend_.stats() += helpers_[i]->stats();
+    return true;
+}
+
 void CpuScene::ExecuteBackEnd(CommandBuffer* const* buffers, uint32_t count) {
     backend_.stats() = {};
-    ExecuteFrontEnd(buffers, count);
+    if (!PaintInBands(buffers, count)) ExecuteAll(buffers, count);
     shared_.glyphs.Trim(kGlyphCacheBytes);
 }
 
@@ -128,7 +173,6 @@ void CpuScene::FreeResources() {
     shared_.resources.DestroySurfacesOf(backend_.owner());
     shared_.layers.Clear();
     shared_.glyphs.Clear();
-    shared_.colorGlyphs.clear();
 }
 
 void CpuScene::Destroy() {

@@ -35,8 +35,13 @@ class CpuScene final : public IScene {
     CpuBackend& backend() { return backend_; }
 
   private:
+    void ExecuteAll(CommandBuffer* const* buffers, uint32_t count);
+    bool PaintInBands(CommandBuffer* const* buffers, uint32_t count);
+
     SharedState& shared_;
     CpuBackend backend_;
+    // For helping threads; made when the first one may come.
+    Vector<std::unique_ptr<CpuBackend, HeapDeleter<CpuBackend>>> helpers_;
     std::atomic<uint64_t> frames_{1};
 };
 

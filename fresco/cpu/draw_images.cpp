@@ -8,8 +8,9 @@ void CpuBackend::DrawTexture(Texture& texture, const Rect& area, const ImageSour
     EndScissors();
     const float alpha = std::clamp(paint.color.a * paint.opacity, 0.0f, 1.0f);
     Homography toPlane;
-    if (!(alpha > 0) || clip_.IsEmpty() || !PlaneAt(area.z).Invert(&toPlane)) return;
-    ImageSource source(texture, placement, toPlane, alpha);
+    const Homography plane = PlaneAt(area.z);
+    if (!(alpha > 0) || IsOutside(area, plane) || !plane.Invert(&toPlane)) return;
+    ImageSource source(shared_.resources, texture, placement, toPlane, alpha);
     Ink ink;
     ink.source = &source;
     ink.blend = paint.blend;
@@ -69,15 +70,15 @@ void CpuBackend::WithEffectSource(uint32_t kind, const uint8_t* data, const Homo
         case EffectKind::LinearGradient: {
             const auto& geometry = *reinterpret_cast<const LinearGradient*>(data);
             const GradientStop* list = stops(data + sizeof(geometry), &count);
-            gradient_.Build(list, count, opacity);
             GradientSource source(geometry, toPlane, gradient_);
+            source.SetStops(list, count, opacity);
             return use(source);
         }
         case EffectKind::RadialGradient: {
             const auto& geometry = *reinterpret_cast<const RadialGradient*>(data);
             const GradientStop* list = stops(data + sizeof(geometry), &count);
-            gradient_.Build(list, count, opacity);
             GradientSource source(geometry, toPlane, gradient_);
+            source.SetStops(list, count, opacity);
             return use(source);
         }
         case EffectKind::Pattern: {
@@ -93,7 +94,7 @@ void CpuBackend::WithEffectSource(uint32_t kind, const uint8_t* data, const Homo
             }
             placement.repeatX = pattern.repeat == kRepeatBoth || pattern.repeat == kRepeatX;
             placement.repeatY = pattern.repeat == kRepeatBoth || pattern.repeat == kRepeatY;
-            ImageSource source(*texture, placement, toPlane, opacity);
+            ImageSource source(shared_.resources, *texture, placement, toPlane, opacity);
             // Where a pattern does not repeat there is nothing beside its one row or column.
             WindowSource window(source, toPlane, placement);
             return use(window);
@@ -124,10 +125,11 @@ void CpuBackend::FillWithEffect(Layer& layer, uint32_t kind, const uint8_t* data
     row_.resize(std::max<size_t>(row_.size(), size_t(area.Width())));
     WithEffectSource(kind, data, layer.transform, 1, [&](PixelSource& source) {
         for (int y = area.y0; y < area.y1; ++y) {
-            source.Fetch(area.x0, y, area.Width(), row_.data());
+            const uint32_t* colors = source.Fetch(area.x0, y, area.Width(), row_.data());
             uint32_t* out = bitmap.Row(y) + area.x0;
-            for (int i = 0; i < area.Width(); ++i)
-                out[i] = ScalePixel(row_[size_t(i)], out[i] >> 24);
+            if (colors != row_.data()) std::memcpy(row_.data(), colors, size_t(area.Width()) * 4);
+            Rows().ScaleByAlpha(row_.data(), out, area.Width());
+            std::memcpy(out, row_.data(), size_t(area.Width()) * 4);
         }
     });
 }
@@ -139,6 +141,7 @@ void CpuBackend::MaskLayer(Texture* texture, const Rect& area, const ImageSource
     const IRect touched = layer.touched;
     const Bitmap bitmap = layer.pixels.View(layer.bounds.x0, layer.bounds.y0);
     ClipMaskPtr inside = MakeClipMask(touched);
+    if (!inside) return;
     MaskSink sink(*inside);
     const Homography plane = PlaneAt(area.z);
     Homography toPlane;
@@ -154,16 +157,16 @@ void CpuBackend::MaskLayer(Texture* texture, const Rect& area, const ImageSource
     std::fill(row_.begin(), row_.end(), 0);
     const auto apply = [&](PixelSource* source) {
         for (int y = touched.y0; y < touched.y1; ++y) {
-            if (source) source->Fetch(touched.x0, y, touched.Width(), row_.data());
+            const uint32_t* mask = row_.data();
+            if (source) mask = source->Fetch(touched.x0, y, touched.Width(), row_.data());
             const uint8_t* coverage = inside->Row(y) + touched.x0;
             uint32_t* out = bitmap.Row(y) + touched.x0;
-            for (int i = 0; i < touched.Width(); ++i) {
-                out[i] = ScalePixel(out[i], MulDiv255(row_[size_t(i)] >> 24, coverage[i]));
-            }
+            for (int i = 0; i < touched.Width(); ++i)
+                out[i] = ScalePixel(out[i], MulDiv255(mask[i] >> 24, coverage[i]));
         }
     };
     if (!visible) return apply(nullptr);
-    ImageSource source(*texture, placement, toPlane, 1);
+    ImageSource source(shared_.resources, *texture, placement, toPlane, 1);
     apply(&source);
 }
 

@@ -16,12 +16,20 @@ CornerRadii Outset(const CornerRadii& radii, float by) {
     return {grow(radii.topLeft), grow(radii.topRight), grow(radii.bottomRight), grow(radii.bottomLeft)};
 }
 
+// Corners that are larger than the box reach out of it.
+Rect BoundsOf(const Rect& rect, const CornerRadii& radii) {
+    float most = 0;
+    for (const Point& r : {radii.topLeft, radii.topRight, radii.bottomRight, radii.bottomLeft})
+        most = std::max({most, r.x, r.y});
+    return most * 2 <= std::min(rect.width, rect.height) ? rect : Outset(rect, most);
+}
+
 }  // namespace
 
 void CpuBackend::DrawRect(const Rect& rect, const Ink& ink) {
     EndScissors();
-    if (ink.DrawsNothing() || clip_.IsEmpty()) return;
     const Homography plane = PlaneAt(rect.z);
+    if (ink.DrawsNothing() || IsOutside(rect, plane)) return;
     IRect aligned;
     if (AlignedRect(rect, plane, &aligned)) return FillAligned(aligned, ink);
     path_.Clear();
@@ -35,9 +43,11 @@ void CpuBackend::ClearRect(const ClearRectRecord& record, const NoneTail&) {
     if (record.flag & 1) {
         EndScissors();
         const Bitmap bitmap = CurrentBitmap();
-        for (int y = bitmap.bounds.y0; y < bitmap.bounds.y1; ++y) {
-            std::memset(bitmap.Row(y) + bitmap.bounds.x0, 0, size_t(bitmap.bounds.Width()) * 4);
-        }
+        const bool onTarget = bitmap.data == target_.data;
+        const IRect area = onTarget ? Intersect(bitmap.bounds, band_) : bitmap.bounds;
+        for (int y = area.y0; y < area.y1; ++y)
+            std::memset(bitmap.Row(y) + area.x0, 0, size_t(area.Width()) * 4);
+        Touch(area);
         return;
     }
     DrawRect(record.rect, ink);
@@ -74,14 +84,17 @@ void CpuBackend::FillQuad(const FillQuadRecord& record, const NoneTail&) {
 }
 
 void CpuBackend::FillRoundedRect(const FillRoundedRectRecord& record, const NoneTail&) {
+    const Homography plane = PlaneAt(record.rect.z);
+    if (IsOutside(BoundsOf(record.rect, record.radii), plane)) return EndScissors();
     path_.Clear();
     path_.AddRoundedRect(record.rect, record.radii);
-    DrawOutline(path_, PlaneAt(record.rect.z), kFillNonZero, SolidInk(record.paint));
+    DrawOutline(path_, plane, kFillNonZero, SolidInk(record.paint));
 }
 
 void CpuBackend::StrokeRoundedRect(const StrokeRoundedRectRecord& record, const NoneTail&) {
     const float half = record.paint.strokeWidth / 2;
-    if (!(half > 0)) return;
+    const Rect reach = Outset(BoundsOf(record.rect, record.radii), half);
+    if (!(half > 0) || IsOutside(reach, PlaneAt(record.rect.z))) return EndScissors();
     const Rect inner = Outset(record.rect, -half);
     path_.Clear();
     path_.AddRoundedRect(Outset(record.rect, half), Outset(record.radii, half));
@@ -138,10 +151,10 @@ void CpuBackend::DrawGradient(const Rect& rect, const Paint& paint, const StopsT
     const float unit = std::max(std::abs(rect.width), std::abs(rect.height));
     Homography toDevice = PlaneAt(rect.z), place, toUnit;
     place.xx = place.yy = unit, place.x0 = rect.x, place.y0 = rect.y;
-    if (!(unit > 0) || !(toDevice * place).Invert(&toUnit)) return;
-    gradient_.Build(stops.stops, stops.count, std::clamp(paint.color.a * paint.opacity, 0.0f, 1.0f));
+    if (!(unit > 0) || IsOutside(rect, toDevice) || !(toDevice * place).Invert(&toUnit)) return;
     GradientSource source =
         linear ? GradientSource(*linear, toUnit, gradient_) : GradientSource(*radial, toUnit, gradient_);
+    source.SetStops(stops.stops, stops.count, std::clamp(paint.color.a * paint.opacity, 0.0f, 1.0f));
     Ink ink;
     ink.source = &source;
     ink.blend = paint.blend;

@@ -4,28 +4,45 @@
 
 namespace fresco::cpu {
 
-void CpuBackend::DrawGlyphBitmap(const FontFace& face, uint32_t glyph, float size, Vec2 at, const Ink& ink) {
+void CpuBackend::DrawCachedRun(const FontFace& face, const GlyphRunParams& run, const Glyph* glyphs,
+                               uint32_t count, const Homography& plane, const Ink& ink) {
     constexpr double kFar = 1 << 22;
-    if (!(std::abs(at.x) < kFar) || !(std::abs(at.y) < kFar)) return;
-    const int64_t quarter = std::llround(at.x * GlyphCache::kSubpixels);
-    const int subpixel = int(quarter & (GlyphCache::kSubpixels - 1));
-    const int x = int((quarter - subpixel) / GlyphCache::kSubpixels), y = int(std::lround(at.y));
-    const GlyphBitmap& bitmap = shared_.glyphs.Get(face, glyph, size, subpixel);
-    const IRect box{x + bitmap.left, y + bitmap.top, x + bitmap.left + bitmap.width,
-                    y + bitmap.top + bitmap.height};
-    const IRect visible = Intersect(box, clip_.bounds());
-    if (visible.IsEmpty()) return;
-    const uint8_t* coverage = shared_.glyphs.Coverage(bitmap);
+    const IRect& clip = clip_.bounds();
+    const float size = float(run.size * plane.xx);
+    const double reach = size * GlyphCache::kReach + 2;
+    placed_.clear();
+    {
+        GlyphCache::Reader cache(shared_.glyphs);
+        for (uint32_t i = 0; i < count; ++i) {
+            const Vec2 at =
+                plane.Apply(run.x + glyphs[i].x + run.letterSpacing * float(i), run.y + glyphs[i].y);
+            if (at.y + reach < clip.y0 || at.y - reach > clip.y1 || at.x + reach < clip.x0 ||
+                at.x - reach > clip.x1 || !(std::abs(at.x) < kFar) || !(std::abs(at.y) < kFar))
+                continue;
+            const int64_t quarter = std::llrint(at.x * GlyphCache::kSubpixels);
+            const int subpixel = int(quarter & (GlyphCache::kSubpixels - 1));
+            const int x = int((quarter - subpixel) / GlyphCache::kSubpixels), y = int(std::lrint(at.y));
+            const GlyphBitmap& bitmap = cache.Get(face, glyphs[i].index, size, subpixel);
+            const IRect box{x + bitmap.left, y + bitmap.top, x + bitmap.left + bitmap.width,
+                            y + bitmap.top + bitmap.height};
+            const IRect visible = Intersect(box, clip);
+            if (visible.IsEmpty()) continue;
+            const ptrdiff_t skipped = ptrdiff_t(visible.y0 - box.y0) * bitmap.width + (visible.x0 - box.x0);
+            placed_.push_back({bitmap.coverage + skipped, bitmap.width, visible});
+        }
+    }
     const Bitmap target = CurrentBitmap();
     PaintSink sink(target, ink, row_);
-    for (int row = visible.y0; row < visible.y1; ++row) {
-        const uint8_t* line = coverage + size_t(row - box.y0) * size_t(bitmap.width) + (visible.x0 - box.x0);
-        if (clip_.IsSimple())
-            sink.Mask(row, visible.x0, line, visible.Width());
-        else
-            clip_.Filter(row, visible.x0, line, visible.Width(), sink);
+    for (const PlacedGlyph& glyph : placed_) {
+        const uint8_t* line = glyph.coverage;
+        for (int y = glyph.box.y0; y < glyph.box.y1; ++y, line += glyph.pitch) {
+            if (clip_.IsSimple())
+                sink.Mask(y, glyph.box.x0, line, glyph.box.Width());
+            else
+                clip_.Filter(y, glyph.box.x0, line, glyph.box.Width(), sink);
+        }
+        Touch(glyph.box);
     }
-    Touch(visible);
     stats_.paintedPixels += sink.painted();
 }
 
@@ -33,15 +50,11 @@ bool CpuBackend::DrawColorGlyph(const FontFace& face, uint32_t glyph, float size
                                 const Paint& paint) {
     const ColorGlyph* picture = face.GetColorGlyph(glyph);
     if (!picture) return false;
-    Texture& texture = shared_.colorGlyphs[uint64_t(face.GetId()) << 32 | glyph];
-    if (texture.width == 0) {
-        if (!texture.pixels.Allocate(int(picture->width), int(picture->height))) return true;
-        texture.width = picture->width, texture.height = picture->height;
-        std::memcpy(texture.pixels.pixels(), picture->pixels.data(), picture->pixels.size() * 4);
-    }
+    Texture* texture = GlyphCache::Reader(shared_.glyphs).GetPicture(face, glyph, *picture);
+    if (!texture) return true;
     const Rect target{at.x + picture->left * size, at.y + picture->top * size, 0, picture->emWidth * size,
                       picture->emHeight * size};
-    DrawTexture(texture, target, {.source = {}, .target = target}, paint);
+    DrawTexture(*texture, target, {.source = {}, .target = target}, paint);
     return true;
 }
 
@@ -57,14 +70,17 @@ void CpuBackend::DrawRun(const GlyphRunParams& run, const Glyph* glyphs, uint32_
     const bool upright = plane.IsScaleTranslate() && scale > 0 && std::abs(plane.yy - scale) < 1e-3 * scale;
     const bool cached =
         upright && !stroke && run.size * scale <= GlyphCache::kMaxSize && run.size * scale >= 0.5;
+    const bool pictures = face->HasColorGlyphs() && !stroke;
+    if (cached && !pictures) return DrawCachedRun(*face, run, glyphs, count, plane, ink);
     const float unit = run.size / face->GetUnitsPerEm();
     for (uint32_t i = 0; i < count; ++i) {
         const Point at{run.x + glyphs[i].x + run.letterSpacing * float(i), run.y + glyphs[i].y};
-        if (face->HasColorGlyphs() && !stroke &&
-            DrawColorGlyph(*face, glyphs[i].index, run.size, at, run.paint))
-            continue;
+        if (pictures && DrawColorGlyph(*face, glyphs[i].index, run.size, at, run.paint)) continue;
         if (cached) {
-            DrawGlyphBitmap(*face, glyphs[i].index, float(run.size * scale), plane.Apply(at.x, at.y), ink);
+            GlyphRunParams one = run;
+            one.x = at.x, one.y = at.y;
+            const Glyph glyph{glyphs[i].index, 0, 0};
+            DrawCachedRun(*face, one, &glyph, 1, plane, ink);
             continue;
         }
         const GlyphOutline& outline = face->GetOutline(glyphs[i].index);

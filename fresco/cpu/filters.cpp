@@ -1,139 +1,87 @@
 #include "fresco/cpu/filters.h"
 
 #include "fresco/cpu/blend.h"
+#include "fresco/cpu/rows.h"
 
 // https://www.w3.org/TR/filter-effects-1/#ShorthandEquivalents
 
 namespace fresco::cpu {
 namespace {
 
-// Rows r, g, b, a; columns r, g, b, a, constant.
-struct ColorMatrix {
-    float m[20];
+// What mixes r, g and b; rows of the result.
+struct Mixer {
+    float m[9];
 };
 
-ColorMatrix SaturateMatrix(float s) {
-    return {{0.213f + 0.787f * s,
-             0.715f - 0.715f * s,
-             0.072f - 0.072f * s,
-             0,
-             0,
-             0.213f - 0.213f * s,
-             0.715f + 0.285f * s,
-             0.072f - 0.072f * s,
-             0,
-             0,
-             0.213f - 0.213f * s,
-             0.715f - 0.715f * s,
-             0.072f + 0.928f * s,
-             0,
-             0,
-             0,
-             0,
-             0,
-             1,
-             0}};
+constexpr Mixer kIdentity = {{1, 0, 0, 0, 1, 0, 0, 0, 1}};
+constexpr Mixer kLuminance = {{0.213f, 0.715f, 0.072f, 0.213f, 0.715f, 0.072f, 0.213f, 0.715f, 0.072f}};
+constexpr Mixer kGray = {{0.2126f, 0.7152f, 0.0722f, 0.2126f, 0.7152f, 0.0722f, 0.2126f, 0.7152f, 0.0722f}};
+constexpr Mixer kSepia = {{0.393f, 0.769f, 0.189f, 0.349f, 0.686f, 0.168f, 0.272f, 0.534f, 0.131f}};
+constexpr Mixer kHueSine = {{-0.213f, -0.715f, 0.928f, 0.143f, 0.140f, -0.283f, -0.787f, 0.715f, 0.072f}};
+
+// `amount` of one and the rest of the other, and a multiple of a third.
+ColorMatrix Mix(const Mixer& a, float amount, const Mixer& b, float third = 0, const Mixer& c = kHueSine) {
+    ColorMatrix matrix = {};
+    for (int row = 0; row < 3; ++row) {
+        for (int column = 0; column < 3; ++column) {
+            const int i = row * 3 + column;
+            matrix.m[row * 5 + column] = a.m[i] * amount + b.m[i] * (1 - amount) + c.m[i] * third;
+        }
+    }
+    matrix.m[18] = 1;
+    return matrix;
 }
 
-ColorMatrix ScaleMatrix(float scale, float offset) {
-    return {{scale, 0, 0, 0, offset, 0, scale, 0, 0, offset, 0, 0, scale, 0, offset, 0, 0, 0, 1, 0}};
-}
-
-ColorMatrix SepiaMatrix(float amount) {
-    const float s = 1 - std::clamp(amount, 0.0f, 1.0f);
-    return {{0.393f + 0.607f * s,
-             0.769f - 0.769f * s,
-             0.189f - 0.189f * s,
-             0,
-             0,
-             0.349f - 0.349f * s,
-             0.686f + 0.314f * s,
-             0.168f - 0.168f * s,
-             0,
-             0,
-             0.272f - 0.272f * s,
-             0.534f - 0.534f * s,
-             0.131f + 0.869f * s,
-             0,
-             0,
-             0,
-             0,
-             0,
-             1,
-             0}};
-}
-
-ColorMatrix HueMatrix(float degrees) {
-    const float c = std::cos(degrees * 0.017453292f), s = std::sin(degrees * 0.017453292f);
-    return {{0.213f + c * 0.787f - s * 0.213f,
-             0.715f - c * 0.715f - s * 0.715f,
-             0.072f - c * 0.072f + s * 0.928f,
-             0,
-             0,
-             0.213f - c * 0.213f + s * 0.143f,
-             0.715f + c * 0.285f + s * 0.140f,
-             0.072f - c * 0.072f - s * 0.283f,
-             0,
-             0,
-             0.213f - c * 0.213f - s * 0.787f,
-             0.715f - c * 0.715f + s * 0.715f,
-             0.072f + c * 0.928f + s * 0.072f,
-             0,
-             0,
-             0,
-             0,
-             0,
-             1,
-             0}};
+ColorMatrix ScaleColors(float scale, float offset, float alpha = 1) {
+    return {{scale, 0, 0, 0, offset, 0, scale, 0, 0, offset, 0, 0, scale, 0, offset, 0, 0, 0, alpha, 0}};
 }
 
 // On colours that are not premultiplied, clamped after.
 void ApplyMatrix(const Bitmap& bitmap, const ColorMatrix& matrix) {
-    const float* m = matrix.m;
-    for (int y = bitmap.bounds.y0; y < bitmap.bounds.y1; ++y) {
-        uint32_t* row = bitmap.Row(y);
-        uint32_t lastIn = 0, lastOut = 0;
-        bool haveLast = false;
-        for (int x = bitmap.bounds.x0; x < bitmap.bounds.x1; ++x) {
-            // Neighbours are often equal, and nothing stays nothing under most matrices: remember one.
-            if (!haveLast || row[x] != lastIn) {
-                lastIn = row[x], haveLast = true;
-                const float a = float(lastIn >> 24) / 255;
-                const float scale = a > 0 ? 1 / (255 * a) : 0;
-                const float c[3] = {float(lastIn & 255) * scale, float(lastIn >> 8 & 255) * scale,
-                                    float(lastIn >> 16 & 255) * scale};
-                float out[4];
-                for (int i = 0; i < 4; ++i) {
-                    const float* r = m + i * 5;
-                    out[i] =
-                        std::clamp(r[0] * c[0] + r[1] * c[1] + r[2] * c[2] + r[3] * a + r[4], 0.0f, 1.0f);
-                }
-                lastOut = PackPixel(out[0] * out[3], out[1] * out[3], out[2] * out[3], out[3]);
-            }
-            row[x] = lastOut;
-        }
-    }
+    for (int y = bitmap.bounds.y0; y < bitmap.bounds.y1; ++y)
+        Rows().ApplyMatrix(bitmap.Row(y) + bitmap.bounds.x0, bitmap.bounds.Width(), matrix);
 }
 
-void ApplyDropShadow(const Bitmap& bitmap, const float* v, float scale) {
+// Standard deviations along the device's axes. A Gaussian that is turned stays one; what its axes have in
+// common (under a skew, or a turned one of two radii) is left out.
+struct Deviation {
+    float x, y;
+};
+
+Deviation MapDeviation(float x, float y, const Jacobian& j) {
+    return {float(std::hypot(j.xx * x, j.xy * y)), float(std::hypot(j.yx * x, j.yy * y))};
+}
+
+// Further away than this a shadow is on no screen; it would only make its layer large.
+constexpr double kMaxShadowOffset = 8192;
+
+// False when the shadow is nowhere near.
+bool MapShadow(const float* v, const Jacobian& j, int* dx, int* dy) {
+    const double x = j.xx * v[0] + j.xy * v[1], y = j.yx * v[0] + j.yy * v[1];
+    if (!(std::abs(x) <= kMaxShadowOffset) || !(std::abs(y) <= kMaxShadowOffset)) return false;
+    *dx = int(std::lround(x)), *dy = int(std::lround(y));
+    return true;
+}
+
+void ApplyDropShadow(const Bitmap& bitmap, const float* v, const Jacobian& space) {
     PixelBuffer shadow;
     const IRect& bounds = bitmap.bounds;
-    if (!shadow.Allocate(bounds.Width(), bounds.Height())) return;
+    int dx = 0, dy = 0;
+    if (!MapShadow(v, space, &dx, &dy) || !shadow.Allocate(bounds.Width(), bounds.Height())) return;
     const Bitmap view = shadow.View(bounds.x0, bounds.y0);
     const float alpha = std::clamp(v[6], 0.0f, 1.0f);
     const uint32_t color = PackPixel(v[3] * alpha, v[4] * alpha, v[5] * alpha, alpha);
-    const float limit = 1 << 20;
-    const int dx = int(std::lround(std::clamp(v[0] * scale, -limit, limit)));
-    const int dy = int(std::lround(std::clamp(v[1] * scale, -limit, limit)));
     for (int y = bounds.y0; y < bounds.y1; ++y) {
         if (y - dy < bounds.y0 || y - dy >= bounds.y1) continue;
         const uint32_t* from = bitmap.Row(y - dy);
         uint32_t* to = view.Row(y);
         const int first = std::max(bounds.x0, bounds.x0 + dx), last = std::min(bounds.x1, bounds.x1 + dx);
-        for (int x = first; x < last; ++x)
-            to[x] = ScalePixel(color, from[x - dx] >> 24);
+        if (first >= last) continue;
+        std::fill(to + first, to + last, color);
+        Rows().ScaleByAlpha(to + first, from + first - dx, last - first);
     }
-    Blur(view, v[2] * scale, v[2] * scale);
+    const Deviation deviation = MapDeviation(v[2], v[2], space);
+    Blur(view, deviation.x, deviation.y);
     for (int y = bounds.y0; y < bounds.y1; ++y) {
         uint32_t *source = bitmap.Row(y) + bounds.x0, *under = view.Row(y) + bounds.x0;
         BlendRow(under, source, bounds.Width(), nullptr, 255);
@@ -141,93 +89,67 @@ void ApplyDropShadow(const Bitmap& bitmap, const float* v, float scale) {
     }
 }
 
+// The two radii of a blur.
+Deviation BlurOf(const FilterRecord& filter, const Jacobian& space) {
+    const float* v = filter.values;
+    return MapDeviation(v[0], filter.kind == uint32_t(FilterKind::AxisBlur) ? v[1] : v[0], space);
+}
+
 }  // namespace
 
-void ApplyFilter(const Bitmap& bitmap, const FilterRecord& filter, float scale) {
+void ApplyFilter(const Bitmap& bitmap, const FilterRecord& filter, const Jacobian& space) {
     const float* v = filter.values;
     const float amount = std::max(0.0f, v[0]), part = std::min(1.0f, amount);
     switch (FilterKind(filter.kind)) {
         case FilterKind::Blur:
-            Blur(bitmap, v[0] * scale, v[0] * scale);
-            break;
-        case FilterKind::AxisBlur:
-            Blur(bitmap, v[0] * scale, v[1] * scale);
-            break;
-        case FilterKind::Brightness:
-            ApplyMatrix(bitmap, ScaleMatrix(amount, 0));
-            break;
-        case FilterKind::Contrast:
-            ApplyMatrix(bitmap, ScaleMatrix(amount, 0.5f - 0.5f * amount));
-            break;
+        case FilterKind::AxisBlur: {
+            const Deviation deviation = BlurOf(filter, space);
+            return Blur(bitmap, deviation.x, deviation.y);
+        }
         case FilterKind::DropShadow:
-            ApplyDropShadow(bitmap, v, scale);
-            break;
-        case FilterKind::Grayscale:
-            ApplyMatrix(bitmap, {{0.2126f + 0.7874f * (1 - part),
-                                  0.7152f - 0.7152f * (1 - part),
-                                  0.0722f - 0.0722f * (1 - part),
-                                  0,
-                                  0,
-                                  0.2126f - 0.2126f * (1 - part),
-                                  0.7152f + 0.2848f * (1 - part),
-                                  0.0722f - 0.0722f * (1 - part),
-                                  0,
-                                  0,
-                                  0.2126f - 0.2126f * (1 - part),
-                                  0.7152f - 0.7152f * (1 - part),
-                                  0.0722f + 0.9278f * (1 - part),
-                                  0,
-                                  0,
-                                  0,
-                                  0,
-                                  0,
-                                  1,
-                                  0}});
-            break;
-        case FilterKind::HueRotate:
-            ApplyMatrix(bitmap, HueMatrix(v[0]));
-            break;
+            return ApplyDropShadow(bitmap, v, space);
+        case FilterKind::Brightness:
+            return ApplyMatrix(bitmap, ScaleColors(amount, 0));
+        case FilterKind::Contrast:
+            return ApplyMatrix(bitmap, ScaleColors(amount, 0.5f - 0.5f * amount));
         case FilterKind::Invert:
-            ApplyMatrix(bitmap, ScaleMatrix(1 - 2 * part, part));
-            break;
+            return ApplyMatrix(bitmap, ScaleColors(1 - 2 * part, part));
         case FilterKind::Opacity:
-            ApplyMatrix(bitmap, {{1, 0, 0, 0, 0, 0, 1, 0, 0, 0, 0, 0, 1, 0, 0, 0, 0, 0, part, 0}});
-            break;
+            return ApplyMatrix(bitmap, ScaleColors(1, 0, part));
+        case FilterKind::Grayscale:
+            return ApplyMatrix(bitmap, Mix(kGray, part, kIdentity));
         case FilterKind::Saturate:
-            ApplyMatrix(bitmap, SaturateMatrix(amount));
-            break;
+            return ApplyMatrix(bitmap, Mix(kIdentity, amount, kLuminance));
         case FilterKind::Sepia:
-            ApplyMatrix(bitmap, SepiaMatrix(v[0]));
-            break;
+            return ApplyMatrix(bitmap, Mix(kSepia, part, kIdentity));
+        case FilterKind::HueRotate: {
+            const float angle = v[0] * 0.017453292f;
+            return ApplyMatrix(bitmap, Mix(kIdentity, std::cos(angle), kLuminance, std::sin(angle)));
+        }
         case FilterKind::ColorMatrix: {
             ColorMatrix matrix;
             std::copy(v, v + 20, matrix.m);
-            ApplyMatrix(bitmap, matrix);
-            break;
+            return ApplyMatrix(bitmap, matrix);
         }
     }
 }
 
-void FilterOutset(const FilterRecord* filters, uint32_t count, float scale, int outset[4]) {
+void FilterOutset(const FilterRecord& filter, const Jacobian& space, int outset[4]) {
     const auto grow = [outset](int left, int top, int right, int bottom) {
-        // Layers are cut to what can be seen; the sum only has to stay an int.
-        const int add[4] = {left, top, right, bottom};
-        for (int i = 0; i < 4; ++i)
-            outset[i] = std::min(outset[i] + std::clamp(add[i], 0, 1 << 15), 1 << 16);
+        outset[0] += std::max(left, 0), outset[1] += std::max(top, 0);
+        outset[2] += std::max(right, 0), outset[3] += std::max(bottom, 0);
     };
-    for (uint32_t i = 0; i < count; ++i) {
-        const float* v = filters[i].values;
-        if (filters[i].kind == uint32_t(FilterKind::Blur) ||
-            filters[i].kind == uint32_t(FilterKind::AxisBlur)) {
-            const bool axis = filters[i].kind == uint32_t(FilterKind::AxisBlur);
-            const int x = BlurExtent(v[0] * scale), y = BlurExtent((axis ? v[1] : v[0]) * scale);
-            grow(x, y, x, y);
-        } else if (filters[i].kind == uint32_t(FilterKind::DropShadow)) {
-            const int e = BlurExtent(v[2] * scale);
-            const int dx = int(std::clamp(v[0] * scale, -32768.0f, 32768.0f)),
-                      dy = int(std::clamp(v[1] * scale, -32768.0f, 32768.0f));
-            grow(e - dx + 1, e - dy + 1, e + dx + 1, e + dy + 1);
-        }
+    if (filter.kind == uint32_t(FilterKind::Blur) || filter.kind == uint32_t(FilterKind::AxisBlur)) {
+        const Deviation deviation = BlurOf(filter, space);
+        const int x = BlurExtent(deviation.x), y = BlurExtent(deviation.y);
+        grow(x, y, x, y);
+    } else if (filter.kind == uint32_t(FilterKind::DropShadow)) {
+        int dx = 0, dy = 0;
+        if (!MapShadow(filter.values, space, &dx, &dy)) return;
+        const Deviation deviation = MapDeviation(filter.values[2], filter.values[2], space);
+        const int ex = BlurExtent(deviation.x), ey = BlurExtent(deviation.y);
+        // The blur needs its own reach around every pixel, even where the offset leads away.
+        grow(ex + std::max(-dx, 0), ey + std::max(-dy, 0), ex + std::max(dx, 0), ey + std::max(dy, 0));
     }
 }
 

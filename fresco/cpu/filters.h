@@ -2,19 +2,20 @@
 #pragma once
 #include <fresco/effects.h>
 #include "fresco/cpu/pixels.h"
+#include "fresco/paths/matrix.h"
 
 namespace fresco::cpu {
 
 // Standard deviations in device pixels. Up to kExactSigma the
 // kernel is the Gaussian itself, above it three box passes (within 3% of it).
 constexpr float kExactSigma = 2;
-bool Blur(const Bitmap& bitmap, float sigmaX, float sigmaY);
+void Blur(const Bitmap& bitmap, float sigmaX, float sigmaY);
 // How far a blur is seen, in pixels.
 int BlurExtent(float sigma);
 
-// The filter in place; lengths times `scale` are device pixels.
-void ApplyFilter(const Bitmap& bitmap, const FilterRecord& filter, float scale);
-// By how much a filter list grows what it is applied to: left, top, right, bottom.
-void FilterOutset(const FilterRecord* filters, uint32_t count, float scale, int outset[4]);
+// The filter in place; `space` takes its lengths to device pixels.
+void ApplyFilter(const Bitmap& bitmap, const FilterRecord& filter, const Jacobian& space);
+// Adds by how much a filter grows what it is applied to: left, top, right, bottom.
+void FilterOutset(const FilterRecord& filter, const Jacobian& space, int outset[4]);
 
 }  // namespace fresco::cpu

@@ -34,26 +34,49 @@ const GlyphBitmap& GlyphCache::Get(const FontFace& face, uint32_t glyph, float s
     Homography transform;
     transform.xx = transform.yy = double(quantized) / 64 / face.GetUnitsPerEm();
     transform.x0 = double(subpixel) / kSubpixels;
-    const IRect bounds = OutlineBuilder::DeviceBounds(outline.path, transform);
-    // A hostile font may claim any extent.
-    const int limit = int(kMaxSize) * 8;
-    if (bounds.IsEmpty() || bounds.Width() > limit || bounds.Height() > limit) return bitmap;
-    bitmap = {bounds.x0, bounds.y0, bounds.Width(), bounds.Height(), bytes_.size()};
-    bytes_.resize(bytes_.size() + size_t(bounds.Width()) * size_t(bounds.Height()), 0);
-    BitmapSink sink(bytes_.data() + bitmap.offset, bounds);
+    const int reach = int(std::ceil(size * kReach));
+    const IRect bounds =
+        Intersect(OutlineBuilder::DeviceBounds(outline.path, transform), {-reach, -reach, reach, reach});
+    if (bounds.IsEmpty()) return bitmap;
+    uint8_t* bytes = TakeBytes(size_t(bounds.Width()) * size_t(bounds.Height()));
+    bitmap = {bounds.x0, bounds.y0, bounds.Width(), bounds.Height(), bytes};
+    BitmapSink sink(bytes, bounds);
     rasterizer_.Begin(bounds);
     builder_.AddFill(outline.path, transform, rasterizer_);
     rasterizer_.Sweep(kFillNonZero, sink);
     return bitmap;
 }
 
+Texture* GlyphCache::GetPicture(const FontFace& face, uint32_t glyph, const ColorGlyph& picture) {
+    Texture& texture = pictures_[uint64_t(face.GetId()) << 32 | glyph];
+    if (texture.width == 0) {
+        if (!texture.pixels.Allocate(int(picture.width), int(picture.height))) return nullptr;
+        texture.width = picture.width, texture.height = picture.height;
+        std::memcpy(texture.pixels.pixels(), picture.pixels.data(), picture.pixels.size() * 4);
+    }
+    return &texture;
+}
+
+uint8_t* GlyphCache::TakeBytes(size_t count) {
+    if (blocks_.empty() || blockUsed_ + count > blocks_.back().size()) {
+        blocks_.emplace_back(std::max(count, kBlockSize), uint8_t(0));
+        blockUsed_ = 0;
+        bytes_ += blocks_.back().size();
+    }
+    uint8_t* bytes = blocks_.back().data() + blockUsed_;
+    blockUsed_ += count;
+    return bytes;
+}
+
 void GlyphCache::Trim(size_t maxBytes) {
-    if (bytes_.size() > maxBytes) Clear();
+    if (bytes_ > maxBytes) Clear();
 }
 
 void GlyphCache::Clear() {
     bitmaps_.clear();
-    bytes_.clear();
+    pictures_.clear();
+    blocks_.clear();
+    blockUsed_ = bytes_ = 0;
 }
 
 }  // namespace fresco::cpu

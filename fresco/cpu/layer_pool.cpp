@@ -3,6 +3,7 @@
 namespace fresco::cpu {
 
 bool LayerPool::Take(int width, int height, PixelBuffer* buffer) {
+    const std::lock_guard<std::mutex> lock(mutex_);
     const size_t pixels = size_t(width) * size_t(height);
     if (inUse_ + pixels * 4 > kMaxBytesInUse) return false;
     size_t best = free_.size();
@@ -24,11 +25,9 @@ bool LayerPool::Take(int width, int height, PixelBuffer* buffer) {
     return true;
 }
 
-void LayerPool::GiveBack(PixelBuffer buffer, const IRect& touched) {
+void LayerPool::GiveBack(PixelBuffer buffer) {
+    const std::lock_guard<std::mutex> lock(mutex_);
     inUse_ -= std::min(inUse_, buffer.bytes());
-    for (int y = touched.y0; y < touched.y1; ++y) {
-        std::memset(buffer.Row(y) + touched.x0, 0, size_t(touched.Width()) * 4);
-    }
     free_.push_back(std::move(buffer));
     Trim();
 }

@@ -1,16 +1,19 @@
 // Pixels of layers. Buffers wait here zeroed, so that opening a layer costs nothing and giving one back costs
 // what was drawn on it.
 #pragma once
+#include <mutex>
+
 #include "fresco/cpu/pixels.h"
 
 namespace fresco::cpu {
 
+// Threads that paint one frame share the pool.
 class LayerPool {
   public:
     // Zeroed pixels; false when there is no memory or the layers in use would pass the limit.
     bool Take(int width, int height, PixelBuffer* buffer);
-    // `touched` in pixels of the buffer: what is not zero any more.
-    void GiveBack(PixelBuffer buffer, const IRect& touched);
+    // The pixels are zero again.
+    void GiveBack(PixelBuffer buffer);
     void SetLimits(size_t count, size_t bytes);
     size_t maxCount() const { return maxCount_; }
     size_t maxBytes() const { return maxBytes_; }
@@ -22,6 +25,7 @@ class LayerPool {
 
     void Trim();
 
+    std::mutex mutex_;
     Vector<PixelBuffer> free_;
     size_t inUse_ = 0;
     size_t maxCount_ = 8;

@@ -12,8 +12,8 @@ namespace {
 
 // Deeper groups are drawn without a layer of their own.
 constexpr size_t kMaxLayerDepth = 256;
-// A filter may ask for a layer beyond the screen, but not for more than this.
-constexpr int kMaxLayerSide = 20000;
+// A layer's filters may bring in what lies this far outside of its clip; those that need more are left out.
+constexpr int kMaxFilterReach = 12000;
 
 template <class Use>
 void ForEachEffect(const EffectsTail& effects, Use use) {
@@ -30,6 +30,26 @@ const FilterRecord* Filters(const uint8_t* data, uint32_t* count) {
     return reinterpret_cast<const FilterRecord*>(data + sizeof(*count));
 }
 
+// How far the filters reach together, and how many of them there is room for.
+uint32_t MeasureFilters(const EffectsTail& effects, const Jacobian& space, int outset[4]) {
+    uint32_t total = 0;
+    bool room = true;
+    ForEachEffect(effects, [&](EffectKind kind, const uint8_t* data, uint32_t) {
+        if (kind != EffectKind::Filter) return;
+        uint32_t count = 0;
+        const FilterRecord* filters = Filters(data, &count);
+        for (uint32_t i = 0; i < count && room; ++i) {
+            int grown[4] = {outset[0], outset[1], outset[2], outset[3]};
+            FilterOutset(filters[i], space, grown);
+            room = *std::max_element(grown, grown + 4) <= kMaxFilterReach;
+            if (!room) break;
+            std::copy(grown, grown + 4, outset);
+            ++total;
+        }
+    });
+    return total;
+}
+
 IRect Grow(const IRect& r, const int outset[4]) {
     return {r.x0 - outset[0], r.y0 - outset[1], r.x1 + outset[2], r.y1 + outset[3]};
 }
@@ -40,6 +60,19 @@ IRect GrowBack(const IRect& r, const int outset[4]) {
 }
 
 }  // namespace
+
+// A layer is as large as its clip and what its filters bring in from around it. Without room for that it is
+// as large as the clip and goes unfiltered, without room for that either it is no layer.
+void CpuBackend::TakeLayerPixels(Layer& layer, const int outset[4]) {
+    const IRect clip = layer.bounds;
+    layer.bounds = GrowBack(clip, outset);
+    if (shared_.layers.Take(layer.bounds.Width(), layer.bounds.Height(), &layer.pixels)) return;
+    FRESCO_WARN("No room for a layer of %d x %d pixels, drawing without it", layer.bounds.Width(),
+                layer.bounds.Height());
+    layer.bounds = clip;
+    layer.filters = 0;
+    layer.collapsed = !shared_.layers.Take(clip.Width(), clip.Height(), &layer.pixels);
+}
 
 void CpuBackend::OpenLayer(uint32_t flags, const LayerPaint& paint, const EffectsTail& effects) {
     EndScissors();
@@ -54,26 +87,13 @@ void CpuBackend::OpenLayer(uint32_t flags, const LayerPaint& paint, const Effect
     layer.savedStates = saved_.size();
     layer.worldMatrix = transform_;
 
-    int outset[4] = {};
-    ForEachEffect(effects, [&](EffectKind kind, const uint8_t* data, uint32_t) {
-        if (kind != EffectKind::Filter) return;
-        uint32_t count = 0;
-        const FilterRecord* filters = Filters(data, &count);
-        FilterOutset(filters, count, float(layer.transform.MeanScale()), outset);
-    });
     layer.bounds = clip_.bounds();
-    if (!layer.bounds.IsEmpty()) {
-        IRect grown = Grow(GrowBack(layer.bounds, outset), outset);
-        if (grown.Width() > kMaxLayerSide || grown.Height() > kMaxLayerSide) grown = layer.bounds;
-        layer.bounds = grown;
-    }
     if (layers_.size() >= kMaxLayerDepth) {
         layer.collapsed = true;
-    } else if (!layer.bounds.IsEmpty() &&
-               !shared_.layers.Take(layer.bounds.Width(), layer.bounds.Height(), &layer.pixels)) {
-        FRESCO_WARN("No room for a layer of %d x %d pixels, drawing without it", layer.bounds.Width(),
-                    layer.bounds.Height());
-        layer.collapsed = true;
+    } else if (!layer.bounds.IsEmpty()) {
+        int outset[4] = {};
+        layer.filters = MeasureFilters(effects, layer.transform.At(0, 0), outset);
+        TakeLayerPixels(layer, outset);
     }
     if (!layer.collapsed) {
         clip_ = Clip(layer.bounds);
@@ -101,7 +121,8 @@ void CpuBackend::RunCustomEffect(Layer& layer, const uint8_t* data, uint32_t siz
 }
 
 void CpuBackend::ApplyEffects(Layer& layer, uint32_t* blend) {
-    const float scale = float(layer.transform.MeanScale());
+    const Jacobian space = layer.transform.At(0, 0);
+    uint32_t left = layer.filters;
     ForEachEffect(layer.effects, [&](EffectKind kind, const uint8_t* data, uint32_t size) {
         switch (kind) {
             case EffectKind::Blend:
@@ -110,9 +131,9 @@ void CpuBackend::ApplyEffects(Layer& layer, uint32_t* blend) {
             case EffectKind::Filter: {
                 uint32_t count = 0;
                 const FilterRecord* filters = Filters(data, &count);
-                for (uint32_t i = 0; i < count; ++i) {
+                for (uint32_t i = 0; i < count && left > 0; ++i, --left) {
                     int outset[4] = {};
-                    FilterOutset(filters + i, 1, scale, outset);
+                    FilterOutset(filters[i], space, outset);
                     // Only a colour matrix makes something of nothing.
                     const bool fills =
                         filters[i].kind == uint32_t(FilterKind::ColorMatrix) && filters[i].values[19] != 0;
@@ -125,7 +146,7 @@ void CpuBackend::ApplyEffects(Layer& layer, uint32_t* blend) {
                     part.data += size_t(layer.touched.y0 - part.bounds.y0) * part.pitch +
                                  size_t(layer.touched.x0 - part.bounds.x0) * 4;
                     part.bounds = layer.touched;
-                    ApplyFilter(part, filters[i], scale);
+                    ApplyFilter(part, filters[i], space);
                 }
                 break;
             }
@@ -147,7 +168,7 @@ bool CpuBackend::Compose(const Layer& layer, float opacity) {
                                  layer.bounds.y0, opacity, layer.worldMatrix, layer.aabb});
 }
 
-void CpuBackend::MergeLayer(const Layer& layer, uint32_t blend, float opacity) {
+void CpuBackend::MergeLayer(Layer& layer, uint32_t blend, float opacity) {
     const uint8_t alpha = uint8_t(std::clamp(opacity, 0.0f, 1.0f) * 255 + 0.5f);
     const IRect area = Intersect(clip_.bounds(), AffectsOutside(blend) ? layer.bounds : layer.touched);
     if (alpha == 0 || area.IsEmpty()) return;
@@ -161,7 +182,10 @@ void CpuBackend::MergeLayer(const Layer& layer, uint32_t blend, float opacity) {
             sink.Span(y, area.x0, area.x1, alpha);
         else
             clip_.Filter(y, area.x0, area.x1, alpha, sink);
+        // Blank again while it is in the cache.
+        std::memset(from.Row(y) + layer.touched.x0, 0, size_t(layer.touched.Width()) * 4);
     }
+    layer.cleared = area;
     Touch(area);
     stats_.paintedPixels += sink.painted();
 }
@@ -180,9 +204,13 @@ void CpuBackend::CloseLayer() {
     if (blend >= kBlendModeCount) blend = kBlendNormal;
     const float opacity = layer.paint.color.a * layer.paint.opacity;
     if (!Compose(layer, opacity)) MergeLayer(layer, blend, opacity);
-    const IRect touched{layer.touched.x0 - layer.bounds.x0, layer.touched.y0 - layer.bounds.y0,
-                        layer.touched.x1 - layer.bounds.x0, layer.touched.y1 - layer.bounds.y0};
-    shared_.layers.GiveBack(std::move(layer.pixels), layer.touched.IsEmpty() ? IRect{} : touched);
+    const IRect& t = layer.touched;
+    for (int y = t.y0; y < t.y1; ++y) {
+        if (y >= layer.cleared.y0 && y < layer.cleared.y1) continue;
+        std::memset(layer.pixels.Row(y - layer.bounds.y0) + (t.x0 - layer.bounds.x0), 0,
+                    size_t(t.Width()) * 4);
+    }
+    shared_.layers.GiveBack(std::move(layer.pixels));
 }
 
 void CpuBackend::BeginLayer(const BeginLayerRecord& record, const NoneTail&) {

@@ -28,22 +28,26 @@ class PaintSink final : public CoverageSink {
     void Span(int y, int x0, int x1, uint8_t coverage) override {
         uint32_t* dst = target_.Row(y) + x0;
         painted_ += uint64_t(x1 - x0);
-        if (solid_ && ink_.blend == kBlendNormal) return BlendSolid(dst, x1 - x0, ink_.color, coverage);
+        uint32_t color = ink_.color;
+        if (ink_.blend == kBlendNormal && (solid_ || HasRowColor(y, &color)))
+            return BlendSolid(dst, x1 - x0, color, coverage);
         BlendRowMode(ink_.blend, dst, Source(y, x0, x1 - x0), x1 - x0, nullptr, coverage);
     }
     void Mask(int y, int x0, const uint8_t* coverage, int count) override {
         uint32_t* dst = target_.Row(y) + x0;
         painted_ += uint64_t(count);
-        if (solid_ && ink_.blend == kBlendNormal) return BlendSolidMask(dst, count, ink_.color, coverage);
+        uint32_t color = ink_.color;
+        if (ink_.blend == kBlendNormal && (solid_ || HasRowColor(y, &color)))
+            return BlendSolidMask(dst, count, color, coverage);
         BlendRowMode(ink_.blend, dst, Source(y, x0, count), count, coverage, 255);
     }
     uint64_t painted() const { return painted_; }
 
   private:
+    bool HasRowColor(int y, uint32_t* color) { return ink_.source && ink_.source->RowColor(y, color); }
     const uint32_t* Source(int y, int x0, int count) {
         if (ink_.bitmap) return ink_.bitmap->Row(y) + x0;
-        if (ink_.source) ink_.source->Fetch(x0, y, count, row_.data());
-        return row_.data();
+        return ink_.source ? ink_.source->Fetch(x0, y, count, row_.data()) : row_.data();
     }
 
     const Bitmap& target_;

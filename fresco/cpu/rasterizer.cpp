@@ -160,6 +160,56 @@ void Rasterizer::EmitRow(int y, FillRule rule, CoverageSink& sink) {
     touched_[words - 1] = 0;
 }
 
+class Rasterizer::RunRecorder final : public CoverageSink {
+  public:
+    explicit RunRecorder(Rasterizer& owner) : owner_(owner) {
+        owner_.runs_.clear();
+        owner_.runMasks_.clear();
+    }
+    void Span(int, int x0, int x1, uint8_t coverage) override {
+        owner_.runs_.push_back({x0, x1 - x0, coverage, false});
+    }
+    void Mask(int, int x0, const uint8_t* coverage, int count) override {
+        owner_.runs_.push_back({x0, count, 0, true});
+        owner_.runMasks_.insert(owner_.runMasks_.end(), coverage, coverage + count);
+    }
+
+  private:
+    Rasterizer& owner_;
+};
+
+// How many rows after this one look like it: as long as all edges are upright, cross whole rows, and no other
+// edge begins.
+int Rasterizer::CountEqualRows(int y) const {
+    const int64_t rowTop = int64_t(y) << kShift;
+    int64_t last = int64_t(lastRow_);
+    for (const int32_t i : active_) {
+        const Edge& edge = edges_[size_t(i)];
+        if (edge.slope != 0 || edge.top > rowTop) return 0;
+        last = std::min(last, (edge.bottom >> kShift) - 1);
+    }
+    int row = y + 1;
+    while (row <= last && heads_[size_t(row - firstRow_)] < 0)
+        ++row;
+    return std::max(0, row - y - 1);
+}
+
+void Rasterizer::EmitEqualRows(int y, int count, FillRule rule, CoverageSink& sink) {
+    RunRecorder recorder(*this);
+    EmitRow(y, rule, recorder);
+    for (int row = y; row < y + count; ++row) {
+        const uint8_t* mask = runMasks_.data();
+        for (const Run& run : runs_) {
+            if (run.masked) {
+                sink.Mask(row, run.x, mask, run.count);
+                mask += run.count;
+            } else {
+                sink.Span(row, run.x, run.x + run.count, run.coverage);
+            }
+        }
+    }
+}
+
 void Rasterizer::Sweep(FillRule rule, CoverageSink& sink) {
     if (edges_.empty() || bounds_.IsEmpty()) return;
     const size_t width = size_t(bounds_.Width());
@@ -179,14 +229,19 @@ void Rasterizer::Sweep(FillRule rule, CoverageSink& sink) {
         for (int32_t i = heads_[size_t(y - firstRow_)]; i >= 0; i = edges_[size_t(i)].next)
             active_.push_back(i);
         if (active_.empty()) continue;
-        const int64_t rowBottom = int64_t(y + 1) << kShift;
+        const int equal = CountEqualRows(y);
+        const int64_t rowBottom = int64_t(y + equal + 1) << kShift;
         size_t kept = 0;
         for (const int32_t i : active_) {
             AccumulateRow(edges_[size_t(i)], y);
             if (edges_[size_t(i)].bottom > rowBottom) active_[kept++] = i;
         }
         active_.resize(kept);
-        EmitRow(y, rule, sink);
+        if (equal > 0)
+            EmitEqualRows(y, equal + 1, rule, sink);
+        else
+            EmitRow(y, rule, sink);
+        y += equal;
     }
 }
 

@@ -4,7 +4,7 @@
 // weighted by area, which the fill rule turns into coverage. Sums are integers (1 / 65536 of a pixel), so the
 // coverage of a pixel depends neither on the bounds nor on the order of the edges: a partial repaint gives
 // the pixels of a full one, bit for bit. A row only visits cells that an edge touched; between them it emits
-// spans.
+// spans. Rows that only upright edges cross are worked out once and emitted as often as they come.
 #pragma once
 #include <fresco/path.h>
 #include "fresco/cpu/pixels.h"
@@ -47,6 +47,8 @@ class Rasterizer {
         touched_[size_t(x) >> 6] |= uint64_t(1) << (x & 63);
     }
     void EmitRow(int y, FillRule rule, CoverageSink& sink);
+    int CountEqualRows(int y) const;
+    void EmitEqualRows(int y, int count, FillRule rule, CoverageSink& sink);
 
     IRect bounds_;
     int firstRow_ = 0, lastRow_ = -1;
@@ -56,6 +58,16 @@ class Rasterizer {
     Vector<int32_t> cells_;  // zero between rows
     Vector<uint64_t> touched_;
     Vector<uint8_t> mask_;
+
+    // Pieces of a row that repeats; masks follow each other in runMasks_.
+    struct Run {
+        int x, count;
+        uint8_t coverage;
+        bool masked;
+    };
+    class RunRecorder;
+    Vector<Run> runs_;
+    Vector<uint8_t> runMasks_;
 };
 
 }  // namespace fresco::cpu

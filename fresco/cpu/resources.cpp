@@ -28,30 +28,30 @@ void Halve(const PixelBuffer& from, PixelBuffer* to) {
     }
 }
 
+void MakeLevels(Texture& texture) {
+    texture.levels.clear();
+    texture.levelsValid = true;
+    const PixelBuffer* from = &texture.pixels;
+    texture.levels.reserve(16);
+    while (from->width() > 1 && from->height() > 1 && texture.levels.size() < 15) {
+        PixelBuffer next;
+        if (!next.Allocate((from->width() + 1) / 2, (from->height() + 1) / 2)) break;
+        Halve(*from, &next);
+        texture.levels.push_back(std::move(next));
+        from = &texture.levels.back();
+    }
+}
+
 }  // namespace
 
-const PixelBuffer& Texture::Level(double scale, int* shift) {
-    *shift = 0;
-    if (!(scale < 0.5)) return pixels;
-    if (!levelsValid) {
-        levels.clear();
-        levelsValid = true;
-        const PixelBuffer* from = &pixels;
-        levels.reserve(16);
-        while (from->width() > 1 && from->height() > 1 && levels.size() < 15) {
-            PixelBuffer next;
-            if (!next.Allocate((from->width() + 1) / 2, (from->height() + 1) / 2)) break;
-            Halve(*from, &next);
-            levels.push_back(std::move(next));
-            from = &levels.back();
-        }
-    }
+const PixelBuffer& Resources::FindLevel(Texture& texture, double scale) {
+    if (!(scale < 0.5)) return texture.pixels;
+    const std::lock_guard<std::mutex> lock(mutex_);
+    if (!texture.levelsValid) MakeLevels(texture);
     // The smallest level that is still shrunk, but by less than one half.
-    const PixelBuffer* level = &pixels;
-    while (scale < 0.5 && size_t(*shift) < levels.size()) {
-        level = &levels[size_t((*shift)++)];
-        scale *= 2;
-    }
+    const PixelBuffer* level = &texture.pixels;
+    for (size_t i = 0; scale < 0.5 && i < texture.levels.size(); ++i, scale *= 2)
+        level = &texture.levels[i];
     return *level;
 }
 
@@ -60,6 +60,9 @@ Texture* Resources::FindImage(ImageId id) {
     if (found == images_.end()) return nullptr;
     Texture& texture = found->second;
     if (texture.user && texture.user->pixels) {
+        const std::lock_guard<std::mutex> lock(mutex_);
+        if (texture.readIn == frame_) return &texture;
+        texture.readIn = frame_;
         const size_t pixelSize = texture.sourceFormat == uint32_t(PixelFormat::A8) ? 1 : 4;
         const size_t pitch = texture.user->rowPitch ? texture.user->rowPitch : texture.width * pixelSize;
         Load(texture, static_cast<const uint8_t*>(texture.user->pixels), pitch);
@@ -147,7 +150,7 @@ void Resources::DestroySurfacesOf(uint32_t owner) {
 }
 
 void Resources::RetireOwner(uint32_t owner) {
-    std::lock_guard<std::mutex> lock(mutex_);
+    std::lock_guard<std::mutex> lock(retiredMutex_);
     retired_.push_back(owner);
     anyRetired_.store(true, std::memory_order_release);
 }
@@ -156,7 +159,7 @@ void Resources::DropRetired() {
     if (!anyRetired_.load(std::memory_order_acquire)) return;
     Vector<uint32_t> retired;
     {
-        std::lock_guard<std::mutex> lock(mutex_);
+        std::lock_guard<std::mutex> lock(retiredMutex_);
         retired.swap(retired_);
         anyRetired_.store(false, std::memory_order_relaxed);
     }

@@ -1,5 +1,5 @@
-// Images and surfaces by id, for all scenes of a library. Render thread only, but for RetireOwner. Images are
-// shared; a surface belongs to the scene whose buffers made it and goes with it at the latest.
+// Images and surfaces by id, for all scenes of a library. Render thread only, but for what says so. Images
+// are shared; a surface belongs to the scene whose buffers made it and goes with it at the latest.
 #pragma once
 #include <fresco/command_records.h>
 
@@ -22,16 +22,21 @@ struct Texture {
     uint32_t owner = 0;          // of a surface
     Vector<PixelBuffer> levels;  // half sizes, from the second level on
     bool levelsValid = false;
-
-    // The level for a draw that shows `scale` device pixels a texel.
-    const PixelBuffer& Level(double scale, int* shift);
+    uint64_t readIn = 0;  // the frame in which a user image was read last
 };
 
 class Resources {
   public:
-    // Null when absent. User images are read anew.
+    // From here on user images are read anew, each at its first use.
+    void BeginFrame() {
+        ++frame_;
+        DropRetired();
+    }
+    // Null when absent. Any thread that paints.
     Texture* FindImage(ImageId id);
     Texture* FindSurface(SurfaceId id);
+    // The level for a draw that shows `scale` device pixels a texel. Any thread that paints.
+    const PixelBuffer& FindLevel(Texture& texture, double scale);
     void CreateImage(const CreateImageRecord& record, const void* pixels, size_t size);
     void UpdateImage(const UpdateImageRecord& record, const void* pixels, size_t size);
     void DestroyImage(ImageId id) { images_.erase(id); }
@@ -51,12 +56,14 @@ class Resources {
   private:
     void Load(Texture& texture, const uint8_t* pixels, size_t pitch);
 
+    std::mutex mutex_;  // what painting threads change: user images and levels
+    uint64_t frame_ = 1;
     HashMap<ImageId, Texture> images_;
     HashMap<SurfaceId, Texture> surfaces_;
     std::atomic<uint32_t> nextOwner_{1};
     std::atomic<bool> anyRetired_{false};
-    std::mutex mutex_;
-    Vector<uint32_t> retired_;  // under mutex_
+    std::mutex retiredMutex_;
+    Vector<uint32_t> retired_;  // under retiredMutex_
 };
 
 }  // namespace fresco::cpu

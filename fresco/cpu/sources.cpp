@@ -1,8 +1,7 @@
 #include "fresco/cpu/sources.h"
 
-#if defined(__SSE2__)
-#include <emmintrin.h>
-#endif
+#include <bit>
+#include <climits>
 
 namespace fresco::cpu {
 namespace {
@@ -31,73 +30,65 @@ void WalkRow(const Homography& h, int x, int y, int count, Use use) {
     }
 }
 
-#if !defined(__SSE2__)
-// Weights of 8 bits between two and then two pixels.
-inline uint32_t Lerp(uint32_t a, uint32_t b, uint32_t weight) {
+// 8-bit weights between two pixels, rounded.
+inline uint32_t Mix(uint32_t a, uint32_t b, uint32_t weight) {
     const uint32_t inverse = 256 - weight;
     const uint32_t even = ((a & 0x00FF00FF) * inverse + (b & 0x00FF00FF) * weight + 0x00800080) >> 8;
     const uint32_t odd = ((a >> 8) & 0x00FF00FF) * inverse + ((b >> 8) & 0x00FF00FF) * weight + 0x00800080;
     return (even & 0x00FF00FF) | (odd & 0xFF00FF00);
 }
-#endif
-
-// Two by two texels, weights of 8 bits: between the rows first, then between the columns. The vector form
-// rounds as the scalar one does.
-inline uint32_t Bilinear(const uint32_t* upper, const uint32_t* lower, int x0, int x1, uint32_t wu,
-                         uint32_t wv) {
-#if defined(__SSE2__)
-    const __m128i zero = _mm_setzero_si128(), half = _mm_set1_epi16(128);
-    const auto pair = [&](const uint32_t* row) {
-        const __m128i texels =
-            _mm_unpacklo_epi32(_mm_cvtsi32_si128(int(row[x0])), _mm_cvtsi32_si128(int(row[x1])));
-        return _mm_unpacklo_epi8(texels, zero);
-    };
-    const auto weigh = [&](__m128i a, __m128i b, uint32_t weight) {
-        const __m128i sum = _mm_add_epi16(_mm_mullo_epi16(a, _mm_set1_epi16(short(256 - weight))),
-                                          _mm_mullo_epi16(b, _mm_set1_epi16(short(weight))));
-        return _mm_srli_epi16(_mm_add_epi16(sum, half), 8);
-    };
-    const __m128i columns = weigh(pair(upper), pair(lower), wv);
-    const __m128i pixel = weigh(columns, _mm_srli_si128(columns, 8), wu);
-    return uint32_t(_mm_cvtsi128_si32(_mm_packus_epi16(pixel, zero)));
-#else
-    return Lerp(Lerp(upper[x0], lower[x0], wv), Lerp(upper[x1], lower[x1], wv), wu);
-#endif
-}
 
 }  // namespace
 
-void GradientTable::Build(const GradientStop* stops, uint32_t count, float opacity) {
-    const auto pack = [opacity](const Color& c) {
-        return PackPixel(std::min(c.r, c.a) * opacity, std::min(c.g, c.a) * opacity,
-                         std::min(c.b, c.a) * opacity, c.a * opacity);
+void GradientTable::Build(const GradientStop* stops, uint32_t count, float opacity, double length) {
+    const double wanted = std::clamp(length * 2, double(kMinSize), double(kMaxSize));
+    const int size = int(std::bit_ceil(uint32_t(wanted)));
+    colors.resize(size_t(size));
+    if (count == 0) return std::fill(colors.begin(), colors.end(), 0u);
+    const float unit = 1.0f / float(size - 1);
+    const auto channels = [opacity](const Color& c, float out[4]) {
+        const float scale = opacity * 255;
+        out[0] = std::min(c.r, c.a) * scale, out[1] = std::min(c.g, c.a) * scale;
+        out[2] = std::min(c.b, c.a) * scale, out[3] = c.a * scale;
     };
-    if (count == 0) {
-        std::memset(colors, 0, sizeof(colors));
-        return;
-    }
-    uint32_t next = 0;
+    // Entry i stands for i * unit; those below an offset belong to the segment that ends there. An offset
+    // below an earlier one counts as equal to it.
+    float from[4], to[4], step[4] = {};
+    int entry = 0;
     float last = stops[0].offset;
-    for (int i = 0; i < kSize; ++i) {
-        const float t = float(i) / (kSize - 1);
-        // An offset below an earlier one counts as equal to it.
-        while (next < count && std::max(last, stops[next].offset) <= t)
-            last = std::max(last, stops[next++].offset);
-        if (next == 0) {
-            colors[i] = pack(stops[0].color);
-        } else if (next == count) {
-            colors[i] = pack(stops[count - 1].color);
-        } else {
-            const Color &a = stops[next - 1].color, &b = stops[next].color;
-            const float f = (t - last) / (stops[next].offset - last);
-            colors[i] = pack(
-                {a.r + (b.r - a.r) * f, a.g + (b.g - a.g) * f, a.b + (b.b - a.b) * f, a.a + (b.a - a.a) * f});
+    channels(stops[0].color, from);
+    const auto fillUntil = [&](int end) {
+        if (end <= entry) return;
+        Rows().Ramp(colors.data() + entry, end - entry, from, step);
+        entry = end;
+    };
+    const auto entriesBelow = [&](float offset) {
+        return int(std::clamp(std::ceil(double(offset) * (size - 1)), 0.0, double(size)));
+    };
+    fillUntil(entriesBelow(last));
+    for (uint32_t k = 1; k < count; ++k) {
+        const float offset = std::max(last, stops[k].offset);
+        channels(stops[k - 1].color, from);
+        channels(stops[k].color, to);
+        const int end = entriesBelow(offset);
+        if (end > entry) {
+            const float slope = unit / (offset - last),
+                        start = (float(entry) * unit - last) / (offset - last);
+            for (int c = 0; c < 4; ++c) {
+                step[c] = (to[c] - from[c]) * slope;
+                from[c] += (to[c] - from[c]) * start;
+            }
+            fillUntil(end);
         }
+        last = offset;
     }
+    channels(stops[count - 1].color, from);
+    std::fill(step, step + 4, 0.0f);
+    fillUntil(size);
 }
 
 GradientSource::GradientSource(const LinearGradient& geometry, const Homography& toPlane,
-                               const GradientTable& table)
+                               GradientTable& table)
     : spread_(geometry.spread), table_(table) {
     const double dx = geometry.end.x - geometry.start.x, dy = geometry.end.y - geometry.start.y;
     const double squared = dx * dx + dy * dy;
@@ -114,11 +105,31 @@ GradientSource::GradientSource(const LinearGradient& geometry, const Homography&
 }
 
 GradientSource::GradientSource(const RadialGradient& geometry, const Homography& toPlane,
-                               const GradientTable& table)
+                               GradientTable& table)
     : radial_(true), spread_(geometry.spread), table_(table) {
     const double rx = std::max<double>(std::abs(geometry.radius.x), 1e-6);
     const double ry = std::max<double>(std::abs(geometry.radius.y), 1e-6);
     toUnit_ = Affine(1 / rx, geometry.center.x, 1 / ry, geometry.center.y) * toPlane;
+}
+
+void GradientSource::SetStops(const GradientStop* stops, uint32_t count, float opacity) {
+    const double perPixel = toUnit_.IsAffine() ? toUnit_.MaxScale() : 0;
+    table_.Build(stops, count, opacity, 1 / std::max(perPixel, 1e-6));
+}
+
+GradientWalk GradientSource::WalkOf(int y) const {
+    const double last = double(table_.colors.size() - 1), py = y + 0.5;
+    const auto start = [&](double xx, double xy, double x0) {
+        // Far off, single floats lose the fraction, but there is one colour or noise.
+        return float(std::clamp((xx * 0.5 + xy * py + x0) * last, -1e9, 1e9));
+    };
+    GradientWalk walk;
+    walk.colors = table_.colors.data();
+    walk.last = float(last);
+    walk.spread = spread_;
+    walk.u = start(toUnit_.xx, toUnit_.xy, toUnit_.x0), walk.du = float(toUnit_.xx * last);
+    walk.v = start(toUnit_.yx, toUnit_.yy, toUnit_.y0), walk.dv = float(toUnit_.yx * last);
+    return walk;
 }
 
 uint32_t GradientSource::Lookup(double t) const {
@@ -127,21 +138,44 @@ uint32_t GradientSource::Lookup(double t) const {
     } else if (spread_ == kSpreadReflect) {
         t = std::abs(t - 2 * std::floor(t / 2 + 0.5));
     }
-    const double index = std::clamp(t, 0.0, 1.0) * (GradientTable::kSize - 1) + 0.5;
+    const double index = std::clamp(t, 0.0, 1.0) * double(table_.colors.size() - 1) + 0.5;
     return table_.colors[size_t(index)];
 }
 
-void GradientSource::Fetch(int x, int y, int count, uint32_t* out) {
-    if (radial_) {
-        WalkRow(toUnit_, x, y, count,
-                [&](int i, double u, double v) { out[i] = Lookup(std::sqrt(u * u + v * v)); });
-    } else {
-        WalkRow(toUnit_, x, y, count, [&](int i, double u, double) { out[i] = Lookup(u); });
-    }
+void GradientSource::FetchProjected(int x, int y, int count, uint32_t* out) const {
+    WalkRow(toUnit_, x, y, count,
+            [&](int i, double u, double v) { out[i] = Lookup(radial_ ? std::sqrt(u * u + v * v) : u); });
 }
 
-ImageSource::ImageSource(Texture& texture, const Placement& placement, const Homography& toPlane,
-                         float opacity)
+bool GradientSource::RowColor(int y, uint32_t* color) {
+    if (radial_ || !toUnit_.IsAffine() || toUnit_.xx != 0) return false;
+    Rows().LinearGradient(color, 0, 1, WalkOf(y));
+    return true;
+}
+
+const uint32_t* GradientSource::Fetch(int x, int y, int count, uint32_t* room) {
+    if (!toUnit_.IsAffine()) {
+        FetchProjected(x, y, count, room);
+        return room;
+    }
+    const bool alongRows = !radial_ && toUnit_.xy == 0;
+    if (alongRows && x >= rowX_ && x + count <= rowX_ + int(row_.size())) return row_.data() + (x - rowX_);
+    uint32_t* out = room;
+    if (alongRows) {
+        row_.resize(size_t(count));
+        rowX_ = x;
+        out = row_.data();
+    }
+    const GradientWalk walk = WalkOf(y);
+    if (radial_)
+        Rows().RadialGradient(out, x, count, walk);
+    else
+        Rows().LinearGradient(out, x, count, walk);
+    return out;
+}
+
+ImageSource::ImageSource(Resources& resources, Texture& texture, const Placement& placement,
+                         const Homography& toPlane, float opacity)
     : alpha_(uint32_t(std::clamp(opacity, 0.0f, 1.0f) * 255 + 0.5f)) {
     Rect source = placement.source;
     if (source.width == 0 || source.height == 0)
@@ -154,125 +188,156 @@ ImageSource::ImageSource(Texture& texture, const Placement& placement, const Hom
     Homography toTexels =
         Affine(1, -double(source.x), 1, -double(source.y)) * Affine(sx, target.x, sy, target.y) * toPlane;
 
-    int shift = 0;
     const double texelsAPixel = toTexels.MaxScale(target.x, target.y);
-    level_ = &texture.Level(1 / std::max(texelsAPixel, 1e-9), &shift);
+    level_ = &resources.FindLevel(texture, 1 / std::max(texelsAPixel, 1e-9));
     // Odd sizes round up, so a level's scale is the ratio of the sizes.
     const double levelX = double(level_->width()) / texture.width,
                  levelY = double(level_->height()) / texture.height;
     toTexels_ = Affine(levelX, 0, levelY, 0) * toTexels;
-    left_ = std::max(0.0, source.x * levelX), top_ = std::max(0.0, source.y * levelY);
-    right_ = std::min<double>(level_->width(), (source.x + source.width) * levelX);
-    bottom_ = std::min<double>(level_->height(), (source.y + source.height) * levelY);
-    right_ = std::max(right_, left_ + 1e-3), bottom_ = std::max(bottom_, top_ + 1e-3);
-    if (placement.repeatX) periodX_ = (std::abs(target.width) + placement.spacingX) * std::abs(sx) * levelX;
-    if (placement.repeatY) periodY_ = (std::abs(target.height) + placement.spacingY) * std::abs(sy) * levelY;
-    wrapX_ = periodX_ > 0 && std::abs(periodX_ - (right_ - left_)) < 1e-6 * periodX_;
-    wrapY_ = periodY_ > 0 && std::abs(periodY_ - (bottom_ - top_)) < 1e-6 * periodY_;
+    const auto axis = [](double begin, double end, int size, double period) {
+        Axis a;
+        a.begin = std::clamp(begin, 0.0, size - 1e-3);
+        a.end = std::max(std::min(double(size), end), a.begin + 1e-3);
+        a.first = int(a.begin), a.last = std::max(a.first, int(std::ceil(a.end)) - 1);
+        a.period = period;
+        a.wraps = period > 0 && std::abs(period - (a.end - a.begin)) < 1e-6 * period;
+        return a;
+    };
+    const double periodX = (std::abs(target.width) + placement.spacingX) * std::abs(sx) * levelX,
+                 periodY = (std::abs(target.height) + placement.spacingY) * std::abs(sy) * levelY;
+    u_ = axis(source.x * levelX, (source.x + source.width) * levelX, level_->width(),
+              placement.repeatX ? std::max(periodX, 0.0) : 0);
+    v_ = axis(source.y * levelY, (source.y + source.height) * levelY, level_->height(),
+              placement.repeatY ? std::max(periodY, 0.0) : 0);
     // Texel for pixel: rows can be copied.
     const auto whole = [](double v) { return std::abs(v - std::round(v)) < 1.0 / 512; };
     aligned_ = toTexels_.IsScaleTranslate() && std::abs(toTexels_.xx - 1) < 1e-6 &&
                std::abs(toTexels_.yy - 1) < 1e-6 && whole(toTexels_.x0) && whole(toTexels_.y0) &&
-               periodX_ == 0 && periodY_ == 0;
+               u_.period == 0 && v_.period == 0;
+}
+
+// Texel centres lie at one half; outside of the source its edge goes on, or the other side comes back.
+bool ImageSource::Axis::Locate(double at, int* low, uint32_t* weight) const {
+    if (period > 0) {
+        at = begin + (at - begin) - std::floor((at - begin) / period) * period;
+        if (at > end && !wraps) return false;
+        at = std::min(at - 0.5, double(last));
+    } else {
+        at = std::min(std::max(at - 0.5, double(first)), double(last));
+    }
+    // Shifted to be positive, so that truncation is floor.
+    const uint32_t fixed = uint32_t((at - (first - 1)) * 256 + 0.5);
+    *low = int(fixed >> 8) + first - 1;
+    *weight = fixed & 255;
+    return true;
+}
+
+int ImageSource::Axis::Texel(int index) const {
+    if (index < first) return wraps ? last : first;
+    if (index > last) return wraps ? first : last;
+    return index;
 }
 
 uint32_t ImageSource::Sample(double u, double v) const {
-    if (periodX_ > 0) {
-        u = left_ + (u - left_) - std::floor((u - left_) / periodX_) * periodX_;
-        if (u > right_ + 0.0 && !wrapX_) return 0;
-    }
-    if (periodY_ > 0) {
-        v = top_ + (v - top_) - std::floor((v - top_) / periodY_) * periodY_;
-        if (v > bottom_ + 0.0 && !wrapY_) return 0;
-    }
-    // Texel centres lie at one half; outside of the source its edge goes on, or the other side comes back.
-    const double firstX = std::floor(left_), lastX = std::ceil(right_) - 1;
-    const double firstY = std::floor(top_), lastY = std::ceil(bottom_) - 1;
-    u -= 0.5, v -= 0.5;
-    const double fu = std::floor(u), fv = std::floor(v);
-    const uint32_t wu = uint32_t((u - fu) * 256 + 0.5), wv = uint32_t((v - fv) * 256 + 0.5);
-    const auto index = [](double i, double first, double last, bool wrap) {
-        if (wrap && i < first) i = last;
-        if (wrap && i > last) i = first;
-        return int(std::clamp(i, first, last));
-    };
-    const int x0 = index(fu, firstX, lastX, wrapX_), x1 = index(fu + 1, firstX, lastX, wrapX_);
-    const int y0 = index(fv, firstY, lastY, wrapY_), y1 = index(fv + 1, firstY, lastY, wrapY_);
-    return Bilinear(level_->Row(y0), level_->Row(y1), x0, x1, wu, wv);
+    int x = 0, y = 0;
+    uint32_t wx = 0, wy = 0;
+    if (!u_.Locate(u, &x, &wx) || !v_.Locate(v, &y, &wy)) return 0;
+    const int x0 = u_.Texel(x), x1 = u_.Texel(x + 1);
+    const uint32_t *upper = level_->Row(v_.Texel(y)), *lower = level_->Row(v_.Texel(y + 1));
+    return Mix(Mix(upper[x0], lower[x0], wy), Mix(upper[x1], lower[x1], wy), wx);
 }
 
-// Without repeats the position is held inside of the source, so that truncation is floor and no index can
-// leave.
-void ImageSource::FetchClamped(int x, int y, int count, uint32_t* out) {
-    const double firstX = std::floor(left_), lastX = std::ceil(right_) - 1;
-    const double firstY = std::floor(top_), lastY = std::ceil(bottom_) - 1;
-    const int endX = int(lastX), endY = int(lastY);
-    const auto locate = [](double at, double first, double last, int end) {
-        const uint32_t fixed = uint32_t(std::min(std::max(at - 0.5, first), last) * 256 + 0.5);
-        const int low = int(fixed >> 8);
-        return Axis{low, std::min(low + 1, end), fixed & 255};
-    };
-    if (toTexels_.IsScaleTranslate()) {
-        const Axis v = locate(toTexels_.yy * (y + 0.5) + toTexels_.y0, firstY, lastY, endY);
-        const uint32_t *upper = level_->Row(v.low), *lower = level_->Row(v.high);
-        // A row comes in pieces (edges, middle), the next row in the same ones: keep the columns of all of
-        // them.
-        const int known = columnsX_ + int(columns_.size());
-        if (columns_.empty() || x < columnsX_ || x + count > known) {
-            const int first = columns_.empty() ? x : std::min(x, columnsX_);
-            const int end = columns_.empty() ? x + count : std::max(x + count, known);
-            columnsX_ = first;
-            columns_.resize(size_t(end - first));
-            WalkRow(toTexels_, first, y, end - first,
-                    [&](int i, double at, double) { columns_[size_t(i)] = locate(at, firstX, lastX, endX); });
-        }
-        const Axis* columns = columns_.data() + (x - columnsX_);
-        for (int i = 0; i < count; ++i) {
-            const Axis& u = columns[i];
-            out[i] = Bilinear(upper, lower, u.low, u.high, u.weight, v.weight);
-        }
-        return;
-    }
-    WalkRow(toTexels_, x, y, count, [&](int i, double atX, double atY) {
-        const Axis u = locate(atX, firstX, lastX, endX), v = locate(atY, firstY, lastY, endY);
-        out[i] = Bilinear(level_->Row(v.low), level_->Row(v.high), u.low, u.high, u.weight, v.weight);
+// A row comes in pieces (edges, middle), the next row in the same ones: the columns of all are kept.
+void ImageSource::LocateColumns(int x, int y, int count) {
+    const int known = columnsX_ + int(offsets_.size());
+    if (!offsets_.empty() && x >= columnsX_ && x + count <= known) return;
+    const int first = offsets_.empty() ? x : std::min(x, columnsX_);
+    const int end = offsets_.empty() ? x + count : std::max(x + count, known);
+    columnsX_ = first;
+    offsets_.resize(size_t(end - first));
+    samples_.resize(size_t(end - first));
+    hasMixed_ = false;
+    constexpr int kGap = INT_MIN;
+    int lowest = INT_MAX, highest = INT_MIN;
+    WalkRow(toTexels_, first, y, end - first, [&](int i, double at, double) {
+        int low = kGap;
+        uint32_t weight = 0;
+        if (u_.Locate(at, &low, &weight))
+            lowest = std::min(lowest, low), highest = std::max(highest, low + 1);
+        offsets_[size_t(i)] = low;
+        ColumnSample& sample = samples_[size_t(i)];
+        std::fill(sample.weights, sample.weights + 4, uint16_t(256 - weight));
+        std::fill(sample.weights + 4, sample.weights + 8, uint16_t(weight));
     });
+    mixedFirst_ = lowest <= highest ? lowest : 0;
+    mixedCount_ = lowest <= highest ? highest - lowest + 1 : 0;
+    for (int32_t& offset : offsets_)
+        offset = offset == kGap ? mixedCount_ : offset - mixedFirst_;
 }
 
-void ImageSource::FetchAligned(int u, int v, int count, uint32_t* out) const {
-    const int first = int(left_), last = int(std::ceil(right_)) - 1;
-    const uint32_t* row = level_->Row(std::clamp(v, int(top_), int(std::ceil(bottom_)) - 1));
-    if (u >= first && u + count <= last + 1) {
-        std::memcpy(out, row + u, size_t(count) * 4);
-        return;
-    }
-    for (int i = 0; i < count; ++i)
-        out[i] = row[std::clamp(u + i, first, last)];
+// The texels that the columns need, blended from the two rows around y; null in a gap.
+const uint32_t* ImageSource::MixedRow(int y) {
+    if (hasMixed_ && mixedY_ == y) return mixed_.data();
+    int low = 0;
+    uint32_t weight = 0;
+    if (!v_.Locate(toTexels_.yy * (y + 0.5) + toTexels_.y0, &low, &weight)) return nullptr;
+    mixed_.resize(size_t(mixedCount_) + 2);
+    const uint32_t *upper = level_->Row(v_.Texel(low)), *lower = level_->Row(v_.Texel(low + 1));
+    // The middle in one go; before the first and after the last texel stands what the axis says.
+    const int begin = std::max(mixedFirst_, u_.first), end = std::min(mixedFirst_ + mixedCount_, u_.last + 1);
+    uint32_t* mixed = mixed_.data() - mixedFirst_;
+    if (begin < end) Rows().MixRows(mixed + begin, upper + begin, lower + begin, end - begin, weight);
+    for (int i = mixedFirst_; i < std::min(begin, mixedFirst_ + mixedCount_); ++i)
+        mixed[i] = Mix(upper[u_.Texel(i)], lower[u_.Texel(i)], weight);
+    for (int i = std::max(end, mixedFirst_); i < mixedFirst_ + mixedCount_; ++i)
+        mixed[i] = Mix(upper[u_.Texel(i)], lower[u_.Texel(i)], weight);
+    mixed_[size_t(mixedCount_)] = mixed_[size_t(mixedCount_) + 1] = 0;
+    mixedY_ = y, hasMixed_ = true;
+    return mixed_.data();
 }
 
-void ImageSource::Fetch(int x, int y, int count, uint32_t* out) {
+void ImageSource::FetchUpright(int x, int y, int count, uint32_t* out) {
+    LocateColumns(x, y, count);
+    const uint32_t* row = MixedRow(y);
+    if (!row) return std::fill(out, out + count, 0u);
+    const size_t at = size_t(x - columnsX_);
+    Rows().SampleColumns(out, row, offsets_.data() + at, samples_.data() + at, count);
+}
+
+// The row itself when all of it lies inside of the source.
+bool ImageSource::FindAligned(int u, int v, int count, const uint32_t** row) const {
+    *row = level_->Row(std::clamp(v, v_.first, v_.last)) + u;
+    return u >= u_.first && u + count <= u_.last + 1;
+}
+
+const uint32_t* ImageSource::Fetch(int x, int y, int count, uint32_t* room) {
     if (aligned_) {
-        FetchAligned(x + int(std::lround(toTexels_.x0)), y + int(std::lround(toTexels_.y0)), count, out);
-    } else if (periodX_ == 0 && periodY_ == 0) {
-        FetchClamped(x, y, count, out);
-    } else {
-        WalkRow(toTexels_, x, y, count, [&](int i, double u, double v) { out[i] = Sample(u, v); });
-    }
-    if (alpha_ != 255) {
+        const int u = x + int(std::lround(toTexels_.x0)), v = y + int(std::lround(toTexels_.y0));
+        const uint32_t* row = nullptr;
+        const bool inside = FindAligned(u, v, count, &row);
+        if (inside && alpha_ == 255) return row;
         for (int i = 0; i < count; ++i)
-            out[i] = ScalePixel(out[i], alpha_);
+            room[i] = row[std::clamp(u + i, u_.first, u_.last) - u];
+    } else if (toTexels_.IsScaleTranslate()) {
+        FetchUpright(x, y, count, room);
+    } else {
+        WalkRow(toTexels_, x, y, count, [&](int i, double u, double v) { room[i] = Sample(u, v); });
     }
+    if (alpha_ != 255) Rows().Scale(room, count, alpha_);
+    return room;
 }
 
-void WindowSource::Fetch(int x, int y, int count, uint32_t* out) {
-    inner_.Fetch(x, y, count, out);
-    if (placement_.repeatX && placement_.repeatY) return;
+const uint32_t* WindowSource::Fetch(int x, int y, int count, uint32_t* room) {
+    const uint32_t* inner = inner_.Fetch(x, y, count, room);
+    if (placement_.repeatX && placement_.repeatY) return inner;
+    if (inner != room) std::memcpy(room, inner, size_t(count) * 4);
     const Rect& t = placement_.target;
     WalkRow(toPlane_, x, y, count, [&](int i, double u, double v) {
         const bool inX = placement_.repeatX || (u >= t.x && u < double(t.x) + t.width);
         const bool inY = placement_.repeatY || (v >= t.y && v < double(t.y) + t.height);
-        if (!inX || !inY) out[i] = 0;
+        if (!inX || !inY) room[i] = 0;
     });
+    return room;
 }
 
 YuvSource::YuvSource(const Texture* const planes[4], const Rect& target, const Homography& toPlane,
@@ -284,7 +349,7 @@ YuvSource::YuvSource(const Texture* const planes[4], const Rect& target, const H
               toPlane;
 }
 
-void YuvSource::Fetch(int x, int y, int count, uint32_t* out) {
+const uint32_t* YuvSource::Fetch(int x, int y, int count, uint32_t* room) {
     const auto sample = [](const Texture& plane, double u, double v) {
         const double px = std::clamp(u * plane.width - 0.5, 0.0, plane.width - 1.0);
         const double py = std::clamp(v * plane.height - 0.5, 0.0, plane.height - 1.0);
@@ -301,10 +366,11 @@ void YuvSource::Fetch(int x, int y, int count, uint32_t* out) {
                     cr = (sample(*planes_[2], u, v) - 128) / 255;
         const float alpha = (planes_[3] ? sample(*planes_[3], u, v) / 255 : 1) * opacity_;
         const auto clamp = [](float c) { return std::clamp(c, 0.0f, 1.0f); };
-        out[i] =
+        room[i] =
             PackPixel(clamp(l + 1.596027f * cr) * alpha, clamp(l - 0.391762f * cb - 0.812968f * cr) * alpha,
                       clamp(l + 2.017232f * cb) * alpha, alpha);
     });
+    return room;
 }
 
 }  // namespace fresco::cpu

@@ -2,6 +2,7 @@
 #include <fresco/library.h>
 #include "fresco/core/heap.h"
 #include "fresco/core/log.h"
+#include "fresco/cpu/rows.h"
 #include "fresco/images/decoders.h"
 
 namespace fresco {
@@ -26,24 +27,35 @@ bool Decode(const uint8_t* data, size_t size, uint32_t index, const DecodeHints&
     return false;
 }
 
-// In place; returns whether all pixels are opaque.
+bool IsOpaque(const uint32_t* pixels, size_t count) {
+    uint32_t all = 0xFFFFFFFFu;
+    for (size_t i = 0; i < count; ++i)
+        all &= pixels[i];
+    return all >> 24 == 255;
+}
+
+// In place, piece by piece so that each is touched once while it is in the cache; returns whether all pixels
+// are opaque.
 bool Finish(DecodedFrame& frame, bool premultiply, PixelFormat format) {
     const size_t count = size_t(frame.width) * frame.height;
-    uint8_t* p = frame.pixels;
-    uint8_t all = 255;
-    for (size_t i = 0; i < count; ++i, p += 4) {
-        const uint32_t a = p[3];
-        all &= uint8_t(a);
-        if (premultiply && a != 255) {
-            for (int c = 0; c < 3; ++c) {
-                const uint32_t t = p[c] * a + 128;
-                p[c] = uint8_t((t + (t >> 8)) >> 8);
-            }
+    if (!frame.hasAlpha && format == PixelFormat::RGBA8) return true;
+    auto* pixels = reinterpret_cast<uint32_t*>(frame.pixels);
+    const cpu::RowLoops& rows = cpu::Rows();
+    bool opaque = true;
+    constexpr size_t kPiece = 4096;
+    for (size_t at = 0; at < count; at += kPiece) {
+        const size_t length = std::min(kPiece, count - at);
+        uint32_t* piece = pixels + at;
+        const bool solid = IsOpaque(piece, length);
+        opaque = opaque && solid;
+        if (premultiply && !solid) rows.Premultiply(piece, int(length));
+        if (format == PixelFormat::BGRA8) rows.SwapRedAndBlue(piece, int(length));
+        if (format == PixelFormat::A8) {
+            for (size_t i = 0; i < length; ++i)
+                frame.pixels[at + i] = uint8_t(piece[i] >> 24);
         }
-        if (format == PixelFormat::BGRA8) std::swap(p[0], p[2]);
-        if (format == PixelFormat::A8) frame.pixels[i] = uint8_t(a);
     }
-    return all == 255;
+    return opaque;
 }
 
 }  // namespace

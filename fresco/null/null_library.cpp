@@ -47,6 +47,7 @@ class NullLibrary final : public IRenderingLibrary {
     void SetFileManipulator(IFileManipulator* files) override { fonts_.SetFiles(files); }
     IFontService* GetFontService() override { return &fonts_; }
     IScene* CreateScene(const SceneParams&) override { return HeapNew<NullScene>(); }
+    void SetPaintHelpers(IPaintHelpers*) override {}
     void Forward(uint64_t, uint64_t, uint64_t) override {}
     void Destroy() override {
         HeapDelete(this);

@@ -1,23 +1,6 @@
 #include "fresco/paths/matrix.h"
 
 namespace fresco {
-namespace {
-
-struct Jacobian {
-    double a, b, c, d;
-};
-
-// Derivative of the projected point by x and y.
-Jacobian JacobianAt(const Homography& h, double x, double y) {
-    if (h.IsAffine()) return {h.xx, h.xy, h.yx, h.yy};
-    double w = h.wx * x + h.wy * y + h.w0;
-    if (std::abs(w) < 1e-6) w = 1e-6;
-    const double px = (h.xx * x + h.xy * y + h.x0) / w, py = (h.yx * x + h.yy * y + h.y0) / w;
-    return {(h.xx - px * h.wx) / w, (h.xy - px * h.wy) / w, (h.yx - py * h.wx) / w, (h.yy - py * h.wy) / w};
-}
-
-}  // namespace
-
 bool Invert(const Matrix4& matrix, Matrix4* inverse) {
     // Gauss-Jordan with partial pivoting, in double.
     double a[4][8];
@@ -82,16 +65,19 @@ bool Homography::Invert(Homography* inverse) const {
     return true;
 }
 
-double Homography::MaxScale(double x, double y) const {
-    // The larger singular value of the 2 by 2 derivative.
-    const Jacobian j = JacobianAt(*this, x, y);
-    const double e = (j.a + j.d) / 2, f = (j.a - j.d) / 2, g = (j.c + j.b) / 2, h = (j.c - j.b) / 2;
-    return std::sqrt(e * e + h * h) + std::sqrt(f * f + g * g);
+Jacobian Homography::At(double x, double y) const {
+    if (IsAffine()) return {xx, xy, yx, yy};
+    double w = wx * x + wy * y + w0;
+    if (std::abs(w) < 1e-6) w = 1e-6;
+    const double px = (xx * x + xy * y + x0) / w, py = (yx * x + yy * y + y0) / w;
+    return {(xx - px * wx) / w, (xy - px * wy) / w, (yx - py * wx) / w, (yy - py * wy) / w};
 }
 
-double Homography::MeanScale(double x, double y) const {
-    const Jacobian j = JacobianAt(*this, x, y);
-    return std::sqrt(std::abs(j.a * j.d - j.b * j.c));
+double Homography::MaxScale(double x, double y) const {
+    // The larger singular value of the 2 by 2 derivative.
+    const Jacobian j = At(x, y);
+    const double e = (j.xx + j.yy) / 2, f = (j.xx - j.yy) / 2, g = (j.yx + j.xy) / 2, h = (j.yx - j.xy) / 2;
+    return std::sqrt(e * e + h * h) + std::sqrt(f * f + g * g);
 }
 
 Homography operator*(const Homography& a, const Homography& b) {

@@ -13,6 +13,11 @@ struct Vec2 {
     double x = 0, y = 0;
 };
 
+// How a transform maps small distances: (dx, dy) goes to (xx * dx + xy * dy, yx * dx + yy * dy).
+struct Jacobian {
+    double xx = 1, xy = 0, yx = 0, yy = 1;
+};
+
 // What a 4 by 4 transform does to the plane of a draw: (x, y) goes to (X / W, Y / W). Depth is of no use
 // here.
 struct Homography {
@@ -31,10 +36,9 @@ struct Homography {
         return {(xx * x + xy * y + x0) / w, (yx * x + yy * y + y0) / w};
     }
     bool Invert(Homography* inverse) const;
+    Jacobian At(double x, double y) const;
     // The largest factor by which a length near (x, y) grows.
     double MaxScale(double x = 0, double y = 0) const;
-    // Square root of the area factor near (x, y).
-    double MeanScale(double x = 0, double y = 0) const;
 };
 
 Homography operator*(const Homography& a, const Homography& b);

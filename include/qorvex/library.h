@@ -61,6 +61,8 @@ struct LibraryParams : LibraryParamsWithExternalRenderingLibrary {
     // Switches, found by plain substring search, then passed on to the rendering library. Null is allowed.
     //   --dont-snap-to-integer-coords-before-transform  paint at fractional positions
     //   --disable-font-data-preloading                  do not rasterise glyphs ahead of recording
+    //   --paint-helpers=N                               up to N threads inside ExecuteWork(Resources) help to
+    //                                                   paint large frames (at most 15; none without it)
     const char* AdditionalOptions = nullptr;
     std::uint64_t RenderingLibraryExtraParam = 0;
 };

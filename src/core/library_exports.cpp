@@ -4,7 +4,7 @@
 #include "core/adapters/rendering_adapters.h"
 #include "core/library_impl.h"
 #include "core/logging/log.h"
-#include "core/url_decode.h"
+#include "core/url/url_decode.h"
 
 namespace qorvex {
 

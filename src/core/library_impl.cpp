@@ -25,6 +25,7 @@ namespace qorvex {
 namespace {
 
 constexpr const char* kRevision = QORVEX_REVISION;
+constexpr uint32_t kLibraryFamily = 0;
 constexpr const char* kDefaultFontFamily = "Droid Sans";
 
 LibraryImpl* g_library = nullptr;
@@ -86,11 +87,12 @@ bool LibraryImpl::Start(const LibraryParams& params, fresco::IRenderingLibrary* 
     tasks_ = MakeUnique<TaskSystem, MemoryTag::General>(settings);
     responses_ = MakeUnique<ClientResponsePool, MemoryTag::Resources>();
 
-    TakeFamily();  // the first system gets family 1
+    TakeFamily();  // kLibraryFamily; the first system gets family 1
     script::CreateScriptClasses();
 
     LogTrace("Initializing Fresco...");
     if (!StartRendering(params, external)) return false;
+    if (!external) StartPaintHelpers(params.AdditionalOptions);
     OpenThreadScope();  // for the life of the library: the main thread keeps its temporary memory
     main_scope_open_ = true;
     return true;
@@ -123,6 +125,18 @@ bool LibraryImpl::StartRendering(const LibraryParams& params, fresco::IRendering
     }
     rendering_->SetFileManipulator(params.FileSystemReader);
     return true;
+}
+
+// A client that starts the rendering library itself gives it helpers itself.
+void LibraryImpl::StartPaintHelpers(const char* options) {
+    constexpr std::string_view kOption = "--paint-helpers=";
+    if (!HasOption(options, kOption)) return;
+    const std::string_view text(options);
+    const unsigned long count = std::strtoul(options + text.find(kOption) + kOption.size(), nullptr, 10);
+    if (count == 0) return;
+    paint_helpers_ = MakeUnique<PaintHelpers, MemoryTag::Rendering>(
+        *tasks_, kLibraryFamily, static_cast<uint32_t>(std::min(count, 15ul)));
+    rendering_->SetPaintHelpers(paint_helpers_.get());
 }
 
 // Undoes what of Start had been done.
@@ -206,8 +220,10 @@ void LibraryImpl::Uninitialize(bool shutdown_script_engine) {
         tasks_.reset();
         if (adapted_allocator_) {
             LogTrace("Uninitializing Fresco...");
+            rendering_->SetPaintHelpers(nullptr);
             rendering_->Destroy();
         }
+        paint_helpers_.reset();
         rendering_ = nullptr;
         script::ReleaseScriptClasses();
         LogInfo("Uninitializing QORVEX library!");

@@ -12,6 +12,7 @@
 #include "core/debug/debug_interfaces.h"
 #include "core/memory/containers.h"
 #include "core/memory/thread_scope.h"
+#include "core/render/paint_helpers.h"
 #include "core/render/renderer_registry.h"
 #include "core/tasks/task_system.h"
 #include "core/tasks/timer.h"
@@ -54,6 +55,7 @@ class LibraryImpl final : public Library {
 
   private:
     bool Start(const LibraryParams& params, fresco::IRenderingLibrary* external);
+    void StartPaintHelpers(const char* options);
     bool StartRendering(const LibraryParams& params, fresco::IRenderingLibrary* external);
     void ReadOptions(const char* options);
     void DestroyForgottenSystems();
@@ -64,6 +66,7 @@ class LibraryImpl final : public Library {
     UniquePtr<TaskSystem, MemoryTag::General> tasks_;
     UniquePtr<FrescoLogHandler, MemoryTag::Rendering> adapted_log_;
     UniquePtr<FrescoAllocator, MemoryTag::Rendering> adapted_allocator_;
+    UniquePtr<PaintHelpers, MemoryTag::Rendering> paint_helpers_;
     fresco::IRenderingLibrary* rendering_ = nullptr;
     UniquePtr<ClientResponsePool, MemoryTag::Resources> responses_;
     RendererRegistry renderers_;

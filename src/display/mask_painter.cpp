@@ -55,7 +55,11 @@ void ApplyMask(const LayoutNode& node, PaintContext& context, CommandBuffer& buf
     if (!layer.repeatX && !layer.repeatY) {
         buffer.SetMaskImage(image, tile, {}, 0);
     } else {
-        buffer.SetMaskImageTiled(image, box, {{}, tile, layer.spacingX, layer.spacingY}, 0);
+        // Along an axis without repeat there is one row or column of tiles.
+        Rect area = box;
+        if (!layer.repeatX) area.x = tile.x, area.width = tile.width;
+        if (!layer.repeatY) area.y = tile.y, area.height = tile.height;
+        buffer.SetMaskImageTiled(image, area, {{}, tile, layer.spacingX, layer.spacingY}, 0);
     }
 }
 

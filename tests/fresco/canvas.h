@@ -1,5 +1,7 @@
 // A scene with a surface to draw on, as a client would set it up.
 #pragma once
+#include <malloc.h>
+
 #include <cstring>
 #include <string>
 #include <vector>
@@ -15,15 +17,20 @@ class CountingAllocator final : public IAllocator {
     void* Allocate(size_t size, size_t alignment) override {
         ++live;
         ++total;
-        return std::aligned_alloc(std::max<size_t>(alignment, 16),
-                                  (size + std::max<size_t>(alignment, 16) - 1) /
-                                      std::max<size_t>(alignment, 16) * std::max<size_t>(alignment, 16));
+        alignment = std::max<size_t>(alignment, 16);
+        void* block = std::aligned_alloc(alignment, (size + alignment - 1) / alignment * alignment);
+        const long now = bytes += long(malloc_usable_size(block));
+        for (long before = peak; now > before && !peak.compare_exchange_weak(before, now);) {
+        }
+        return block;
     }
     void Deallocate(void* block, size_t) override {
-        if (block) --live;
+        if (!block) return;
+        --live;
+        bytes -= long(malloc_usable_size(block));
         std::free(block);
     }
-    std::atomic<long> live{0}, total{0};
+    std::atomic<long> live{0}, total{0}, bytes{0}, peak{0};
 };
 
 class LogLines final : public Logging::ILogHandler {

@@ -5,6 +5,7 @@
 #include <fresco/file_manipulator.h>
 #include <fresco/font.h>
 #include <fresco/logging.h>
+#include <fresco/paint_helpers.h>
 #include <fresco/scene.h>
 
 namespace fresco {
@@ -34,6 +35,9 @@ class IRenderingLibrary {
     virtual void SetFileManipulator(IFileManipulator* files) = 0;
     virtual IFontService* GetFontService() = 0;
     virtual IScene* CreateScene(const SceneParams& params) = 0;
+    // Who helps with the frames of all scenes from now on; null (as at the start): nobody. The object must
+    // live until it is replaced. Render thread, or any before the first frame.
+    virtual void SetPaintHelpers(IPaintHelpers* helpers) = 0;
     // Passed on from the engine's own forwarding operation.
     virtual void Forward(uint64_t first, uint64_t second, uint64_t third) = 0;
     // No scene may be left.

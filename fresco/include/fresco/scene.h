@@ -79,12 +79,18 @@ class ICustomCompositor {
     virtual bool OnLayer(const CompositionLayer& layer) = 0;
 };
 
-// Counts of the last ExecuteBackEnd.
+// Counts of the last ExecuteBackEnd. With paint helpers a draw or layer counts for each band that it touches.
 struct SceneStats {
     uint64_t commands = 0;
     uint64_t draws = 0;
     uint64_t paintedPixels = 0;  // pixels that some draw touched, counted for each draw
     uint64_t layers = 0;
+
+    SceneStats& operator+=(const SceneStats& other) {
+        commands += other.commands, draws += other.draws;
+        paintedPixels += other.paintedPixels, layers += other.layers;
+        return *this;
+    }
 };
 
 class IScene {

@@ -42,13 +42,18 @@ void ObjectPool::Register() {
     index_.store(index, std::memory_order_release);
 }
 
+PoolList* ObjectPool::ListOfThisThread() {
+    PoolCache* pools = t_thread_record.pools;
+    const auto index = static_cast<uint32_t>(index_.load(std::memory_order_acquire));
+    return pools && index < limits::kObjectPools && ArePoolsEnabled() ? &pools->lists[index] : nullptr;
+}
+
 void* ObjectPool::Take() {
-    const auto index = static_cast<size_t>(Index());
-    if (!ArePoolsEnabled() || index >= limits::kObjectPools)
-        return GetAllocator()->AlignedAllocate(object_size_, alignment_, tag_);
-    ThreadScope scope;
-    PoolList& list = t_thread_record.pools->lists[index];
-    if (!list.head) Refill(list);
+    PoolList* list = ListOfThisThread();
+    return list && list->head ? TakeFrom(*list) : TakeSlowly();
+}
+
+void* ObjectPool::TakeFrom(PoolList& list) {
     FreeObject* object = list.head;
     list.head = object->next;
     if (object == list.split) list.split = nullptr;
@@ -56,12 +61,21 @@ void* ObjectPool::Take() {
     return object;
 }
 
-void ObjectPool::Give(void* memory) {
+void* ObjectPool::TakeSlowly() {
     const auto index = static_cast<size_t>(Index());
     if (!ArePoolsEnabled() || index >= limits::kObjectPools)
-        return GetAllocator()->AlignedDeallocate(memory, tag_);
+        return GetAllocator()->AlignedAllocate(object_size_, alignment_, tag_);
     ThreadScope scope;
     PoolList& list = t_thread_record.pools->lists[index];
+    return list.head || Refill(list) ? TakeFrom(list) : nullptr;
+}
+
+void ObjectPool::Give(void* memory) {
+    PoolList* list = ListOfThisThread();
+    list ? GiveTo(*list, memory) : GiveSlowly(memory);
+}
+
+void ObjectPool::GiveTo(PoolList& list, void* memory) {
     auto* object = ::new (memory) FreeObject{list.head};
     list.head = object;
     ++list.count;
@@ -69,16 +83,27 @@ void ObjectPool::Give(void* memory) {
     if (list.count == 2 * batch_) HandOn(list);
 }
 
-void ObjectPool::Refill(PoolList& list) {
+void ObjectPool::GiveSlowly(void* memory) {
+    const auto index = static_cast<size_t>(Index());
+    if (!ArePoolsEnabled() || index >= limits::kObjectPools)
+        return GetAllocator()->AlignedDeallocate(memory, tag_);
+    ThreadScope scope;
+    GiveTo(t_thread_record.pools->lists[index], memory);
+}
+
+bool ObjectPool::Refill(PoolList& list) {
     qsl::MutexLock lock(mutex_);
     FreeObject* objects = nullptr;
     if (spare_) {
         Batch* batch = std::exchange(spare_, spare_->below);
         objects = &batch->head;
-    } else {
+    } else if (chunk_count_ < max_chunks_) {
         objects = AddChunk();
+    } else {
+        return false;
     }
     list = PoolList{objects, nullptr, batch_};
+    return true;
 }
 
 void ObjectPool::HandOn(PoolList& list) {
@@ -93,9 +118,11 @@ void ObjectPool::HandOn(PoolList& list) {
 FreeObject* ObjectPool::AddChunk() {
     const size_t stride = AlignUp(object_size_, alignment_);
     const size_t header = AlignUp(sizeof(Chunk), alignment_);
-    auto* bytes = static_cast<std::byte*>(GetAllocator()->Allocate(header + stride * batch_, tag_));
+    auto* bytes =
+        static_cast<std::byte*>(GetAllocator()->AlignedAllocate(header + stride * batch_, alignment_, tag_));
     LogTrace("Allocated object pool memory chunk!");
     chunks_ = ::new (bytes) Chunk{chunks_};
+    ++chunk_count_;
     FreeObject* head = nullptr;
     for (uint32_t i = batch_; i-- > 0;)
         head = ::new (bytes + header + stride * i) FreeObject{head};
@@ -106,7 +133,8 @@ uint32_t ObjectPool::FreeChunks() {
     qsl::MutexLock lock(mutex_);
     uint32_t freed = 0;
     for (; chunks_; ++freed)
-        GetAllocator()->Deallocate(std::exchange(chunks_, chunks_->next), tag_);
+        GetAllocator()->AlignedDeallocate(std::exchange(chunks_, chunks_->next), tag_);
+    chunk_count_ = 0;
     spare_ = nullptr;
     return freed;
 }

@@ -27,9 +27,17 @@ class ObjectPool {
   public:
     static constexpr size_t kSmallestObject = 2 * sizeof(void*);
 
-    constexpr ObjectPool(size_t object_size, size_t alignment, uint32_t batch, MemoryTag tag)
-        : object_size_(object_size), alignment_(alignment), batch_(batch), tag_(tag) {}
+    static constexpr uint32_t kUnbounded = 0xFFFFFFFF;
 
+    constexpr ObjectPool(size_t object_size, size_t alignment, uint32_t batch, MemoryTag tag,
+                         uint32_t max_chunks = kUnbounded)
+        : object_size_(object_size),
+          alignment_(alignment),
+          batch_(batch),
+          max_chunks_(max_chunks),
+          tag_(tag) {}
+
+    /// Null when the pool has as many chunks as it may have and this thread finds none of their objects free.
     void* Take();
     void Give(void* object);
 
@@ -45,9 +53,15 @@ class ObjectPool {
     };
     static constexpr int32_t kUnregistered = -1;
 
+    /// The fast road: null when the thread is in no scope or the pool is not in use yet, or not at all.
+    PoolList* ListOfThisThread();
+    static void* TakeFrom(PoolList& list);
+    void GiveTo(PoolList& list, void* object);
+    void* TakeSlowly();
+    void GiveSlowly(void* object);
     int32_t Index();
     void Register() QSL_REQUIRES(mutex_);
-    void Refill(PoolList& list) QSL_EXCLUDES(mutex_);
+    bool Refill(PoolList& list) QSL_EXCLUDES(mutex_);
     void HandOn(PoolList& list) QSL_EXCLUDES(mutex_);
     FreeObject* AddChunk() QSL_REQUIRES(mutex_);
     uint32_t FreeChunks() QSL_EXCLUDES(mutex_);
@@ -55,11 +69,13 @@ class ObjectPool {
     const size_t object_size_;
     const size_t alignment_;
     const uint32_t batch_;
+    const uint32_t max_chunks_;
     const MemoryTag tag_;
     std::atomic<int32_t> index_{kUnregistered};
     ObjectPool* next_pool_ = nullptr;
     qsl::Mutex mutex_;
     Chunk* chunks_ QSL_GUARDED_BY(mutex_) = nullptr;
+    uint32_t chunk_count_ QSL_GUARDED_BY(mutex_) = 0;
     Batch* spare_ QSL_GUARDED_BY(mutex_) = nullptr;
 };
 

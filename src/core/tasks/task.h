@@ -7,6 +7,8 @@
 
 #include <atomic>
 #include <cstdint>
+#include <iterator>
+#include <memory>
 #include <type_traits>
 #include <utility>
 
@@ -20,7 +22,10 @@ namespace qorvex {
 class Task;
 class TaskSystem;
 
-using TaskPtr = UniquePtr<Task, MemoryTag::Tasks>;
+struct TaskDeleter {
+    void operator()(Task* task) const;
+};
+using TaskPtr = std::unique_ptr<Task, TaskDeleter>;
 
 /// The numbers stand in log lines.
 enum class TaskChannels : uint32_t {
@@ -52,7 +57,7 @@ class alignas(8) Task {
     Task& operator=(const Task&) = delete;
 
     virtual void Execute(TaskFamilyHandle family) = 0;
-    virtual ~Task();
+    virtual ~Task() { ClearHandle(); }
 
     int32_t id() const { return id_; }
     const char* name() const { return name_; }
@@ -60,7 +65,11 @@ class alignas(8) Task {
 
   private:
     friend class TaskChannel;
+    friend class TaskQueue;
     friend class TaskSystem;
+    friend struct TaskDeleter;
+    template <class Made, class... Args>
+    friend TaskPtr NewTask(Args&&... args);
 
     /// From the process-wide counter, by the block: a thread that makes many tasks does not fight over it.
     static int32_t NextId() {
@@ -73,7 +82,10 @@ class alignas(8) Task {
         int32_t end = 0;
         void Refill();
     };
-    void ClearHandle();
+    void ClearHandle() {
+        if (handle_) ClearHandleSlowly();
+    }
+    void ClearHandleSlowly();
     /// Nothing waits for this task and it waits for nothing: it ends without telling anybody.
     bool StandsAlone() const {
         return child_count_.load(std::memory_order_acquire) == 0 && !parent_ && !handle_ &&
@@ -83,7 +95,9 @@ class alignas(8) Task {
     static constinit thread_local IdBlock t_ids_;
 
     const int32_t id_;
+    uint8_t block_ = 0;
     const char* const name_;  ///< A literal.
+    Task* next_ = nullptr;    ///< In the queue that owns this task.
     Task* parent_ = nullptr;
     TaskHandle* handle_ = nullptr;
     /// Changes under the task system's mutex; read without it where zero is final.
@@ -126,16 +140,40 @@ class TaskFuncFinalizer final : public Task {
     G finalizer_;
 };
 
+/// Memory of tasks: most are small and short-lived, so blocks of a few sizes are kept for the next ones. A
+/// block is known by its size's place in the table plus one; 0 stands for a block of its own.
+inline constexpr size_t kTaskBlockSizes[] = {96, 128, 256};
+constexpr uint8_t TaskBlockFor(size_t size) {
+    uint8_t block = 0;
+    while (block < std::size(kTaskBlockSizes) && kTaskBlockSizes[block] < size)
+        ++block;
+    return block < std::size(kTaskBlockSizes) ? block + 1 : 0;
+}
+/// Sets `block` to 0 when no kept block is to be had.
+[[nodiscard]] void* AllocateTask(size_t size, uint8_t& block);
+void DeallocateTask(void* memory, uint8_t block);
+
+template <class Made, class... Args>
+[[nodiscard]] TaskPtr NewTask(Args&&... args) {
+    static_assert(alignof(Made) <= alignof(Task));
+    uint8_t block = TaskBlockFor(sizeof(Made));
+    void* memory = AllocateTask(sizeof(Made), block);
+    // Task is the first base, so both have the same address.
+    TaskPtr task(qsl::ConstructAt<Made>(memory, std::forward<Args>(args)...));
+    task->block_ = block;
+    return task;
+}
+
 /// `function` takes the TaskFamilyHandle of the queue it came from, or nothing.
 template <class F>
 [[nodiscard]] TaskPtr MakeTask(const char* name, F&& function) {
-    return TaskPtr(New<TaskFunc<std::decay_t<F>>, MemoryTag::Tasks>(name, std::forward<F>(function)));
+    return NewTask<TaskFunc<std::decay_t<F>>>(name, std::forward<F>(function));
 }
 
 template <class F, class G>
 [[nodiscard]] TaskPtr MakeTask(const char* name, F&& function, G&& finalizer) {
     using Made = TaskFuncFinalizer<std::decay_t<F>, std::decay_t<G>>;
-    return TaskPtr(New<Made, MemoryTag::Tasks>(name, std::forward<F>(function), std::forward<G>(finalizer)));
+    return NewTask<Made>(name, std::forward<F>(function), std::forward<G>(finalizer));
 }
 
 }  // namespace qorvex

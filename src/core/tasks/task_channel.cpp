@@ -6,8 +6,9 @@
 
 namespace qorvex {
 
-/// A task that this thread is running. Loops nest, so the frames of a thread form a chain; a family that is
-/// closed from inside one of its own tasks must not wait for that one.
+/// The tasks that this thread has taken: one of them runs, the rest waits here. Loops nest, so the frames of
+/// a thread form a chain; a family that is closed from inside one of its own tasks must not wait for that
+/// one.
 class TaskChannel::RunFrame {
   public:
     RunFrame(const TaskChannel* channel, uint32_t family)
@@ -16,17 +17,29 @@ class TaskChannel::RunFrame {
     }
     ~RunFrame() { innermost_ = outer_; }
 
+    uint32_t family() const { return family_; }
+    TaskQueue& rest() { return rest_; }
+
     static int32_t CountOnThisThread(const TaskChannel* channel, uint32_t family) {
         int32_t count = 0;
         for (const RunFrame* frame = innermost_; frame; frame = frame->outer_)
             count += frame->channel_ == channel && frame->family_ == family;
         return count;
     }
+    /// Of the frames of one channel only the innermost may have a rest, since each took after the one around
+    /// it had given back.
+    static RunFrame* InnermostOf(const TaskChannel* channel) {
+        RunFrame* frame = innermost_;
+        while (frame && frame->channel_ != channel)
+            frame = frame->outer_;
+        return frame;
+    }
 
   private:
     static thread_local RunFrame* innermost_;
     const TaskChannel* channel_;
     uint32_t family_;
+    TaskQueue rest_;
     RunFrame* outer_;
 };
 
@@ -48,15 +61,19 @@ void TaskChannel::Open(uint32_t family) {
 
 void TaskChannel::Close(uint32_t family) {
     TaskQueue left;
+    bool wake;
     UniquePtr<qsl::Condition, MemoryTag::Tasks> idle;
     {
         qsl::MutexLock lock(mutex_);
+        GiveBackOnThisThread();
         const int32_t own = RunFrame::CountOnThisThread(this, family);
         FamilyQueue* queue;
         while ((queue = Find(family)) && queue->in_flight > own) {
             LogDebug("Waiting for in-progress tasks on channel on family ", family);
             ++queue->closers;
+            interrupts_.fetch_add(1, std::memory_order_relaxed);
             queue->idle->Wait(lock);
+            interrupts_.fetch_sub(1, std::memory_order_relaxed);
             if ((queue = Find(family))) --queue->closers;
         }
         if (!queue) return;
@@ -64,12 +81,15 @@ void TaskChannel::Close(uint32_t family) {
         CountPending(-static_cast<int32_t>(left.size()));
         idle = std::move(queue->idle);
         families_.erase(queue);
+        wake = choosy_waiters_ > 0;
         if (next_queue_ >= families_.size()) next_queue_ = families_.empty() ? 0 : families_.size() - 1;
     }
+    // Who waited for this family finds it closed, and leaves.
+    if (wake) work_.Broadcast();
     // What a task owns may come back here when it goes, so the tasks go after the lock.
 }
 
-void TaskChannel::Put(uint32_t family, TaskPtr task) {
+void TaskChannel::Put(uint32_t family, TaskPtr&& task) {
     bool wake_all;
     {
         qsl::MutexLock lock(mutex_);
@@ -95,6 +115,7 @@ void TaskChannel::Put(uint32_t family, TaskPtr task) {
 void TaskChannel::Run(bool blocking, const std::atomic<uint32_t>* stop_flag, uint32_t family) {
     const auto stopped = [stop_flag] { return stop_flag && stop_flag->load(std::memory_order_acquire) != 0; };
     qsl::MutexLock lock(mutex_);
+    GiveBackOnThisThread();
     Register(family, +1);
     while (!stopped()) {
         if (quit_.load(std::memory_order_relaxed)) return Leave(family, false);
@@ -109,32 +130,58 @@ void TaskChannel::Run(bool blocking, const std::atomic<uint32_t>* stop_flag, uin
             WaitForWork(lock, family);
             continue;
         }
-        TaskPtr task = queue->queue.pop_front();
-        const uint32_t from = queue->family;
-        ++queue->in_flight;
+        RunFrame frame(this, queue->family);
+        Take(*queue, IsTakenWhole() && family != kAllTaskFamilies, frame);
         lock.Unlock();
-        {
-            RunFrame frame(this, from);
-            TempMark mark;
-            LogTrace("Executing task ", task->name());
-            task->Execute({from, system_});
-            // A task that nobody waits for, like most, ends without asking.
-            if (!task->StandsAlone() || !on_finished_) on_finished_(from, task);
-            // The task goes before it stops counting as in flight: once a family is closed nothing of it is
-            // left.
-            task.reset();
-        }
+        uint32_t done = 0;
+        do {
+            Execute(frame.rest().pop_front(), frame.family());
+            ++done;
+        } while (!frame.rest().empty() && !stopped() && !interrupts_.load(std::memory_order_relaxed));
         lock.Lock();
-        CountPending(-1);
-        NoteFinished(from);
+        GiveBack(frame);
+        CountPending(-static_cast<int32_t>(done));
+        NoteFinished(frame.family(), done);
     }
     Leave(family, true);
+}
+
+void TaskChannel::Take(FamilyQueue& queue, bool whole, RunFrame& frame) {
+    if (whole)
+        frame.rest().swap(queue.queue);
+    else
+        frame.rest().push_back(queue.queue.pop_front());
+    queue.in_flight += static_cast<int32_t>(frame.rest().size());
+}
+
+void TaskChannel::GiveBack(RunFrame& frame) {
+    if (frame.rest().empty()) return;
+    // Whoever closes the family waits for what is in flight, so it is still there.
+    FamilyQueue* queue = Find(frame.family());
+    queue->in_flight -= static_cast<int32_t>(frame.rest().size());
+    frame.rest().append(queue->queue);
+    queue->queue.swap(frame.rest());
+}
+
+void TaskChannel::GiveBackOnThisThread() {
+    if (RunFrame* frame = RunFrame::InnermostOf(this)) GiveBack(*frame);
+}
+
+void TaskChannel::Execute(TaskPtr task, uint32_t family) {
+    TempMark mark;
+    LogTrace("Executing task ", task->name());
+    task->Execute({family, system_});
+    // A task that nobody waits for, like most, ends without asking.
+    if (!task->StandsAlone() || !on_finished_) on_finished_(family, task);
+    // Before it stops counting as in flight: once a family is closed nothing of it is left.
+    task.reset();
 }
 
 void TaskChannel::Quit() {
     {
         qsl::MutexLock lock(mutex_);
         quit_.exchange(true);
+        interrupts_.fetch_add(1, std::memory_order_relaxed);
     }
     work_.Broadcast();
 }
@@ -148,12 +195,12 @@ TaskChannel::FamilyQueue* TaskChannel::Find(uint32_t family) {
 TaskChannel::FamilyQueue* TaskChannel::Choose(uint32_t family) {
     if (family != kAllTaskFamilies) {
         FamilyQueue* queue = Find(family);
-        return queue && !queue->queue.empty() ? queue : nullptr;
+        return queue && queue->HasWork() ? queue : nullptr;
     }
     for (uint32_t looked = 0; looked < families_.size(); ++looked) {
         FamilyQueue& queue = families_[next_queue_];
         next_queue_ = next_queue_ + 1 == families_.size() ? 0 : next_queue_ + 1;
-        if (!queue.queue.empty()) return &queue;
+        if (queue.HasWork()) return &queue;
     }
     return nullptr;
 }
@@ -189,13 +236,13 @@ void TaskChannel::Leave(uint32_t family, bool stopped) {
     }
 }
 
-void TaskChannel::NoteFinished(uint32_t family) {
+void TaskChannel::NoteFinished(uint32_t family, uint32_t count) {
     FamilyQueue* queue = Find(family);
     if (!queue) {
         LogWarning("A family (%d) channel was closed while there were still tasks in-flight!", family);
         return;
     }
-    --queue->in_flight;
+    queue->in_flight -= static_cast<int32_t>(count);
     // Not only at zero: one that closes from inside its own task waits for all others but itself.
     if (queue->closers) queue->idle->Broadcast();
 }

@@ -2,7 +2,9 @@
 // it.
 //
 // Invariants: everything below the mutex is touched with it held; a task runs with no lock of this room held;
-// the task system's mutex may be held when this one is taken, never the other way round.
+// the task system's mutex may be held when this one is taken, never the other way round. Tasks that a thread
+// has taken count as in flight; it gives those that it has not begun back to the front of their queue before
+// anybody could miss them: when its loop ends, when a loop nests inside it, and when somebody closes.
 #pragma once
 
 #include <atomic>
@@ -28,7 +30,7 @@ class TaskChannel {
     /// it.
     void Close(uint32_t family) QSL_EXCLUDES(mutex_);
     /// A task for a family that is not open is destroyed.
-    void Put(uint32_t family, TaskPtr task) QSL_EXCLUDES(mutex_);
+    void Put(uint32_t family, TaskPtr&& task) QSL_EXCLUDES(mutex_);
     /// Runs tasks of one family, or of all, until there are none, or, when blocking, until the channel quits
     /// or the flag is set.
     void Run(bool blocking, const std::atomic<uint32_t>* stop_flag, uint32_t family) QSL_EXCLUDES(mutex_);
@@ -48,16 +50,26 @@ class TaskChannel {
         /// Threads that wait on `idle`.
         uint32_t closers = 0;
         uint32_t workers = 0;
+
+        /// What waits in a queue that somebody is about to drop is not begun any more.
+        bool HasWork() const { return !queue.empty() && !closers; }
     };
     class RunFrame;
 
+    /// What only the main thread serves it takes at once, with one lock; a client thread leaves the rest of
+    /// what waits to its fellows.
+    bool IsTakenWhole() const { return number_ < TaskChannels::Layout; }
+    void Take(FamilyQueue& queue, bool whole, RunFrame& frame) QSL_REQUIRES(mutex_);
+    void GiveBack(RunFrame& frame) QSL_REQUIRES(mutex_);
+    void GiveBackOnThisThread() QSL_REQUIRES(mutex_);
+    void Execute(TaskPtr task, uint32_t family) QSL_EXCLUDES(mutex_);
     FamilyQueue* Find(uint32_t family) QSL_REQUIRES(mutex_);
     FamilyQueue* Choose(uint32_t family) QSL_REQUIRES(mutex_);
     void Register(uint32_t family, int change) QSL_REQUIRES(mutex_);
     void CountPending(int32_t change) QSL_REQUIRES(mutex_);
     bool HasWorkers(const FamilyQueue& queue) const QSL_REQUIRES(mutex_);
     void Leave(uint32_t family, bool stopped) QSL_REQUIRES(mutex_);
-    void NoteFinished(uint32_t family) QSL_REQUIRES(mutex_);
+    void NoteFinished(uint32_t family, uint32_t count) QSL_REQUIRES(mutex_);
     void WaitForWork(qsl::MutexLock& lock, uint32_t family) QSL_REQUIRES(mutex_);
     bool IsAnnounced() const { return static_cast<bool>(on_pushed_); }
 
@@ -75,6 +87,8 @@ class TaskChannel {
     uint32_t waiters_ QSL_GUARDED_BY(mutex_) = 0;
     uint32_t choosy_waiters_ QSL_GUARDED_BY(mutex_) = 0;
     std::atomic<bool> quit_{false};
+    /// Not zero: who has taken tasks gives them back before beginning the next.
+    std::atomic<uint32_t> interrupts_{0};
     std::atomic<uint32_t> pending_{0};
 };
 

@@ -1,5 +1,5 @@
-// Double-ended queue of owned tasks in blocks of 64 pointers. A drained block is kept for the next push, so a
-// queue in steady use allocates nothing. Not locked: the owner's mutex guards it.
+// First-in, first-out list of owned tasks, chained through the tasks themselves, so that queueing allocates
+// nothing. Not locked: the owner's mutex guards it.
 #pragma once
 
 #include <cstdint>
@@ -20,51 +20,48 @@ class TaskQueue {
         return *this;
     }
     /// Destroys what is left in it, in order, without running it.
-    ~TaskQueue();
+    ~TaskQueue() {
+        while (TaskPtr task = pop_front())
+            task.reset();
+    }
 
     bool empty() const { return size_ == 0; }
     uint32_t size() const { return size_; }
 
     void push_back(TaskPtr task) {
-        if (!last_ || end_ == kBlockTasks) AddBlock();
-        last_->tasks[end_++] = task.release();
+        Task* added = task.release();
+        (size_ ? last_->next_ : first_) = added;
+        last_ = added;
         ++size_;
     }
 
     /// The oldest task, null when there is none.
     TaskPtr pop_front() {
         if (!size_) return TaskPtr();
-        TaskPtr task(first_->tasks[begin_++]);
-        if (--size_ == 0)
-            begin_ = end_ = 0;
-        else if (begin_ == kBlockTasks)
-            DropFirstBlock();
-        return task;
+        Task* oldest = first_;
+        first_ = std::exchange(oldest->next_, nullptr);
+        --size_;
+        return TaskPtr(oldest);
+    }
+
+    /// Puts all tasks of `later` behind those of this queue.
+    void append(TaskQueue& later) {
+        if (later.empty()) return;
+        (size_ ? last_->next_ : first_) = later.first_;
+        last_ = later.last_;
+        size_ += std::exchange(later.size_, 0);
+        later.first_ = nullptr;
     }
 
     void swap(TaskQueue& other) noexcept {
         std::swap(first_, other.first_);
         std::swap(last_, other.last_);
-        std::swap(spare_, other.spare_);
-        std::swap(begin_, other.begin_);
-        std::swap(end_, other.end_);
         std::swap(size_, other.size_);
     }
 
   private:
-    static constexpr uint32_t kBlockTasks = 64;
-    struct Block {
-        Task* tasks[kBlockTasks];
-        Block* next;
-    };
-    void AddBlock();
-    void DropFirstBlock();
-
-    Block* first_ = nullptr;
-    Block* last_ = nullptr;
-    Block* spare_ = nullptr;
-    uint32_t begin_ = 0;  ///< In the first block.
-    uint32_t end_ = 0;    ///< In the last block.
+    Task* first_ = nullptr;
+    Task* last_ = nullptr;  ///< Of a queue that is not empty.
     uint32_t size_ = 0;
 };
 

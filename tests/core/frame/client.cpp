@@ -11,6 +11,7 @@ Client::Client(Options given) : options(given) {
     params.LoggingSeverity = options.severity;
     params.UseDedicatedLayoutThread = options.dedicated_layout;
     params.UseObjectPools = options.pools;
+    params.AdditionalOptions = options.switches;
     library = qorvex::Library::Initialize(params);
 
     qorvex::SystemSettings system_settings;

@@ -92,6 +92,10 @@ class Log final : public qorvex::Logging::ILogHandler {
             if (severity >= at_least) result.push_back(text);
         return result;
     }
+    std::vector<std::pair<qorvex::Logging::Severity, std::string>> LinesWithSeverity() const {
+        std::lock_guard<std::mutex> lock(mutex_);
+        return lines_;
+    }
     bool Contains(const std::string& text) const { return Count(text) > 0; }
     size_t Count(const std::string& text) const {
         size_t count = 0;
@@ -210,6 +214,7 @@ struct Options {
     unsigned height = 48;
     unsigned severity = qorvex::Logging::Trace;
     bool pools = true;
+    const char* switches = nullptr;
 };
 
 // One library, system, view and renderer; the test's thread is main and render thread.

@@ -101,6 +101,31 @@ TEST(FrameCycle, AllThreadModesGiveTheSamePixels) {
     EXPECT_EQ(pictures[0], pictures[2]);
 }
 
+TEST(FrameCycle, HelpingThreadsPaintTheSamePixels) {
+    std::vector<std::vector<uint32_t>> pictures;
+    for (const char* switches : {"", "--paint-helpers=2", "--paint-helpers=nonsense"}) {
+        Options options;
+        options.width = 640, options.height = 400;
+        options.resource_threads = 2;
+        options.switches = switches;
+        Client client(options);
+        client.Load(
+            "<html><body style='margin:0'><div style='margin:40px;height:300px;border-radius:50px;"
+            "background-image:linear-gradient(45deg,red,blue);filter:blur(3px)'></div></body></html>");
+        for (int i = 0; i < 6; ++i) {
+            const std::string color = "rgb(0,0," + std::to_string(i) + ")";
+            client.view->ExecuteScript(("document.body.style.backgroundColor = '" + color + "'").c_str());
+            client.Frame();
+        }
+        pictures.push_back(client.pixels);
+        EXPECT_EQ(client.log.Contains("Executing task PaintBands"),
+                  std::string(switches) == "--paint-helpers=2");
+        EXPECT_EQ(client.log.Lines(qorvex::Logging::Error), std::vector<std::string>());
+    }
+    EXPECT_EQ(pictures[0], pictures[1]);
+    EXPECT_EQ(pictures[0], pictures[2]);
+}
+
 TEST(FrameCycle, TimeGoingBackIsReportedAndIgnored) {
     Client client;
     client.view->Advance(100);

@@ -1,5 +1,6 @@
 #include "core/tasks/task_system.h"
 
+#include <array>
 #include <mutex>
 #include <string>
 #include <thread>
@@ -198,16 +199,70 @@ TEST_F(TaskSystemTest, AStoppedLoopAnnouncesTheWorkItLeavesBehind) {
     EXPECT_EQ(announced.calls.size(), 1u);
 }
 
-TEST_F(TaskSystemTest, AllocatesOneBlockForATaskAndNoneForItsPlaceInTheQueue) {
-    tasks_->Push(kFamily, TaskChannels::Main, MakeTask("Warm", [] {}));
-    RunEmpty(TaskChannels::Main);
-    const uint64_t before = allocator_.Allocations(MemoryTag::Tasks);
-    for (int round = 0; round < 10; ++round) {
-        for (int i = 0; i < 60; ++i)
+TEST_F(TaskSystemTest, KeepsTheBlocksOfSmallTasksAndGivesABurstBack) {
+    const auto run = [&](int count) {
+        for (int i = 0; i < count; ++i)
             tasks_->Push(kFamily, TaskChannels::Main, MakeTask("Count", [] {}));
         RunEmpty(TaskChannels::Main);
-    }
-    EXPECT_EQ(allocator_.Allocations(MemoryTag::Tasks) - before, 600u);
+    };
+    run(60);
+    const size_t blocks = allocator_.LiveBlocks(MemoryTag::Tasks);
+    const uint64_t before = allocator_.Allocations(MemoryTag::Tasks);
+    for (int round = 0; round < 10; ++round)
+        run(60);
+    EXPECT_EQ(allocator_.Allocations(MemoryTag::Tasks), before)
+        << "neither tasks nor their places in a queue";
+    run(5000);
+    EXPECT_LE(allocator_.LiveBlocks(MemoryTag::Tasks), blocks + 16) << "chunks of 64 tasks";
+}
+
+TEST_F(TaskSystemTest, WithoutPoolsEveryTaskIsABlockOfItsOwn) {
+    SetPoolsEnabled(false);
+    const size_t before = allocator_.LiveBlocks(MemoryTag::Tasks);
+    TaskPtr small = Note("a");
+    TaskPtr large = MakeTask("Large", [text = std::array<char, 1000>()] { (void)text; });
+    EXPECT_EQ(allocator_.LiveBlocks(MemoryTag::Tasks), before + 2);
+    small.reset();
+    large.reset();
+    EXPECT_EQ(allocator_.LiveBlocks(MemoryTag::Tasks), before);
+    SetPoolsEnabled(true);
+}
+
+// The main thread takes what waits in one go; none of that may show.
+TEST_F(TaskSystemTest, ANestedLoopRunsWhatTheOuterOneHasTaken) {
+    tasks_->Push(kFamily, TaskChannels::Main, MakeTask("Nest", [&] {
+                     order_ += "(";
+                     tasks_->Push(kFamily, TaskChannels::Main, Note("c"));
+                     RunEmpty(TaskChannels::Main);
+                     order_ += ")";
+                     tasks_->Push(kFamily, TaskChannels::Main, Note("d"));
+                 }));
+    tasks_->Push(kFamily, TaskChannels::Main, Note("a"));
+    tasks_->Push(kFamily, TaskChannels::Main, Note("b"));
+    RunEmpty(TaskChannels::Main);
+    EXPECT_EQ(order_, "(abc)d");
+}
+
+TEST_F(TaskSystemTest, AStopInsideANestedLoopLeavesTheRestInOrder) {
+    std::atomic<uint32_t> stop{0};
+    tasks_->Push(kFamily, TaskChannels::Main, MakeTask("Nest", [&] {
+                     tasks_->Run(TaskChannels::Main, true, &stop, kFamily);
+                     order_ += "|";
+                 }));
+    tasks_->Push(kFamily, TaskChannels::Main, Note("a"));
+    tasks_->Push(kFamily, TaskChannels::Main, MakeTask("Stop", [&] { stop = 1; }));
+    tasks_->Push(kFamily, TaskChannels::Main, Note("b"));
+    tasks_->Push(kFamily, TaskChannels::Main, Note("c"));
+    RunEmpty(TaskChannels::Main);
+    EXPECT_EQ(order_, "a|bc");
+}
+
+TEST_F(TaskSystemTest, QuittingFromATaskLeavesTheRestUnrun) {
+    tasks_->Push(kFamily, TaskChannels::Main, MakeTask("Quit", [&] { tasks_->Stop(); }));
+    tasks_->Push(kFamily, TaskChannels::Main, Note("never"));
+    RunEmpty(TaskChannels::Main);
+    RunEmpty(TaskChannels::Main);
+    EXPECT_EQ(order_, "");
 }
 
 }  // namespace

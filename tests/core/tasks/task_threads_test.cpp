@@ -94,6 +94,45 @@ TEST_F(TaskThreadsTest, ClosingWaitsForWhatRunsAndDropsTheRest) {
     }
 }
 
+TEST_F(TaskThreadsTest, ClosingElsewhereDropsWhatALoopHasTakenButNotBegun) {
+    tasks_->OpenChannel(TaskChannels::Main, 5);
+    std::atomic<int> started{0};
+    std::atomic<int> destroyed{0};
+    std::atomic<bool> closing{false};
+    tasks_->Push(5, TaskChannels::Main, MakeTask("Slow", [&] {
+                     ++started;
+                     while (!closing)
+                         std::this_thread::yield();
+                     std::this_thread::sleep_for(std::chrono::milliseconds(20));
+                 }));
+    for (int i = 0; i < 10; ++i)
+        tasks_->Push(5, TaskChannels::Main,
+                     MakeTask(
+                         "Dropped", [] { FAIL(); }, [&] { ++destroyed; }));
+    std::thread closer([&] {
+        ThreadScope scope;
+        WaitFor(started, 1);
+        closing = true;
+        tasks_->CloseChannel(TaskChannels::Main, 5);
+        EXPECT_EQ(destroyed, 10);
+    });
+    tasks_->Run(TaskChannels::Main, false, nullptr, 5);
+    closer.join();
+}
+
+TEST_F(TaskThreadsTest, ClosingSendsThoseAwayWhoWaitForJustThisFamily) {
+    for (int round = 0; round < 20; ++round) {
+        tasks_->OpenChannel(TaskChannels::Layout, 5);
+        std::atomic<int> run{0};
+        std::thread server(
+            [&] { tasks_->ExecuteWork(WorkType::Layout, WorkExecutionMode::RunUntilStopped, 5); });
+        tasks_->Push(5, TaskChannels::Layout, MakeTask("Run", [&] { ++run; }));
+        WaitFor(run, 1);
+        tasks_->CloseChannel(TaskChannels::Layout, 5);
+        server.join();
+    }
+}
+
 TEST_F(TaskThreadsTest, ClosingFromInsideATaskWaitsForTheOthersAlone) {
     tasks_->OpenChannel(TaskChannels::Resources, 5);
     std::atomic<int> started{0};

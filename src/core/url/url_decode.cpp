@@ -1,4 +1,4 @@
-#include "core/url_decode.h"
+#include "core/url/url_decode.h"
 
 namespace qorvex {
 
