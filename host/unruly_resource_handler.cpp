@@ -177,7 +177,7 @@ std::unique_ptr<UnrulyResourceHandler::Answer> UnrulyResourceHandler::Judge(
         Fault fault;
         std::uint32_t percent;
     } rows[] = {
-        {Fault::Fail, manners_.fail},       {Fault::Cut, manners_.cut},     {Fault::Pieces, manners_.pieces},
+        {Fault::Fail, manners_.fail},        {Fault::Cut, manners_.cut},     {Fault::Pieces, manners_.pieces},
         {Fault::TooLong, manners_.too_long}, {Fault::Twice, manners_.twice}, {Fault::Abrupt, manners_.abrupt},
         {Fault::Never, manners_.never},
     };

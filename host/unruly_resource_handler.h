@@ -28,12 +28,12 @@ struct Manners {
                                        // is no longer the same run each time
 };
 
-// Stands between the engine and a well-behaved handler and spoils what that one answers: for tests, and to see
-// one's own loading screens, placeholders and error pages.
+// Stands between the engine and a well-behaved handler and spoils what that one answers: for tests, and to
+// see one's own loading screens, placeholders and error pages.
 //
-// What happens to a request follows from the seed, its URL and how often that URL was asked for, so a run with
-// the same seed is the same run. Answers come in Step, in an order that the seed picks; a client calls it once
-// a frame, before Advance.
+// What happens to a request follows from the seed, its URL and how often that URL was asked for, so a run
+// with the same seed is the same run. Answers come in Step, in an order that the seed picks; a client calls
+// it once a frame, before Advance.
 //
 // For one system. Requests come on any thread, Step and AnswerAll on one. The inner handler must answer each
 // request exactly once, as the interface asks it to. Both handlers must live until every request was answered

@@ -96,12 +96,14 @@ class Library {
     virtual System* CreateSystem(const SystemSettings& settings) = 0;
 
     // Main thread. Every thread inside ExecuteWork returns, and later calls return at once. Call it when all
-    // systems are destroyed.
+    // systems are destroyed; frames that are still on the layout side are dropped.
     virtual void StopWorkers() = 0;
 
     // Main thread, last call; the object is gone afterwards. Stops the workers first, with an Error line,
-    // when StopWorkers was forgotten. With shutdownScriptEngine the script engine's process-wide state goes
-    // too, and the library cannot be initialised again in this process.
+    // when StopWorkers was forgotten; systems, views and renderers that were forgotten are destroyed, with an
+    // Error line. No other thread may be in the engine, but for those that are on their way out of
+    // ExecuteWork. Refused inside an operation of a view. With shutdownScriptEngine the script engine's
+    // process-wide state goes too, and the library cannot be initialised again in this process.
     virtual void Uninitialize(bool shutdownScriptEngine) = 0;
 
     // Optional interfaces by id (<qorvex/feature_interfaces.h>); null for an id that is not known. The

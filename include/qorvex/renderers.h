@@ -28,7 +28,8 @@ struct RenderTargetDescription {
     std::uint32_t Samples = 1;
 };
 
-// Draws the frames of one view. Must be destroyed before its View.
+// Draws the frames of one view. Best destroyed before its View; a renderer that outlives the view finds no
+// frame to paint, and goes with Library::Uninitialize, with an Error line, when it is forgotten.
 class ViewRenderer {
   protected:
     virtual ~ViewRenderer() = default;
@@ -37,7 +38,8 @@ class ViewRenderer {
     virtual void Destroy() = 0;
     // Draws the frame with this id, as OnFrameComplete gave it, onto the render target. Frames may be painted
     // in any order; an id that completed is forgotten. With waitForCompletion the call blocks until the
-    // frame's recording has finished, so the layout side must be served by another thread.
+    // frame's recording has finished, or the view or the workers end, so the layout side must be served by
+    // another thread.
     virtual PaintStatus Paint(unsigned frameId, bool waitForCompletion) = 0;
     // The targets stay the client's and must live until another target is set or the renderer is destroyed.
     // depth may be null for back ends without one; description gives the size.
@@ -49,7 +51,7 @@ class ViewRenderer {
     virtual void FreeRenderingResources() = 0;
 };
 
-// The render thread's end of a System. Must be destroyed before its System, after its ViewRenderers.
+// The render thread's end of a System. Destroyed at any time before Library::Uninitialize.
 class SystemRenderer {
   protected:
     virtual ~SystemRenderer() = default;

@@ -42,8 +42,11 @@ class IAsyncResourceRequest {
 };
 
 // Where the answer goes. Implemented by the engine. The client may keep it and answer from any thread, one
-// thread at a time, and must call Finish exactly once; afterwards the object must not be touched. Finish may
-// be called inside OnResourceRequest.
+// thread at a time, and should call Finish exactly once, inside OnResourceRequest or later, even when the
+// view or the system has gone. By mistake: a second Finish, or a write after it, gets a Warning line and does
+// nothing, as long as some hundred later requests have not been finished too; a request that is never
+// finished keeps its page waiting and goes with Library::Uninitialize. After Uninitialize nothing may be
+// touched.
 class IAsyncResourceResponse {
   protected:
     virtual ~IAsyncResourceResponse() = default;
@@ -51,7 +54,8 @@ class IAsyncResourceResponse {
   public:
     enum class Status : std::uint32_t { Success = 0, Failure = 1 };
 
-    // A buffer of size bytes for the data. A further call resizes it and keeps what was written.
+    // A buffer of size bytes for the data. A further call resizes it and keeps what was written; only the
+    // last buffer is valid. Null, with a Warning line, for more than 1 GiB: what was written so far stays.
     virtual void* GetSpace(std::size_t size) = 0;
     // An image made by the client, in place of bytes. The record is copied.
     virtual void RecieveUserImage(const UserImageData& image) = 0;

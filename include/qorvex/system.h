@@ -93,8 +93,9 @@ class System {
                                               const UserFontDescription& description) = 0;
     virtual void RemoveUserFont(const FontDescription& description) = 0;
 
-    // Every view must be gone. Waits for requests in flight: the client must go on finishing them, and
-    // serving resource work, while this runs.
+    // Every view must be gone; one that is not is destroyed with an Error line. Requests that are still on
+    // their way are aborted and not waited for: late answers go nowhere. Waits only for work that other
+    // threads are in the middle of. Refused, with an Error line, inside an operation of one of its views.
     virtual void Destroy() = 0;
 
     // Once per game frame, beside the views' Advance: results that belong to no single view.

@@ -38,7 +38,7 @@ class View {
 
   public:
     // Ends the view: waits for its frame on the layout side, unloads the document, drops frames not painted.
-    // Its ViewRenderer must have been destroyed before.
+    // Best after its ViewRenderer. Refused, with an Error line, inside an operation of this view.
     virtual void Destroy() = 0;
 
     // Asks for a page by absolute URL and returns; the old document stays until the new one has arrived.
@@ -50,7 +50,8 @@ class View {
 
     // One frame: results of the last one, timers, scripts, animations, styles; then the layout side gets its
     // work. Calls OnFrameComplete once. Waits for the layout side only while the previous frame is still
-    // there. Do not call it from inside a listener of this view.
+    // there, and does itself what of it no thread has begun. Refused inside a listener of this view and after
+    // Library::StopWorkers. A time that goes back, or is not finite, is reported and ignored.
     virtual void Advance(double time) = 0;
 
     virtual unsigned GetId() const = 0;

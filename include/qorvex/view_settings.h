@@ -9,7 +9,8 @@ class ITextInputHandler;
 class IViewListener;
 
 // Fires once for each Advance: when the frame's recording is finished (on the layout thread; on the main
-// thread in synchronous mode), or, for a frame with nothing to do, inside Advance. The last argument is 0.
+// thread in synchronous mode, and when the next Advance finds the frame not begun by any thread), or, for a
+// frame with nothing to do, inside Advance. The last argument is 0.
 using OnFrameCompleteCallback = void (*)(void* userData, std::uint32_t viewId, std::uint32_t frameId,
                                          std::uint32_t reserved);
 // The page's clock in milliseconds. Main thread.

@@ -185,18 +185,11 @@ void LibraryImpl::OnSystemDestroyed(SystemImpl* system) {
     systems_.erase_if([&](SystemImpl* other) { return other == system; });
 }
 
-// False when one of them is at work further up the stack.
-bool LibraryImpl::DestroyForgottenSystems() {
-    for (const SystemImpl* system : systems_) {
-        if (!system->IsInsideOperation()) continue;
-        LogError("Library::Uninitialize must not be called from inside an operation of a view");
-        return false;
-    }
+void LibraryImpl::DestroyForgottenSystems() {
     while (!systems_.empty()) {
         LogError("Library::Uninitialize called before its systems were destroyed");
         systems_[systems_.size() - 1]->Destroy();
     }
-    return true;
 }
 
 void LibraryImpl::StopWorkers() {
@@ -211,13 +204,18 @@ void LibraryImpl::StopWorkers() {
 
 void LibraryImpl::Uninitialize(bool shutdown_script_engine) {
     if (!CheckMainThread("Library::Uninitialize")) return;
+    for (const SystemImpl* system : systems_) {
+        if (!system->IsInsideOperation()) continue;
+        LogError("Library::Uninitialize must not be called from inside an operation of a view");
+        return;
+    }
     {
         ThreadScope scope;
         if (tasks_->IsRunning()) {
             LogError("You must call StopWorkers before Uninitialize!");
             tasks_->Stop();
         }
-        if (!DestroyForgottenSystems()) return;
+        DestroyForgottenSystems();
         renderers_.DestroyForgotten();
         // Threads that StopWorkers has sent home may still be on their way out.
         while (threads_at_work_.load(std::memory_order_acquire) != 0)

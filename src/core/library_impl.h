@@ -58,7 +58,7 @@ class LibraryImpl final : public Library {
     void StartPaintHelpers(const char* options);
     bool StartRendering(const LibraryParams& params, fresco::IRenderingLibrary* external);
     void ReadOptions(const char* options);
-    bool DestroyForgottenSystems();
+    void DestroyForgottenSystems();
     void Fail();
     void Free();
 

@@ -157,9 +157,9 @@ void ViewImpl::WaitForPendingFrame() {
 void ViewImpl::WaitUntilLayoutIdle() {
     while (layout_unblocked_.load(std::memory_order_acquire) == 0) {
         if (!services_.tasks->IsRunning()) return DropFrameOnLayoutSide();
-        // No thread may be there to serve the layout side (a paused game, a job that has not started yet), and
-        // this one has nothing else to do. The tasks of a frame form a chain: whoever runs one goes on with the
-        // next, so what is not queued now ends without help.
+        // No thread may be there to serve the layout side (a paused game, a job that has not started yet),
+        // and this one has nothing else to do. The tasks of a frame form a chain: whoever runs one goes on
+        // with the next, so what is not queued now ends without help.
         services_.tasks->Run(TaskChannels::Layout, false, nullptr, family_.family);
         services_.tasks->Run(TaskChannels::Main, true, &layout_unblocked_, family_.family);
     }

@@ -71,8 +71,7 @@ class ClientResponsePool {
     void Give(ClientResponse& response) QSL_EXCLUDES(mutex_);
 
     qsl::Mutex mutex_;
-    Vector<UniquePtr<ClientResponse, MemoryTag::Resources>, MemoryTag::Resources> all_
-        QSL_GUARDED_BY(mutex_);
+    Vector<UniquePtr<ClientResponse, MemoryTag::Resources>, MemoryTag::Resources> all_ QSL_GUARDED_BY(mutex_);
     // First in, first out.
     ClientResponse* first_free_ QSL_GUARDED_BY(mutex_) = nullptr;
     ClientResponse* last_free_ QSL_GUARDED_BY(mutex_) = nullptr;

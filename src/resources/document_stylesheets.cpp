@@ -19,14 +19,14 @@ uint32_t DocumentLoader::LoadAndParseStylesheet(const URL& url, dom::Element& el
     const auto document = GetWeakDocument();
     // The cache speaks inside System::Advance; the page's scripts run inside operations of their view alone.
     const TaskFamilyHandle family = host_.GetLoaderFamily();
-    const bool joined = stylesheet_cache_.Join(absolute, [family, document,
-                                                          id](RefPtr<css::Stylesheet> loaded) {
-        PushSheet(family, "NewStyleFromFile", std::move(loaded),
-                  [document, id](const RefPtr<css::Stylesheet>& sheet) {
-                      if (dom::Document* alive = document.get())
-                          GetLoaderOf(*alive).DeliverStylesheet(id, sheet);
-                  });
-    });
+    const bool joined =
+        stylesheet_cache_.Join(absolute, [family, document, id](RefPtr<css::Stylesheet> loaded) {
+            PushSheet(family, "NewStyleFromFile", std::move(loaded),
+                      [document, id](const RefPtr<css::Stylesheet>& sheet) {
+                          if (dom::Document* alive = document.get())
+                              GetLoaderOf(*alive).DeliverStylesheet(id, sheet);
+                      });
+        });
     if (joined) return id;
 
     UrlKey key = MakeUrlKey(absolute);
@@ -35,11 +35,9 @@ uint32_t DocumentLoader::LoadAndParseStylesheet(const URL& url, dom::Element& el
         return id;
     }
     if (!IsAllowed(absolute)) {
-        PushSheet(family, "NewStyleFromFile", nullptr,
-                  [document, id](const RefPtr<css::Stylesheet>& sheet) {
-                      if (dom::Document* alive = document.get())
-                          GetLoaderOf(*alive).DeliverStylesheet(id, sheet);
-                  });
+        PushSheet(family, "NewStyleFromFile", nullptr, [document, id](const RefPtr<css::Stylesheet>& sheet) {
+            if (dom::Document* alive = document.get()) GetLoaderOf(*alive).DeliverStylesheet(id, sheet);
+        });
         return id;
     }
     loading_stylesheets_[key].push_back(id);

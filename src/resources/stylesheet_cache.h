@@ -1,8 +1,8 @@
 // Parsed stylesheets by URL, one cache for each system. Loads that the cache starts itself (preloads) stay in
 // it; a document joins such a load, and otherwise loads for itself.
 //
-// Invariant: main thread only, but for the client's answer, which only pushes ParseCSS; when the cache's family
-// is closed, a late answer reaches nobody.
+// Invariant: main thread only, but for the client's answer, which only pushes ParseCSS; when the cache's
+// family is closed, a late answer reaches nobody.
 #pragma once
 
 #include "core/memory/containers.h"

@@ -71,8 +71,8 @@ int main(int count, char** values) {
     std::signal(SIGALRM, OnAlarm);
     for (unsigned long i = 0; i < arguments.sequences; ++i) {
         const unsigned long long seed = arguments.seed + i;
-        const auto mode =
-            static_cast<stress::Mode>(arguments.mode >= 0 ? arguments.mode : static_cast<int>(seed % stress::kModes));
+        const auto mode = static_cast<stress::Mode>(
+            arguments.mode >= 0 ? arguments.mode : static_cast<int>(seed % stress::kModes));
         std::snprintf(g_replay, sizeof g_replay,
                       "qorvex-stress --mode %s --seed %llu --sequences 1 --operations %lu\n",
                       stress::NameOf(mode), seed, arguments.operations);

@@ -19,13 +19,15 @@ struct File {
 constexpr File kFiles[] = {
     {"coui://stress/plain.html",
      "<html><head><style>body{margin:0;background-color:#204060}.b{position:absolute;width:40px;height:30px;"
-     "background-color:#fc0;border-radius:6px}</style></head><body><div class=b>one</div><p>two<b>three</b></p>"
+     "background-color:#fc0;border-radius:6px}</style></head><body><div "
+     "class=b>one</div><p>two<b>three</b></p>"
      "</body></html>"},
     {"coui://stress/rich.html",
      "<html><head><link rel=stylesheet href=a.css><link rel=stylesheet href=b.css><script src=a.js></script>"
      "<script src=b.js async></script><script src=c.js defer></script></head><body><div id=app "
      "class='card shadow'>text <span>with a span</span></div><script>document.getElementById('app')"
-     ".setAttribute('data-inline', '1')</script><img src=none.png><script src=gone.js></script></body></html>"},
+     ".setAttribute('data-inline', '1')</script><img src=none.png><script "
+     "src=gone.js></script></body></html>"},
     {"coui://stress/busy.html",
      "<html><head><link rel=stylesheet href=a.css></head><body><div id=app></div><script>"
      "var n = 0; function tick() { var app = document.getElementById('app'); if (!app) return;"
@@ -50,7 +52,8 @@ constexpr File kFiles[] = {
      ".b0{background-color:red;height:10px}.b1{width:50%;opacity:.5}.b2{transform:translate(4px,4px) "
      "rotate(5deg)}#app{position:absolute;padding:4px;font-family:Web,sans-serif;font-size:12px}"},
     {"coui://stress/b.css",
-     ".card{display:flex;flex-direction:row;border:1px solid #000;border-radius:4px}.shadow{box-shadow:2px 2px "
+     ".card{display:flex;flex-direction:row;border:1px solid #000;border-radius:4px}.shadow{box-shadow:2px "
+     "2px "
      "6px rgba(0,0,0,.5)}.card span{color:blue}@media (max-width: 200px){.card{flex-direction:column}}"},
     {"coui://stress/c.css", "p{margin:3px} broken { } } @import url(a.css); p::{"},
     {"coui://stress/a.js", "window.a = (window.a || 0) + 1; console.log('a');"},
@@ -61,8 +64,8 @@ constexpr File kFiles[] = {
 };
 
 const File* Find(std::string_view url) {
-    const File* found = std::find_if(std::begin(kFiles), std::end(kFiles),
-                                     [&](const File& file) { return file.url == url; });
+    const File* found =
+        std::find_if(std::begin(kFiles), std::end(kFiles), [&](const File& file) { return file.url == url; });
     return found == std::end(kFiles) ? nullptr : found;
 }
 
@@ -87,9 +90,14 @@ class BrokenFont final : public qorvex::ISyncStreamReader {
 }  // namespace
 
 const char* const kPages[8] = {
-    "coui://stress/plain.html",  "coui://stress/rich.html", "coui://stress/busy.html",
-    "coui://stress/loader.html", "coui://stress/away.html", "coui://stress/missing.html",
-    "relative.html",             "coui://stress/a.js",
+    "coui://stress/plain.html",
+    "coui://stress/rich.html",
+    "coui://stress/busy.html",
+    "coui://stress/loader.html",
+    "coui://stress/away.html",
+    "coui://stress/missing.html",
+    "relative.html",
+    "coui://stress/a.js",
 };
 
 const char* const kSheets[4] = {

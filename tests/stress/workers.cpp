@@ -35,9 +35,8 @@ void Workers::Start(qorvex::Library* library) {
     library_ = library;
     pool_.Start(library);
     if (mode_ == Mode::AllThreads)
-        threads_.emplace_back([library] {
-            library->ExecuteWork(WorkType::Resources, WorkExecutionMode::RunUntilStopped, 0);
-        });
+        threads_.emplace_back(
+            [library] { library->ExecuteWork(WorkType::Resources, WorkExecutionMode::RunUntilStopped, 0); });
     if (mode_ == Mode::JobPool)
         for (int i = 0; i < 2; ++i)
             threads_.emplace_back([this] { ServeJobs(); });

@@ -55,8 +55,8 @@ struct ViewSlot final : qorvex::IViewListener {
     World& world;
     SystemSlot& system;
     qorvex::View* view = nullptr;
-    double time = 0;  // of its last good Advance, milliseconds
-    int depth = 0;    // operations of this view on the stack
+    double time = 0;                       // of its last good Advance, milliseconds
+    int depth = 0;                         // operations of this view on the stack
     std::atomic<std::uint32_t> frames{0};  // completed; also the next id
 };
 

@@ -1,8 +1,8 @@
-// What a view and its renderers share. Counted, so that they may be destroyed in either order: a renderer that
-// outlives its view finds an empty queue, and the scene goes with the last of them.
+// What a view and its renderers share. Counted, so that they may be destroyed in either order: a renderer
+// that outlives its view finds an empty queue, and the scene goes with the last of them.
 //
-// Invariant: a frame runs only through a renderer, which holds the link; so what a frame borrows from here (the
-// scene, the recorder) is alive while it runs.
+// Invariant: a frame runs only through a renderer, which holds the link; so what a frame borrows from here
+// (the scene, the recorder) is alive while it runs.
 #pragma once
 
 #include <fresco/scene.h>
