@@ -85,10 +85,9 @@ void ElementMatcher::OfferRule(const IndexedRule& rule, Element& element) {
 void ElementMatcher::OfferCustom(Atom name, const CustomPropertyPtr& record, uint32_t specificity,
                                  Element& element) {
     const bool important = (record->flags & kImportant) != 0;
-    auto* known = std::find_if(offers_.custom.begin(), offers_.custom.end(),
-                               [&](const auto& offer) { return offer.name == name; });
-    if (known == offers_.custom.end()) {
-        offers_.custom.push_back({name, specificity, important});
+    Offers::CustomOffer* known = offers_.custom.get(name);
+    if (!known) {
+        offers_.custom.insert_or_assign(name, Offers::CustomOffer{specificity, important});
     } else {
         if (known->important && !important) return;
         if (known->specificity > specificity) return;

@@ -31,11 +31,10 @@ class ElementMatcher {
         PropertySet important;
         std::array<uint32_t, kLonghandCount> specificity;
         struct CustomOffer {
-            Atom name;
             uint32_t specificity;
             bool important;
         };
-        CssSmallVector<CustomOffer, 4> custom;
+        CssHashMap<Atom, CustomOffer> custom;  // one element may have thousands
     };
 
     bool Apply(RuleIndex& index, dom::Element& element, MatchContext& context);
