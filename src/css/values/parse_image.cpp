@@ -26,8 +26,16 @@ bool ParseUrl(std::string_view text, size_t start, CssString& out) {
     return true;
 }
 
+char QuoteFor(std::string_view text) {
+    for (size_t i = 0; i < text.size(); ++i) {
+        if (text[i] == '"') return '\'';
+        if (text[i] == '\\') ++i;
+    }
+    return '"';
+}
+
 void SerialiseUrl(std::string_view url, CssString& out) {
-    char quote = url.find('"') == std::string_view::npos ? '"' : '\'';
+    const char quote = QuoteFor(url);
     out.append("url(");
     out.push_back(quote);
     out.append(url);

@@ -56,14 +56,20 @@ bool ParseName(std::string_view text, CssString& out) {
     return !out.empty();
 }
 
-void SerialiseName(std::string_view name, CssString& out) {
-    bool plain = !name.empty() && !name.starts_with(' ') && !name.ends_with(' ') &&
-                 name.find("  ") == std::string_view::npos;
+// Without quotes where it may do without; `joins` says that identifiers side by side are one name.
+void SerialiseName(std::string_view name, bool joins, CssString& out) {
+    // Unquoted, its white space would come back as single blanks, and these words mean something else.
+    bool plain = !name.empty() && (joins || name.find(' ') == std::string_view::npos) &&
+                 !name.starts_with(' ') && !name.ends_with(' ') &&
+                 name.find("  ") == std::string_view::npos &&
+                 name.find_first_of("\t\n\r\f") == std::string_view::npos;
+    for (const std::string_view reserved : {"inherit", "initial", "none"})
+        plain = plain && !EqualsIgnoreCase(name, reserved);
     WordReader words(name);
     std::string_view word;
     while (plain && words.Next(word))
         plain = IsIdentifier(word);
-    char quote = name.find('"') == std::string_view::npos ? '"' : '\'';
+    const char quote = QuoteFor(name);
     if (!plain) out.push_back(quote);
     out.append(name);
     if (!plain) out.push_back(quote);
@@ -93,7 +99,8 @@ bool Parse(std::string_view text, FontFamily& out) {
 }
 
 void Serialise(const FontFamily& value, CssString& out) {
-    SerialiseList(value, "", out, SerialiseName);
+    SerialiseList(value, "", out,
+                  [](const CssString& name, CssString& text) { SerialiseName(name, true, text); });
 }
 
 bool Parse(std::string_view text, LetterSpacing& out) {
@@ -137,7 +144,7 @@ void Serialise(const AnimationName& value, CssString& out) {
         if (name.empty())
             text.append("none");
         else
-            SerialiseName(name, text);
+            SerialiseName(name, false, text);
     });
 }
 
