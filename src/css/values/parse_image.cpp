@@ -6,6 +6,22 @@
 
 namespace qorvex::css {
 
+namespace {
+
+bool HoldsUnescaped(std::string_view text, char quote) {
+    for (size_t i = 0; i < text.size(); ++i) {
+        if (text[i] == quote) return true;
+        if (text[i] == '\\') ++i;
+    }
+    return false;
+}
+
+}  // namespace
+
+char QuoteFor(std::string_view text) {
+    return HoldsUnescaped(text, '"') ? '\'' : '"';
+}
+
 bool ParseUrl(std::string_view text, size_t start, CssString& out) {
     if (start >= text.size() || !StartsWithIgnoreCase(text.substr(start), "url(")) {
         LogWarning("Trying to parse URL with invalid start index.");
@@ -21,17 +37,10 @@ bool ParseUrl(std::string_view text, size_t start, CssString& out) {
         if (url.size() < 2 || url.back() != url[0]) return false;
         url = url.substr(1, url.size() - 2);
     }
-    if (url.empty()) return false;
+    // With both quotes in it there is no text for it.
+    if (url.empty() || HoldsUnescaped(url, QuoteFor(url))) return false;
     out = url;
     return true;
-}
-
-char QuoteFor(std::string_view text) {
-    for (size_t i = 0; i < text.size(); ++i) {
-        if (text[i] == '"') return '\'';
-        if (text[i] == '\\') ++i;
-    }
-    return '"';
 }
 
 void SerialiseUrl(std::string_view url, CssString& out) {
