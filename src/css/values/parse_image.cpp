@@ -6,6 +6,22 @@
 
 namespace qorvex::css {
 
+namespace {
+
+bool HoldsUnescaped(std::string_view text, char quote) {
+    for (size_t i = 0; i < text.size(); ++i) {
+        if (text[i] == quote) return true;
+        if (text[i] == '\\') ++i;
+    }
+    return false;
+}
+
+}  // namespace
+
+char QuoteFor(std::string_view text) {
+    return HoldsUnescaped(text, '"') ? '\'' : '"';
+}
+
 bool ParseUrl(std::string_view text, size_t start, CssString& out) {
     if (start >= text.size() || !StartsWithIgnoreCase(text.substr(start), "url(")) {
         LogWarning("Trying to parse URL with invalid start index.");
@@ -25,7 +41,8 @@ bool ParseUrl(std::string_view text, size_t start, CssString& out) {
     } else if (HoldsUnescaped(url, '"') || HoldsUnescaped(url, '\'')) {
         return false;
     }
-    if (url.empty()) return false;
+    // With both quotes in it there is no text for it.
+    if (url.empty() || HoldsUnescaped(url, QuoteFor(url))) return false;
     out = url;
     return true;
 }
