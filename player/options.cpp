@@ -93,6 +93,13 @@ constexpr OptionRow kRows[] = {
      }},
     {"--default-font", "NAME", "family of last resort",
      [](std::string_view text, Options& o) { return Store(text, o.default_font); }},
+    {"--no-text-services", "", "leave out bidirectional text, line breaks by language and case mapping",
+     [](std::string_view, Options& o) {
+         o.text_services = false;
+         return true;
+     }},
+    {"--translations", "FILE", "texts for elements with a data-l10n-id, as JSON",
+     [](std::string_view text, Options& o) { return Store(text, o.translations_file); }},
 };
 
 const OptionRow* FindRow(std::string_view name) {

@@ -87,6 +87,8 @@ bool Session::Start(std::string& error) {
         return false;
     }
 
+    if (!options_.translations_file.empty() && !localization_.AddFile(options_.translations_file, error))
+        return false;
     engine_options_ = FontOptions(options_.fonts);
     if (!options_.stats_file.empty()) engine_options_ = engine_options_ + ' ' + kCountAllocationsOption;
     LibraryParams params;
@@ -112,6 +114,11 @@ bool Session::Start(std::string& error) {
     SystemSettings system_settings;
     system_settings.ResourceHandler = resources_.get();
     system_settings.EmbeddedFallbackFont = kLargeFallbackFont;
+    if (options_.text_services) {
+        system_settings.InternationalizationManager = &internationalization_;
+        system_settings.TextTransformationManager = &text_transformation_;
+        system_settings.LocalizationManager = &localization_;
+    }
     system_ = library_->CreateSystem(system_settings);
 
     ViewSettings view_settings;

@@ -13,6 +13,8 @@
 #include "host/counting_allocator.h"
 #include "host/file_system.h"
 #include "host/folder_resource_handler.h"
+#include "host/icu_text_services.h"
+#include "host/json_localization.h"
 #include "host/print_log_handler.h"
 #include "host/software_render_target.h"
 #include "host/worker_pool.h"
@@ -80,6 +82,9 @@ class Session final : public qorvex::IViewListener {
     qorvex::host::CountingAllocator allocator_;
     qorvex::host::PrintLogHandler log_;
     qorvex::host::FileSystem files_;
+    qorvex::host::IcuInternationalization internationalization_;
+    qorvex::host::IcuTextTransformation text_transformation_;
+    qorvex::host::JsonLocalization localization_;
     std::unique_ptr<qorvex::host::FolderResourceHandler> resources_;
     qorvex::host::WorkerPool pool_;
     qorvex::host::SoftwareRenderTarget target_;

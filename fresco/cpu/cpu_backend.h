@@ -79,7 +79,8 @@ class CpuBackend final : public Backend {
 
     // --- text
     void DrawRun(const GlyphRunParams& run, const Glyph* glyphs, uint32_t count, bool stroke);
-    void DrawGlyphBitmap(const FontFace& face, uint32_t glyph, float size, Vec2 at, const Ink& ink);
+    void DrawGlyphBitmap(const FontFace& face, uint32_t glyph, float size, bool field, Vec2 at,
+                         const Ink& ink);
     bool DrawColorGlyph(const FontFace& face, uint32_t glyph, float size, Point at, const Paint& paint);
 
     // --- clips

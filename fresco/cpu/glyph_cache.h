@@ -18,16 +18,21 @@ class GlyphCache {
     // Beyond this, glyphs are drawn as outlines: they are rare, and their bitmaps would push out the others.
     static constexpr float kMaxSize = 160;
 
-    // `size` in device pixels per em.
-    const GlyphBitmap& Get(const FontFace& face, uint32_t glyph, float size, int subpixel);
+    // `size` in device pixels per em. `field`: from the glyph's distance field, where it has one.
+    const GlyphBitmap& Get(const FontFace& face, uint32_t glyph, float size, int subpixel, bool field);
     const uint8_t* Coverage(const GlyphBitmap& bitmap) const { return bytes_.data() + bitmap.offset; }
     // Between frames: bitmaps must not move while a run is drawn.
     void Trim(size_t maxBytes);
     void Clear();
 
   private:
+    void FromOutline(const FontFace& face, uint32_t glyph, double size, int subpixel, GlyphBitmap& out);
+    void FromField(const DistanceField& field, double size, int subpixel, GlyphBitmap& out);
+    // Room for the coverage; false when a hostile font asks for too much.
+    bool Reserve(const IRect& bounds, GlyphBitmap& out);
+
     struct Key {
-        uint32_t font, glyph, size;  // size in 64ths, with the subpixel in the low bits
+        uint32_t font, glyph, size;  // size in 64ths, with field and subpixel in the low bits
         bool operator==(const Key&) const = default;
     };
     struct KeyHash {

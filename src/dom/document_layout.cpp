@@ -52,7 +52,8 @@ void Document::RebuildLayoutTree() {
     }
     Node& root = *html_;
     layout::FontManager* fonts = host_->GetFontManager();
-    layout_tree_.SetFonts(fonts ? &fonts->Service() : nullptr);
+    layout_tree_.SetTextServices(
+        {fonts ? &fonts->Service() : nullptr, host_->GetInternationalizationManager()});
     root.layout_node_ = layout_tree_.CreateRoot({.style = root.style_,
                                                  .display = root.display_element_,
                                                  .link = root.GetLayoutLink(),

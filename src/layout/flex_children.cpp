@@ -58,6 +58,8 @@ void SyncFlexChildren(LayoutHandle& handle) {
     }
     if (node.flags.measuredByDisplayElement && !YGNodeHasMeasureFunc(owner))
         YGNodeSetMeasureFunc(owner, MeasureFlexNode);
+    if (node.display && node.display->Has(dsp::IDisplayElement::kFlowsChildren))
+        handle.store().flowsText = true;
 }
 
 void UpdateDepths(LayoutHandle& top, const HandleSet& changed) {
