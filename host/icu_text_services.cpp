@@ -185,13 +185,13 @@ void IcuInternationalization::ComputeTextDirection(const char* utf8, unsigned le
     UErrorCode fault = U_ZERO_ERROR;
     const auto count = static_cast<int32_t>(scratch->text.size());
     ubidi_setPara(scratch->bidi, scratch->text.data(), count, UBIDI_DEFAULT_LTR, nullptr, &fault);
+    const UBiDiLevel* levels = ubidi_getLevels(scratch->bidi, &fault);
     for (int32_t start = 0; U_SUCCESS(fault) && start < count;) {
-        int32_t end = start;
-        UBiDiLevel level = 0;
-        ubidi_getLogicalRun(scratch->bidi, start, &end, &level);
-        if (end <= start) break;
+        int32_t end = start + 1;
+        while (end < count && levels[end] == levels[start])
+            ++end;
         const unsigned first = scratch->offsets[static_cast<std::size_t>(start)];
-        result->AddRun(first, scratch->offsets[static_cast<std::size_t>(end)] - first, level);
+        result->AddRun(first, scratch->offsets[static_cast<std::size_t>(end)] - first, levels[start]);
         start = end;
     }
     shared_->ReturnScratch(std::move(scratch));

@@ -30,6 +30,7 @@ struct Options {
     bool strict = false;
     std::vector<std::string> fonts;
     std::string default_font;
+    std::vector<std::string> bitmap_fonts;
     bool text_services = true;
     std::string translations_file;
     std::string page;

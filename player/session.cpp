@@ -11,6 +11,8 @@
 #include <cstdio>
 #include <filesystem>
 
+#include "bitmap_font.h"
+
 namespace player {
 namespace fs = std::filesystem;
 using namespace qorvex;
@@ -120,6 +122,7 @@ bool Session::Start(std::string& error) {
         system_settings.LocalizationManager = &localization_;
     }
     system_ = library_->CreateSystem(system_settings);
+    if (!AddBitmapFonts(error)) return false;
 
     ViewSettings view_settings;
     view_settings.Listener = this;
@@ -137,6 +140,26 @@ bool Session::Start(std::string& error) {
     view_renderer_ = system_renderer_->CreateViewRenderer(view_);
     SetTarget();
     stats_->SetEnabled(view_, true);
+    return true;
+}
+
+bool Session::AddBitmapFonts(std::string& error) {
+    for (const std::string& path : options_.bitmap_fonts) {
+        BitmapFont font;
+        if (!font.Load(path, error)) return false;
+        std::vector<const void*> pages;
+        std::vector<std::uint32_t> sizes;
+        for (const std::string& page : font.pages) {
+            pages.push_back(page.data());
+            sizes.push_back(static_cast<std::uint32_t>(page.size()));
+        }
+        UserFontDescription description;
+        description.FamilyName = font.family.c_str();
+        description.Description = font.table.data();
+        description.DescriptionSize = static_cast<std::uint32_t>(font.table.size());
+        system_->AddUserFontFromEncodedImages(pages.data(), sizes.data(), static_cast<unsigned>(pages.size()),
+                                              description);
+    }
     return true;
 }
 

@@ -65,6 +65,7 @@ class Session final : public qorvex::IViewListener {
   private:
     Session(const Options& options, bool headless);
     bool Start(std::string& error);
+    bool AddBitmapFonts(std::string& error);
     void SetTarget();
     void OnLoadFailed(const char* url, const char* error) override;
     static void OnFrameComplete(void* session, std::uint32_t view, std::uint32_t frame, std::uint32_t);

@@ -154,8 +154,10 @@ uint32_t ScalableFace::StyleOfInstance(uint32_t instance) const {
         const float value = coords[i];
         if (axes[i].tag == kWeightAxis && std::isfinite(value))
             flags = (flags & ~kWeightFlags) | WeightFlag(int(std::clamp(value, 1.0f, 1000.0f)));
-        if (axes[i].tag == kItalicAxis) flags = (flags & ~kFontItalic) | (value >= 0.5f ? kFontItalic : 0);
-        if (axes[i].tag == kSlantAxis) flags = (flags & ~kFontOblique) | (value != 0 ? kFontOblique : 0);
+        if (axes[i].tag == kItalicAxis)
+            flags = (flags & ~uint32_t(kFontItalic)) | (value >= 0.5f ? uint32_t(kFontItalic) : 0);
+        if (axes[i].tag == kSlantAxis)
+            flags = (flags & ~uint32_t(kFontOblique)) | (value != 0 ? uint32_t(kFontOblique) : 0);
     }
     return flags;
 }

@@ -161,6 +161,14 @@ void Document::QueueTextCommit(Text& text) {
     text_commits_.insert(&text);
 }
 
+TaskPtr Document::TakeFontPreload(fresco::IFontService& service) {
+    for (Node* node : text_commits_) {
+        const css::LayoutStyleRefs& style = node->GetStyle();
+        if (style.text) font_usage_.Add(style.text->typefaces, static_cast<Text*>(node)->GetDisplayedText());
+    }
+    return font_usage_.TakeTask(service);
+}
+
 void Document::CommitLayout(layout::LayoutUpdateData& update, dsp::DirtyRegion* dirty,
                             layout::DebugNames* names) {
     for (Node* node : text_commits_)
