@@ -1,5 +1,7 @@
 #include "fresco/cpu/blend.h"
 
+#include <cstring>
+
 #include <fresco/paint.h>
 #include "fresco/cpu/blend_modes.h"
 #include "fresco/cpu/pixels.h"
@@ -144,6 +146,12 @@ void BlendRow(uint32_t* dst, const uint32_t* src, int count, const uint8_t* mask
 void BlendRowMode(uint32_t mode, uint32_t* dst, const uint32_t* src, int count, const uint8_t* mask,
                   uint8_t coverage) {
     if (mode == kBlendNormal) return BlendRow(dst, src, count, mask, coverage);
+    // Each frame starts with the one and may end with the other, over the whole target.
+    if (!mask && coverage == 255 && mode == kBlendClear) return FillPixels(dst, count, 0);
+    if (!mask && coverage == 255 && mode == kBlendSource) {
+        std::memcpy(dst, src, size_t(count) * sizeof(uint32_t));
+        return;
+    }
     for (int i = 0; i < count; ++i) {
         const uint32_t c = mask ? mask[i] : coverage;
         if (c == 0) continue;

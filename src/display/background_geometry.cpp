@@ -141,7 +141,7 @@ void ResolveBackgrounds(const LayoutNode& node, const Rect& box, const LengthCon
                         ResolvedVisuals& out) {
     const css::VisualStyle& style = *node.style.visual;
     const Rect local{0, 0, 0, box.width, box.height};
-    const Rect area = layout::Inset(local, node.border);
+    const Rect area = layout::Inset(local, node.border());
     const bool hasSlots = node.display && node.display->Has(IDisplayElement::kPaintsBox);
     auto* element = hasSlots ? static_cast<Box*>(node.display.get()) : nullptr;
     for (size_t i = 0; i < style.backgroundImage.size(); ++i) {
@@ -151,7 +151,7 @@ void ResolveBackgrounds(const LayoutNode& node, const Rect& box, const LengthCon
                               Cycled(style.backgroundSize, i, css::BackgroundSize()),
                               Cycled(style.backgroundRepeat, i, css::BackgroundRepeatType())};
         const Size own =
-            image.IsGradient() || element == nullptr ? Size{} : IntrinsicSize(&element->BackgroundSlots(), i);
+            image.IsGradient() || element == nullptr ? Size{} : IntrinsicSize(element->BackgroundSlots(), i);
         ResolvedImageLayer layer = PlaceLayer(placing, area, own, lengths);
         if (image.gradient)
             ResolveGradient(*image.gradient, {layer.tile.width, layer.tile.height}, lengths, layer);

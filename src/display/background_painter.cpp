@@ -72,14 +72,14 @@ void PaintBackgroundColor(const LayoutNode& node, const BoxShape& shape, Command
 }
 
 void PaintBackgroundImages(PaintContext& context, const LayoutNode& node, const BoxShape& shape,
-                           ImageSlots& slots, CommandBuffer& buffer) {
+                           const ImageSlots* slots, CommandBuffer& buffer) {
     const css::VisualStyle& visual = *node.style.visual;
     if (visual.backgroundImage.empty() || !node.visuals || layout::IsEmpty(shape.box)) return;
     const auto& layers = node.visuals->backgrounds;
     bool clipped = false;
     for (size_t i = std::min<size_t>(visual.backgroundImage.size(), layers.size()); i-- > 0;) {
         const css::ImageValue& image = visual.backgroundImage[i];
-        const bool isImage = !image.IsGradient() && i < slots.size() && slots[i].resource >= 0;
+        const bool isImage = !image.IsGradient() && slots && i < slots->size() && (*slots)[i].resource >= 0;
         if (layout::IsEmpty(layers[i].tile) || (!image.gradient && !isImage)) continue;
         if (!clipped) ClipToShape(shape, buffer);
         clipped = true;
@@ -87,17 +87,18 @@ void PaintBackgroundImages(PaintContext& context, const LayoutNode& node, const 
             PaintGradientLayer(context, *image.gradient, layers[i], {shape.box.x, shape.box.y}, shape.box,
                                buffer);
         } else {
-            DrawImageLayer(slots[i], layers[i], shape.box, buffer);
+            DrawImageLayer((*slots)[i], layers[i], shape.box, buffer);
         }
     }
     if (clipped) buffer.PopState();
 }
 
-bool PaintBorderImage(const LayoutNode& node, const BoxShape& shape, ImageSlots& slots,
+bool PaintBorderImage(const LayoutNode& node, const BoxShape& shape, const ImageSlots* slots,
                       CommandBuffer& buffer) {
     const css::VisualStyle& visual = *node.style.visual;
-    if (!HasBorderImage(visual) || slots.empty() || slots[0].resource < 0 || !node.visuals) return false;
-    const ImageSlot& slot = slots[0];
+    if (!HasBorderImage(visual) || !slots || slots->empty() || slots->front().resource < 0 || !node.visuals)
+        return false;
+    const ImageSlot& slot = slots->front();
     const Edges& outset = node.visuals->borderImageOutset;
     const Rect area = layout::Inset(shape.box, {-outset.left, -outset.right, -outset.top, -outset.bottom});
     const Edges& w = node.visuals->borderImageWidth;

@@ -12,9 +12,9 @@ namespace qorvex::dsp {
 void PaintBackgroundColor(const layout::LayoutNode& node, const BoxShape& shape,
                           fresco::CommandBuffer& buffer);
 void PaintBackgroundImages(PaintContext& context, const layout::LayoutNode& node, const BoxShape& shape,
-                           ImageSlots& slots, fresco::CommandBuffer& buffer);
+                           const ImageSlots* slots, fresco::CommandBuffer& buffer);
 // False when there is no border image to draw, and the border of the style shows.
-bool PaintBorderImage(const layout::LayoutNode& node, const BoxShape& shape, ImageSlots& slots,
+bool PaintBorderImage(const layout::LayoutNode& node, const BoxShape& shape, const ImageSlots* slots,
                       fresco::CommandBuffer& buffer);
 
 }  // namespace qorvex::dsp

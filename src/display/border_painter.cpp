@@ -69,6 +69,18 @@ void PaintSharpBorder(const BoxShape& shape, CommandBuffer& buffer) {
     }
 }
 
+// At a corner between two sides that do not draw both curves of the ring would be the same, and only straight
+// edges that coincide leave no trace of their smoothing.
+fresco::CornerRadii RingRadii(const BoxShape& shape) {
+    fresco::CornerRadii radii = shape.radii;
+    const Edges& b = shape.border;
+    if (b.left == 0 && b.top == 0) radii.topLeft = {};
+    if (b.right == 0 && b.top == 0) radii.topRight = {};
+    if (b.left == 0 && b.bottom == 0) radii.bottomLeft = {};
+    if (b.right == 0 && b.bottom == 0) radii.bottomRight = {};
+    return radii;
+}
+
 // The ring between the rounded border box and the rounded padding box, at the origin.
 PathPtr FramePath(PaintContext& context, const BoxShape& shape) {
     const TempMark mark;
@@ -77,9 +89,10 @@ PathPtr FramePath(PaintContext& context, const BoxShape& shape) {
     return context.paths.Get(key.view(), [&](fresco::Path& path) {
         const Rect outer{0, 0, 0, shape.box.width, shape.box.height};
         path.SetFillRule(fresco::kFillEvenOdd);
-        path.AddRoundedRect(outer, shape.radii);
+        const fresco::CornerRadii radii = RingRadii(shape);
+        path.AddRoundedRect(outer, radii);
         const Rect inner = layout::Inset(outer, shape.border);
-        if (!layout::IsEmpty(inner)) path.AddRoundedRect(inner, InsetRadii(shape.radii, shape.border));
+        if (!layout::IsEmpty(inner)) path.AddRoundedRect(inner, InsetRadii(radii, shape.border));
     });
 }
 
@@ -110,14 +123,19 @@ void PaintRing(PaintContext& context, const BoxShape& shape, const fresco::Color
     }
 }
 
-void PaintRoundBorder(PaintContext& context, const BoxShape& shape, CommandBuffer& buffer) {
-    if ((shape.bits & kAnyDiffers) == 0) {
-        for (uint32_t side = 0; side < 4; ++side) {
-            if (!Draws(shape, side)) continue;
-            PaintRing(context, shape, shape.colors[side], buffer);
-            return;
-        }
+// Null when two sides that draw differ, whether they meet in a corner or face each other.
+const fresco::Color* OnlyColor(const BoxShape& shape) {
+    const fresco::Color* only = nullptr;
+    for (uint32_t side = 0; side < 4; ++side) {
+        if (!Draws(shape, side)) continue;
+        if (only && !SameColor(*only, shape.colors[side])) return nullptr;
+        only = &shape.colors[side];
     }
+    return only;
+}
+
+void PaintRoundBorder(PaintContext& context, const BoxShape& shape, CommandBuffer& buffer) {
+    if (const fresco::Color* color = OnlyColor(shape)) return PaintRing(context, shape, *color, buffer);
     for (uint32_t side = 0; side < 4; ++side) {
         if (!Draws(shape, side) || shape.colors[side].a <= 0) continue;
         Point quad[4];

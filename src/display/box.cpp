@@ -9,11 +9,13 @@ namespace qorvex::dsp {
 
 void Box::SetHasMask(bool on) {
     SetFlag(kHasMask, on);
-    if (!on) {
-        mask_.reset();
-    } else if (!mask_) {
-        mask_ = MakeUnique<ImageSlots, MemoryTag::Rendering>();
-    }
+    if (on) EnsureImages();
+    if (!on && images_) images_->mask.clear();
+}
+
+Box::Images& Box::EnsureImages() {
+    if (!images_) images_ = MakeUnique<Images, MemoryTag::Rendering>();
+    return *images_;
 }
 
 void Box::Paint(PaintContext& context, bool dirty, const layout::LayoutNode& node,
@@ -21,10 +23,11 @@ void Box::Paint(PaintContext& context, bool dirty, const layout::LayoutNode& nod
     const BoxShape shape = AnalyseBox(node, context.snapToPixels);
     PaintOuterShadows(context, node, shape, buffer);
     PaintBackgroundColor(node, shape, buffer);
-    PaintBackgroundImages(context, node, shape, background_, buffer);
+    PaintBackgroundImages(context, node, shape, BackgroundSlots(), buffer);
     PaintInsetShadows(context, node, shape, buffer);
     PaintContent(context, dirty, node, buffer);
-    if (!PaintBorderImage(node, shape, border_image_, buffer)) PaintBorder(context, shape, buffer);
+    const ImageSlots* border = images_ ? &images_->border : nullptr;
+    if (!PaintBorderImage(node, shape, border, buffer)) PaintBorder(context, shape, buffer);
 }
 
 void Box::PaintContent(PaintContext&, bool, const layout::LayoutNode&, fresco::CommandBuffer&) {}

@@ -25,10 +25,17 @@ class Box : public IDisplayElement {
     void Paint(PaintContext& context, bool dirty, const layout::LayoutNode& node,
                fresco::CommandBuffer& buffer) override;
 
-    ImageSlots& BackgroundSlots() { return background_; }
-    ImageSlots& BorderImageSlots() { return border_image_; }
-    // Exists only for elements with a mask image.
-    ImageSlots* MaskSlots() { return mask_.get(); }
+    // The slots of an element's images; most elements have none. Null until first asked for by EnsureImages.
+    struct Images {
+        ImageSlots background;
+        ImageSlots border;
+        ImageSlots mask;
+    };
+    Images* GetImages() { return images_.get(); }
+    Images& EnsureImages();
+    ImageSlots* BackgroundSlots() { return images_ ? &images_->background : nullptr; }
+    // Null for elements without a mask image.
+    ImageSlots* MaskSlots() { return images_ && Has(kHasMask) ? &images_->mask : nullptr; }
     void SetHasMask(bool on);
 
   protected:
@@ -39,9 +46,7 @@ class Box : public IDisplayElement {
                               fresco::CommandBuffer& buffer);
 
   private:
-    ImageSlots background_;
-    ImageSlots border_image_;
-    UniquePtr<ImageSlots, MemoryTag::Rendering> mask_;
+    UniquePtr<Images, MemoryTag::Rendering> images_;
 };
 
 }  // namespace qorvex::dsp

@@ -17,10 +17,6 @@ using layout::Point;
 
 namespace {
 
-bool SameColor(const fresco::Color& a, const fresco::Color& b) {
-    return a.r == b.r && a.g == b.g && a.b == b.b && a.a == b.a;
-}
-
 void ReadSides(const LayoutNode& node, BoxShape& shape) {
     const css::LayoutStyle& style = *node.style.layout;
     const css::VisualStyle& visual = *node.style.visual;
@@ -32,10 +28,10 @@ void ReadSides(const LayoutNode& node, BoxShape& shape) {
         float& out;
     };
     const Side sides[] = {
-        {node.border.left, style.borderLeftStyle, visual.borderLeftColor, shape.border.left},
-        {node.border.right, style.borderRightStyle, visual.borderRightColor, shape.border.right},
-        {node.border.top, style.borderTopStyle, visual.borderTopColor, shape.border.top},
-        {node.border.bottom, style.borderBottomStyle, visual.borderBottomColor, shape.border.bottom}};
+        {node.border().left, style.borderLeftStyle, visual.borderLeftColor, shape.border.left},
+        {node.border().right, style.borderRightStyle, visual.borderRightColor, shape.border.right},
+        {node.border().top, style.borderTopStyle, visual.borderTopColor, shape.border.top},
+        {node.border().bottom, style.borderBottomStyle, visual.borderBottomColor, shape.border.bottom}};
     for (uint32_t i = 0; i < 4; ++i) {
         shape.colors[i] = ToFresco(sides[i].color.Resolve(current));
         // Dotted and dashed sides take room but paint nothing.
@@ -134,6 +130,10 @@ CornerRadii SpreadRadii(const CornerRadii& r, float spread) {
                      corner.y > 0 ? std::max(corner.y + spread, 0.0f) : 0};
     };
     return {more(r.topLeft), more(r.topRight), more(r.bottomRight), more(r.bottomLeft)};
+}
+
+bool SameColor(const fresco::Color& a, const fresco::Color& b) {
+    return a.r == b.r && a.g == b.g && a.b == b.b && a.a == b.a;
 }
 
 BoxShape AnalyseBox(const LayoutNode& node, bool snapToPixels) {

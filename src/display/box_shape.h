@@ -55,6 +55,8 @@ struct BoxShape {
     bool IsRounded() const { return kind == BoxKind::Rounded || kind == BoxKind::RoundedBordered; }
 };
 
+bool SameColor(const fresco::Color& a, const fresco::Color& b);
+
 BoxShape AnalyseBox(const layout::LayoutNode& node, bool snapToPixels);
 
 // Radii that do not fit their box shrink together, which keeps their proportions (CSS Backgrounds 3,

@@ -25,11 +25,11 @@ Rect ReferenceBox(const LayoutNode& node, const css::ClipPathType& clip, bool sn
     switch (clip.box) {
         case css::ClipBox::MarginBox:
             return layout::Inset(
-                box, {-node.margin.left, -node.margin.right, -node.margin.top, -node.margin.bottom});
+                box, {-node.margin().left, -node.margin().right, -node.margin().top, -node.margin().bottom});
         case css::ClipBox::PaddingBox:
-            return layout::Inset(box, node.border);
+            return layout::Inset(box, node.border());
         case css::ClipBox::ContentBox:
-            return layout::Inset(layout::Inset(box, node.border), node.padding);
+            return layout::Inset(layout::Inset(box, node.border()), node.padding());
         default:
             return box;
     }

@@ -73,7 +73,8 @@ void DisplayParagraph::Measure(layout::LayoutHandle& handle, float availableWidt
 
 void DisplayParagraph::PlaceContent(layout::LayoutHandle& handle, layout::LayoutPass& pass) {
     const layout::LayoutNode& node = handle.node();
-    const layout::Rect content = layout::Inset(layout::Inset(node.box, node.border), node.padding);
+    const layout::Rect content =
+        layout::Inset(layout::Inset(node.box, node.edges.border()), node.edges.padding());
     // Lines that were not broken at an unknown width are right for the box that was made of them.
     const bool measured = !stale_ && std::isnan(width_) && content.width >= std::ceil(size_.width);
     if (!measured) FlowFor(handle, content.width, content.height);
@@ -86,7 +87,7 @@ void InvalidateParagraphs(layout::LayoutHandle& changed) {
         const layout::LayoutNode& node = at->node();
         if (!node.display || !node.display->Has(IDisplayElement::kFlowsChildren)) continue;
         static_cast<DisplayParagraph&>(*node.display).Invalidate();
-        if (YGNodeHasMeasureFunc(node.flex)) YGNodeMarkDirty(node.flex);
+        if (node.flex != nullptr && YGNodeHasMeasureFunc(node.flex)) YGNodeMarkDirty(node.flex);
     }
 }
 

@@ -127,7 +127,7 @@ void DisplayText::PaintShadows(PaintContext& context, const layout::LayoutNode& 
         params.paint.color = ToFresco(items[i].color.Resolve(style.color));
         if (params.paint.color.a <= 0) continue;
         const bool blurred = shadow.blur > layout::kLengthTolerance;
-        if (blurred && IsMirrored(node.world)) {
+        if (blurred && IsMirrored(node.world.Get())) {
             if (!reported) LogWarning("Text shadows on reversed/flipped text is not supported.");
             reported = true;
             continue;

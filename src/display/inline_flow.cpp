@@ -7,6 +7,7 @@
 
 #include "display/display_text.h"
 #include "layout/flex_results.h"
+#include "layout/layout_store.h"
 
 namespace qorvex::dsp {
 
@@ -81,10 +82,12 @@ void InlineFlow::Walk(LayoutHandle& parent, Cursor& cursor, uint32_t depth) {
     for (const layout::HandlePtr& child : parent.node().children) {
         const LayoutNode& node = child->node();
         if (node.style.layout->display == css::CSSDisplay::None) continue;
-        if (node.flags.isAbsolute || node.flags.isFixed)
-            outOfFlow_.push_back(child.get());
-        else if (IsText(node))
+        if (node.flags.isAbsolute || node.flags.isFixed) {
+            if (node.flex != nullptr) outOfFlow_.push_back(child.get());
+        } else if (IsText(node))
             AddText(*child, cursor);
+        else if (node.flex == nullptr)
+            continue;  // beyond the depth limit
         else if (IsInline(node))
             AddInline(*child, cursor, depth);
         else
@@ -214,9 +217,7 @@ void InlineFlow::PlaceInline(LayoutPass& pass, const Item& item, Point origin) {
     LayoutNode& node = item.handle->node();
     const layout::OldBox old(node);
     const OuterEdges edges(node);
-    node.border = edges.border;
-    node.padding = edges.padding;
-    node.margin = edges.margin;
+    node.edges.Set({edges.border, edges.padding, edges.margin}, item.handle->store().recentEdges);
     const Rect content = Around(item.firstPiece, item.endPiece, origin);
     const layout::Edges around{edges.border.left + edges.padding.left,
                                edges.border.right + edges.padding.right, edges.border.top + edges.padding.top,

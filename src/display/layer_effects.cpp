@@ -116,10 +116,10 @@ void CollectEffects(const LayoutNode& node, PaintContext& context, EffectList& l
 
 void AnnotateLayer(const LayoutNode& node, PaintContext& context, CommandBuffer& buffer) {
     const VisualStyle& style = *node.style.visual;
-    buffer.Annotate(fresco::kAnnotateBaseTransform, node.world.m);
+    buffer.Annotate(fresco::kAnnotateBaseTransform, node.world.Get().m);
     if (!style.compositionId.empty()) {
         buffer.Annotate(fresco::kAnnotateCompositionId, style.compositionId.value.c_str());
-        buffer.Annotate(fresco::kAnnotateWorldMatrix, node.world.m);
+        buffer.Annotate(fresco::kAnnotateWorldMatrix, node.world.Get().m);
         buffer.Annotate(fresco::kAnnotateAABB, &node.aabb);
     }
     if (layout::Near(context.scaleX, 1) && layout::Near(context.scaleY, 1)) return;

@@ -26,8 +26,8 @@ class Collector {
         const uint32_t count = parent.children.size();
         for (uint32_t i = 0; i < count; ++i) {
             // A group of children out of sight costs one test.
-            if (i % kChildGroup == 0 && i / kChildGroup < parent.groups.size() &&
-                !TouchesAny(areas_, parent.groups[i / kChildGroup].visual)) {
+            if (i % kChildGroup == 0 && parent.below && i / kChildGroup < parent.below->groups.size() &&
+                !TouchesAny(areas_, parent.below->groups[i / kChildGroup].visual)) {
                 i += kChildGroup - 1;
                 order_ += kChildGroup;
                 continue;

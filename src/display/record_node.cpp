@@ -56,7 +56,7 @@ void ClipToPaddingBox(const LayoutNode& node, const PaintContext& context, Comma
         const Rect box = PaintBox(node, context.snapToPixels);
         fresco::CornerRadii radii = node.visuals->radii;
         FitRadii(radii, box.width, box.height);
-        buffer.ClipRoundedRect(padding, InsetRadii(radii, node.border), fresco::kClipIntersect);
+        buffer.ClipRoundedRect(padding, InsetRadii(radii, node.border()), fresco::kClipIntersect);
     } else {
         buffer.ClipRect(padding, fresco::kClipIntersect);
     }
@@ -68,7 +68,7 @@ class ChildAreas {
     ChildAreas(const LayoutNode& node, const PaintContext& context, Areas areas) : areas_(areas) {
         if (!node.flags.shouldOverflowClip) return;
         const Rect clip =
-            layout::RoundOut(layout::MapBounds(node.world, ClipBox(node, context.snapToPixels)));
+            layout::RoundOut(layout::MapBounds(node.world.Get(), ClipBox(node, context.snapToPixels)));
         uint32_t kept = 0;
         for (const Rect& area : areas) {
             const Rect cut = layout::Intersection(area, clip);
@@ -90,7 +90,7 @@ bool NeedsWholeContent(const LayoutNode& node) {
 
 void PushChildState(const LayoutNode& node, const PaintContext& context, StateScope& scope,
                     CommandBuffer& buffer) {
-    if (!node.flags.preserves3d && !layout::IsFlat(node.world)) {
+    if (!node.flags.preserves3d && !layout::IsFlat(node.world.Get())) {
         scope.Push(fresco::kStateTransform);
         buffer.FlattenTransform();
     }

@@ -170,9 +170,9 @@ void PaintOuterShadows(PaintContext& context, const LayoutNode& node, const BoxS
 void PaintInsetShadows(PaintContext& context, const LayoutNode& node, const BoxShape& shape,
                        CommandBuffer& buffer) {
     if ((shape.bits & kInsetShadow) == 0) return;
-    const Rect padding = layout::Inset(shape.box, node.border);
+    const Rect padding = layout::Inset(shape.box, node.border());
     if (layout::IsEmpty(padding)) return;
-    const CornerRadii inner = InsetRadii(shape.radii, node.border);
+    const CornerRadii inner = InsetRadii(shape.radii, node.border());
     buffer.PushState(fresco::kStateClip);
     HasRadii(inner) ? buffer.ClipRoundedRect(padding, inner, fresco::kClipIntersect)
                     : buffer.ClipRect(padding, fresco::kClipIntersect);

@@ -35,9 +35,6 @@ Rect ToVisual(const Rect& bounds) {
 bool Same(const Rect& a, const Rect& b) {
     return a.x == b.x && a.y == b.y && a.width == b.width && a.height == b.height;
 }
-bool Same(const Matrix& a, const Matrix& b) {
-    return std::equal(a.m, a.m + 16, b.m);
-}
 bool Same(const layout::ScrollPosition& a, const layout::ScrollPosition& b) {
     return a.x == b.x && a.y == b.y;
 }
@@ -45,6 +42,8 @@ bool Same(const layout::ScrollPosition& a, const layout::ScrollPosition& b) {
 // What a parent hands down.
 struct Above {
     const Matrix& children;
+    const layout::WorldMatrix*
+        shared;  // what a child without a matrix of its own has; null where it makes its own
     layout::ScrollPosition scroll;
     Rect clip;   // view coordinates
     bool moved;  // the matrix or the scroll position differs from the last pass
@@ -79,15 +78,14 @@ class TransformPass {
 
         const Before before(node);
         const Rect box = PaintBox(node, pass_.snapToPixels);
-        bool ownMatricesChanged = false;
+        bool ownMatricesChanged = false, worldChanged = false;
         if (self) {
             UpdateStacking(node);
             lengths_.em = node.style.text->computedFontSize;
             ownMatricesChanged = UpdateLocalMatrices(node, box, lengths_) ||
                                  (node.needsTransform && (node.local || node.perspective));
-            node.world = WorldOf(node, above);
+            worldChanged = UpdateWorld(node, above);
         }
-        const bool worldChanged = !Same(before.world, node.world);
         bool dirtyBelow = UpdateChildren(node, above, worldChanged || ownMatricesChanged);
         UpdateBounds(node, box);
         const layout::ScrollPosition clamped = layout::ClampScroll(node.scroll, node);
@@ -104,52 +102,57 @@ class TransformPass {
 
   private:
     struct Before {
-        Matrix world;
         Rect aabb, paint, visual;
         layout::Size scrollSize;
         layout::ScrollPosition scroll;
         explicit Before(const LayoutNode& node)
-            : world(node.world),
-              aabb(node.aabb),
+            : aabb(node.aabb),
               paint(node.paintBounds),
               visual(node.visualAabb),
-              scrollSize(node.scrollSize),
-              scroll(node.appliedScroll) {}
+              scrollSize(node.ScrollSize()),
+              scroll(node.below ? node.below->appliedScroll : layout::ScrollPosition()) {}
     };
 
-    static Matrix WorldOf(const LayoutNode& node, const Above& above) {
+    static bool UpdateWorld(LayoutNode& node, const Above& above) {
+        const bool scrolled = layout::IsScrolled(above.scroll);
+        if (above.shared && !scrolled && !node.local) return node.world.Share(*above.shared);
         Matrix world = above.children;
-        if (layout::IsScrolled(above.scroll)) {
-            world = world * fresco::TranslationMatrix(-above.scroll.x, -above.scroll.y);
-        }
-        return node.local ? world * *node.local : world;
+        if (scrolled) world = world * fresco::TranslationMatrix(-above.scroll.x, -above.scroll.y);
+        return node.world.Set(node.local ? world * *node.local : world);
+    }
+
+    // Do the children stand in the node's own matrix?
+    static bool HandsDownWorld(const LayoutNode& node) {
+        return !node.perspective && (node.flags.preserves3d || layout::IsFlat(node.world.Get()));
     }
 
     static Matrix ChildrenMatrix(const LayoutNode& node) {
-        Matrix children = node.world;
+        Matrix children = node.world.Get();
         if (!node.flags.preserves3d && !layout::IsFlat(children)) children = fresco::Flattened(children);
         return node.perspective ? children * *node.perspective : children;
     }
 
     bool UpdateChildren(LayoutNode& node, const Above& above, bool matricesChanged) {
         if (node.children.empty()) {
-            node.contentBounds = {};
+            node.below.reset();
             childrenVisual_ = {};
             return false;
         }
-        const bool scrolled = !Same(node.scroll, node.appliedScroll);
-        node.appliedScroll = node.scroll;
+        if (!node.below) node.below = MakeUnique<layout::ChildBounds, MemoryTag::LayoutNodes>();
+        const bool scrolled = !Same(node.scroll, node.below->appliedScroll);
+        node.below->appliedScroll = node.scroll;
         const Matrix children = ChildrenMatrix(node);
-        Above below{children, node.scroll, above.clip, above.moved || matricesChanged || scrolled};
+        Above below{children, HandsDownWorld(node) ? &node.world : nullptr, node.scroll, above.clip,
+                    above.moved || matricesChanged || scrolled};
         if (node.flags.shouldOverflowClip) {
             const Rect clip =
-                layout::RoundOut(layout::MapBounds(node.world, ClipBox(node, pass_.snapToPixels)));
+                layout::RoundOut(layout::MapBounds(node.world.Get(), ClipBox(node, pass_.snapToPixels)));
             below.clip = layout::Intersection(below.clip, clip);
         }
         Bounds bounds;
         const bool dirty = node.children.size() <= kChildGroup ? UpdateFewChildren(node, below, bounds)
                                                                : UpdateChildGroups(node, below, bounds);
-        node.contentBounds = bounds.content;
+        node.below->content = bounds.content;
         childrenVisual_ = bounds.visual;
         return dirty;
     }
@@ -166,35 +169,36 @@ class TransformPass {
     bool UpdateChildGroups(LayoutNode& node, const Above& below, Bounds& bounds) {
         const uint32_t count = node.children.size();
         const uint32_t groups = (count + kChildGroup - 1) / kChildGroup;
-        const bool all = below.moved || pass_.everything || node.groups.size() != groups;
-        node.groups.resize(groups);
+        auto& known = node.below->groups;
+        const bool all = below.moved || pass_.everything || known.size() != groups;
+        known.resize(groups);
         bool dirty = false;
         for (uint32_t g = 0; g < groups; ++g) {
-            if (all || node.groups[g].dirty) {
+            if (all || known[g].dirty) {
                 Bounds group;
                 const uint32_t end = std::min((g + 1) * kChildGroup, count);
                 for (uint32_t i = g * kChildGroup; i < end; ++i) {
                     dirty = Visit(*node.children[i], below) || dirty;
                     group.Add(node.children[i]->node());
                 }
-                node.groups[g] = {group.content, group.visual, false};
+                known[g] = {group.content, group.visual, false};
             }
-            bounds.Add(node.groups[g]);
+            bounds.Add(known[g]);
         }
         return dirty;
     }
 
     static void UpdateBounds(LayoutNode& node, const Rect& box) {
-        const bool overflows = !node.flags.shouldOverflowClip && !layout::IsEmpty(node.contentBounds);
-        node.aabb = overflows ? layout::Union(box, node.contentBounds) : box;
-        node.scrollSize = {node.contentBounds.width, node.contentBounds.height};
+        const bool overflows =
+            !node.flags.shouldOverflowClip && node.below && !layout::IsEmpty(node.below->content);
+        node.aabb = overflows ? layout::Union(box, node.below->content) : box;
     }
 
     void UpdatePaintBounds(LayoutNode& node, const Rect& box) {
         Rect reach = box;
         Rect subtree = childrenVisual_;
         if (node.flags.shouldOverflowClip && !layout::IsEmpty(subtree)) {
-            const Rect clip = layout::MapBounds(node.world, ClipBox(node, pass_.snapToPixels));
+            const Rect clip = layout::MapBounds(node.world.Get(), ClipBox(node, pass_.snapToPixels));
             subtree = layout::Intersection(subtree, layout::RoundOut(clip));
         }
         if (node.display) {
@@ -202,7 +206,7 @@ class TransformPass {
             reach = Outset(reach, {ink, ink, ink, ink});
         }
         if (node.visuals) reach = Outset(reach, PaintOutset(*node.visuals));
-        node.paintBounds = ToVisual(layout::MapBounds(node.world, reach));
+        node.paintBounds = ToVisual(layout::MapBounds(node.world.Get(), reach));
         node.visualAabb = layout::Union(node.paintBounds, subtree);
         if (node.visuals && !node.visuals->filters.empty() && !layout::IsEmpty(node.visualAabb)) {
             node.visualAabb = layout::RoundOut(Outset(node.visualAabb, FilterReach(node)));
@@ -211,7 +215,7 @@ class TransformPass {
 
     // The filter's reach under the node's transform; the largest scale stands for all directions.
     static Edges FilterReach(const LayoutNode& node) {
-        const float* m = node.world.m;
+        const float* m = node.world.Get().m;
         const float scale = std::max({std::hypot(m[0], m[1]), std::hypot(m[4], m[5]), 1e-3f});
         const Edges reach = FilterOutset(*node.visuals);
         const float largest = scale * std::max({reach.left, reach.right, reach.top, reach.bottom});
@@ -223,8 +227,9 @@ class TransformPass {
         LayoutNode& node = handle.node();
         const bool stacking =
             node.establishesStackingContext != node.previousStacking || node.zIndex != node.previousZIndex;
-        const bool scrolls = !layout::Near(before.scrollSize.width, node.scrollSize.width) ||
-                             !layout::Near(before.scrollSize.height, node.scrollSize.height) ||
+        const layout::Size scrollSize = node.ScrollSize();
+        const bool scrolls = !layout::Near(before.scrollSize.width, scrollSize.width) ||
+                             !layout::Near(before.scrollSize.height, scrollSize.height) ||
                              !Same(before.scroll, node.scroll);
         const bool paints = node.visualChanged || stacking || moved || node.rectChanged ||
                             node.boxMetricsChanged || !Same(before.paint, node.paintBounds);
@@ -254,7 +259,8 @@ void RunTransformPass(LayoutPass& pass) {
     if (pass.root == nullptr) return;
     const Matrix identity;
     const Rect view{0, 0, 0, static_cast<float>(pass.viewWidth), static_cast<float>(pass.viewHeight)};
-    TransformPass(pass).Visit(*pass.root, {identity, {}, view, false});
+    const layout::WorldMatrix none;
+    TransformPass(pass).Visit(*pass.root, {identity, &none, {}, view, false});
 }
 
 void MarkForTransform(LayoutHandle& handle) {
@@ -263,8 +269,10 @@ void MarkForTransform(LayoutHandle& handle) {
     for (LayoutHandle* parent = handle.node().parent; parent != nullptr; parent = parent->node().parent) {
         LayoutNode& node = parent->node();
         const uint32_t group = index / kChildGroup;
-        const bool groupKnown = group >= node.groups.size() || node.groups[group].dirty;
-        if (group < node.groups.size()) node.groups[group].dirty = true;
+        ChildGroup* known =
+            node.below && group < node.below->groups.size() ? &node.below->groups[group] : nullptr;
+        const bool groupKnown = !known || known->dirty;
+        if (known) known->dirty = true;
         if (node.descendantNeedsTransform && groupKnown) break;
         node.descendantNeedsTransform = true;
         index = node.index;
@@ -276,7 +284,7 @@ Rect PaintBox(const LayoutNode& node, bool snapToPixels) {
 }
 
 Rect ClipBox(const LayoutNode& node, bool snapToPixels) {
-    return layout::Inset(PaintBox(node, snapToPixels), node.border);
+    return layout::Inset(PaintBox(node, snapToPixels), node.border());
 }
 
 Rect ClipToAncestors(const LayoutNode& node) {
@@ -285,7 +293,7 @@ Rect ClipToAncestors(const LayoutNode& node) {
         const LayoutNode& parent = above->node();
         if (parent.flags.shouldOverflowClip) {
             area = layout::Intersection(
-                area, layout::RoundOut(layout::MapBounds(parent.world, ClipBox(parent, true))));
+                area, layout::RoundOut(layout::MapBounds(parent.world.Get(), ClipBox(parent, true))));
         }
         const bool spreads = parent.visuals && !parent.visuals->filters.empty();
         if (spreads && !layout::IsEmpty(area)) area = parent.visualAabb;

@@ -117,8 +117,8 @@ void ResolveVisuals(const LayoutNode& node, const Rect& box, const LengthContext
     for (const css::FilterFunction& filter : style.filter)
         out.filters.push_back(ResolveFilter(filter, lengths));
     if (style.borderImageSource.kind > css::ImageKind::Initial) {
-        out.borderImageWidth = ResolveSides(style.borderImageWidth.sides, node.border, box, lengths);
-        out.borderImageOutset = ResolveSides(style.borderImageOutset.sides, node.border, box, lengths);
+        out.borderImageWidth = ResolveSides(style.borderImageWidth.sides, node.border(), box, lengths);
+        out.borderImageOutset = ResolveSides(style.borderImageOutset.sides, node.border(), box, lengths);
     }
     ResolveBackgrounds(node, box, lengths, out);
 }

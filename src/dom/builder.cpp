@@ -13,7 +13,9 @@
 namespace qorvex::dom {
 
 Builder::Builder(RefPtr<ParsedHTML> parsed, Document& document)
-    : parsed_(std::move(parsed)), document_(document) {}
+    : parsed_(std::move(parsed)), document_(document) {
+    if (parsed_->IsNestingCut()) ReportDepth();
+}
 Builder::~Builder() = default;
 
 UniquePtr<Builder, MemoryTag::DOM> Builder::BuildRoot(RefPtr<ParsedHTML> parsed, Document& document) {
@@ -133,11 +135,14 @@ void Builder::PushContent(const StackEntry& entry, Node& element) {
     // At the bound the content becomes siblings of what should hold it, scripts and sheets keep their text.
     const bool keeps_text =
         entry.node->v.element.tag == GUMBO_TAG_SCRIPT || entry.node->v.element.tag == GUMBO_TAG_STYLE;
-    if (!depth_reported_)
-        LogWarning("HTML nests deeper than ", limits::kMaxDocumentDepth,
-                   " levels; deeper content is attached there");
-    depth_reported_ = true;
+    ReportDepth();
     PushChildren(*entry.node, keeps_text ? element : *entry.parent, entry.depth);
+}
+
+void Builder::ReportDepth() {
+    if (std::exchange(depth_reported_, true)) return;
+    LogWarning("HTML nests deeper than ", limits::kMaxDocumentDepth,
+               " levels; deeper content is attached there");
 }
 
 void Builder::AppendText(const StackEntry& entry) {

@@ -44,6 +44,8 @@ class Builder {
     // True when the building has to stop in front of the element.
     bool BuildElement(const StackEntry& entry);
     void PushContent(const StackEntry& entry, Node& element);
+    // Once a builder.
+    void ReportDepth();
     void AppendText(const StackEntry& entry);
     void FlushText();
     void FlushReactions();

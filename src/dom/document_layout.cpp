@@ -57,7 +57,7 @@ void Document::RebuildLayoutTree() {
     root.layout_node_ = layout_tree_.CreateRoot({.style = root.style_,
                                                  .display = root.display_element_,
                                                  .link = root.GetLayoutLink(),
-                                                 .scroll = root.scroll_});
+                                                 .scroll = root.GetStoredScroll()});
     root.style_.written = {};
     if (HasDisplay(root)) AppendLayoutSubtree(root, *root.layout_node_);
     layout_tree_built_ = true;

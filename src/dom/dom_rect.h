@@ -1,6 +1,7 @@
 // Rectangles that script gets.
 #pragma once
 
+#include "script/pooled_memory.h"
 #include "script/scripting_handle_enabled.h"
 
 namespace qorvex::dom {
@@ -30,6 +31,8 @@ class DOMRectReadOnly : public script::ScriptingHandleEnabledRefCounted {
 class DOMRect final : public DOMRectReadOnly {
     QORVEX_SCRIPT_CLASS(DOMRect)
   public:
+    QORVEX_POOLED(DOMRect, 64)
+
     using DOMRectReadOnly::DOMRectReadOnly;
     void SetX(float x) { x_ = x; }
     void SetY(float y) { y_ = y; }

@@ -2,12 +2,15 @@
 #pragma once
 
 #include "dom/element.h"
+#include "script/pooled_memory.h"
 
 namespace qorvex::dom {
 
 class DOMTokenList final : public script::ScriptingHandleEnabledRefCounted {
     QORVEX_SCRIPT_CLASS(DOMTokenList)
   public:
+    QORVEX_POOLED(DOMTokenList, 48)
+
     explicit DOMTokenList(Element& element) : element_(&element) {}
 
     size_t GetLength() const;

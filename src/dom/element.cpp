@@ -38,7 +38,7 @@ void Element::CopyElementTo(Element& target) {
     });
     // Declarations are copied as they are: some have no text form that gives the same value back.
     if (inline_style_) target.EnsureInlineStyle() = *inline_style_;
-    if (extra_style_) target.EnsureExtraStyle() = *extra_style_;
+    if (const css::StyleDeclarationSet* extra = GetExtraStyle()) target.EnsureExtraStyle() = *extra;
 }
 
 void Element::OnInsertedIntoDocument() {

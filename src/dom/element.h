@@ -79,8 +79,12 @@ class Element : public Node {
     qsl::RefPtr<DOMTokenList> GetClassList();
 
     // --- Style
-    css::MatchState& GetMatchState() { return match_state_; }
-    const css::MatchState& GetMatchState() const { return match_state_; }
+    // Null until the element was matched.
+    const css::MatchState* GetMatchState() const { return match_state_.get(); }
+    // Gives the one that stood there before.
+    css::MatchStatePtr SetMatchState(css::MatchStatePtr state) {
+        return std::exchange(match_state_, std::move(state));
+    }
     css::PropertySet& GetDirtyProperties() { return dirty_properties_; }
     const css::PropertySet& GetDirtyProperties() const { return dirty_properties_; }
     // What running animations and transitions say; null without any.
@@ -89,7 +93,9 @@ class Element : public Node {
     // Null until first use.
     css::StyleDeclarationSet* GetInlineStyle() const { return inline_style_.get(); }
     css::StyleDeclarationSet& EnsureInlineStyle();
-    css::StyleDeclarationSet* GetExtraStyle() const { return extra_style_.get(); }
+    css::StyleDeclarationSet* GetExtraStyle() const {
+        return GetRareData() ? GetRareData()->extra_style.get() : nullptr;
+    }
     css::StyleDeclarationSet& EnsureExtraStyle();
     // Replaces the inline declarations by those of a style attribute's text.
     void SetInlineStyleText(std::string_view text);
@@ -165,12 +171,11 @@ class Element : public Node {
     qsl::RefPtr<Node> InsertAdjacent(std::string_view position, qsl::RefPtr<Node> node);
 
     UniquePtr<css::StyleDeclarationSet, MemoryTag::DOM> inline_style_;
-    UniquePtr<css::StyleDeclarationSet, MemoryTag::DOM> extra_style_;
     css::PropertySet dirty_properties_;
-    css::MatchState match_state_;
+    css::MatchStatePtr match_state_;
     Vector<AttributePair, MemoryTag::DOM> attributes_;
     Atom id_;
-    Vector<Atom, MemoryTag::DOM> classes_;
+    SmallVector<Atom, 1, MemoryTag::DOM> classes_;
 };
 
 template <class Visitor>

@@ -110,14 +110,16 @@ void Element::SetAttribute(std::string_view name, std::string_view value) {
     const Atom atom = document.Intern(split.view);
     const Store store = StoreOf(atom);
     if (store == Store::Style) return SetStyleAttribute(value);
-    const std::optional<Atom> old_value = GetAttribute(split.view);
+    std::optional<Atom> old_value;
     const Atom new_value = document.Intern(value);
     if (store == Store::Id) {
+        if (Is(kHasId)) old_value = id_;
         SetId(new_value);
     } else if (store == Store::Class) {
+        if (Is(kHasClasses)) old_value = GetClassName();
         SetClassName(value);
     } else if (AttributePair* pair = Find({attributes_.data(), attributes_.size()}, atom)) {
-        pair->value = new_value;
+        old_value = std::exchange(pair->value, new_value);
     } else {
         attributes_.push_back({atom, new_value});
     }
@@ -370,8 +372,9 @@ css::StyleDeclarationSet& Element::EnsureInlineStyle() {
 }
 
 css::StyleDeclarationSet& Element::EnsureExtraStyle() {
-    if (!extra_style_) extra_style_ = MakeUnique<css::StyleDeclarationSet, MemoryTag::DOM>();
-    return *extra_style_;
+    auto& extra = EnsureRareData().extra_style;
+    if (!extra) extra = MakeUnique<css::StyleDeclarationSet, MemoryTag::DOM>();
+    return *extra;
 }
 
 void Element::SetInlineStyleText(std::string_view text) {

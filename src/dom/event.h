@@ -2,6 +2,7 @@
 #pragma once
 
 #include "core/memory/string_pool.h"
+#include "script/pooled_memory.h"
 #include "script/scripting_handle_enabled.h"
 
 namespace qorvex::dom {
@@ -14,6 +15,8 @@ enum class EventPhase : uint32_t { None = 0, Capture = 1, AtTarget = 2, Bubble =
 class Event : public script::ScriptingHandleEnabledRefCounted {
     QORVEX_SCRIPT_CLASS(Event)
   public:
+    QORVEX_POOLED(Event, 192)
+
     Event(Document* document, Atom type, bool bubbles, bool cancelable);
 
     Atom GetType() const { return type_; }

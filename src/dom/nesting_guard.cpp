@@ -1,5 +1,8 @@
 #include "dom/nesting_guard.h"
 
+#include <algorithm>
+#include <utility>
+
 #include "core/limits.h"
 #include "css/values/html_tags.h"
 #include "dom/ascii.h"
@@ -12,7 +15,8 @@ namespace {
 
 struct Tag {
     size_t start = 0;
-    size_t end = 0;  // behind the ">"
+    size_t end = 0;      // behind the ">"
+    size_t surplus = 0;  // where the attributes begin that are too many; 0 without
     TagId id = TagId::Unknown;
     bool closing = false;
     bool self_closing = false;
@@ -112,6 +116,9 @@ class TagScanner {
         }
         tag.id = css::TagLookup({upper, length});
         char quote = 0;
+        bool between = false;
+        size_t attributes = 0;
+        tag.surplus = 0;
         for (; end < source_.size(); ++end) {
             const char c = source_[end];
             if (quote) {
@@ -120,6 +127,10 @@ class TagScanner {
                 break;
             } else if ((c == '"' || c == '\'') && source_[end - 1] == '=') {
                 quote = c;
+            } else if (IsAsciiSpace(c) || c == '/') {
+                between = true;
+            } else if (std::exchange(between, false) && ++attributes > limits::kMaxSourceAttributes) {
+                if (tag.surplus == 0) tag.surplus = end;
             }
         }
         tag.self_closing = end < source_.size() && source_[end - 1] == '/';
@@ -142,15 +153,26 @@ class TagScanner {
 
 }  // namespace
 
-bool FlattenNesting(std::string_view source, TaggedString<MemoryTag::DOM>& rewritten) {
-    // So many tags do not fit in less.
-    if (source.size() < limits::kMaxSourceNesting * 3) return false;
+TamedSource TameSource(std::string_view source, TaggedString<MemoryTag::DOM>& rewritten) {
+    TamedSource done;
+    // So many tags or attributes do not fit in less.
+    if (source.size() < std::min(limits::kMaxSourceNesting * 3, limits::kMaxSourceAttributes * 2))
+        return done;
+    const auto blank = [&](size_t start, size_t end) {
+        if (rewritten.empty()) rewritten = source;
+        std::fill(rewritten.data() + start, rewritten.data() + end, ' ');
+    };
     TagScanner scanner(source);
     Tag tag;
     size_t open = 0;
     size_t blanked = 0;  // start tags whose end tags have to go too
-    bool changed = false;
     while (scanner.Next(tag)) {
+        if (tag.surplus) {
+            done.attributes = true;
+            // All but the sign that ends the tag.
+            const bool ends = source[tag.end - 1] == '>';
+            blank(tag.surplus, tag.end - (ends ? 1 : 0) - (ends && tag.self_closing ? 1 : 0));
+        }
         // Content of raw text must not turn into text of the page.
         if (!StaysOpen(tag) || tag.self_closing || HoldsRawText(tag.id)) continue;
         if (tag.closing) {
@@ -165,11 +187,10 @@ bool FlattenNesting(std::string_view source, TaggedString<MemoryTag::DOM>& rewri
         } else {
             ++blanked;
         }
-        if (!changed) rewritten = source;
-        changed = true;
-        std::fill(rewritten.data() + tag.start, rewritten.data() + tag.end, ' ');
+        done.nesting = true;
+        blank(tag.start, tag.end);
     }
-    return changed;
+    return done;
 }
 
 }  // namespace qorvex::dom

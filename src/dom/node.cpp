@@ -230,8 +230,12 @@ RefPtr<NodeLink> Node::GetLayoutLink() {
 }
 
 void Node::SetTextSelectionFlag() {
-    for (Node* node = this; node; node = node->GetNextInTree(this))
-        if (node->IsText()) node->textTransformFlag = 1;
+    for (Node* node = this; node; node = node->GetNextInTree(this)) {
+        if (!node->IsText()) continue;
+        node->textTransformFlag = 1;
+        // Solving goes no further down than what changed, so each text stands for itself.
+        document_->MarkNodeDirty(*node);
+    }
 }
 
 void Node::PostDispatch(Event& event) {

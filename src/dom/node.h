@@ -172,6 +172,10 @@ class Node : public EventTarget {
     void SetFlag(uint32_t flag, bool on) { flags_ = on ? flags_ | flag : flags_ & ~flag; }
     void SetScroll(layout::ScrollPosition wanted);
     layout::ScrollPosition ClampScroll(layout::ScrollPosition wanted) const;
+    layout::ScrollPosition KeepScrollInside();
+    layout::ScrollPosition GetStoredScroll() const {
+        return rare_ ? rare_->scroll : layout::ScrollPosition();
+    }
     // Index among the layout children of `parent` at which a new handle of this node goes.
     uint32_t FindLayoutIndex(const layout::LayoutHandle& parent) const;
     void AdoptLayoutHandle(layout::HandlePtr handle) { layout_node_ = std::move(handle); }
@@ -200,7 +204,6 @@ class Node : public EventTarget {
     css::LayoutStyleRefs style_;
     layout::HandlePtr layout_node_;
     NodeVector children_;
-    layout::ScrollPosition scroll_;
     UniquePtr<NodeRareData, MemoryTag::DOM> rare_;
     qsl::RefPtr<NodeLink> link_;
 };

@@ -14,7 +14,7 @@ layout::HandlePtr Node::CreateLayoutNode(layout::LayoutTree& tree, layout::Layou
                                  {.style = style_,
                                   .display = display_element_,
                                   .link = GetLayoutLink(),
-                                  .scroll = scroll_,
+                                  .scroll = GetStoredScroll(),
                                   .isImage = tag_ == css::TagId::Img});
     return layout_node_;
 }
@@ -51,37 +51,41 @@ const layout::LayoutResult* Node::GetLayoutResult() const {
 layout::ScrollPosition Node::ClampScroll(layout::ScrollPosition wanted) const {
     const layout::LayoutResult* box = GetLayoutResult();
     if (!box) return wanted;
-    const float width = box->width - box->border.left - box->border.right;
-    const float height = box->height - box->border.top - box->border.bottom;
+    const float width = box->width - box->edges.border().left - box->edges.border().right;
+    const float height = box->height - box->edges.border().top - box->edges.border().bottom;
     const float max_x = std::max(0.0f, box->scrollSize.width - width);
     const float max_y = std::max(0.0f, box->scrollSize.height - height);
     return {std::clamp(wanted.x, 0.0f, max_x), std::clamp(wanted.y, 0.0f, max_y)};
 }
 
+// What a smaller box cut off is gone, also when the box grows again.
+layout::ScrollPosition Node::KeepScrollInside() {
+    return rare_ ? rare_->scroll = ClampScroll(rare_->scroll) : layout::ScrollPosition();
+}
+
 float Node::GetScrollLeft() {
-    scroll_ = ClampScroll(scroll_);
-    return scroll_.x;
+    return KeepScrollInside().x;
 }
 
 float Node::GetScrollTop() {
-    scroll_ = ClampScroll(scroll_);
-    return scroll_.y;
+    return KeepScrollInside().y;
 }
 
 void Node::SetScrollLeft(float value) {
-    SetScroll({value, scroll_.y});
+    SetScroll({value, GetStoredScroll().y});
 }
 void Node::SetScrollTop(float value) {
-    SetScroll({scroll_.x, value});
+    SetScroll({GetStoredScroll().x, value});
 }
 
 void Node::SetScroll(layout::ScrollPosition wanted) {
     if (!std::isfinite(wanted.x) || !std::isfinite(wanted.y)) return;
     const layout::ScrollPosition clamped = ClampScroll(wanted);
-    if (layout::Near(clamped.x, scroll_.x) && layout::Near(clamped.y, scroll_.y)) return;
-    scroll_ = clamped;
+    const layout::ScrollPosition before = GetStoredScroll();
+    if (layout::Near(clamped.x, before.x) && layout::Near(clamped.y, before.y)) return;
+    EnsureRareData().scroll = clamped;
     if (!layout_node_ || !IsInDocument()) return;
-    document_->GetLayoutTree().SetScroll(*layout_node_, scroll_);
+    document_->GetLayoutTree().SetScroll(*layout_node_, clamped);
     document_->QueueTransformChange(*this);
 }
 

@@ -3,6 +3,8 @@
 
 #include "core/memory/containers.h"
 #include "core/memory/string_pool.h"
+#include "css/values/style_declaration_set.h"
+#include "layout/geometry.h"
 #include "qsl/ref_ptr.h"
 
 namespace qorvex::dom {
@@ -20,6 +22,9 @@ struct NodeRareData {
     NodeRareData();
     ~NodeRareData();
 
+    layout::ScrollPosition scroll;
+    // Declarations of an element that come between the default sheet and the author's.
+    UniquePtr<css::StyleDeclarationSet, MemoryTag::DOM> extra_style;
     qsl::RefPtr<NodeList> child_nodes;
     qsl::RefPtr<DOMStringMap> dataset_map;
     qsl::RefPtr<DOMTokenList> class_list;

@@ -2,6 +2,7 @@
 
 #include <gumbo.h>
 
+#include "core/limits.h"
 #include "core/logging/log.h"
 #include "dom/nesting_guard.h"
 
@@ -43,7 +44,12 @@ RefPtr<ParsedHTML> ParseHTML(std::string_view bytes, ParsedHTML::ReleaseSource r
     RefPtr<ParsedHTML> parsed = MakeRef<ParsedHTML>(bytes, std::move(release));
     std::string_view text = bytes;
     if (text.starts_with("\xEF\xBB\xBF")) text.remove_prefix(3);
-    if (FlattenNesting(text, parsed->rewritten_)) text = parsed->rewritten_;
+    const TamedSource tamed = TameSource(text, parsed->rewritten_);
+    if (tamed.nesting || tamed.attributes) text = parsed->rewritten_;
+    parsed->nesting_cut_ = tamed.nesting;
+    if (tamed.attributes)
+        LogWarning("HTML has a tag of more than ", limits::kMaxSourceAttributes,
+                   " attributes; the others are left out");
 
     GumboOptions options = kGumboDefaultOptions;
     options.allocator = AllocateInArena;

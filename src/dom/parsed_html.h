@@ -28,6 +28,8 @@ class ParsedHTML : public AtomicRefCounted<ParsedHTML, MemoryTag::DOM> {
     // Null when the parser made nothing.
     const GumboInternalNode* GetDocumentNode() const;
     const GumboInternalNode* GetRootNode() const;
+    // The source nests so deep that tags were left out before the parser saw it.
+    bool IsNestingCut() const { return nesting_cut_; }
     size_t GetArenaBytes() const { return arena_.GetAllocatedBytes(); }
 
   private:
@@ -37,6 +39,7 @@ class ParsedHTML : public AtomicRefCounted<ParsedHTML, MemoryTag::DOM> {
     ParseArena arena_;
     std::string_view source_;
     ReleaseSource release_;
+    bool nesting_cut_ = false;
     TaggedString<MemoryTag::DOM> rewritten_;  // what was parsed instead of a source that nests without end
 };
 

@@ -16,7 +16,7 @@ namespace qorvex::layout {
 
 namespace {
 
-bool Written(const css::LayoutStyleRefs& style, css::StyleGroup group) {
+bool Written(const css::LaidOutStyle& style, css::StyleGroup group) {
     return style.written[static_cast<size_t>(group)] != 0;
 }
 
@@ -29,12 +29,11 @@ void Sever(LayoutHandle& handle) {
     LayoutNode& node = handle.node();
     node.parent = nullptr;
     node.children.clear();
-    node.groups.clear();
+    node.below.reset();
     node.depth = 0;
     node.absoluteBelow = false;
     node.paintBounds = node.visualAabb = {};
-    if (YGNode* owner = YGNodeGetOwner(node.flex)) YGNodeRemoveChild(owner, node.flex);
-    YGNodeRemoveAllChildren(node.flex);
+    handle.store().FreeFlexNode(node);
 }
 
 void CopyToLayoutSide(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
@@ -55,13 +54,13 @@ void CopyToLayoutSide(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
     node.visualChanged = node.visualChanged || data.changed || Written(data.style, css::StyleGroup::Layout) ||
                          Written(data.style, css::StyleGroup::Transform);
     // Text, its font or its element changed: the cached size may be wrong.
-    if (data.changed && YGNodeHasMeasureFunc(node.flex)) YGNodeMarkDirty(node.flex);
+    if (data.changed && node.flex && YGNodeHasMeasureFunc(node.flex)) YGNodeMarkDirty(node.flex);
     data.changed = false;
     data.style.written.fill(0);
     if (!SameChildren(node.children, data.children)) {
         node.children = data.children;
         // The bounds by groups are made anew: any child may have moved to another one.
-        node.groups.clear();
+        if (node.below) node.below->groups.clear();
         node.childrenChanged = true;
     }
 }
@@ -88,7 +87,7 @@ void LayoutTree::Commit(LayoutUpdateData& update, dsp::DirtyRegion* dirty, Debug
         const LayoutHandle* parent = handle.node().parent;
         if (parent == nullptr || !changed_.Contains(parent)) UpdateDepths(handle, changed_);
     });
-    changed_.ForEach([](LayoutHandle& handle) { SyncFlexChildren(handle); });
+    changed_.ForEach([&](LayoutHandle& handle) { SyncFlexChildren(handle, changed_); });
     removed_.ForEach([](LayoutHandle& handle) { Sever(handle); });
     changed_.ForEach([](LayoutHandle& handle) { dsp::MarkForTransform(handle); });
     // Two commits may meet before one layout ran; nothing of the first may be lost.

@@ -28,12 +28,24 @@ void ReportDepth(LayoutHandle& handle) {
 
 }  // namespace
 
-void SyncFlexChildren(LayoutHandle& handle) {
+// The children that come anew to Yoga are added to `made`.
+static void SyncOneLevel(LayoutHandle& handle, const HandleSet* changed, TempVector<LayoutHandle*>& made) {
     LayoutNode& node = handle.node();
     YGNode* owner = node.flex;
     if (!node.flags.measuredByDisplayElement) YGNodeSetMeasureFunc(owner, nullptr);
     const uint32_t wanted = FlexChildCount(node);
     if (wanted == 0 && !node.children.empty() && !node.flags.measuredByDisplayElement) ReportDepth(handle);
+    const bool flows = node.display && node.display->Has(dsp::IDisplayElement::kFlowsChildren);
+    if (flows) handle.store().flowsText = true;
+    // What a paragraph flows is no child of its node, but the flow asks Yoga for edges and sizes of it.
+    const uint32_t known = flows ? static_cast<uint32_t>(node.children.size()) : wanted;
+    for (uint32_t i = 0; i < known; ++i) {
+        LayoutHandle& child = *node.children[i];
+        if (child.node().flex != nullptr) continue;
+        child.store().MakeFlexNode(child);
+        if (changed && !changed->Contains(&child)) child.store().flexStylesMissing = true;
+        made.push_back(&child);
+    }
     uint32_t present = static_cast<uint32_t>(YGNodeGetChildCount(owner));
     uint32_t prefix = 0;
     while (prefix < wanted && prefix < present &&
@@ -58,8 +70,28 @@ void SyncFlexChildren(LayoutHandle& handle) {
     }
     if (node.flags.measuredByDisplayElement && !YGNodeHasMeasureFunc(owner))
         YGNodeSetMeasureFunc(owner, MeasureFlexNode);
-    if (node.display && node.display->Has(dsp::IDisplayElement::kFlowsChildren))
-        handle.store().flowsText = true;
+}
+
+static void SyncFlexTree(LayoutHandle& handle, const HandleSet* changed) {
+    const TempMark mark;
+    TempVector<LayoutHandle*> stack;
+    stack.push_back(&handle);
+    while (!stack.empty()) {
+        LayoutHandle* next = stack.back();
+        stack.pop_back();
+        SyncOneLevel(*next, changed, stack);
+    }
+}
+
+void SyncFlexChildren(LayoutHandle& handle, const HandleSet& changed) {
+    if (handle.node().flex != nullptr) SyncFlexTree(handle, &changed);
+}
+
+bool EnsureFlexTree(LayoutHandle& handle) {
+    if (handle.node().flex != nullptr) return false;
+    handle.store().MakeFlexNode(handle);
+    SyncFlexTree(handle, nullptr);
+    return true;
 }
 
 void UpdateDepths(LayoutHandle& top, const HandleSet& changed) {
@@ -78,7 +110,7 @@ void UpdateDepths(LayoutHandle& top, const HandleSet& changed) {
             if (child.IsBeyondLimit()) child.box = child.aabb = child.paintBounds = child.visualAabb = {};
             if (moved || changed.Contains(node.children[i].get())) stack.push_back(node.children[i].get());
         }
-        if (!changed.Contains(parent)) SyncFlexChildren(*parent);
+        if (!changed.Contains(parent)) SyncFlexChildren(*parent, changed);
     }
 }
 

@@ -3,6 +3,7 @@
 #include "core/memory/temp_vector.h"
 #include "display/display_paragraph.h"
 #include "display/transforms.h"
+#include "layout/layout_store.h"
 
 #include <yoga/Yoga.h>
 
@@ -28,12 +29,14 @@ void CopyEdges(YGNodeConstRef flex, float (*get)(YGNodeConstRef, YGEdge), Edges&
     out.bottom = Finite(get(flex, YGEdgeBottom));
 }
 
-void CopyMetrics(LayoutNode& node) {
+void CopyMetrics(LayoutNode& node, EdgesCache& cache) {
     node.box.width = Finite(YGNodeLayoutGetWidth(node.flex));
     node.box.height = Finite(YGNodeLayoutGetHeight(node.flex));
-    CopyEdges(node.flex, YGNodeLayoutGetBorder, node.border);
-    CopyEdges(node.flex, YGNodeLayoutGetPadding, node.padding);
-    CopyEdges(node.flex, YGNodeLayoutGetMargin, node.margin);
+    BoxEdges edges;
+    CopyEdges(node.flex, YGNodeLayoutGetBorder, edges.border);
+    CopyEdges(node.flex, YGNodeLayoutGetPadding, edges.padding);
+    CopyEdges(node.flex, YGNodeLayoutGetMargin, edges.margin);
+    node.edges.Set(edges, cache);
 }
 
 // The box that a fixed node is placed in: the padding box of its container, or the view.
@@ -41,7 +44,7 @@ Rect FixedContainingBox(const Entry& entry, const LayoutPass& pass) {
     if (entry.fixedContainer == nullptr)
         return {0, 0, 0, static_cast<float>(pass.viewWidth), static_cast<float>(pass.viewHeight)};
     const LayoutNode& container = entry.fixedContainer->node();
-    return Inset(container.box, container.border);
+    return Inset(container.box, container.border());
 }
 
 bool IsInset(YGNodeConstRef flex, YGEdge edge) {
@@ -56,15 +59,15 @@ void PlaceFixed(LayoutNode& node, const Rect& in, Point origin) {
     node.box.x = origin.x + Finite(YGNodeLayoutGetLeft(flex));
     node.box.y = origin.y + Finite(YGNodeLayoutGetTop(flex));
     if (IsInset(flex, YGEdgeLeft)) {
-        node.box.x = in.x + YGNodeStyleGetPosition(flex, YGEdgeLeft).value + node.margin.left;
+        node.box.x = in.x + YGNodeStyleGetPosition(flex, YGEdgeLeft).value + node.margin().left;
     } else if (IsInset(flex, YGEdgeRight)) {
-        node.box.x =
-            Right(in) - YGNodeStyleGetPosition(flex, YGEdgeRight).value - node.margin.right - node.box.width;
+        node.box.x = Right(in) - YGNodeStyleGetPosition(flex, YGEdgeRight).value - node.margin().right -
+                     node.box.width;
     }
     if (IsInset(flex, YGEdgeTop)) {
-        node.box.y = in.y + YGNodeStyleGetPosition(flex, YGEdgeTop).value + node.margin.top;
+        node.box.y = in.y + YGNodeStyleGetPosition(flex, YGEdgeTop).value + node.margin().top;
     } else if (IsInset(flex, YGEdgeBottom)) {
-        node.box.y = Bottom(in) - YGNodeStyleGetPosition(flex, YGEdgeBottom).value - node.margin.bottom -
+        node.box.y = Bottom(in) - YGNodeStyleGetPosition(flex, YGEdgeBottom).value - node.margin().bottom -
                      node.box.height;
     }
 }
@@ -87,7 +90,7 @@ void NoteBoxChange(LayoutHandle& handle, const OldBox& old, LayoutPass& pass) {
     LayoutNode& node = handle.node();
     ++pass.update.counters.laidOut;
     const bool metrics = !Near(old.box.width, node.box.width) || !Near(old.box.height, node.box.height) ||
-                         !Near(old.border, node.border) || !Near(old.padding, node.padding);
+                         !Near(old.border, node.border()) || !Near(old.padding, node.padding());
     if (metrics) node.boxMetricsChanged = true;
     const bool moved = !Near(SnapToPixels(old.box), SnapToPixels(node.box));
     if (moved) node.rectChanged = true;
@@ -107,7 +110,7 @@ void ReadYogaResults(const FlexReadRoot& root, LayoutPass& pass) {
         const OldBox old(node);
         const bool isNew = YGNodeGetHasNewLayout(node.flex);
         if (isNew) {
-            CopyMetrics(node);
+            CopyMetrics(node, entry.handle->store().recentEdges);
             YGNodeSetHasNewLayout(node.flex, false);
         }
         Place(entry, pass);

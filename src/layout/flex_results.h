@@ -21,7 +21,7 @@ struct OldBox {
     Rect box;
     Edges border;
     Edges padding;
-    explicit OldBox(const LayoutNode& node) : box(node.box), border(node.border), padding(node.padding) {}
+    explicit OldBox(const LayoutNode& node) : box(node.box), border(node.border()), padding(node.padding()) {}
 };
 void NoteBoxChange(LayoutHandle& handle, const OldBox& old, LayoutPass& pass);
 

@@ -257,14 +257,15 @@ Edges ResolveBorders(const LayoutStyle& style, const LengthContext& lengths) {
             width(style.borderBottomWidth, style.borderBottomStyle)};
 }
 
-void SyncStyleToYoga(LayoutHandle& handle, FlexStyleContext& context) {
+bool SyncStyleToYoga(LayoutHandle& handle, FlexStyleContext& context) {
     LayoutNode& layoutNode = handle.node();
     YGNodeRef node = layoutNode.flex;
     const LayoutStyle& style = *layoutNode.style.layout;
     RefreshNodeFlags(layoutNode);
+    if (node == nullptr) return false;
     if (style.display == css::CSSDisplay::None) {
         YGNodeStyleSetDisplay(node, YGDisplayNone);
-        return;
+        return true;
     }
     context.lengths.em = layoutNode.style.text->computedFontSize;
     YGNodeStyleSetDisplay(node, YGDisplayFlex);
@@ -275,6 +276,7 @@ void SyncStyleToYoga(LayoutHandle& handle, FlexStyleContext& context) {
     SyncSizes(node, layoutNode, style, context.lengths);
     SyncPosition(node, layoutNode, style, context);
     MarkAbsoluteBelow(layoutNode);
+    return true;
 }
 
 }  // namespace qorvex::layout

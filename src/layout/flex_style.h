@@ -13,7 +13,7 @@ struct FlexStyleContext {
     const LayoutHandle* root = nullptr;
 };
 
-void SyncStyleToYoga(LayoutHandle& handle, FlexStyleContext& context);
+bool SyncStyleToYoga(LayoutHandle& handle, FlexStyleContext& context);
 
 // Widths of the four borders in pixels; a side without a painting or counting style is 0.
 Edges ResolveBorders(const css::LayoutStyle& style, const css::LengthContext& lengths);

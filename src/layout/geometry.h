@@ -25,6 +25,13 @@ struct Edges {
     float bottom = 0;
 };
 
+// Of one box. Shared: most boxes have none, and the DOM side takes over what the layout side found.
+struct BoxEdges {
+    Edges border;
+    Edges padding;
+    Edges margin;
+};
+
 struct ScrollPosition {
     float x = 0;
     float y = 0;

@@ -6,7 +6,7 @@
 // of handles, style groups, node links and display elements are atomic.
 //
 // Owners of a handle: its element, the child vector of its parent's halves, change sets and tasks. Both
-// halves return to the pools of the tree's store in one step with the handle.
+// halves lie in the handle, which returns to the pool of the tree's store.
 #pragma once
 
 #include "core/limits.h"
@@ -17,6 +17,7 @@
 #include "layout/node_link.h"
 #include "qsl/ref_ptr.h"
 
+#include <array>
 #include <atomic>
 #include <cstdint>
 
@@ -30,6 +31,8 @@ namespace qorvex::layout {
 
 class LayoutHandle;
 class LayoutStore;
+template <typename T>
+class ObjectPool;
 class LayoutTree;
 using HandlePtr = qsl::RefPtr<LayoutHandle>;
 using HandleVector = Vector<HandlePtr, MemoryTag::LayoutNodes>;
@@ -45,16 +48,54 @@ struct NodeFlags {
     bool measuredByDisplayElement = false;
 };
 
+// An immutable record of the layout side that several nodes and both halves hold.
+template <class Value>
+struct SharedRecord : AtomicRefCounted<SharedRecord<Value>, MemoryTag::LayoutNodes> {
+    explicit SharedRecord(const Value& value) : value(value) {}
+    Value value;
+};
+
+// The records made last: the boxes of a list mostly have the same edges.
+using EdgesPtr = qsl::RefPtr<const SharedRecord<BoxEdges>>;
+using EdgesCache = std::array<EdgesPtr, 16>;
+
+// Border, padding and margin of a box; without a record all of them are zero.
+class SharedEdges {
+  public:
+    const Edges& border() const { return Get().border; }
+    const Edges& padding() const { return Get().padding; }
+    const Edges& margin() const { return Get().margin; }
+    void Set(const BoxEdges& edges, EdgesCache& cache);
+
+  private:
+    static constexpr BoxEdges kNone{};
+    const BoxEdges& Get() const { return record_ ? record_->value : kNone; }
+    EdgesPtr record_;
+};
+
+// A node's world matrix. The node that has another one than its parent owns a record and writes it in place;
+// all below it that add nothing hold the same one. Without a record it is the identity.
+class WorldMatrix {
+  public:
+    const Matrix& Get() const { return record_ ? record_->value : kIdentity; }
+    // True when it may be another matrix now. Another record counts even with the same value: those below,
+    // who hold the former one, must change over before its owner writes it.
+    bool Share(const WorldMatrix& other);
+    bool Set(const Matrix& matrix);
+
+  private:
+    static constexpr Matrix kIdentity{};
+    qsl::RefPtr<SharedRecord<Matrix>> record_;
+    bool owns_ = false;
+};
+
 // The geometry that scripts read. Left and Top are in document coordinates, before transforms and scrolling.
 struct LayoutResult {
     float left = 0;
     float top = 0;
     float width = 0;
     float height = 0;
-    Edges border;
-    Edges padding;
-    Edges margin;
-    Rect aabb{};
+    SharedEdges edges;
     Rect visualAabb{};
     Rect viewBox{};  // the box under its transforms and the scrolling of its ancestors, in view coordinates
     Size scrollSize;
@@ -63,17 +104,16 @@ struct LayoutResult {
 struct LayoutData {
     LayoutHandle* parent = nullptr;
     HandleVector children;  // DOM order among the siblings that have handles
-    css::LayoutStyleRefs style;
+    css::LaidOutStyle style;
     dsp::DisplayElementPtr display;
     ScrollPosition scroll;
-    Size measuredSize;
+    NodeLinkPtr node;
+    LayoutResult result;
+    int32_t zIndex = 0;
     NodeFlags flags;
     bool establishesStackingContext = false;
     bool isImage = false;
-    int32_t zIndex = 0;
     bool changed = false;  // an edit that the next commit must carry over
-    LayoutResult result;
-    NodeLinkPtr node;
     bool inTree = false;
 };
 
@@ -86,47 +126,52 @@ struct ChildGroup {
 };
 inline constexpr uint32_t kChildGroup = 64;
 
+// What a node with children knows of them.
+struct ChildBounds {
+    Rect content{};                // their aabb together, document coordinates
+    ScrollPosition appliedScroll;  // under which their matrices were made
+    // Bounds of kChildGroup children each, kept only by nodes with more children than that.
+    Vector<ChildGroup, MemoryTag::LayoutNodes> groups;
+};
+
 struct LayoutNode {
     LayoutHandle* parent = nullptr;
     HandleVector children;
-    YGNode* flex = nullptr;  // its context points back at the handle
-    css::LayoutStyleRefs style;
+    // Its context points back at the handle. Only of nodes that Yoga lays out: none in a page, or a part of
+    // it, that the simple engine places.
+    YGNode* flex = nullptr;
+    css::LaidOutStyle style;
     dsp::DisplayElementPtr display;
     ScrollPosition scroll;
-    ScrollPosition appliedScroll;  // under which the children's matrices were made
-    NodeFlags flags;
-    bool transformDirty = false;
-    bool establishesStackingContext = false;
-    int32_t zIndex = 0;
-    bool previousStacking = false;  // as of the last SyncTrees
-    int32_t previousZIndex = 0;
 
     Rect box{};  // document coordinates; z and the pixel grid play no part yet
-    Edges border;
-    Edges padding;
-    Edges margin;
-    Size scrollSize;
-    Rect aabb{};           // snapped box and in-flow overflow, document coordinates
-    Rect paintBounds{};    // what the node's own content can touch, view coordinates
-    Rect visualAabb{};     // the same with its subtree
-    Rect contentBounds{};  // of the children: their aabb, document coordinates
-    // Bounds of kChildGroup children each, kept only by nodes with more children than that.
-    Vector<ChildGroup, MemoryTag::LayoutNodes> groups;
-    Matrix world;
+    SharedEdges edges;
+    Rect aabb{};         // snapped box and in-flow overflow, document coordinates
+    Rect paintBounds{};  // what the node's own content can touch, view coordinates
+    Rect visualAabb{};   // the same with its subtree
+    // Made by the transform pass where there are children.
+    UniquePtr<ChildBounds, MemoryTag::LayoutNodes> below;
+    WorldMatrix world;
     // Present only where the style needs them.
     UniquePtr<Matrix, MemoryTag::LayoutNodes> local;
     UniquePtr<Matrix, MemoryTag::LayoutNodes> perspective;
     UniquePtr<dsp::ResolvedVisuals, MemoryTag::LayoutNodes> visuals;
+
+    int32_t zIndex = 0;
+    int32_t previousZIndex = 0;  // as of the last SyncTrees, like previousStacking
+    // Place among the parent's children, for the bounds that the parent keeps by groups of children.
+    uint32_t index = 0;
+    // Depth below the root, which is 0. Nodes at kMaxLayoutDepth and deeper keep zero boxes.
+    uint32_t depth = 0;
+    NodeFlags flags;
+    bool establishesStackingContext = false;
+    bool previousStacking = false;
 
     // One frame long; SyncTrees clears them.
     bool visualChanged = false;
     bool rectChanged = false;
     bool boxMetricsChanged = false;
 
-    // Place among the parent's children, for the bounds that the parent keeps by groups of children.
-    uint32_t index = 0;
-    // Depth below the root, which is 0. Nodes at kMaxLayoutDepth and deeper keep zero boxes.
-    uint32_t depth = 0;
     // Sticky and conservative: there is an absolute or fixed box below, whose containing block may lie above
     // this node. When it is set here, it is set on all ancestors.
     bool absoluteBelow = false;
@@ -135,6 +180,11 @@ struct LayoutNode {
     bool descendantNeedsTransform = false;
     // The commit gave the node other children, so what their bounds add up to is not known.
     bool childrenChanged = false;
+
+    const Edges& border() const { return edges.border(); }
+    const Edges& padding() const { return edges.padding(); }
+    const Edges& margin() const { return edges.margin(); }
+    Size ScrollSize() const { return below ? Size{below->content.width, below->content.height} : Size{}; }
     // Beyond the depth limit a node takes no part in layout, transforms and painting.
     bool IsBeyondLimit() const { return depth >= limits::kMaxLayoutDepth; }
 };
@@ -148,22 +198,24 @@ class LayoutHandle {
     void Release() noexcept;
 
     // DOM thread.
-    LayoutData& data() { return *data_; }
-    const LayoutData& data() const { return *data_; }
+    LayoutData& data() { return data_; }
+    const LayoutData& data() const { return data_; }
     // Layout thread.
-    LayoutNode& node() { return *node_; }
-    const LayoutNode& node() const { return *node_; }
+    LayoutNode& node() { return node_; }
+    const LayoutNode& node() const { return node_; }
     // Shared by all handles of a tree; outlives the tree while a handle lives.
     LayoutStore& store() const { return *store_; }
 
   private:
     friend class LayoutStore;
+    friend class ObjectPool<LayoutHandle>;
     LayoutHandle() = default;
+    ~LayoutHandle() = default;
 
     std::atomic<uint32_t> count_{1};
     LayoutStore* store_ = nullptr;
-    LayoutData* data_ = nullptr;
-    LayoutNode* node_ = nullptr;
+    LayoutData data_;
+    LayoutNode node_;
 };
 
 }  // namespace qorvex::layout

@@ -1,6 +1,5 @@
 #include "layout/layout_store.h"
 
-#include "core/memory/allocator.h"
 #include "display/resolved_visuals.h"
 
 #include <yoga/Yoga.h>
@@ -13,71 +12,56 @@ LayoutStore::LayoutStore() : config_(YGConfigNew()) {
 }
 
 LayoutStore::~LayoutStore() {
-    for (YGNode* node : free_flex_nodes_)
-        YGNodeFree(node);
     YGConfigFree(config_);
 }
 
 HandlePtr LayoutStore::MakeHandle() {
-    auto* handle = new (GetAllocator()->Allocate(sizeof(LayoutHandle), MemoryTag::General)) LayoutHandle();
     const std::lock_guard lock(mutex_);
+    LayoutHandle* handle = handles_.Make();
     AddRef();
     handle->store_ = this;
-    handle->data_ = data_pool_.Make();
-    handle->node_ = node_pool_.Make();
-    handle->node_->flex = MakeFlexNode(handle);
     return qsl::AdoptRef(handle);
 }
 
-YGNode* LayoutStore::MakeFlexNode(LayoutHandle* handle) {
-    YGNode* node = nullptr;
-    if (free_flex_nodes_.empty()) {
-        node = YGNodeNewWithConfig(config_);
-    } else {
-        node = free_flex_nodes_.take_back();
-    }
-    YGNodeSetContext(node, handle);
-    return node;
+void LayoutStore::MakeFlexNode(LayoutHandle& handle) {
+    YGNode* node = YGNodeNewWithConfig(config_);
+    YGNodeSetContext(node, &handle);
+    handle.node().flex = node;
 }
 
-void LayoutStore::RecycleFlexNode(YGNode* node) {
-    if (YGNode* owner = YGNodeGetOwner(node)) YGNodeRemoveChild(owner, node);
-    YGNodeRemoveAllChildren(node);
-    YGNodeReset(node);
-    free_flex_nodes_.push_back(node);
+void LayoutStore::FreeFlexNode(LayoutNode& node) noexcept {
+    if (node.flex == nullptr) return;
+    if (YGNode* owner = YGNodeGetOwner(node.flex)) YGNodeRemoveChild(owner, node.flex);
+    YGNodeRemoveAllChildren(node.flex);
+    YGNodeFree(node.flex);
+    node.flex = nullptr;
 }
 
 // Children lose a reference each; those that die with it join a list, so that a page's deep tree costs no
 // deep stack. The list runs through the parent links, which mean nothing any more in a dead handle.
 void LayoutStore::Destroy(LayoutHandle* first) noexcept {
     uint32_t died = 0;
-    first->data_->parent = nullptr;
+    first->data_.parent = nullptr;
     for (LayoutHandle* handle = first; handle != nullptr;) {
-        LayoutHandle* next = handle->data_->parent;
+        LayoutHandle* next = handle->data_.parent;
         auto drop = [&](HandleVector& children, bool dataSide) {
             for (HandlePtr& child : children) {
                 LayoutHandle* raw = child.leak();
-                if (dataSide && raw->data_->parent == handle) raw->data_->parent = nullptr;
-                if (!dataSide && raw->node_->parent == handle) raw->node_->parent = nullptr;
+                if (dataSide && raw->data_.parent == handle) raw->data_.parent = nullptr;
+                if (!dataSide && raw->node_.parent == handle) raw->node_.parent = nullptr;
                 if (raw->count_.fetch_sub(1, std::memory_order_acq_rel) != 1) continue;
-                raw->data_->parent = next;
+                raw->data_.parent = next;
                 next = raw;
             }
             children.clear();
         };
-        drop(handle->data_->children, true);
-        drop(handle->node_->children, false);
+        drop(handle->data_.children, true);
+        drop(handle->node_.children, false);
         {
             const std::lock_guard lock(mutex_);
-            RecycleFlexNode(handle->node_->flex);
+            FreeFlexNode(handle->node_);
+            handles_.Recycle(handle);
         }
-        LayoutData* data = handle->data_;
-        LayoutNode* node = handle->node_;
-        handle->~LayoutHandle();
-        GetAllocator()->Deallocate(handle, MemoryTag::General);
-        const std::lock_guard lock(mutex_);
-        data_pool_.Recycle(data);
-        node_pool_.Recycle(node);
         ++died;
         handle = next;
     }

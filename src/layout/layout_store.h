@@ -1,7 +1,7 @@
 // Where the handles of one tree live, and what their layout side shares. Counted: it outlives the tree while
-// any handle lives, so that a released handle always has pools to return to.
+// any handle lives, so that a released handle always has a pool to return to.
 //
-// A handle may be released by the last task of a frame on any thread, so the pools take a lock. Everything
+// A handle may be released by the last task of a frame on any thread, so the pool takes a lock. Everything
 // else here belongs to the layout thread.
 #pragma once
 
@@ -22,6 +22,10 @@ class LayoutStore : public AtomicRefCounted<LayoutStore, MemoryTag::LayoutNodes>
 
     HandlePtr MakeHandle();
     void Destroy(LayoutHandle* handle) noexcept;
+    // Yoga's node is larger than all else that a handle has, so it is made when Yoga first has to lay the
+    // node out, and given back when it has not any more.
+    void MakeFlexNode(LayoutHandle& handle);
+    void FreeFlexNode(LayoutNode& node) noexcept;
 
     // What the last layout resolved viewport units and rem against; a difference makes every style be written
     // anew.
@@ -38,18 +42,16 @@ class LayoutStore : public AtomicRefCounted<LayoutStore, MemoryTag::LayoutNodes>
     bool flowsText = false;
     // The warning about the depth limit is given once a tree.
     bool reportedDepth = false;
+    EdgesCache recentEdges;
+    // Yoga has nodes whose style was never written.
+    bool flexStylesMissing = false;
     // The engine of the last layout; the other one's inputs are stale.
     enum class Engine : uint8_t { None, Flex, Simple };
     Engine engine = Engine::None;
 
   private:
-    YGNode* MakeFlexNode(LayoutHandle* handle);
-    void RecycleFlexNode(YGNode* node);
-
     std::mutex mutex_;
-    ObjectPool<LayoutData> data_pool_;
-    ObjectPool<LayoutNode> node_pool_;
-    Vector<YGNode*, MemoryTag::LayoutNodes> free_flex_nodes_;
+    ObjectPool<LayoutHandle> handles_;
     YGConfig* config_;
 };
 

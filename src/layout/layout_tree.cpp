@@ -102,7 +102,7 @@ void LayoutTree::MarkChanged(LayoutHandle& handle) {
     changed_.Insert(&handle);
 }
 
-void LayoutTree::UpdateStyle(LayoutHandle& handle, const css::LayoutStyleRefs& style) {
+void LayoutTree::UpdateStyle(LayoutHandle& handle, const css::LaidOutStyle& style) {
     LayoutData& data = handle.data();
     const auto pending = data.style.written;
     data.style = style;

@@ -16,7 +16,7 @@ namespace qorvex::layout {
 
 // What a node brings along when its handle is made.
 struct NewNode {
-    const css::LayoutStyleRefs& style;
+    const css::LaidOutStyle& style;
     dsp::DisplayElementPtr display;
     NodeLinkPtr link;
     ScrollPosition scroll;
@@ -50,7 +50,7 @@ class LayoutTree {
     // The next commit copies the handle.
     void MarkChanged(LayoutHandle& handle);
     // Takes over the element's groups; the caller clears the element's own written flags after it.
-    void UpdateStyle(LayoutHandle& handle, const css::LayoutStyleRefs& style);
+    void UpdateStyle(LayoutHandle& handle, const css::LaidOutStyle& style);
     void SetScroll(LayoutHandle& handle, ScrollPosition scroll);
     void SetDisplayElement(LayoutHandle& handle, dsp::DisplayElementPtr display);
 

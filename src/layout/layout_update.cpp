@@ -15,13 +15,10 @@ void SyncTrees(LayoutUpdateData& update) {
         result.top = node.box.y;
         result.width = node.box.width;
         result.height = node.box.height;
-        result.border = node.border;
-        result.padding = node.padding;
-        result.margin = node.margin;
-        result.scrollSize = node.scrollSize;
-        result.aabb = node.aabb;
+        result.edges = node.edges;
+        result.scrollSize = node.ScrollSize();
         result.visualAabb = node.visualAabb;
-        result.viewBox = MapBounds(node.world, node.box);
+        result.viewBox = MapBounds(node.world.Get(), node.box);
         data.scroll = ClampScroll(data.scroll, node);
         data.flags = node.flags;
         data.establishesStackingContext = node.establishesStackingContext;
@@ -29,7 +26,6 @@ void SyncTrees(LayoutUpdateData& update) {
         node.visualChanged = false;
         node.rectChanged = false;
         node.boxMetricsChanged = false;
-        node.transformDirty = false;
         node.previousStacking = node.establishesStackingContext;
         node.previousZIndex = node.zIndex;
     });

@@ -5,6 +5,7 @@
 #include "css/values/length_context.h"
 #include "display/display_paragraph.h"
 #include "display/transforms.h"
+#include "layout/flex_children.h"
 #include "layout/flex_measure.h"
 #include "layout/flex_results.h"
 #include "layout/flex_style.h"
@@ -41,9 +42,8 @@ void SyncAllStyles(LayoutPass& pass, FlexStyleContext& context) {
     while (!stack.empty()) {
         LayoutHandle* handle = stack.back();
         stack.pop_back();
-        SyncStyleToYoga(*handle, context);
+        if (SyncStyleToYoga(*handle, context)) ++pass.update.counters.synced;
         dsp::InvalidateParagraphs(*handle);
-        ++pass.update.counters.synced;
         if (YGNodeGetChildCount(handle->node().flex) == 0 && !FlowsChildren(handle->node())) continue;
         for (const HandlePtr& child : handle->node().children)
             stack.push_back(child.get());
@@ -52,13 +52,14 @@ void SyncAllStyles(LayoutPass& pass, FlexStyleContext& context) {
 
 void PerformFlexLayout(LayoutPass& pass, const css::LengthContext& lengths) {
     FlexStyleContext context{lengths, pass.disableFlexBasisUnits, pass.root};
+    const bool stylesMissing = std::exchange(pass.root->store().flexStylesMissing, false);
+    if (EnsureFlexTree(*pass.root) || stylesMissing) pass.everything = true;
     if (pass.everything) {
         SyncAllStyles(pass, context);
     } else {
         pass.update.changed.ForEach([&](LayoutHandle& handle) {
-            SyncStyleToYoga(handle, context);
+            if (SyncStyleToYoga(handle, context)) ++pass.update.counters.synced;
             dsp::InvalidateParagraphs(handle);
-            ++pass.update.counters.synced;
         });
     }
     YGNodeCalculateLayout(pass.root->node().flex, static_cast<float>(pass.viewWidth),
@@ -82,6 +83,7 @@ void PerformLayout(LayoutPass& pass) {
     using Engine = LayoutStore::Engine;
     if (TakeMetrics(pass, simple ? Engine::Simple : Engine::Flex)) pass.everything = true;
     if (simple) {
+        if (std::exchange(pass.root->store().flexStylesMissing, false)) pass.everything = true;
         PerformSimpleLayout(pass, lengths, pass.everything);
     } else if (pass.algorithm != FlexAlgorithm::Internal) {
         PerformFlexLayout(pass, lengths);

@@ -17,9 +17,10 @@ float ClampAxis(float position, float scrollSize, float clientSize) {
 
 ScrollPosition ClampScroll(ScrollPosition position, const LayoutNode& node) {
     if (!node.flags.shouldOverflowClip) return {};
-    const Rect client = Inset(node.box, node.border);
-    return {ClampAxis(position.x, node.scrollSize.width, client.width),
-            ClampAxis(position.y, node.scrollSize.height, client.height)};
+    const Rect client = Inset(node.box, node.border());
+    const Size content = node.ScrollSize();
+    return {ClampAxis(position.x, content.width, client.width),
+            ClampAxis(position.y, content.height, client.height)};
 }
 
 }  // namespace qorvex::layout

@@ -2,9 +2,11 @@
 
 #include "core/memory/temp_vector.h"
 #include "display/display_paragraph.h"
+#include "layout/flex_children.h"
 #include "layout/flex_measure.h"
 #include "layout/flex_results.h"
 #include "layout/flex_style.h"
+#include "layout/layout_store.h"
 #include "layout/node_flags.h"
 
 #include <yoga/Yoga.h>
@@ -29,26 +31,28 @@ struct Containers {
 
 Rect ContainingBox(const LayoutNode& node, const Containers& in, const LengthContext& lengths) {
     if (node.flags.isFixed) {
-        if (in.fixed != nullptr) return Inset(in.fixed->node().box, in.fixed->node().border);
+        if (in.fixed != nullptr) return Inset(in.fixed->node().box, in.fixed->node().border());
         return {0, 0, 0, lengths.vw * 100, lengths.vh * 100};
     }
     if (node.flags.isAbsolute && in.positioned != nullptr)
-        return Inset(in.positioned->box, in.positioned->border);
+        return Inset(in.positioned->box, in.positioned->border());
     if (node.parent == nullptr) return {0, 0, 0, lengths.vw * 100, lengths.vh * 100};
     const LayoutNode& parent = node.parent->node();
-    return Inset(Inset(parent.box, parent.border), parent.padding);
+    return Inset(Inset(parent.box, parent.border()), parent.padding());
 }
 
-void ResolveEdges(LayoutNode& node, const LayoutStyle& style, const LengthContext& lengths, float base) {
-    node.border = ResolveBorders(style, lengths);
+void ResolveEdges(LayoutHandle& handle, const LayoutStyle& style, const LengthContext& lengths, float base) {
+    BoxEdges edges;
+    edges.border = ResolveBorders(style, lengths);
     // Stored for scripts; in this engine margins move nothing.
-    node.margin = {ResolveExtent(style.marginLeft, lengths, base, 0),
-                   ResolveExtent(style.marginRight, lengths, base, 0),
-                   ResolveExtent(style.marginTop, lengths, base, 0),
-                   ResolveExtent(style.marginBottom, lengths, base, 0)};
-    node.padding = {
+    edges.margin = {ResolveExtent(style.marginLeft, lengths, base, 0),
+                    ResolveExtent(style.marginRight, lengths, base, 0),
+                    ResolveExtent(style.marginTop, lengths, base, 0),
+                    ResolveExtent(style.marginBottom, lengths, base, 0)};
+    edges.padding = {
         ResolveLength(style.paddingLeft, lengths, base), ResolveLength(style.paddingRight, lengths, base),
         ResolveLength(style.paddingTop, lengths, base), ResolveLength(style.paddingBottom, lengths, base)};
+    handle.node().edges.Set(edges, handle.store().recentEdges);
 }
 
 Point PlaceIn(const Rect& in, const LayoutNode& node, const LayoutStyle& style,
@@ -68,8 +72,8 @@ float AtLeastZero(float value) {
 void FitAutoSizes(LayoutNode& node, const LayoutStyle& style) {
     if (node.flags.measuredByDisplayElement) return;
     if (style.width.IsLength() && style.height.IsLength()) return;
-    Size sum{node.padding.left + node.padding.right + node.border.left + node.border.right,
-             node.padding.top + node.padding.bottom + node.border.top + node.border.bottom};
+    Size sum{node.padding().left + node.padding().right + node.border().left + node.border().right,
+             node.padding().top + node.padding().bottom + node.border().top + node.border().bottom};
     for (const HandlePtr& child : node.children) {
         const LayoutNode& flow = child->node();
         if (flow.flags.isAbsolute || flow.flags.isFixed) continue;
@@ -82,6 +86,7 @@ void FitAutoSizes(LayoutNode& node, const LayoutStyle& style) {
 
 // A paragraph reads edges and sizes of what it flows from the nodes of the flex engine.
 void SyncFlow(LayoutHandle& paragraph, LayoutPass& pass, const LengthContext& lengths) {
+    EnsureFlexTree(paragraph);
     FlexStyleContext context{lengths, false, pass.root};
     const TempMark mark;
     TempVector<LayoutHandle*> queue;
@@ -97,12 +102,13 @@ void SyncFlow(LayoutHandle& paragraph, LayoutPass& pass, const LengthContext& le
 void LayoutSimpleSubtree(LayoutHandle& handle, LayoutPass& pass, LengthContext lengths, Containers in) {
     LayoutNode& node = handle.node();
     if (node.IsBeyondLimit()) return;
+    handle.store().FreeFlexNode(node);
     RefreshNodeFlags(node);
     const LayoutStyle& style = *node.style.layout;
     const OldBox old(node);
     lengths.em = node.style.text->computedFontSize;
     const Rect containing = ContainingBox(node, in, lengths);
-    ResolveEdges(node, style, lengths, containing.width);
+    ResolveEdges(handle, style, lengths, containing.width);
     const Point place = PlaceIn(containing, node, style, lengths);
     node.box.x = place.x;
     node.box.y = place.y;
@@ -201,16 +207,15 @@ void PerformSimpleLayout(LayoutPass& pass, const LengthContext& lengths, bool ev
 void LayoutFlexInSimple(const LengthContext& lengths, LayoutPass& pass, LayoutHandle& handle, Point place,
                         LayoutHandle* fixedContainer) {
     FlexStyleContext context{lengths, false, pass.root};
-    const bool everything = pass.everything;
+    const bool everything = EnsureFlexTree(handle) || pass.everything;
     const TempMark mark;
     TempVector<LayoutHandle*> queue;
     queue.push_back(&handle);
     for (uint32_t next = 0; next < queue.size(); ++next) {
         LayoutHandle* current = queue[next];
         if (everything || pass.update.changed.Contains(current)) {
-            SyncStyleToYoga(*current, context);
+            if (SyncStyleToYoga(*current, context)) ++pass.update.counters.synced;
             dsp::InvalidateParagraphs(*current);
-            ++pass.update.counters.synced;
         }
         const LayoutNode& node = current->node();
         const bool flows = node.display && node.display->Has(dsp::IDisplayElement::kFlowsChildren);

@@ -116,6 +116,7 @@ class NodeSet<T*, Alloc> {
             const uint32_t* now =
                 std::lower_bound(std::begin(kNodeSetPrimes), std::end(kNodeSetPrimes), capacity());
             slots_.truncate(now[-1]);
+            slots_.shrink_to_fit();
         }
         std::fill(slots_.begin(), slots_.end(), nullptr);
     }

@@ -3,8 +3,6 @@
 #include <array>
 
 #include "core/logging/log.h"
-#include "script/native_private.h"
-#include "script/scripting_handle_enabled.h"
 
 namespace qorvex::script {
 
@@ -16,18 +14,17 @@ JSClassRef CreateClass(ScriptClass script_class, const ClassDescription* descrip
     const ScriptClassRow& row = GetScriptClassRow(script_class);
     JSClassDefinition definition = kJSClassDefinitionEmpty;
     definition.className = row.name;
-    // Neither a parent class nor the automatic prototype: the engine searches the tables of every class of a
-    // chain on every access (463 ns for a method of the fifth class, 167 with plain prototype objects), and
-    // would run a finaliser once for each of them.
+    // Only classes with property rules are used for objects, see wrapper_table.h. Neither a parent class nor
+    // the automatic prototype: the engine searches the tables of every class of a chain on every access (463
+    // ns for a method of the fifth class, 167 with plain prototype objects).
     definition.attributes = kJSClassAttributeNoAutomaticPrototype;
-    if (row.finaliser != Finaliser::None) definition.finalize = FinaliseHandle;
     if (description) {
         definition.hasProperty = description->properties.has;
         definition.getProperty = description->properties.get;
         definition.setProperty = description->properties.set;
         definition.deleteProperty = description->properties.remove;
         definition.getPropertyNames = description->properties.names;
-        if (description->finalise) definition.finalize = description->finalise;
+        definition.finalize = description->finalise;
     }
     return JSClassCreate(&definition);
 }
@@ -60,18 +57,6 @@ void ReleaseScriptClasses() {
 
 const ClassDescription* GetClassDescription(ScriptClass script_class) {
     return g_descriptions[static_cast<size_t>(script_class)];
-}
-
-void FinaliseHandle(JSObjectRef object) {
-    const NativePrivate found = UnpackPrivate(JSObjectGetPrivate(object));
-    if (!found.object) return;
-    JSObjectSetPrivate(object, nullptr);
-    auto* handle = static_cast<ScriptingHandleEnabled*>(found.object);
-    if (found.has_weak) {
-        static_cast<ScriptingHandleEnabledRefCountedWithWeak*>(handle)->FinaliseWrapper();
-    } else {
-        static_cast<ScriptingHandleEnabledRefCounted*>(handle)->FinaliseWrapper();
-    }
 }
 
 }  // namespace qorvex::script

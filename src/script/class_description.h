@@ -52,7 +52,7 @@ struct ClassDescription {
     // False for classes that script cannot name.
     bool has_global_name = true;
     PropertyAccessDescription properties = {};
-    // For the one class whose private is not a handle; null: the common finaliser.
+    // For the one class whose private is not a handle.
     JSObjectFinalizeCallback finalise = nullptr;
 };
 
@@ -64,8 +64,5 @@ void ReleaseScriptClasses();
 
 // The description of a class; null for one that has none.
 [[nodiscard]] const ClassDescription* GetClassDescription(ScriptClass script_class);
-
-// `finalize` of all classes whose private is a handle.
-void FinaliseHandle(JSObjectRef object);
 
 }  // namespace qorvex::script

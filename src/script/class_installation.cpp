@@ -3,41 +3,89 @@
 #include <JavaScriptCore/JavaScript.h>
 
 #include "script/class_description.h"
+#include "script/engine_seam.h"
 #include "script/evaluate.h"
+#include "script/native_private.h"
 
 namespace qorvex::script {
 
 namespace {
 
-// Gives the functions that build classes; what they are handed is what the C API cannot express.
-constexpr std::string_view kBuilders = R"((function() {
-    'use strict';
-    const fixed = value => ({ value, writable: false, enumerable: false, configurable: false });
-    return {
-        accessor(target, name, get, set) {
-            Object.defineProperty(target, name, { get, set, enumerable: true, configurable: true });
-        },
-        constant(target, name, value) {
-            Object.defineProperty(target, name, { value, writable: false, enumerable: true, configurable: false });
-        },
-        constructorOf(name, prototype, parent, construct, global) {
-            const result = { [name]: function(...values) { return construct(new.target, ...values); } }[name];
-            Object.defineProperties(result, { prototype: fixed(prototype), name: fixed(name) });
-            Object.defineProperty(prototype, 'constructor',
-                { value: result, writable: true, enumerable: false, configurable: true });
-            if (parent) Object.setPrototypeOf(result, parent);
-            if (global) {
-                const inherited = Function.prototype[Symbol.hasInstance];
-                Object.defineProperty(result, Symbol.hasInstance,
-                    fixed(function(value) { return value === global || inherited.call(this, value); }));
+// Gives the functions that build classes, in the order of ClassBuilder; what they are handed is what the C
+// API cannot express. They run whenever a class is first used, so they keep what they need of the language
+// before any script of the page can change it. Descriptors are kept as well: making one costs more than
+// defining a property with it.
+constexpr std::string_view kBuilders = R"('use strict'; {
+    const global = globalThis;
+    let build;
+    const { defineProperty, create, setPrototypeOf, prototype: root } = Object;
+    const { toStringTag, hasInstance } = Symbol;
+    const { apply } = Reflect;
+    const instanceOf = Function.prototype[hasInstance];
+    const kind = (writable, enumerable, configurable) =>
+        ({ __proto__: null, value: undefined, writable, enumerable, configurable });
+    const accessor = { __proto__: null, get: undefined, set: undefined, enumerable: true, configurable: true };
+    const method = kind(true, true, true), constant = kind(false, true, false), fixed = kind(false, false, false);
+    const hidden = kind(true, false, true), label = kind(false, false, true);
+    function define(target, key, descriptor, value) {
+        descriptor.value = value;
+        defineProperty(target, key, descriptor);
+        descriptor.value = undefined;
+    }
+    function constants(target, values, i) {
+        for (; i < values.length; i += 2) define(target, values[i], constant, values[i + 1]);
+    }
+    [
+        // A global name whose class is made when it is read; `make` does that.
+        function lazy(make, ...names) {
+            build = make;
+            for (let i = 0; i < names.length; i += 2) {
+                const name = names[i], index = names[i + 1];
+                defineProperty(global, name, { __proto__: null, enumerable: false, configurable: true,
+                    get() {
+                        const made = build(index);
+                        define(global, name, hidden, made);
+                        return made;
+                    },
+                    set(value) { define(global, name, hidden, value); } });
             }
+        },
+        function prototypeOf(parent) { return create(parent || root); },
+        // Name, getter and setter of each attribute; name and function of each method; name and value of constants.
+        function members(target, attributes, methods, ...values) {
+            let i = 0;
+            for (; attributes > 0; --attributes, i += 3) {
+                accessor.get = values[i + 1];
+                accessor.set = values[i + 2];
+                defineProperty(target, values[i], accessor);
+            }
+            for (; methods > 0; --methods, i += 2) define(target, values[i], method, values[i + 1]);
+            constants(target, values, i);
+        },
+        function constructorOf(name, prototype, parent, construct, answersForGlobal, ...values) {
+            const result = { [name]: function(...values) { return construct(new.target, ...values); } }[name];
+            define(result, 'prototype', fixed, prototype);
+            define(result, 'name', fixed, name);
+            define(prototype, 'constructor', hidden, result);
+            define(prototype, toStringTag, label, name);
+            if (parent) setPrototypeOf(result, parent);
+            if (answersForGlobal) {
+                define(result, hasInstance, fixed,
+                    function(value) { return value === global || apply(instanceOf, this, [value]); });
+            }
+            constants(result, values, 0);
             return result;
         },
-        tag(target, name) {
-            Object.defineProperty(target, Symbol.toStringTag, { value: name, configurable: true });
-        }
-    };
-})())";
+        // Sixteen objects that inherit from `prototype`, handed over in one call.
+        function blanksOf(prototype, take) {
+            function Blank() {}
+            Blank.prototype = prototype;
+            return () => take(new Blank, new Blank, new Blank, new Blank, new Blank, new Blank, new Blank, new Blank,
+                              new Blank, new Blank, new Blank, new Blank, new Blank, new Blank, new Blank, new Blank);
+        },
+        function tagGlobal(name) { define(global, toStringTag, label, name); }
+    ];
+})";
 
 JSValueRef InvalidConstructor(JSContextRef context, JSObjectRef, JSObjectRef, size_t, const JSValueRef[],
                               JSValueRef* exception) {
@@ -45,137 +93,229 @@ JSValueRef InvalidConstructor(JSContextRef context, JSObjectRef, JSObjectRef, si
     return JSObjectMake(context, nullptr, nullptr);
 }
 
-class Installer {
-  public:
-    explicit Installer(ScriptingContext& page)
-        : page_(page), context_(page.context), global_(JSContextGetGlobalObject(page.context)) {
-        JSStringRef source = JSStringCreateWithUTF8CString(kBuilders.data());
-        const JSValueRef builders = JSEvaluateScript(context_, source, nullptr, nullptr, 0, nullptr);
-        JSStringRelease(source);
-        auto* object = const_cast<JSObjectRef>(builders);
-        accessor_ = Function(object, "accessor");
-        constant_ = Function(object, "constant");
-        constructor_of_ = Function(object, "constructorOf");
-        tag_ = Function(object, "tag");
-        invalid_constructor_ = JSObjectMakeFunctionWithCallback(context_, nullptr, InvalidConstructor);
-    }
+// Where the object that holds all of a page keeps what.
+constexpr size_t kPrototypesAt = 0;
+constexpr size_t kConstructorsAt = kScriptClassCount;
+constexpr size_t kBuildersAt = 2 * kScriptClassCount;
 
-    void Run() {
-        page_.prototype_keeper = JSObjectMakeArray(context_, 0, nullptr, nullptr);
-        JSValueProtect(context_, page_.prototype_keeper);
-        for (size_t i = 0; i < kScriptClassCount; ++i) {
-            page_.prototypes[i] = JSObjectMake(context_, nullptr, nullptr);
-            JSObjectSetPropertyAtIndex(context_, page_.prototype_keeper, static_cast<unsigned>(i),
-                                       page_.prototypes[i], nullptr);
-        }
-        // Constructors need a second pass with parents first; the keeper holds them behind the prototypes,
-        // and the array on this stack keeps them for the while.
-        for (size_t i = 0; i < kScriptClassCount; ++i)
-            InstallMembers(static_cast<ScriptClass>(i));
-        for (size_t i = 0; i < kScriptClassCount; ++i)
-            ConstructorFor(static_cast<ScriptClass>(i));
-        Call(tag_, {global_, ToScriptString(context_, "Window")});
+// Arguments of a call, on the stack, where the collector sees them.
+class Arguments {
+  public:
+    explicit Arguments(JSContextRef context) : context_(context) {}
+    void Add(JSValueRef value) { values_[count_++] = value; }
+    void Add(const char* text) {
+        JSStringRef string = JSStringCreateWithUTF8CString(text);
+        Add(JSValueMakeString(context_, string));
+        JSStringRelease(string);
     }
+    void Add(double number) { Add(JSValueMakeNumber(context_, number)); }
+    // A function of that name, or undefined for a null callback.
+    void Add(JSStringRef name, JSObjectCallAsFunctionCallback callback) {
+        Add(callback ? JSObjectMakeFunctionWithCallback(context_, name, callback)
+                     : JSValueMakeUndefined(context_));
+    }
+    // Room for a few more of the same.
+    [[nodiscard]] bool IsFull() const { return count_ + 4 > kMost; }
+    [[nodiscard]] std::span<const JSValueRef> values() const { return {values_, count_}; }
+    [[nodiscard]] size_t count() const { return count_; }
+    void Set(size_t index, double number) { values_[index] = JSValueMakeNumber(context_, number); }
 
   private:
-    JSObjectRef Function(JSObjectRef object, const char* name) {
-        return const_cast<JSObjectRef>(GetProperty(context_, object, name));
-    }
+    static constexpr size_t kMost = 256;
+    JSContextRef context_;
+    size_t count_ = 0;
+    JSValueRef values_[kMost];
+};
 
-    JSValueRef Call(JSObjectRef function, std::initializer_list<JSValueRef> arguments) {
-        return CallFunction(context_, function, nullptr, {arguments.begin(), arguments.size()});
-    }
+class Installer {
+  public:
+    explicit Installer(ScriptingContext& page) : page_(page), context_(page.context) {}
 
-    JSObjectRef MakeFunction(const char* name, JSObjectCallAsFunctionCallback callback) {
-        JSStringRef text = JSStringCreateWithUTF8CString(name);
-        const JSObjectRef function = JSObjectMakeFunctionWithCallback(context_, text, callback);
-        JSStringRelease(text);
-        return function;
-    }
-
-    void DefineMembers(JSObjectRef target, const ClassDescription& description) {
-        for (const AttributeDescription& attribute : description.attributes) {
-            const JSValueRef undefined = JSValueMakeUndefined(context_);
-            const JSValueRef getter = MakeFunction(attribute.name, attribute.getter);
-            const JSValueRef setter =
-                attribute.setter ? MakeFunction(attribute.name, attribute.setter) : undefined;
-            Call(accessor_, {target, ToScriptString(context_, attribute.name), getter, setter});
-        }
-        for (const MethodDescription& method : description.methods) {
-            SetProperty(context_, target, method.name, MakeFunction(method.name, method.callback),
-                        kJSPropertyAttributeNone);
-        }
-        DefineConstants(target, description);
-    }
-
-    void DefineConstants(JSObjectRef target, const ClassDescription& description) {
-        for (const ConstantDescription& constant : description.constants) {
-            Call(constant_, {target, ToScriptString(context_, constant.name),
-                             JSValueMakeNumber(context_, constant.value)});
-        }
-    }
-
-    void InstallMembers(ScriptClass script_class) {
-        const JSObjectRef prototype = page_.prototypes[static_cast<size_t>(script_class)];
-        const ScriptClass parent = GetScriptClassRow(script_class).parent;
-        if (parent != ScriptClass::None) {
-            JSObjectSetPrototype(context_, prototype, page_.prototypes[static_cast<size_t>(parent)]);
-        }
-        const ClassDescription* description = GetClassDescription(script_class);
-        if (!description) return;
+    void Install() {
+        const ScriptEngineLock lock(context_);
+        // Without a prototype: a page can change what an array does with its entries.
+        page_.class_keeper = JSObjectMake(context_, nullptr, nullptr);
+        JSObjectSetPrototype(context_, page_.class_keeper, JSValueMakeNull(context_));
+        JSValueProtect(context_, page_.class_keeper);
+        MakeBuilders();
+        InstallNames();
         // The global object's prototype cannot be changed: what its classes have stands on itself.
-        if (IsScriptClassOrDerived(ScriptClass::Window, script_class)) DefineMembers(global_, *description);
-        if (script_class != ScriptClass::Window) DefineMembers(prototype, *description);
+        for (const ScriptClass script_class : {ScriptClass::EventTarget, ScriptClass::Window}) {
+            if (const ClassDescription* description = GetClassDescription(script_class))
+                DefineMembers(page_.global_object, *description);
+        }
+        Arguments tag(context_);
+        tag.Add(GetScriptClassRow(ScriptClass::Window).name);
+        Call(ClassBuilder::TagGlobal, tag);
     }
 
-    JSObjectRef ConstructorFor(ScriptClass script_class) {
-        JSObjectRef& made = constructors_[static_cast<size_t>(script_class)];
-        if (made || script_class == ScriptClass::None) return made;
-        const ScriptClassRow& row = GetScriptClassRow(script_class);
-        const JSObjectRef parent = ConstructorFor(row.parent);
+    // Null when script cannot run now.
+    JSObjectRef PrototypeOf(ScriptClass script_class) {
+        const auto index = static_cast<size_t>(script_class);
+        if (script_class == ScriptClass::None || !page_.class_keeper) return nullptr;
+        if (page_.prototypes[index]) return page_.prototypes[index];
+        const ScriptEngineLock lock(context_);
+        const ScriptClass parent = GetScriptClassRow(script_class).parent;
+        const JSObjectRef parent_prototype = PrototypeOf(parent);
+        if (parent != ScriptClass::None && !parent_prototype) return nullptr;
+        Arguments arguments(context_);
+        arguments.Add(parent_prototype ? parent_prototype : JSValueMakeNull(context_));
+        const JSObjectRef prototype = AsObject(context_, Call(ClassBuilder::PrototypeOf, arguments));
+        if (!prototype) return nullptr;
         const ClassDescription* description = GetClassDescription(script_class);
-        const JSValueRef construct = description && description->construct
-                                         ? MakeFunction(row.name, description->construct)
-                                         : invalid_constructor_;
-        const JSValueRef null = JSValueMakeNull(context_);
-        const bool answers_for_global = IsScriptClassOrDerived(ScriptClass::Window, script_class);
-        made = const_cast<JSObjectRef>(
-            Call(constructor_of_,
-                 {ToScriptString(context_, row.name), page_.prototypes[static_cast<size_t>(script_class)],
-                  parent ? parent : null, construct, answers_for_global ? JSValueRef{global_} : null}));
-        if (!made) return nullptr;
-        if (description) DefineConstants(made, *description);
-        if (description && !description->has_global_name) return made;
-        SetProperty(context_, global_, row.name, made, kJSPropertyAttributeDontEnum);
-        if (description && description->alias) {
-            SetProperty(context_, global_, description->alias, made, kJSPropertyAttributeDontEnum);
+        // The window's own stand on the global object.
+        const bool has_members = description && script_class != ScriptClass::Window;
+        if (has_members && !DefineMembers(prototype, *description)) return nullptr;
+        const JSObjectRef constructor = MakeConstructor(script_class, description, prototype);
+        if (!constructor) return nullptr;
+        Keep(kPrototypesAt + index, prototype);
+        Keep(kConstructorsAt + index, constructor);
+        return page_.prototypes[index] = prototype;
+    }
+
+    JSObjectRef ConstructorOf(ScriptClass script_class) {
+        if (!PrototypeOf(script_class)) return nullptr;
+        return AsObject(
+            context_,
+            JSObjectGetPropertyAtIndex(
+                context_, page_.class_keeper,
+                static_cast<unsigned>(kConstructorsAt + static_cast<size_t>(script_class)), nullptr));
+    }
+
+    [[nodiscard]] JSValueRef exception() const { return exception_; }
+
+  private:
+    // The getter of a global name: gives the constructor.
+    static JSValueRef BuildClass(JSContextRef context, JSObjectRef, JSObjectRef, size_t,
+                                 const JSValueRef arguments[], JSValueRef* exception) {
+        ScriptingContext* page = GetScriptingContext(context);
+        if (!page) return JSValueMakeUndefined(context);
+        Installer installer(*page);
+        const double index = JSValueToNumber(context, arguments[0], nullptr);
+        const JSObjectRef made = installer.ConstructorOf(static_cast<ScriptClass>(index));
+        if (!made) *exception = installer.exception();
+        return made ? made : JSValueMakeUndefined(context);
+    }
+
+    void MakeBuilders() {
+        JSStringRef source = JSStringCreateWithUTF8CString(kBuilders.data());
+        const JSObjectRef builders =
+            AsObject(context_, JSEvaluateScript(context_, source, nullptr, nullptr, 0, nullptr));
+        JSStringRelease(source);
+        for (size_t i = 0; i < page_.builders.size(); ++i) {
+            page_.builders[i] = AsObject(
+                context_, JSObjectGetPropertyAtIndex(context_, builders, static_cast<unsigned>(i), nullptr));
         }
-        return made;
+        Keep(kBuildersAt, builders);
+    }
+
+    void InstallNames() {
+        Arguments names(context_);
+        names.Add(nullptr, BuildClass);
+        for (size_t i = 0; i < kScriptClassCount; ++i) {
+            const ClassDescription* description = GetClassDescription(static_cast<ScriptClass>(i));
+            if (description && !description->has_global_name) continue;
+            names.Add(kScriptClassRows[i].name);
+            names.Add(static_cast<double>(i));
+            if (!description || !description->alias) continue;
+            names.Add(description->alias);
+            names.Add(static_cast<double>(i));
+        }
+        Call(ClassBuilder::Lazy, names);
+    }
+
+    void Keep(size_t index, JSValueRef value) {
+        JSObjectSetPropertyAtIndex(context_, page_.class_keeper, static_cast<unsigned>(index), value,
+                                   nullptr);
+    }
+
+    JSValueRef Call(ClassBuilder builder, const Arguments& arguments) {
+        const auto values = arguments.values();
+        const JSValueRef result =
+            JSObjectCallAsFunction(context_, page_.builders[static_cast<size_t>(builder)], nullptr,
+                                   values.size(), values.data(), &exception_);
+        return exception_ ? nullptr : result;
+    }
+
+    bool DefineMembers(JSObjectRef target, const ClassDescription& description) {
+        auto attribute = description.attributes.begin();
+        auto method = description.methods.begin();
+        auto constant = description.constants.begin();
+        // The largest classes take several calls.
+        while (attribute != description.attributes.end() || method != description.methods.end() ||
+               constant != description.constants.end()) {
+            Arguments arguments(context_);
+            arguments.Add(target);
+            arguments.Add(0.0);
+            arguments.Add(0.0);
+            double attributes = 0, methods = 0;
+            for (; attribute != description.attributes.end() && !arguments.IsFull();
+                 ++attribute, ++attributes) {
+                JSStringRef name = JSStringCreateWithUTF8CString(attribute->name);
+                arguments.Add(JSValueMakeString(context_, name));
+                arguments.Add(name, attribute->getter);
+                arguments.Add(name, attribute->setter);
+                JSStringRelease(name);
+            }
+            for (; method != description.methods.end() && !arguments.IsFull(); ++method, ++methods) {
+                JSStringRef name = JSStringCreateWithUTF8CString(method->name);
+                arguments.Add(JSValueMakeString(context_, name));
+                arguments.Add(name, method->callback);
+                JSStringRelease(name);
+            }
+            for (; constant != description.constants.end() && !arguments.IsFull(); ++constant) {
+                arguments.Add(constant->name);
+                arguments.Add(constant->value);
+            }
+            arguments.Set(1, attributes);
+            arguments.Set(2, methods);
+            if (!Call(ClassBuilder::Members, arguments)) return false;
+        }
+        return true;
+    }
+
+    JSObjectRef MakeConstructor(ScriptClass script_class, const ClassDescription* description,
+                                JSObjectRef prototype) {
+        const ScriptClassRow& row = GetScriptClassRow(script_class);
+        const JSObjectRef parent = ConstructorOf(row.parent);
+        const bool constructs = description && description->construct;
+        const bool answers_for_global = IsScriptClassOrDerived(ScriptClass::Window, script_class);
+        Arguments arguments(context_);
+        arguments.Add(row.name);
+        arguments.Add(prototype);
+        arguments.Add(parent ? parent : JSValueMakeNull(context_));
+        arguments.Add(nullptr, constructs ? description->construct : InvalidConstructor);
+        arguments.Add(JSValueMakeBoolean(context_, answers_for_global));
+        for (const ConstantDescription& constant :
+             description ? description->constants : std::span<const ConstantDescription>()) {
+            arguments.Add(constant.name);
+            arguments.Add(constant.value);
+        }
+        return AsObject(context_, Call(ClassBuilder::ConstructorOf, arguments));
     }
 
     ScriptingContext& page_;
     JSGlobalContextRef context_;
-    JSObjectRef global_;
-    JSObjectRef accessor_ = nullptr;
-    JSObjectRef constant_ = nullptr;
-    JSObjectRef constructor_of_ = nullptr;
-    JSObjectRef tag_ = nullptr;
-    JSObjectRef invalid_constructor_ = nullptr;
-    // Index kScriptClassCount stands for "no class" and stays null.
-    std::array<JSObjectRef, kScriptClassCount + 1> constructors_{};
+    JSValueRef exception_ = nullptr;
 };
 
 }  // namespace
 
 void InstallClasses(ScriptingContext& page) {
     // On the stack, where the collector sees the objects it holds.
-    Installer(page).Run();
+    Installer(page).Install();
+}
+
+JSObjectRef GetPrototype(ScriptingContext& page, ScriptClass script_class) {
+    if (const JSObjectRef made = page.prototypes[static_cast<size_t>(script_class)]) return made;
+    return Installer(page).PrototypeOf(script_class);
 }
 
 void UninstallClasses(ScriptingContext& page) {
-    if (page.prototype_keeper) UnprotectUnlessTeardown(page.context, page.prototype_keeper);
-    page.prototype_keeper = nullptr;
+    if (page.class_keeper) UnprotectUnlessTeardown(page.context, page.class_keeper);
+    page.class_keeper = nullptr;
     page.prototypes = {};
+    page.builders = {};
 }
 
 }  // namespace qorvex::script

@@ -122,9 +122,9 @@ enum class ScriptClass : uint8_t {
 inline constexpr size_t kScriptClassCount = static_cast<size_t>(ScriptClass::None);
 static_assert(kScriptClassCount == 95);
 
-// How an object ends when the collector finalises its wrapper. All kinds but None and StyleHolder drop the
-// wrapper's weight and then release as a native holder would; where the memory goes back to is the business
-// of the object's own operator delete, so the kinds differ only in what they document.
+// How an object ends when the collector takes its wrapper. All kinds but None and StyleHolder drop the
+// wrapper's weight and then release as a native holder would (wrapper_table.h); where the memory goes back to
+// is the business of the object's own operator delete, so the kinds differ only in what they document.
 enum class Finaliser : uint8_t {
     None,
     Weak,
@@ -152,6 +152,24 @@ inline constexpr std::array<ScriptClassRow, kScriptClassCount> kScriptClassRows 
 
 [[nodiscard]] constexpr const ScriptClassRow& GetScriptClassRow(ScriptClass script_class) {
     return kScriptClassRows[static_cast<size_t>(script_class)];
+}
+
+// Collections and maps whose properties are their items: the engine has to ask for each, so their objects are
+// of a native class (wrapper_table.h). All others are plain objects.
+[[nodiscard]] constexpr bool HasPropertyRules(ScriptClass script_class) {
+    switch (script_class) {
+        case ScriptClass::CSSStyleDeclaration:
+        case ScriptClass::StyleSheetList:
+        case ScriptClass::DOMStringMap:
+        case ScriptClass::DOMTokenList:
+        case ScriptClass::HTMLCollection:
+        case ScriptClass::NamedNodeMap:
+        case ScriptClass::NodeList:
+        case ScriptClass::TouchList:
+            return true;
+        default:
+            return false;
+    }
 }
 
 namespace internal {

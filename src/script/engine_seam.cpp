@@ -3,9 +3,11 @@
 #include <JavaScriptCore/JavaScript.h>
 #include <glib.h>
 
+#include <algorithm>
 #include <mutex>
 
 #include "core/logging/log.h"
+#include "core/memory/containers.h"
 
 namespace WTF {
 void initializeMainThread();
@@ -18,6 +20,21 @@ void JSContextGroupSetExecutionTimeLimit(JSContextGroupRef group, double seconds
 void JSContextGroupClearExecutionTimeLimit(JSContextGroupRef group);
 void JSSynchronousGarbageCollectForDebugging(JSContextRef context);
 JSObjectRef JSGetMemoryUsageStatistics(JSContextRef context);
+
+struct JSMarker {
+    bool (*IsMarked)(JSMarker*, JSObjectRef);
+    void (*Mark)(JSMarker*, JSObjectRef);
+};
+using JSMarkingConstraint = void (*)(JSMarker*, void* data);
+using JSHeapFinalizer = void (*)(JSContextGroupRef, void* data);
+void JSContextGroupAddMarkingConstraint(JSContextGroupRef group, JSMarkingConstraint constraint, void* data);
+void JSContextGroupAddHeapFinalizer(JSContextGroupRef group, JSHeapFinalizer finalizer, void* data);
+OpaqueJSWeak* JSWeakCreate(JSContextGroupRef group, JSObjectRef object);
+void JSWeakRelease(JSContextGroupRef group, OpaqueJSWeak* reference);
+JSObjectRef JSWeakGetObject(OpaqueJSWeak* reference);
+void JSReportExtraMemoryCost(JSContextRef context, size_t bytes);
+void JSLock(JSContextRef context);
+void JSUnlock(JSContextRef context);
 }
 
 namespace qorvex::script {
@@ -30,6 +47,76 @@ size_t ReadSize(JSContextRef context, JSObjectRef object, const char* name) {
         JSValueToNumber(context, JSObjectGetProperty(context, object, key, nullptr), nullptr);
     JSStringRelease(key);
     return value > 0 ? static_cast<size_t>(value) : 0;
+}
+
+// The engine has no call that takes a constraint away, so it is given a number that is looked up each time.
+struct ObserverEntry {
+    uintptr_t id;
+    IHeapObserver* observer;
+};
+
+class ObserverRegistry {
+  public:
+    uintptr_t Add(IHeapObserver& observer) {
+        const std::lock_guard lock(mutex_);
+        entries_.push_back({++last_id_, &observer});
+        return last_id_;
+    }
+    void Remove(IHeapObserver& observer) {
+        const std::lock_guard lock(mutex_);
+        for (size_t i = 0; i < entries_.size(); ++i) {
+            if (entries_[i].observer != &observer) continue;
+            entries_.erase(entries_.begin() + i);
+            break;
+        }
+        // Nothing stays allocated beyond the last library.
+        if (entries_.empty()) entries_ = {};
+    }
+    // The observer cannot go while `use` runs.
+    template <class F>
+    void With(uintptr_t id, F&& use) {
+        const std::lock_guard lock(mutex_);
+        for (const ObserverEntry& entry : entries_) {
+            if (entry.id == id) return use(*entry.observer);
+        }
+    }
+
+  private:
+    std::mutex mutex_;
+    uintptr_t last_id_ = 0;
+    Vector<ObserverEntry> entries_;
+};
+
+ObserverRegistry& GetObservers() {
+    static ObserverRegistry registry;
+    return registry;
+}
+
+// Those of this thread, for what only the script thread does.
+thread_local Vector<IHeapObserver*> t_observers;
+
+struct EngineMarker final : IHeapObserver::Marker {
+    explicit EngineMarker(JSMarker* engine_marker) : marker(engine_marker) {}
+    void Mark(JSObjectRef object) override { marker->Mark(marker, object); }
+    JSMarker* marker;
+};
+
+void OnMarking(JSMarker* marker, void* id) {
+    EngineMarker adapter(marker);
+    GetObservers().With(reinterpret_cast<uintptr_t>(id),
+                        [&](IHeapObserver& observer) { observer.MarkRoots(adapter); });
+}
+
+void OnCollection(JSContextGroupRef, void* id) {
+    IHeapObserver* found = nullptr;
+    GetObservers().With(reinterpret_cast<uintptr_t>(id), [&](IHeapObserver& observer) { found = &observer; });
+    // Not under the lock; this is the thread that would remove it.
+    if (found) found->OnCollected();
+}
+
+void SettleObservers() {
+    for (size_t i = 0; i < t_observers.size(); ++i)
+        t_observers[i]->Settle();
 }
 
 bool OnTimeLimit(JSContextRef, void*) {
@@ -48,10 +135,51 @@ void StopScriptEngine() {}
 
 void PumpScriptEngine() {
     g_main_context_iteration(nullptr, FALSE);
+    SettleObservers();
 }
 
 void CollectGarbageNow(JSContextRef context) {
+    SettleObservers();
     JSSynchronousGarbageCollectForDebugging(context);
+    SettleObservers();
+}
+
+void AddHeapObserver(JSContextGroupRef group, IHeapObserver& observer) {
+    t_observers.push_back(&observer);
+    auto* id = reinterpret_cast<void*>(GetObservers().Add(observer));
+    JSContextGroupAddMarkingConstraint(group, OnMarking, id);
+    JSContextGroupAddHeapFinalizer(group, OnCollection, id);
+}
+
+void RemoveHeapObserver(IHeapObserver& observer) {
+    for (size_t i = 0; i < t_observers.size(); ++i) {
+        if (t_observers[i] != &observer) continue;
+        t_observers.erase(t_observers.begin() + i);
+        break;
+    }
+    if (t_observers.empty()) t_observers = {};
+    GetObservers().Remove(observer);
+}
+
+ScriptWeakRef MakeWeakReference(JSContextGroupRef group, JSObjectRef object) {
+    return JSWeakCreate(group, object);
+}
+void ReleaseWeakReference(JSContextGroupRef group, ScriptWeakRef reference) {
+    JSWeakRelease(group, reference);
+}
+JSObjectRef GetWeakObject(ScriptWeakRef reference) {
+    return JSWeakGetObject(reference);
+}
+
+ScriptEngineLock::ScriptEngineLock(JSContextRef context) : context_(context) {
+    JSLock(context_);
+}
+ScriptEngineLock::~ScriptEngineLock() {
+    JSUnlock(context_);
+}
+
+void ReportNativeMemory(JSContextRef context, size_t bytes) {
+    JSReportExtraMemoryCost(context, bytes);
 }
 
 ScriptEngineMemory GetScriptEngineMemory(JSContextRef context) {

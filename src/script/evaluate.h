@@ -33,7 +33,7 @@ JSValueRef CallFunction(JSContextRef context, JSObjectRef function, JSObjectRef 
 // UTF-8 text as a script string. Text ends at its first NUL.
 [[nodiscard]] JSValueRef ToScriptString(JSContextRef context, std::string_view text);
 
-// Property of an object by a name that is used once; see script/property_names.h for kept names.
+// Property of an object by name.
 [[nodiscard]] JSValueRef GetProperty(JSContextRef context, JSObjectRef object, std::string_view name);
 void SetProperty(JSContextRef context, JSObjectRef object, std::string_view name, JSValueRef value,
                  JSPropertyAttributes attributes);

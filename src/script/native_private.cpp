@@ -4,9 +4,11 @@
 
 namespace qorvex::script {
 
-NativePrivate PrivateOfGlobal(JSContextRef context, JSObjectRef object) {
+NativePrivate FindWrapped(JSContextRef context, JSObjectRef object) {
     const ScriptingContext* page = GetScriptingContext(context);
-    if (!page || !page->global_handle || object != page->global_object) return {};
+    if (!page) return {};
+    if (const void* packed = page->wrappers.Find(object)) return UnpackPrivate(packed);
+    if (!page->global_handle || object != page->global_object) return {};
     return {page->global_handle, ScriptClass::Window, true};
 }
 

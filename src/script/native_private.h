@@ -1,11 +1,10 @@
-// What the private pointer of a script object says.
+// From a script object to the native one behind it.
 //
-// JavaScriptCore hands a callback any object as `this`, and the private of any object to whoever asks. Asking
-// the engine for an object's class costs about as much as the whole call (110 ns against 112 for a bare
-// callback with a chain of five classes), so the answer travels in the pointer itself: the address takes 48
-// bits, a marker, the class and the kind of count the rest. Memory is touched only after marker and class
-// fit, hence a method borrowed from another class, an object of the client's own class or a null private are
-// told apart without a crash.
+// Any object can come as `this` or as an argument. Wrappers are found in the page's table (wrapper_table.h),
+// so a method borrowed by a foreign object meets nothing and memory is touched only when the class fits.
+// Objects of the few classes with property rules carry the same answer in their private pointer, where the
+// engine's own callbacks need it: the address takes 48 bits, a marker, the class and the kind of count the
+// rest; an object of the client's own class and a null private are told apart by them.
 #pragma once
 
 #include <JavaScriptCore/JavaScript.h>
@@ -55,15 +54,8 @@ inline constexpr uint64_t kPrivateAddress = (uint64_t{1} << kWeakShift) - 1;
             ((packed >> kWeakShift) & 1) != 0};
 }
 
-// For an object without a private: the page's window when the object is the global object, which is not of a
-// bound class (see class_installation.h).
-[[nodiscard]] NativePrivate PrivateOfGlobal(JSContextRef context, JSObjectRef object);
-
-[[nodiscard]] inline NativePrivate PrivateOf(JSContextRef context, JSObjectRef object) {
-    if (!object) return {};
-    const void* value = JSObjectGetPrivate(object);
-    return value ? UnpackPrivate(value) : PrivateOfGlobal(context, object);
-}
+// The native behind a plain wrapper, or behind the global object, which is none; null for others.
+[[nodiscard]] NativePrivate FindWrapped(JSContextRef context, JSObjectRef object);
 
 // The object of a value that is one, else null. In this engine an object's value is its reference; asking
 // JSValueToObject for the same pointer would cost a lock.
@@ -74,7 +66,13 @@ inline constexpr uint64_t kPrivateAddress = (uint64_t{1} << kWeakShift) - 1;
 // The native object of class T behind a script object; null for every other object.
 template <class T>
 [[nodiscard]] T* NativeOf(JSContextRef context, JSObjectRef object) {
-    const NativePrivate found = PrivateOf(context, object);
+    if (!object) return nullptr;
+    NativePrivate found;
+    if constexpr (HasPropertyRules(T::kScriptClass)) {
+        found = UnpackPrivate(JSObjectGetPrivate(object));
+    } else {
+        found = FindWrapped(context, object);
+    }
     if (!found.object || !IsScriptClassOrDerived(found.script_class, T::kScriptClass)) return nullptr;
     if constexpr (std::is_base_of_v<ScriptingHandleEnabled, T>) {
         return static_cast<T*>(static_cast<ScriptingHandleEnabled*>(found.object));

@@ -40,9 +40,11 @@ void RegisterScriptingContext(ScriptingContext& context) {
     context.global_object = JSContextGetGlobalObject(context.context);
     context.next = t_contexts;
     t_contexts = &context;
+    context.wrappers.Start(context);
 }
 
 void UnregisterScriptingContext(ScriptingContext& context) {
+    context.wrappers.Stop();
     for (ScriptingContext** link = &t_contexts; *link; link = &(*link)->next) {
         if (*link != &context) continue;
         *link = context.next;

@@ -11,6 +11,7 @@
 #include <string_view>
 
 #include "script/class_table.h"
+#include "script/wrapper_table.h"
 
 namespace qorvex::dom {
 class Window;
@@ -19,6 +20,10 @@ class Window;
 namespace qorvex::script {
 
 class ScriptingHandleEnabled;
+
+// The script functions that make classes.
+enum class ClassBuilder : uint8_t { Lazy, PrototypeOf, Members, ConstructorOf, BlanksOf, TagGlobal };
+inline constexpr size_t kClassBuilderCount = 6;
 
 struct ScriptingContext {
     // Error raised by native code that has no exception out-parameter at hand; protected while it stands
@@ -30,15 +35,17 @@ struct ScriptingContext {
     // The global object, and the window as the handle that calls on it act on.
     JSObjectRef global_object = nullptr;
     ScriptingHandleEnabled* global_handle = nullptr;
-    // The prototype of each class in this context, all held by `prototype_keeper`.
+    // What has been made of the bound classes (class_installation.h), all held by `class_keeper`.
     std::array<JSObjectRef, kScriptClassCount> prototypes{};
-    JSObjectRef prototype_keeper = nullptr;
+    std::array<JSObjectRef, kClassBuilderCount> builders{};
+    JSObjectRef class_keeper = nullptr;
+    WrapperTable wrappers;
     // Chain of the thread's contexts, see GetScriptingContext.
     ScriptingContext* next = nullptr;
 };
 
-// Puts a context whose `context` field is set among those that GetScriptingContext finds, or takes it out.
-// To be called on the context's own thread.
+// Puts a context whose `context` field is set among those that GetScriptingContext finds, or takes it out,
+// which parts all wrappers from their natives. To be called on the context's own thread.
 void RegisterScriptingContext(ScriptingContext& context);
 void UnregisterScriptingContext(ScriptingContext& context);
 

@@ -1,7 +1,5 @@
 #include "script/scripting_handle_enabled.h"
 
-#include <JavaScriptCore/JavaScript.h>
-
 #include <new>
 
 #include "core/memory/allocator.h"
@@ -21,22 +19,21 @@ void ScriptingHandleEnabled::operator delete(void* memory) {
 }
 
 void ScriptingHandleEnabled::ReleaseWrapper() {
-    if (wrapper_) UnprotectUnlessTeardown(wrapper_context_, wrapper_);
+    if (!wrapper_ || IsScriptContextTeardown()) return;
+    if (ScriptingContext* page = GetScriptingContext(wrapper_context_)) page->wrappers.LetGo(wrapper_);
 }
 
-void ScriptingHandleEnabled::ProtectWrapper() {
-    JSValueProtect(wrapper_context_, wrapper_);
+void ScriptingHandleEnabled::HoldWrapper() {
+    if (IsScriptContextTeardown()) return;
+    if (ScriptingContext* page = GetScriptingContext(wrapper_context_)) page->wrappers.Hold(wrapper_);
 }
 
 bool ScriptingHandleEnabled::MakeWrapper(ScriptClass script_class, bool has_weak, JSContextRef context) {
-    JSClassRef engine_class = GetScriptClassTable()[script_class];
-    if (!engine_class) return false;
-    const ScriptingContext* page = GetScriptingContext(context);
-    if (!wrapper_context_) wrapper_context_ = GetGlobalContext(context);
-    wrapper_ = JSObjectMake(wrapper_context_, engine_class, PackPrivate(this, script_class, has_weak));
-    // The classes have no prototypes of their own, see prototypes.h.
-    const JSObjectRef prototype = page ? page->prototypes[static_cast<size_t>(script_class)] : nullptr;
-    if (prototype) JSObjectSetPrototype(wrapper_context_, wrapper_, prototype);
+    ScriptingContext* page = GetScriptingContext(context);
+    if (!page) return false;
+    wrapper_ = page->wrappers.Add(script_class, PackPrivate(this, script_class, has_weak));
+    if (!wrapper_) return false;
+    wrapper_context_ = page->context;
     return true;
 }
 

@@ -3,8 +3,9 @@
 // count = 2 x native references + wrapper bit:
 //   0  dead                       1  only the wrapper is left, the collector decides
 //   2  one native holder          3  one native holder and a wrapper
-// Invariant: a wrapper exists at most once per object, and it is protected from the collector exactly while
-// count >= 3. So each side keeps the other alive as long as somebody outside needs it, and no longer.
+// Invariant: a wrapper exists at most once per object, and the collector must keep it exactly while count >=
+// 3 (wrapper_table.h). So each side keeps the other alive as long as somebody outside needs it, and no
+// longer.
 //
 // Objects are used only on the thread that runs the view's script, so the count is a plain integer; the weak
 // control block is atomic because a weak pointer may be dropped by another thread's clean-up.
@@ -51,8 +52,8 @@ class ScriptingHandleEnabled {
     static void operator delete(void* memory);
 
   protected:
-    void ProtectWrapper();
-    // Makes the wrapper unless there is one; true when it was made by this call.
+    void HoldWrapper();
+    // True when it was made.
     bool MakeWrapper(ScriptClass script_class, bool has_weak, JSContextRef context);
 
     JSObjectRef wrapper_ = nullptr;
@@ -140,7 +141,7 @@ template <class T, class Counter, class WeakPolicy, class NotificationPolicy>
 class ReferenceCounted : public ScriptingHandleEnabled, protected WeakPolicy, protected Counter {
   public:
     void AddRef() {
-        if (Counter::AddNative() == 3 && wrapper_) ProtectWrapper();
+        if (Counter::AddNative() == 3 && wrapper_) HoldWrapper();
     }
 
     void Release() {
@@ -158,14 +159,13 @@ class ReferenceCounted : public ScriptingHandleEnabled, protected WeakPolicy, pr
         delete this;
     }
 
-    // The collector has finalised the wrapper: the object goes on only if native holders are left, which can
-    // be so only while a context is torn down.
-    void FinaliseWrapper() {
+    // The wrapper is gone. What it weighed is now one native reference, which the caller releases.
+    void DetachWrapper() {
         Counter::TurnWrapperIntoNative();
         wrapper_ = nullptr;
         wrapper_context_ = nullptr;
-        Release();
     }
+    [[nodiscard]] bool IsHeldByWrapperOnly() const { return Counter::value() == 1; }
 
     // 2 x native references + wrapper bit.
     [[nodiscard]] uint32_t reference_count() const { return Counter::value(); }
@@ -174,7 +174,6 @@ class ReferenceCounted : public ScriptingHandleEnabled, protected WeakPolicy, pr
     void WrapAs(ScriptClass script_class, JSContextRef context, JSValueRef* out) {
         if (!wrapper_ && !Counter::IsDying() && MakeWrapper(script_class, WeakPolicy::kHasWeak, context)) {
             Counter::AddWrapper();
-            ProtectWrapper();
         }
         *out = wrapper_;
     }

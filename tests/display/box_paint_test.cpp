@@ -11,7 +11,7 @@ constexpr const char* kBox = "position: absolute; left: 100px; top: 50px; width:
 
 TEST_F(BoxPaintTest, BackgroundsAndBorders) {
     LayoutHandle* box = page.Add(page.body, kBox);
-    const css::LayoutStyleRefs plain = box->data().style;
+    const css::LaidOutStyle plain = box->data().style;
     struct Case {
         const char* style;
         const char* records;
@@ -59,6 +59,15 @@ TEST_F(BoxPaintTest, RoundBordersOfSeveralColoursClipEachSide) {
     EXPECT_EQ(CountOf(lines, "ClipQuad"), 4u);
     EXPECT_EQ(CountOf(lines, "StrokeRoundedRect"), 4u);
     EXPECT_EQ(CountOf(lines, "PushState"), CountOf(lines, "PopState"));
+}
+
+TEST_F(BoxPaintTest, RoundBordersKeepTheColoursOfSidesThatDoNotMeet) {
+    LayoutHandle* box = page.Add(page.body, kBox);
+    page.Change(box, "border-top: 2px solid red; border-bottom: 4px solid blue; border-radius: 10px");
+    const auto lines = Frame();
+    EXPECT_EQ(CountOf(lines, "ClipQuad"), 2u);
+    EXPECT_EQ(CountOf(lines, "FillPath #ff0000ff"), 1u);
+    EXPECT_EQ(CountOf(lines, "FillPath #0000ffff"), 1u);
 }
 
 TEST_F(BoxPaintTest, EqualShadowsShareOneSurface) {

@@ -66,7 +66,7 @@ TEST_F(RecordTest, ScissorsAreTheDirtyRectangles) {
 TEST_F(RecordTest, LayersOpenOnlyWhereAsked) {
     LayoutHandle* box = page.Add(page.body, "width: 10px; height: 10px; background-color: red");
     page.Add(box, "width: 5px; height: 5px; background-color: blue");
-    const css::LayoutStyleRefs plain = box->data().style;
+    const css::LaidOutStyle plain = box->data().style;
     struct Case {
         const char* style;
         const char* layer;

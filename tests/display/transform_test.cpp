@@ -15,7 +15,7 @@ using layout::Rect;
 using TransformTest = LayoutTest;
 
 Rect Mapped(const LayoutHandle* handle) {
-    return layout::MapBounds(handle->node().world, handle->node().box);
+    return layout::MapBounds(handle->node().world.Get(), handle->node().box);
 }
 
 void ExpectRect(const Rect& rect, float x, float y, float width, float height) {
@@ -164,7 +164,7 @@ TEST_F(TransformTest, StackingContexts) {
         {"overflow: hidden", false, 0},
         {"position: relative", false, 0},
     };
-    const css::LayoutStyleRefs plain = box->data().style;
+    const css::LaidOutStyle plain = box->data().style;
     for (const Case& c : cases) {
         page.tree.UpdateStyle(*box, plain);
         page.Change(box, c.style);
@@ -201,6 +201,11 @@ struct Twin {
         fast.tree.Remove(*fastNodes[node], nullptr);
         slow.tree.Remove(*slowNodes[node], nullptr);
     }
+    // A node that was removed comes back somewhere else, alone.
+    void Attach(size_t node, size_t parent, uint32_t index) {
+        fast.tree.Attach(*fastNodes[node], *fastNodes[parent], index);
+        slow.tree.Attach(*slowNodes[node], *slowNodes[parent], index);
+    }
     void Frame(LayoutWork work) {
         fast.Frame(work);
         slow.Frame(work);
@@ -216,8 +221,9 @@ std::string Describe(const LayoutHandle* handle) {
         return std::string(part);
     };
     std::snprintf(text, sizeof(text), " scroll %g %g %g %g z %d %d world %g %g %g %g %g %g", n.scroll.x,
-                  n.scroll.y, n.scrollSize.width, n.scrollSize.height, n.zIndex, n.establishesStackingContext,
-                  n.world.m[0], n.world.m[1], n.world.m[4], n.world.m[5], n.world.m[12], n.world.m[13]);
+                  n.scroll.y, n.ScrollSize().width, n.ScrollSize().height, n.zIndex,
+                  n.establishesStackingContext, n.world.Get().m[0], n.world.Get().m[1], n.world.Get().m[4],
+                  n.world.Get().m[5], n.world.Get().m[12], n.world.Get().m[13]);
     return BoxOf(handle) + r(n.box) + r(n.aabb) + r(n.paintBounds) + r(n.visualAabb) + text;
 }
 
@@ -260,11 +266,18 @@ TEST_F(TransformTest, IncrementalPassesEqualFullOnesUnderRandomChanges) {
     Twin twin;
     std::vector<bool> gone(1, false);
     auto pick = [&](size_t count) { return static_cast<size_t>(random() % count); };
-    for (int step = 0; step < 250; ++step) {
+    bool simple = false;
+    for (int step = 0; step < 400; ++step) {
         const size_t edits = 1 + pick(4);
         for (size_t edit = 0; edit < edits; ++edit) {
             const size_t node = pick(twin.fastNodes.size());
-            if (gone[node] || !twin.fastNodes[node]->data().inTree) continue;
+            if (gone[node] || !twin.fastNodes[node]->data().inTree) {
+                const size_t parent = pick(twin.fastNodes.size());
+                if (!twin.fastNodes[parent]->data().inTree || pick(3) != 0) continue;
+                twin.Attach(node, parent, 0);
+                gone[node] = false;
+                continue;
+            }
             const uint32_t children = twin.fastNodes[node]->data().children.size();
             switch (pick(twin.fastNodes.size() < 60 ? 3 : 8)) {
                 case 0:
@@ -291,8 +304,12 @@ TEST_F(TransformTest, IncrementalPassesEqualFullOnesUnderRandomChanges) {
                     break;
             }
         }
+        // Now and then the other engine takes over, and Yoga's nodes come and go.
+        // That engine leaves the boxes around a changed one alone, and so does not end where a full layout
+        // does.
+        if (pick(25) == 0) twin.Change(0, (simple = !simple) ? "display: simple" : "display: block");
         twin.Frame(LayoutWork::Layout);
-        for (size_t i = 0; i < twin.fastNodes.size(); ++i) {
+        for (size_t i = 0; i < twin.fastNodes.size() && !simple; ++i) {
             if (!twin.fastNodes[i]->data().inTree) continue;
             ASSERT_EQ(Describe(twin.fastNodes[i]), Describe(twin.slowNodes[i]))
                 << "step " << step << " node " << i;

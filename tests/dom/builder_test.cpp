@@ -254,6 +254,30 @@ TEST_F(BuilderTest, ManyAttributesAndLongTexts) {
     EXPECT_EQ(Find("a").GetTextContent().size(), size_t{10} << 20);
 }
 
+// The parser compares each attribute of a tag with all before it.
+TEST_F(BuilderTest, AttributesBeyondTheBoundAreLeftOut) {
+    std::string page = "<p id=before>x</p><p id=a title='a > b'";
+    for (int i = 0; i < 60000; ++i)
+        page += i % 2 ? " a" + std::to_string(i) + "='" + std::to_string(i) + "'" : " b" + std::to_string(i);
+    Load(page + "/>text</p><p id=after>y</p>");
+    EXPECT_EQ(log_.Count("HTML has a tag of more than 8192 attributes; the others are left out"), 1u);
+    EXPECT_EQ(Find("a").GetAttributeCount(), 8192u);
+    EXPECT_EQ(Find("a").GetAttribute("title")->view(), "a > b");
+    EXPECT_EQ(Find("a").GetAttribute("a8189")->view(), "8189");
+    EXPECT_FALSE(Find("a").HasAttribute("b8190"));
+    EXPECT_EQ(document_->GetTextContent().view(), "xtexty");
+}
+
+// Tables and formatting elements move what they hold, so that the tree is flat while the source is not.
+TEST_F(BuilderTest, SourceThatIsCutIsReportedOnceHoweverTheTreeLooks) {
+    std::string page;
+    for (int i = 0; i < 12000; ++i)
+        page += "<b><span><table><div>";
+    Load(page + "<p id=last>text");
+    EXPECT_EQ(log_.Count("HTML nests deeper than 512 levels"), 1u);
+    EXPECT_EQ(Find("last").GetTextContent().view(), "text");
+}
+
 TEST_F(BuilderTest, ParsedPagesAreSharedAndGiveTheirSourceBack) {
     int released = 0;
     const std::string_view page = "<my-page>x</my-page>";

@@ -31,6 +31,24 @@ class EventTest : public DomTest {
     std::string trace_;
 };
 
+TEST_F(EventTest, EventsOfABusyFrameAllocateNothing) {
+    LoadEmpty();
+    Note(Body(), "body", false);
+    trace_.reserve(4096);
+    const auto round = [&] {
+        std::vector<RefPtr<Event>> kept;
+        kept.reserve(40);
+        for (int i = 0; i < 40; ++i) {
+            Ping(Body());
+            kept.push_back(script::MakeHandle<UIEvent>(document_.get(), Atom(), true, true));
+        }
+    };
+    round();
+    const uint64_t before = allocator_.Allocations();
+    round();
+    EXPECT_EQ(allocator_.Allocations(), before);
+}
+
 TEST_F(EventTest, CaptureTargetBubble) {
     Load("<div id=a><p id=b></p></div>");
     Element &a = Find("a"), &b = Find("b");

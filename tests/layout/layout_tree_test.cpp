@@ -146,12 +146,12 @@ TEST_F(LayoutTreeTest, ScrollPositionIsClampedWhenContentShrinks) {
     page.tree.SetScroll(*scroller, {0, 300});
     page.Frame();
     EXPECT_EQ(scroller->data().scroll.y, 300);
-    EXPECT_EQ(content->node().world.m[13], -300);
+    EXPECT_EQ(content->node().world.Get().m[13], -300);
     EXPECT_EQ(scroller->data().result.scrollSize.height, 500);
     page.Change(content, "height: 250px");
     page.Frame();
     EXPECT_EQ(scroller->data().scroll.y, 150);
-    EXPECT_EQ(content->node().world.m[13], -150);
+    EXPECT_EQ(content->node().world.Get().m[13], -150);
     page.tree.SetScroll(*scroller, {std::nanf(""), -5});
     page.Frame();
     EXPECT_EQ(scroller->data().scroll.x, 0);

@@ -116,7 +116,8 @@ class Page {
     }
     // Adds declarations to the style that the handle has.
     void Change(layout::LayoutHandle* handle, std::string_view style) {
-        css::LayoutStyleRefs changed = handle->data().style;
+        css::LayoutStyleRefs changed = css::DefaultStyles();
+        static_cast<css::LaidOutStyle&>(changed) = handle->data().style;
         changed.written.fill(0);
         ApplyDeclarations(changed, style);
         tree.UpdateStyle(*handle, changed);

@@ -20,8 +20,8 @@ TEST_F(SimpleLayoutTest, ChildrenOverlapAndAutoSizesAddUp) {
     EXPECT_EQ(BoxOf(a), "5 5 10 20");
     EXPECT_EQ(BoxOf(b), "5 5 30 40");
     EXPECT_EQ(BoxOf(box), "0 0 50 70");
-    EXPECT_EQ(b->data().result.margin.left, 9);
-    EXPECT_EQ(box->data().result.margin.left, 0);
+    EXPECT_EQ(b->data().result.edges.margin().left, 9);
+    EXPECT_EQ(box->data().result.edges.margin().left, 0);
     EXPECT_EQ(out->data().result.width, 500);
 }
 
@@ -67,6 +67,27 @@ TEST_F(SimpleLayoutTest, FlexElementsGetTheirOwnRun) {
     page.Frame();
     EXPECT_EQ(BoxOf(b), "125 54 20 30");
     EXPECT_EQ(row->data().result.width, 35);
+}
+
+// Yoga's nodes are most of what a handle costs.
+TEST_F(SimpleLayoutTest, OnlyFlexPartsHaveYogaNodes) {
+    LayoutHandle* row = page.Add(page.body, "display: flex");
+    LayoutHandle* a = page.Add(row, "width: 10px; height: 10px");
+    LayoutHandle* plain = page.Add(page.body, "width: 10px; height: 10px");
+    page.Frame();
+    EXPECT_TRUE(row->node().flex && a->node().flex);
+    EXPECT_FALSE(plain->node().flex || page.body->node().flex);
+    page.Change(row, "display: block");
+    page.Frame();
+    EXPECT_FALSE(row->node().flex || a->node().flex);
+    // What changed while Yoga did not know the part is not lost.
+    page.Change(a, "width: 12px");
+    page.Frame();
+    page.Change(row, "display: flex");
+    LayoutHandle* b = page.Add(row, "width: 20px; height: 30px");
+    page.Frame();
+    EXPECT_EQ(BoxOf(a), "0 0 12 10");
+    EXPECT_EQ(BoxOf(b), "12 0 20 30");
 }
 
 TEST_F(SimpleLayoutTest, MeasuredLeavesHaveNoAvailableSize) {

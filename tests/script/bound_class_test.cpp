@@ -106,6 +106,49 @@ TEST_F(BoundClass, PrototypesChainAsTheClassesDo) {
               "8");
 }
 
+// Classes are made when they are first used: after the page has run, and whatever it has done to the
+// language.
+TEST_F(BoundClass, ClassesThatAreMadeLateAreTheSame) {
+    EXPECT_EQ(page_.prototypes[static_cast<size_t>(ScriptClass::HTMLVideoElement)], nullptr);
+    EXPECT_EQ(Run("Object.keys(globalThis).includes('Node') + ' ' + ('HTMLVideoElement' in globalThis)"),
+              "false true");
+    EXPECT_EQ(page_.prototypes[static_cast<size_t>(ScriptClass::HTMLVideoElement)], nullptr);
+    Run("Object.defineProperty = Object.create = Object.setPrototypeOf = Reflect.apply = null;"
+        "Object.prototype.get = Object.prototype.set = Object.prototype.value = 'page';"
+        "Object.prototype.writable = false;"
+        "for (const i of [0, 5, 94, 95, 189, 200]) "
+        "    Array.prototype.__defineSetter__(i, () => { throw 'entered the page'; }); 0");
+    EXPECT_EQ(
+        Run("[HTMLVideoElement === HTMLVideoElement, new (class { static x = HTMLVideoElement.name }) !== 0,"
+            " HTMLVideoElement.prototype.constructor === HTMLVideoElement,"
+            " Object.prototype.toString.call(HTMLVideoElement.prototype)].join()"),
+        "true,true,true,[object HTMLVideoElement]");
+    const auto node = MakeHandle<TestNode>(counts_);
+    SetGlobal("late", node.get());
+    Collect();
+    EXPECT_EQ(Run("late.sum(1, 2) + Node.ELEMENT_NODE + (globalThis instanceof EventTarget)"), "5");
+}
+
+TEST_F(BoundClass, APageMayTakeTheNameOfAClass) {
+    EXPECT_EQ(Run("Event = 5; Event"), "5");
+    EXPECT_EQ(Run("var Screen = 6; Screen"), "6");
+    EXPECT_EQ(Run("function Touch() { return 7; } Touch()"), "7");
+    EXPECT_EQ(Run("delete globalThis.Selection; typeof Selection"), "undefined");
+    EXPECT_EQ(Run("const d = Object.getOwnPropertyDescriptor(globalThis, 'Event'); [d.value, d.enumerable]"),
+              "5,false");
+}
+
+// What cannot be made on a full stack is made later, whole.
+TEST_F(BoundClass, AClassFirstNamedOnAFullStackIsNotHalfMade) {
+    Run("let depth = 0; (function f() { ++depth; try { f(); } catch (e) { try { HTMLVideoElement; } catch "
+        "(e) {} } })();"
+        "0");
+    EXPECT_EQ(Run("Object.getPrototypeOf(HTMLVideoElement.prototype) === HTMLMediaElement.prototype"),
+              "true");
+    EXPECT_EQ(Run("typeof Node.prototype.sum + Node.prototype.TEXT_NODE + typeof HTMLMediaElement"),
+              "function3function");
+}
+
 TEST_F(BoundClass, ConstructorsWithoutAConstructorRefuse) {
     EXPECT_EQ(Run("new Node()"), "throws Error: Invalid constructor!");
     EXPECT_EQ(Run("Element()"), "throws Error: Invalid constructor!");

@@ -132,6 +132,73 @@ TEST_F(WrapperLife, ADestructorMayTouchItsOwnCount) {
     EXPECT_EQ(destroyed, 1);
 }
 
+TEST_F(WrapperLife, AHolderThatComesBackKeepsTheSameWrapper) {
+    auto node = MakeHandle<TestNode>(counts_);
+    SetGlobal("node", node.get());
+    Run("globalThis.seen = new WeakMap([[node, 'seen']]); node.mine = 3; 0");
+    for (int i = 0; i < 3; ++i) {
+        WeakHandle<TestNode> weak(node.get());
+        node.reset();
+        Collect();  // script alone holds it
+        node = qsl::RefPtr<TestNode>(weak.get());
+        ASSERT_TRUE(node);
+        Run("delete globalThis.node; 0");
+        Collect();  // native code alone holds it
+        SetGlobal("node", node.get());
+        EXPECT_EQ(Run("node.mine + seen.get(node)"), "3seen");
+    }
+    EXPECT_EQ(counts_.destroyed, 0);
+}
+
+// Objects in all states while the collector runs as it likes: new, held, let go, taken back, shared by
+// script.
+TEST_F(WrapperLife, ChurnUnderTheCollectorLosesNothing) {
+    std::vector<qsl::RefPtr<TestNode>> held;
+    int made = 0;
+    Run("globalThis.kept = []; globalThis.churn = function() { let a = [];"
+        "for (let i = 0; i < 3000; ++i) a.push({ i }); }; 0");
+    for (int round = 0; round < 150; ++round) {
+        for (int i = 0; i < 40; ++i, ++made) {
+            auto node = MakeHandle<TestNode>(counts_);
+            node->SetNumber(made);
+            SetGlobal("node", node.get());
+            Run("node.copy = node.number; if (node.number % 7 === 0) kept.push(node);");
+            if (made % 3 == 0) held.push_back(std::move(node));
+        }
+        Run("churn()");
+        if (round % 5 == 4) held.erase(held.begin(), held.begin() + static_cast<long>(held.size() / 2));
+        if (round % 10 == 9) PumpScriptEngine();
+    }
+    for (const auto& node : held) {
+        SetGlobal("node", node.get());
+        ASSERT_EQ(Run("node.copy === node.number && node.number"), std::to_string(int(node->GetNumber())));
+    }
+    EXPECT_EQ(Run("kept.every((node, i) => node.number === i * 7 && node.copy === node.number)"), "true");
+    Run("kept = null; delete globalThis.node");
+    held.clear();
+    Collect();
+    EXPECT_GE(counts_.destroyed, made - 50);
+    DestroyContext();
+    EXPECT_EQ(counts_.destroyed, made);
+    EXPECT_EQ(counts_.notified, made);
+}
+
+TEST_F(WrapperLife, ScriptThatMakesObjectsWithoutEndKeepsNoneOfThem) {
+    SetGlobal("node", MakeHandle<TestNode>(counts_).get());
+    RunBody("for (let i = 0; i < 300000; ++i) node.make();");
+    EXPECT_GE(counts_.destroyed, 250000);
+}
+
+// Where no script can run (the stack is used up) a wrapper still comes, with its class.
+TEST_F(WrapperLife, WrappersComeWhereScriptCannotRun) {
+    SetGlobal("node", MakeHandle<TestElement>(counts_).get());
+    EXPECT_EQ(Run("let made = [];"
+                  "(function f() { try { f(); } catch (e) { for (let i = 0; i < 40; ++i) "
+                  "made.push(node.make()); } })();"
+                  "made.length >= 40 && made.every(m => m instanceof Node && m.make)"),
+              "true");
+}
+
 TEST_F(WrapperLife, WeakHandlesCopyMoveAndOutlive) {
     auto node = MakeHandle<TestNode>(counts_);
     WeakHandle<TestNode> first(node.get());

@@ -3,7 +3,7 @@
 #include "core/logging/log.h"
 #include "core/memory/thread_scope.h"
 #include "core/view_impl.h"
-#include "css/values/value_text.h"
+#include "css/style/computed_serializer.h"
 #include "dom/style_engine.h"
 #include "resources/resource_context.h"
 #include "resources/url_key.h"
@@ -76,10 +76,8 @@ bool DebugInterface::VisitComputedStyle(View* view, const char* selector, StyleC
     css::CssString value;
     for (size_t i = 0; i < css::kLonghandCount; ++i) {
         const auto id = static_cast<css::PropertyId>(i);
-        const void* field = element->GetStyle().Field(id);
-        if (!field) continue;
         value.clear();
-        css::SerialiseValue(id, field, value);
+        css::SerialiseComputed(id, element->GetStyle(), value);
         callback(user_data, String(css::PropertyName(id)).c_str(), value.c_str());
     }
     return true;

@@ -11,7 +11,8 @@
 
 namespace qorvex {
 class StringPool;
-}
+class URL;
+}  // namespace qorvex
 
 namespace qorvex::css {
 
@@ -41,6 +42,10 @@ namespace qorvex::css {
 // As above, but a shorthand gives all of its longhands. False, with nothing appended, when it does not parse.
 [[nodiscard]] bool MakeDeclarations(PropertyId property, std::string_view valueText, StringPool& strings,
                                     uint8_t flags, CssVector<Declaration>& out);
+
+// Makes relative image URLs of a value absolute; a base that is not valid leaves them as written. Conversion
+// does it for sheets and style attributes, who makes a declaration otherwise calls this.
+void ResolveImageUrls(Declaration& declaration, const URL& base);
 
 // Calls visit(url) for each image URL in the declaration's value.
 void ForEachImageUrl(const Declaration& declaration, void (*visit)(std::string_view url, void* user),

@@ -20,7 +20,7 @@ std::string_view WithoutQuotes(std::string_view text) {
 // The first url( ) in the text, wherever it stands.
 bool ConvertFontSource(std::string_view text, CssString& url) {
     if (text.find("local(") != std::string_view::npos) {
-        LogDebug("Skipping local() in src string for @font-face ", text, " as it is not supported");
+        LogWarning("Skipping local() in src string for @font-face ", text, " as it is not supported");
     }
     size_t start = text.find("url(");
     if (start != std::string_view::npos) {
@@ -55,9 +55,30 @@ void ConvertFontWeight(std::string_view text, int32_t& weight) {
 
 }  // namespace
 
+namespace {
+
+// A descriptor holds a plain value: there is no element that a variable or a parent could belong to.
+bool IsPlainDescriptor(const DeclarationSyntax& descriptor) {
+    static constexpr std::string_view kNames[] = {"font-family", "font-weight", "font-style", "src"};
+    std::string_view what = descriptor.value;
+    if (descriptor.flags & (kHasVar | kHasCalc)) {
+        what = "custom expression";
+    } else if (EqualsIgnoreCase(descriptor.value, "inherit")) {
+        what = "inherited";
+    } else if (std::find(std::begin(kNames), std::end(kNames), descriptor.name) != std::end(kNames)) {
+        return true;
+    }
+    LogDebug("Ignoring @font-face property declaration '", descriptor.name, "' containing ", what);
+    return false;
+}
+
+}  // namespace
+
 std::optional<FontFace> ConvertFontFace(const FontFaceSyntax& syntax, ConversionContext& context) {
     FontFace face;
+    bool hasSource = false;
     for (const DeclarationSyntax& descriptor : syntax.declarations) {
+        if (!IsPlainDescriptor(descriptor)) continue;
         if (descriptor.name == "font-family") {
             face.family = WithoutQuotes(descriptor.value);
         } else if (descriptor.name == "font-weight") {
@@ -66,10 +87,13 @@ std::optional<FontFace> ConvertFontFace(const FontFaceSyntax& syntax, Conversion
             if (!Parse(descriptor.value, face.style)) face.style = FontStyle::Normal;
         } else if (descriptor.name == "src") {
             CssString url;
+            hasSource = true;
             if (ConvertFontSource(descriptor.value, url)) face.url = ResolveUrl(url, context.base);
         }
     }
     // Without a family nothing can ask for the face, and without a source there is none.
+    if (face.family.empty()) LogWarning("Invalid font-family given for @font-face rule!");
+    if (!hasSource) LogWarning("Unable to parse src string for @font-face: ");
     if (face.family.empty() || face.url.empty()) return std::nullopt;
     return face;
 }

@@ -38,13 +38,18 @@ void ForEachImageUrl(const Declaration& declaration, void (*visit)(std::string_v
     VisitUrls(declaration, [&](const CssString& url) { visit(url, user); });
 }
 
-void ResolveImageUrls(Declaration& declaration, ConversionContext& context) {
+void ResolveImageUrls(Declaration& declaration, const URL& base) {
     VisitUrls(declaration, [&](const CssString& url) {
-        // The declaration is this conversion's own; the visitor is const for all its other users.
+        // The declaration is the caller's own; the visitor is const for all its other users.
         CssString& text = const_cast<CssString&>(url);
-        text = ResolveUrl(text, context.base);
-        if (context.imageUrls) context.imageUrls->insert(text);
+        text = ResolveUrl(text, base);
     });
+}
+
+void ResolveImageUrls(Declaration& declaration, ConversionContext& context) {
+    ResolveImageUrls(declaration, context.base);
+    if (!context.imageUrls) return;
+    VisitUrls(declaration, [&](const CssString& url) { context.imageUrls->insert(url); });
 }
 
 // Looks no further than the scheme of an absolute one: data URLs can be long.

@@ -3,30 +3,40 @@
 #include "css/values/value_text.h"
 
 namespace qorvex::css {
+namespace {
 
-CssString SerializeComputed(PropertyId longhand, const LayoutStyleRefs& style) {
-    CssString text;
-    // Where solving derives the final value, that is the computed value, not what was declared.
-    if (longhand == PropertyId::FontSize) {
-        const Length size = Length::Pixels(style.text->computedFontSize);
-        SerialiseValue(longhand, &size, text);
-    } else if (longhand == PropertyId::FontWeight) {
-        const auto weight = static_cast<FontWeight>(style.text->computedFontWeight / 100);
-        SerialiseValue(longhand, &weight, text);
-    } else {
-        SerialiseValue(longhand, style.Field(longhand), text);
-    }
-    return text;
+template <class Value>
+void Put(PropertyId longhand, const Value& value, CssString& out) {
+    SerialiseValue(longhand, &value, out);
 }
 
-void AppendComputedStyle(const LayoutStyleRefs& style, CssString& out) {
-    for (size_t id = 0; id < kLonghandCount; ++id) {
-        const auto longhand = static_cast<PropertyId>(id);
-        out.append(PropertyName(longhand));
-        out.append(": ");
-        out.append(std::string_view(SerializeComputed(longhand, style)));
-        out.append("\n");
+template <class Spacing>
+Spacing WithPixels(Spacing spacing, float pixels) {
+    if (spacing.kind == SpacingKind::Length) spacing.length = Length::Pixels(pixels);
+    return spacing;
+}
+
+}  // namespace
+
+void SerialiseComputed(PropertyId longhand, const LayoutStyleRefs& style, CssString& out) {
+    const TextLayoutStyle& text = *style.text;
+    switch (longhand) {
+        case PropertyId::FontSize:
+            return Put(longhand, Length::Pixels(text.computedFontSize), out);
+        case PropertyId::FontWeight:
+            return Put(longhand, static_cast<FontWeight>(text.computedFontWeight / 100), out);
+        case PropertyId::TextStrokeWidth:
+            return Put(longhand, Length::Pixels(text.computedStrokeWidth), out);
+        case PropertyId::LetterSpacing:
+            return Put(longhand, WithPixels(text.letterSpacing, text.computedLetterSpacing), out);
+        case PropertyId::LineHeight:
+            // A plain number is an em and is inherited as one, so it stays.
+            if (text.lineHeight.length.unit == LengthUnit::Em) break;
+            return Put(longhand, WithPixels(text.lineHeight, text.computedLineHeight), out);
+        default:
+            break;
     }
+    SerialiseValue(longhand, style.Field(longhand), out);
 }
 
 }  // namespace qorvex::css

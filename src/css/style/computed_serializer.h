@@ -1,12 +1,12 @@
-// Computed values as text, for the inspector, script and the style dump: one formatter for all of them.
+// Computed style as text, for script, the inspector, tools and tests.
 #pragma once
 
 #include "css/values/layout_style_refs.h"
 
 namespace qorvex::css {
 
-[[nodiscard]] CssString SerializeComputed(PropertyId longhand, const LayoutStyleRefs& style);
-// Every longhand as "name: value", one a line, in the order of their ids.
-void AppendComputedStyle(const LayoutStyleRefs& style, CssString& out);
+// Appends the value of one longhand. What solving derives is what is shown: sizes in pixels and an absolute
+// weight, whatever was declared.
+void SerialiseComputed(PropertyId longhand, const LayoutStyleRefs& style, CssString& out);
 
 }  // namespace qorvex::css

@@ -2,6 +2,7 @@
 
 #include "core/limits.h"
 #include "core/logging/log.h"
+#include "css/parser/convert.h"
 #include "css/style/calc.h"
 #include "css/values/value_text.h"
 
@@ -121,6 +122,7 @@ bool EvaluateCustomExpression(const Declaration& declaration, const LayoutStyleR
         LogWarning("Unable to parse declaration: ", std::string_view(text));
         return false;
     }
+    if (context.base) ResolveImageUrls(out, *context.base);
     return true;
 }
 

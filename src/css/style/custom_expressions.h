@@ -6,6 +6,10 @@
 #include "css/values/layout_style_refs.h"
 #include "css/values/length_context.h"
 
+namespace qorvex {
+class URL;
+}
+
 namespace qorvex::css {
 
 // What an expression is evaluated against. An em is the parent's font size, a rem the root's.
@@ -14,6 +18,7 @@ struct ExpressionContext {
     const LayoutStyleRefs* root = nullptr;
     float vw = 0;  // one hundredth of the viewport's sides
     float vh = 0;
+    const URL* base = nullptr;  // the document's: whose URLs a variable holds is not known any more
 };
 
 // True with the evaluated declaration in `out`: a plain value, or inherit. False, with the reason logged,

@@ -2,126 +2,165 @@
 
 #include <algorithm>
 
+#include "core/limits.h"
 #include "dom/element.h"
 
 namespace qorvex::css {
 
 using dom::Element;
 
-void ElementMatcher::CollectQuick(const RuleIndex& index, const RuleIndex::Indices* indices) {
-    if (!indices) return;
-    for (const uint32_t i : *indices) {
-        const IndexedRule& rule = index.QuickRule(i);
-        candidates_.push_back({rule.ruleId, rule.position, &rule});
-    }
-}
+// --- Which rules
 
-void ElementMatcher::Consider(const IndexedRule& rule, Element& element, MatchContext& context, bool record) {
-    if (MatchSelector(rule.selector, element, context, record))
-        candidates_.push_back({rule.ruleId, rule.position, &rule});
+void ElementMatcher::CollectBucket(const RuleIndex& index, const RuleBucket& bucket, Element& element,
+                                   MatchContext& context, bool record) {
+    for (const uint32_t i : bucket.quick) {
+        const IndexedRule& rule = index.QuickRule(i);
+        candidates_.push_back({rule.position, &rule});
+    }
+    for (const uint32_t i : bucket.complex) {
+        const IndexedRule& rule = index.ComplexRule(i);
+        if (MatchSelector(rule.selector, element, context, record))
+            candidates_.push_back({rule.position, &rule});
+    }
 }
 
 void ElementMatcher::Collect(RuleIndex& index, Element& element, MatchContext& context, bool record) {
     candidates_.clear();
+    if (index.IsEmpty()) return;
     index.Refresh();
-    const TagId tag = element.GetTag();
     for (const Atom name : element.GetClasses()) {
-        CollectQuick(index, index.FindQuickByClass(name));
-        if (const auto* rules = index.FindComplexByClass(name)) {
-            for (const IndexedRule& rule : *rules)
-                Consider(rule, element, context, record);
-        }
+        if (const RuleBucket* bucket = index.FindByClass(name))
+            CollectBucket(index, *bucket, element, context, record);
     }
-    const bool hasId = element.Is(dom::kHasId);
-    if (hasId) CollectQuick(index, index.FindQuickById(element.GetId()));
-    if (tag != TagId::Custom) {
-        CollectQuick(index, &index.FindQuickByTag(tag));
-    } else {
+    if (element.Is(dom::kHasId)) {
+        if (const RuleBucket* bucket = index.FindById(element.GetId()))
+            CollectBucket(index, *bucket, element, context, record);
+    }
+    const TagId tag = element.GetTag();
+    CollectBucket(index, index.FindByTag(tag), element, context, record);
+    if (tag == TagId::Custom) {
+        // One bucket serves all custom tags; the quick rules in it were taken without a look at the name.
         const Atom name = element.GetNodeName();
-        for (const uint32_t i : index.FindQuickByTag(tag)) {
-            const IndexedRule& rule = index.QuickRule(i);
-            if (rule.selector.key.simple[0].name == name)
-                candidates_.push_back({rule.ruleId, rule.position, &rule});
-        }
+        candidates_.erase_if([&](const Candidate& candidate) {
+            const SimpleSelector& key = candidate.rule->selector.key.simple[0];
+            return candidate.rule->selector.IsQuick() && key.type == SelectorType::Tag && key.name != name;
+        });
     }
-    CollectQuick(index, &index.GetQuickUniversal());
-
-    const std::span<const SelectorKey> keys = index.GetComplexKeys();
-    const Atom id = element.GetId();
-    for (size_t i = 0; i < keys.size(); ++i) {
-        const SelectorKey& key = keys[i];
-        if (key.type == SelectorType::Tag ? key.tag != tag
-                                          : key.type == SelectorType::Id && (!hasId || key.name != id))
-            continue;
-        Consider(index.ComplexRule(i), element, context, record);
-    }
-
-    // An element with the same class twice finds the class's rules twice; they are the same rules, and once
-    // is enough.
+    CollectBucket(index, index.GetUnkeyed(), element, context, record);
     std::sort(candidates_.begin(), candidates_.end(),
-              [](const MatchedRule& a, const MatchedRule& b) { return a.position < b.position; });
+              [](const Candidate& a, const Candidate& b) { return a.position < b.position; });
+    // An element with the same class twice finds the class's rules twice.
+    const auto same = [](const Candidate& a, const Candidate& b) { return a.position == b.position; };
+    candidates_.erase(std::unique(candidates_.begin(), candidates_.end(), same), candidates_.end());
 }
 
-void ElementMatcher::OfferRule(const IndexedRule& rule, Element& element) {
-    MatchState& state = element.GetMatchState();
-    PropertySet& dirty = element.GetDirtyProperties();
+CssVector<uint64_t> ElementMatcher::GetMatchedRuleIds(RuleIndex& index, Element& element,
+                                                      MatchContext& context) {
+    Collect(index, element, context, false);
+    CssVector<uint64_t> ids;
+    for (const Candidate& candidate : candidates_)
+        ids.push_back(candidate.rule->ruleId);
+    return ids;
+}
+
+// --- Which of their declarations
+
+void ElementMatcher::BeginCascade() {
+    cascade_.properties.Clear();
+    cascade_.own.Clear();
+    cascade_.custom.clear();
+}
+
+void ElementMatcher::OfferAll(const Candidates& candidates) {
+    cascade_.recorded.Clear();
+    cascade_.important.Clear();
+    cascade_.customOffers.clear();
+    for (const Candidate& candidate : candidates)
+        OfferRule(*candidate.rule);
+}
+
+void ElementMatcher::OfferRule(const IndexedRule& rule) {
     const uint32_t specificity = rule.selector.specificity.AsNumber();
     for (const Declaration& declaration : rule.declarations()) {
         const PropertyId id = declaration.property();
-        if (offers_.recorded.Contains(id)) {
-            if (!declaration.important() && offers_.important.Contains(id)) continue;
-            if (offers_.specificity[IndexOf(id)] > specificity) continue;
+        if (cascade_.recorded.Contains(id)) {
+            if (!declaration.important() && cascade_.important.Contains(id)) continue;
+            if (cascade_.specificity[IndexOf(id)] > specificity) continue;
         }
-        state.Store(declaration);
-        dirty.Add(id);
-        offers_.recorded.Add(id);
-        offers_.specificity[IndexOf(id)] = specificity;
-        if (declaration.important()) offers_.important.Add(id);
+        cascade_.properties.Add(id);
+        cascade_.own.Remove(id);
+        cascade_.winners[IndexOf(id)] = &declaration;
+        cascade_.recorded.Add(id);
+        cascade_.specificity[IndexOf(id)] = specificity;
+        if (declaration.important()) cascade_.important.Add(id);
     }
     for (const auto& entry : rule.customProperties())
-        OfferCustom(entry.first, entry.second, specificity, element);
+        OfferCustom(entry.first, entry.second, specificity);
 }
 
-void ElementMatcher::OfferCustom(Atom name, const CustomPropertyPtr& record, uint32_t specificity,
-                                 Element& element) {
+void ElementMatcher::OfferCustom(Atom name, const CustomPropertyPtr& record, uint32_t specificity) {
     const bool important = (record->flags & kImportant) != 0;
-    auto* known = std::find_if(offers_.custom.begin(), offers_.custom.end(),
-                               [&](const auto& offer) { return offer.name == name; });
-    if (known == offers_.custom.end()) {
-        offers_.custom.push_back({name, specificity, important});
-    } else {
-        if (known->important && !important) return;
-        if (known->specificity > specificity) return;
-        known->specificity = specificity;
-        known->important |= important;
+    const auto [known, isNew] = cascade_.customOffers.try_emplace(name, Offer{specificity, important});
+    if (!isNew) {
+        Offer& offer = known->second;
+        if ((offer.important && !important) || offer.specificity > specificity) return;
+        offer.specificity = specificity;
+        offer.important |= important;
     }
-    element.GetMatchState().customProperties().insert_or_assign(name, record);
-    element.GetDirtyProperties() = PropertySet::All();  // any property may depend on it
+    cascade_.custom.insert_or_assign(name, record);
 }
 
-bool ElementMatcher::Apply(RuleIndex& index, Element& element, MatchContext& context) {
-    if (index.IsEmpty()) return false;
-    Collect(index, element, context, true);
-    offers_.recorded.Clear();
-    offers_.important.Clear();
-    offers_.custom.clear();
-    for (const MatchedRule& matched : candidates_)
-        OfferRule(*matched.rule, element);
-    return !candidates_.empty();
-}
-
-void ElementMatcher::StoreSet(const StyleDeclarationSet& set, Element& element, bool respectImportant) {
-    MatchState& state = element.GetMatchState();
+void ElementMatcher::StoreSet(const StyleDeclarationSet& set, bool respectImportant) {
     for (const Declaration& declaration : set.declarations()) {
-        const MatchState::Slot* slot = respectImportant ? state.Find(declaration.property()) : nullptr;
-        if (slot && (slot->flags & kImportant) && !declaration.important()) continue;
-        state.Store(declaration);
-        element.GetDirtyProperties().Add(declaration.property());
+        const PropertyId id = declaration.property();
+        if (respectImportant && cascade_.properties.Contains(id) &&
+            cascade_.winners[IndexOf(id)]->important() && !declaration.important())
+            continue;
+        cascade_.properties.Add(id);
+        cascade_.own.Add(id);
+        cascade_.winners[IndexOf(id)] = &declaration;
     }
-    for (const auto& entry : set.customProperties()) {
-        state.customProperties().insert_or_assign(entry.first, entry.second);
-        element.GetDirtyProperties() = PropertySet::All();
-    }
+    for (const auto& entry : set.customProperties())
+        cascade_.custom.insert_or_assign(entry.first, entry.second);
+}
+
+// --- The result
+
+MatchStatePtr ElementMatcher::FindKnown(const RuleIndex& defaults, const RuleIndex& author) {
+    // Both numbers only grow, and they change one at a time.
+    const uint64_t generations = defaults.GetGeneration() + author.GetGeneration();
+    if (generations != knownGenerations_ || known_.size() >= limits::kCachedMatches) known_.clear();
+    knownGenerations_ = generations;
+
+    const uint32_t count = defaultCandidates_.size() + candidates_.size();
+    const auto ruleAt = [&](uint32_t i) {
+        return i < defaultCandidates_.size() ? defaultCandidates_[i].rule
+                                             : candidates_[i - defaultCandidates_.size()].rule;
+    };
+    uint64_t hash = count;
+    for (uint32_t i = 0; i < count; ++i)
+        hash = (hash ^ reinterpret_cast<uintptr_t>(ruleAt(i))) * 0x9E3779B97F4A7C15ull + (hash >> 29);
+    Known& known = known_[hash];
+    bool same = known.state && known.rules.size() == count;
+    for (uint32_t i = 0; same && i < count; ++i)
+        same = known.rules[i] == ruleAt(i);
+    if (same) return known.state;
+
+    BeginCascade();
+    OfferAll(defaultCandidates_);
+    OfferAll(candidates_);
+    known.rules.clear();
+    for (uint32_t i = 0; i < count; ++i)
+        known.rules.push_back(ruleAt(i));
+    RefPtr<MatchState> state = MakeRef<MatchState>();
+    state->Fill(cascade_.properties, cascade_.own, cascade_.winners.data());
+    state->FillCustomProperties(cascade_.custom);
+    known.state = state;
+    return state;
+}
+
+RefPtr<MatchState> ElementMatcher::TakeSpare() {
+    return spare_ ? std::move(spare_) : MakeRef<MatchState>();
 }
 
 void ElementMatcher::MatchElementStyle(Element& element, RuleIndex& defaults, RuleIndex& author,
@@ -129,26 +168,31 @@ void ElementMatcher::MatchElementStyle(Element& element, RuleIndex& defaults, Ru
     ++counters_.elementsMatched;
     element.pendingStyleBits &= static_cast<uint16_t>(
         ~(dom::kQueuedForMatching | dom::kHoverDependentQueued | dom::kActiveFocusDependentQueued));
-    MatchState& state = element.GetMatchState();
-    PropertySet& dirty = element.GetDirtyProperties();
-    for (const MatchState::Slot& slot : state.slots())
-        dirty.Add(slot.property);
-    if (!state.customProperties().empty()) dirty = PropertySet::All();
-    state.Reset();
-    Apply(defaults, element, context);
-    if (const StyleDeclarationSet* extra = element.GetExtraStyle()) StoreSet(*extra, element, false);
-    Apply(author, element, context);
-    if (const StyleDeclarationSet* inlineStyle = element.GetInlineStyle())
-        StoreSet(*inlineStyle, element, true);
-}
+    Collect(defaults, element, context, true);
+    candidates_.swap(defaultCandidates_);
+    Collect(author, element, context, true);
 
-CssVector<uint64_t> ElementMatcher::GetMatchedRuleIds(RuleIndex& index, Element& element,
-                                                      MatchContext& context) {
-    Collect(index, element, context, false);
-    CssVector<uint64_t> ids;
-    for (const MatchedRule& matched : candidates_)
-        ids.push_back(matched.ruleId);
-    return ids;
+    const StyleDeclarationSet* extra = element.GetExtraStyle();
+    const StyleDeclarationSet* inlineStyle = element.GetInlineStyle();
+    MatchStatePtr next;
+    if (extra || inlineStyle) {
+        BeginCascade();
+        OfferAll(defaultCandidates_);
+        if (extra) StoreSet(*extra, false);
+        OfferAll(candidates_);
+        if (inlineStyle) StoreSet(*inlineStyle, true);
+        RefPtr<MatchState> own = TakeSpare();
+        own->Fill(cascade_.properties, cascade_.own, cascade_.winners.data());
+        own->FillCustomProperties(cascade_.custom);
+        next = std::move(own);
+    } else {
+        next = FindKnown(defaults, author);
+    }
+    const MatchState* before = element.GetMatchState();
+    element.GetDirtyProperties() |= MatchState::Difference(before ? *before : *nothing_, *next);
+    MatchStatePtr old = element.SetMatchState(std::move(next));
+    // Nobody else has it any more, so it may be filled anew.
+    if (old && old->HasOneRef() && !spare_) spare_ = RefPtr<MatchState>(const_cast<MatchState*>(old.get()));
 }
 
 }  // namespace qorvex::css

@@ -20,6 +20,23 @@ constexpr PropertySet kTransitionGroup =
     Range(PropertyId::TransitionProperty, PropertyId::TransitionTimingFunction);
 constexpr PropertySet kTextGroup = Range(PropertyId::Color, PropertyId::TextStrokeColor);
 
+// Groups that most elements have as all others have them.
+struct ResetGroup {
+    PropertySet properties;
+    bool (*isShared)(const LayoutStyleRefs& a, const LayoutStyleRefs& b);
+};
+template <class Group>
+bool SharesGroup(const LayoutStyleRefs& a, const LayoutStyleRefs& b) {
+    return a.Handle<Group>() == b.Handle<Group>();
+}
+constexpr ResetGroup kResetGroups[] = {
+    {Range(PropertyId::Display, PropertyId::Contain), &SharesGroup<LayoutStyle>},
+    {Range(PropertyId::BackgroundImage, PropertyId::CompositionId), &SharesGroup<VisualStyle>},
+    {Range(PropertyId::Transform, PropertyId::PerspectiveOrigin), &SharesGroup<TransformStyle>},
+    {Range(PropertyId::AnimationName, PropertyId::AnimationPlayState), &SharesGroup<AnimationStyle>},
+    {kTransitionGroup, &SharesGroup<TransitionStyle>},
+};
+
 class ElementSolver {
   public:
     ElementSolver(Element& element, StyleRun& run)
@@ -28,18 +45,21 @@ class ElementSolver {
           parentNode_(*element.GetParent()),
           style_(element.GetStyle()),
           parent_(parentNode_.GetStyle()),
-          match_(element.GetMatchState()),
+          match_(element.GetMatchState() ? *element.GetMatchState() : run.nothingMatched),
           dirty_(element.GetDirtyProperties()),
           isHtml_(&element == run.document.GetHtmlElement()),
           isBody_(&element == run.document.GetBodyElement()),
           wasDisplayed_(style_.layout->display != CSSDisplay::None) {}
 
-    uint32_t Run() {
+    SolvedElement Run() {
+        const bool isFirst = element_.timesSolved == 0;
         if (element_.timesSolved < 2) ++element_.timesSolved;
         const bool ownEmpty = dirty_.Empty();
         const bool animates = TakeAnimatedChanges();
         const bool inherits = InheritDirtiness();
-        if (dirty_.Empty() && element_.styleSolved) return 0;
+        const bool reaches = isFirst || dirty_ == PropertySet::All() || newCustomProperties_ ||
+                             ((isHtml_ || isBody_) && !dirty_.Empty());
+        if (dirty_.Empty() && element_.styleSolved) return {0, reaches};
 
         ++run_.counters.elementsSolved;
         mask_ = dom::kChangeSolved;
@@ -54,7 +74,7 @@ class ElementSolver {
         }
         if (run_.rootFontSizeChanged) mask_ |= dom::kChangeLayout;  // lengths in rem are resolved by layout
         CheckDisplay();
-        return mask_;
+        return {mask_, reaches || mask_ != dom::kChangeSolved};
     }
 
   private:
@@ -74,28 +94,21 @@ class ElementSolver {
 
     bool InheritDirtiness() {
         PropertySet added;
-        if (parentNode_.IsElement()) {
+        // Above the root stand the initial values, which do not change.
+        if (!parentNode_.Is(dom::kIsDocument)) {
             const PropertySet& parentDirty = static_cast<Element&>(parentNode_).GetDirtyProperties();
             if (!parentDirty.Empty()) {
-                added = parentDirty & kInheritedProperties;
-                AddDependents(DeclarationKind::Inherit, parentDirty, added);
+                added = (parentDirty & kInheritedProperties) | (parentDirty & match_.inheriting());
                 // A variable may hold the word inherit; inside calc(), an em is the parent's.
                 const bool newEm = parentDirty.Contains(PropertyId::FontSize);
-                AddDependents(DeclarationKind::CustomExpression, newEm ? PropertySet::All() : parentDirty,
-                              added);
+                added |= newEm ? match_.expressions() : parentDirty & match_.expressions();
             }
         }
-        if (UpdateCustomProperties(style_, parent_, match_) || run_.rootFontSizeChanged)
-            AddDependents(DeclarationKind::CustomExpression, PropertySet::All(), added);
+        newCustomProperties_ = UpdateCustomProperties(style_, parent_, match_);
+        if (newCustomProperties_ || run_.rootFontSizeChanged) added |= match_.expressions();
         if (run_.rootFontSizeChanged) added |= kDerivedTextInputs;
         dirty_ |= added;
         return !added.Empty();
-    }
-
-    void AddDependents(DeclarationKind kind, const PropertySet& among, PropertySet& added) const {
-        for (const MatchState::Slot& slot : match_.slots()) {
-            if (slot.declaration->kind() == kind && among.Contains(slot.property)) added.Add(slot.property);
-        }
     }
 
     bool IsAnimated() const { return element_.animatedProperties || element_.transitionProperties; }
@@ -145,6 +158,7 @@ class ElementSolver {
         if (isHtml_ || isBody_) properties &= ~kPropagatedProperties;
         const bool adopts = AdoptParentText();
         if (adopts) properties &= ~kTextGroup;
+        if (!IsAnimated()) LeaveOutInitialGroups(properties);
         // Transitions first: they decide how the others may change.
         ApplyAll(properties & kTransitionGroup);
         ApplyAll(properties & ~kTransitionGroup);
@@ -158,16 +172,28 @@ class ElementSolver {
         mask_ |= maskBefore;
     }
 
+    // A group for which nothing is declared, and which parent and element share with everybody, has its
+    // initial values already, inherited ones included.
+    void LeaveOutInitialGroups(PropertySet& properties) const {
+        for (const ResetGroup& group : kResetGroups) {
+            if (match_.properties().Intersects(group.properties)) continue;
+            const bool inherits = group.properties.Intersects(kInheritedProperties);
+            if (group.isShared(style_, DefaultStyles()) &&
+                (!inherits || group.isShared(parent_, DefaultStyles())))
+                properties &= ~group.properties;
+        }
+    }
+
     PropertyInputs MakeInputs() const {
         const dom::Element* html = run_.document.GetHtmlElement();
-        PropertyInputs inputs{
-            style_,
-            parent_,
-            match_,
-            ActiveOrNull(element_.animatedProperties.get()),
-            ActiveOrNull(element_.transitionProperties.get()),
-            element_.timesSolved < 2,
-            {&parent_, html ? &html->GetStyle() : nullptr, run_.metrics.vw, run_.metrics.vh}};
+        PropertyInputs inputs{style_,
+                              parent_,
+                              match_,
+                              ActiveOrNull(element_.animatedProperties.get()),
+                              ActiveOrNull(element_.transitionProperties.get()),
+                              element_.timesSolved < 2,
+                              {&parent_, html ? &html->GetStyle() : nullptr, run_.metrics.vw, run_.metrics.vh,
+                               &run_.document.GetURL()}};
         if (IsLandmark(parentNode_)) {
             inputs.parentRoot = &run_.rootStyles;
             inputs.parentIsHtml = &parentNode_ == html;
@@ -201,9 +227,7 @@ class ElementSolver {
     // each of its kind. Not where the parent has values of its own that are not inherited.
     bool AdoptParentText() {
         if (isHtml_ || !dirty_.Intersects(kTextGroup) || IsAnimated()) return false;
-        for (const MatchState::Slot& slot : match_.slots()) {
-            if (kTextGroup.Contains(slot.property)) return false;
-        }
+        if (match_.properties().Intersects(kTextGroup)) return false;
         const TextLayoutStyle& parent = *parent_.text;
         const TextLayoutStyle& initial = *DefaultStyles().text;
         if (parent.fontFitMode != initial.fontFitMode || parent.textOverflow != initial.textOverflow ||
@@ -258,7 +282,11 @@ class ElementSolver {
             LengthContext metrics = run_.metrics;
             // On the root a rem is the initial size (CSS Values and Units, 6.1.2).
             if (isHtml_) metrics.rem = DefaultStyles().text->computedFontSize;
-            if (UpdateDerivedText(style_, parent_, metrics)) mask_ |= dom::kChangeLayout;
+            if (UpdateDerivedText(style_, parent_, metrics)) {
+                mask_ |= dom::kChangeLayout;
+                // What is declared in em follows the font size, and heirs get it in pixels.
+                dirty_ |= kDerivedTextInputs;
+            }
         }
         if (run_.fonts && dirty_.Intersects(kFontKeyInputs) && UpdateTypefaces(element_, *run_.fonts))
             mask_ |= dom::kChangeLayout;
@@ -293,12 +321,13 @@ class ElementSolver {
     const bool wasDisplayed_;
     uint32_t mask_ = 0;
     bool canShare_ = false;
+    bool newCustomProperties_ = false;
     StyleSharingTable::Key sharingKey_;
 };
 
 }  // namespace
 
-uint32_t SolveElement(Element& element, StyleRun& run) {
+SolvedElement SolveElement(Element& element, StyleRun& run) {
     return ElementSolver(element, run).Run();
 }
 

@@ -5,8 +5,14 @@
 
 namespace qorvex::css {
 
-// dom::ChangeMask bits of what changed; 0 when there was nothing to look at. The element's parent is solved
-// already, and keeps its dirty properties until the run ends.
-[[nodiscard]] uint32_t SolveElement(dom::Element& element, StyleRun& run);
+struct SolvedElement {
+    uint32_t changeMask = 0;  // dom::ChangeMask bits; 0 when there was nothing to look at
+    // The children may inherit something new, or were never solved themselves. When it is not set they have
+    // to be looked at only if they are dirty themselves.
+    bool reachesChildren = false;
+};
+
+// The element's parent is solved already, and keeps its dirty properties until its children have been.
+[[nodiscard]] SolvedElement SolveElement(dom::Element& element, StyleRun& run);
 
 }  // namespace qorvex::css

@@ -39,8 +39,8 @@ const void* PropertySolver::FromParent(PropertyId id) {
 
 const void* PropertySolver::FromCascade(PropertyId id, ValueSource& source) {
     source = ValueSource::Declaration;
-    if (const MatchState::Slot* slot = in_.match.Find(id)) {
-        const Declaration& declaration = *slot->declaration;
+    if (const Declaration* found = in_.match.Find(id)) {
+        const Declaration& declaration = *found;
         switch (declaration.kind()) {
             case DeclarationKind::Value:
                 return declaration.value();

@@ -5,21 +5,20 @@
 namespace qorvex::css {
 namespace {
 
-const SimpleSelector* FindClass(const CompoundSelector& compound) {
+// The simple selector that the fewest elements fulfil: an id, else a class, else a tag; null for a compound
+// that has none of these.
+const SimpleSelector* FindKey(const CompoundSelector& compound) {
+    const SimpleSelector* best = nullptr;
+    const auto rank = [](SelectorType type) {
+        return type == SelectorType::Id      ? 3
+               : type == SelectorType::Class ? 2
+               : type == SelectorType::Tag   ? 1
+                                             : 0;
+    };
     for (const SimpleSelector& simple : compound.simple) {
-        if (simple.type == SelectorType::Class) return &simple;
+        if (rank(simple.type) > (best ? rank(best->type) : 0)) best = &simple;
     }
-    return nullptr;
-}
-
-// Ids refuse more elements than tags do.
-SelectorKey MakeKey(const ComplexSelector& selector) {
-    SelectorKey key;
-    for (const SimpleSelector& simple : selector.key.simple) {
-        if (simple.type == SelectorType::Id) return {SelectorType::Id, TagId::Any, simple.name};
-        if (simple.type == SelectorType::Tag) key = {SelectorType::Tag, simple.tag, simple.name};
-    }
-    return key;
+    return best;
 }
 
 bool IsBefore(const IndexedRule& a, const IndexedRule& b) {
@@ -33,8 +32,6 @@ template <class Visitor>
 void RuleIndex::ForEachList(Visitor&& visit) {
     visit(quickRules_);
     visit(complexRules_);
-    for (auto& entry : complexRulesByClass_)
-        visit(entry.second);
 }
 
 template <class Visitor>
@@ -47,10 +44,6 @@ void RuleIndex::ForEachRule(Visitor&& visit) {
         for (IndexedRule& rule : group.rules)
             visit(rule);
     }
-}
-
-uint32_t RuleIndex::GetSearchableRuleCount() const {
-    return quickRules_.size() + complexRules_.size() + complexByClassCount_;
 }
 
 IndexedRule RuleIndex::Number(Ruleset rule) {
@@ -69,52 +62,42 @@ void RuleIndex::CountCombinators(const ComplexSelector& selector, int32_t change
     if (reachesSiblings) siblingInvalidatingRules_ += static_cast<uint32_t>(change);
 }
 
-void RuleIndex::NoteQuickRule(uint32_t index) {
-    const SimpleSelector& key = quickRules_[index].selector.key.simple[0];
-    switch (key.type) {
-        case SelectorType::Id:
-            quickById_[key.name].push_back(index);
-            break;
-        case SelectorType::Class:
-            quickByClass_[key.name].push_back(index);
-            break;
-        case SelectorType::Tag:
-            quickByTag_[static_cast<size_t>(key.tag)].push_back(index);
-            break;
-        default:
-            quickUniversal_.push_back(index);
-            break;
-    }
+RuleBucket& RuleIndex::BucketOf(const CompoundSelector& compound) {
+    const SimpleSelector* key = FindKey(compound);
+    if (!key) return unkeyed_;
+    if (key->type == SelectorType::Id) return byId_[key->name];
+    if (key->type == SelectorType::Class) return byClass_[key->name];
+    return byTag_[static_cast<size_t>(key->tag)];
 }
 
 void RuleIndex::File(IndexedRule rule) {
+    ++generation_;
     CountCombinators(rule.selector, +1);
-    if (rule.selector.IsQuick()) {
-        quickRules_.push_back(std::move(rule));
-        if (!indexStale_) NoteQuickRule(quickRules_.size() - 1);
-    } else if (const SimpleSelector* key = FindClass(rule.selector.key)) {
-        const Atom name = key->name;
-        complexRulesByClass_[name].push_back(std::move(rule));
-        ++complexByClassCount_;
-    } else {
-        complexKeys_.push_back(MakeKey(rule.selector));
-        complexRules_.push_back(std::move(rule));
+    const bool quick = rule.selector.IsQuick();
+    CssVector<IndexedRule>& list = quick ? quickRules_ : complexRules_;
+    if (!indexStale_) {
+        RuleBucket& bucket = BucketOf(rule.selector.key);
+        (quick ? bucket.quick : bucket.complex).push_back(list.size());
     }
+    list.push_back(std::move(rule));
 }
 
 void RuleIndex::Rebuild() {
-    for (auto& entry : quickById_)
-        entry.second.clear();
-    for (auto& entry : quickByClass_)
-        entry.second.clear();
-    for (Indices& indices : quickByTag_)
-        indices.clear();
-    quickUniversal_.clear();
+    const auto empty = [](RuleBucket& bucket) {
+        bucket.quick.clear();
+        bucket.complex.clear();
+    };
+    for (auto& entry : byId_)
+        empty(entry.second);
+    for (auto& entry : byClass_)
+        empty(entry.second);
+    for (RuleBucket& bucket : byTag_)
+        empty(bucket);
+    empty(unkeyed_);
     for (uint32_t i = 0; i < quickRules_.size(); ++i)
-        NoteQuickRule(i);
-    complexKeys_.clear();
-    for (const IndexedRule& rule : complexRules_)
-        complexKeys_.push_back(MakeKey(rule.selector));
+        BucketOf(quickRules_[i].selector.key).quick.push_back(i);
+    for (uint32_t i = 0; i < complexRules_.size(); ++i)
+        BucketOf(complexRules_[i].selector.key).complex.push_back(i);
     indexStale_ = false;
 }
 
@@ -194,10 +177,10 @@ CssVector<IndexedRule> RuleIndex::TakeRules(std::span<const uint64_t> ruleIds) {
             return true;
         });
     });
-    complexByClassCount_ = 0;
-    for (const auto& entry : complexRulesByClass_)
-        complexByClassCount_ += entry.second.size();
-    if (!taken.empty()) indexStale_ = true;
+    if (!taken.empty()) {
+        indexStale_ = true;
+        ++generation_;
+    }
     std::sort(taken.begin(), taken.end(), [](const auto& a, const auto& b) { return a.ruleId < b.ruleId; });
     return taken;
 }

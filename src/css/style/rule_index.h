@@ -2,16 +2,19 @@
 // one index for the default sheet and one for the author's.
 //
 // A rule is quick when its selector is a single universal, tag, id or class selector: looking it up under its
-// key is all the matching there is. Every other rule is complex and goes through MatchSelector, found under a
-// class of its key compound if it has one, else tried on every element after a look at its packed key.
+// key is all the matching there is. Every other rule is complex and goes through MatchSelector. Both kinds
+// are filed by what an element must have for them to match: an id, else a class, else a tag of the key
+// compound, so that an element meets only the rules that may concern it.
 //
 // Invariants:
 // - positions are unique and decide the cascade; where a rule is stored does not matter;
-// - a searchable rule is in exactly one of quickRules_, complexRules_ and the class lists; rules of inactive
-// media
-//   groups are in none of them;
-// - the maps and keys describe the rule vectors unless indexStale_ is set, and every search refreshes them
-// first. View thread only.
+// - a searchable rule is in exactly one of quickRules_ and complexRules_; rules of inactive media groups are
+// in
+//   neither;
+// - the buckets describe the rule vectors unless indexStale_ is set, and every search refreshes them first;
+// - whatever is remembered about rules is good for one generation.
+//
+// View thread only.
 #pragma once
 
 #include <cstdint>
@@ -28,25 +31,16 @@ struct IndexedRule : Ruleset {
     uint32_t position = 0;  // later positions win ties
 };
 
-// A candidate during matching.
-struct MatchedRule {
-    uint64_t ruleId;
-    uint32_t position;
-    const IndexedRule* rule;
-};
-
 // The ids that a sheet brought, in order; shared by its owner and its script objects.
 struct RuleIdList : SharedValue<RuleIdList> {
     CssVector<uint64_t> ids;
 };
 using RuleIdListPtr = qsl::RefPtr<RuleIdList>;
 
-// What the key compound of a complex rule asks first, packed so that most rules are refused without touching
-// them.
-struct SelectorKey {
-    SelectorType type = SelectorType::Universal;  // Universal: no quick refusal
-    TagId tag = TagId::Any;
-    Atom name;
+// Indices of the rules with one key.
+struct RuleBucket {
+    CssVector<uint32_t> quick;
+    CssVector<uint32_t> complex;
 };
 
 class RuleIndex {
@@ -71,31 +65,33 @@ class RuleIndex {
     bool UpdateMedia(const LengthContext& metrics);
 
     bool IsEmpty() const { return GetSearchableRuleCount() == 0; }
-    uint32_t GetSearchableRuleCount() const;
+    uint32_t GetSearchableRuleCount() const { return quickRules_.size() + complexRules_.size(); }
     uint32_t GetQuickRuleCount() const { return quickRules_.size(); }
-    uint32_t GetComplexRuleCount() const { return GetSearchableRuleCount() - GetQuickRuleCount(); }
+    uint32_t GetComplexRuleCount() const { return complexRules_.size(); }
     uint32_t GetSubtreeInvalidatingRules() const { return subtreeInvalidatingRules_; }
     uint32_t GetSiblingInvalidatingRules() const { return siblingInvalidatingRules_; }
     const CssVector<KeyframesRule>& GetKeyframes() const { return keyframes_; }
     const CssVector<FontFace>& GetFontFaces() const { return fontFaces_; }
     CssVector<uint64_t> GetAllRuleIds() const;  // by position
 
+    // Another number whenever rules came, went, moved or changed.
+    uint64_t GetGeneration() const { return generation_; }
+    // The declarations of a rule were edited.
+    void NoteRuleEdited() { ++generation_; }
+
     // --- Searching. Call Refresh before a batch of the rest.
     void Refresh() {
         if (indexStale_) [[unlikely]]
             Rebuild();
     }
-    using Indices = CssVector<uint32_t>;
     const IndexedRule& QuickRule(uint32_t index) const { return quickRules_[index]; }
-    const Indices* FindQuickByClass(Atom name) const { return quickByClass_.get(name); }
-    const Indices* FindQuickById(Atom name) const { return quickById_.get(name); }
-    const Indices& FindQuickByTag(TagId tag) const { return quickByTag_[static_cast<size_t>(tag)]; }
-    const Indices& GetQuickUniversal() const { return quickUniversal_; }
-    const CssVector<IndexedRule>* FindComplexByClass(Atom name) const {
-        return complexRulesByClass_.get(name);
-    }
-    std::span<const SelectorKey> GetComplexKeys() const { return {complexKeys_.data(), complexKeys_.size()}; }
-    const IndexedRule& ComplexRule(size_t index) const { return complexRules_[index]; }
+    const IndexedRule& ComplexRule(uint32_t index) const { return complexRules_[index]; }
+    // Null for a name that no rule has as its key.
+    const RuleBucket* FindByClass(Atom name) const { return byClass_.get(name); }
+    const RuleBucket* FindById(Atom name) const { return byId_.get(name); }
+    const RuleBucket& FindByTag(TagId tag) const { return byTag_[static_cast<size_t>(tag)]; }
+    // Rules that any element may match.
+    const RuleBucket& GetUnkeyed() const { return unkeyed_; }
 
   private:
     struct MediaGroup {
@@ -109,7 +105,7 @@ class RuleIndex {
 
     IndexedRule Number(Ruleset rule);
     void File(IndexedRule rule);
-    void NoteQuickRule(uint32_t index);
+    RuleBucket& BucketOf(const CompoundSelector& key);
     void CountCombinators(const ComplexSelector& selector, int32_t change);
     void AddMediaGroup(const MediaFeatureList& features, const CssVector<Ruleset>& rules, RuleIdList& ids);
     CssVector<IndexedRule> TakeRules(std::span<const uint64_t> ruleIds);
@@ -121,9 +117,8 @@ class RuleIndex {
 
     uint64_t nextRuleId_ = 0;
     uint32_t nextPosition_ = 0;
+    uint64_t generation_ = 0;
     CssVector<IndexedRule> complexRules_;
-    CssHashMap<Atom, CssVector<IndexedRule>> complexRulesByClass_;
-    uint32_t complexByClassCount_ = 0;
     CssVector<IndexedRule> quickRules_;
     CssVector<MediaGroup> inactiveMediaGroups_;
     CssVector<ActiveMediaGroup> activeMediaGroups_;
@@ -133,11 +128,10 @@ class RuleIndex {
     uint32_t siblingInvalidatingRules_ = 0;
     bool indexStale_ = false;
 
-    CssVector<SelectorKey> complexKeys_;  // one per complex rule
-    CssHashMap<Atom, Indices> quickById_;
-    CssHashMap<Atom, Indices> quickByClass_;
-    Indices quickByTag_[kTagCount];
-    Indices quickUniversal_;
+    CssHashMap<Atom, RuleBucket> byId_;
+    CssHashMap<Atom, RuleBucket> byClass_;
+    RuleBucket byTag_[kTagCount];
+    RuleBucket unkeyed_;
 };
 
 // Do all conditions hold? An empty list holds.

@@ -27,6 +27,18 @@ void RecordDependencies(Element& element, uint8_t usedPseudoBits) {
     element.pendingStyleBits |= flags;
 }
 
+// What most compounds consist of.
+inline bool TestName(const SimpleSelector& simple, const Element& element) {
+    if (simple.type == SelectorType::Class) return element.HasClass(simple.name);
+    if (simple.type == SelectorType::Tag) return MatchesTag(simple, element);
+    return element.Is(dom::kHasId) && element.GetId() == simple.name;
+}
+inline bool IsName(const CompoundSelector& compound) {
+    if (compound.simple.size() != 1) return false;
+    const SelectorType type = compound.simple[0].type;
+    return type == SelectorType::Class || type == SelectorType::Tag || type == SelectorType::Id;
+}
+
 // Whether a pseudo class is missing is settled last: an element that would match on hover must be known as
 // depending on it even while the pointer is elsewhere.
 CompoundResult TestCompound(const CompoundSelector& compound, Element& element, const MatchContext& context,
@@ -38,13 +50,9 @@ CompoundResult TestCompound(const CompoundSelector& compound, Element& element, 
             case SelectorType::Universal:
                 break;
             case SelectorType::Tag:
-                matches = MatchesTag(simple, element);
-                break;
             case SelectorType::Id:
-                matches = element.Is(dom::kHasId) && element.GetId() == simple.name;
-                break;
             case SelectorType::Class:
-                matches = element.HasClass(simple.name);
+                matches = TestName(simple, element);
                 break;
             case SelectorType::Pseudo:
                 usedPseudoBits |= uint8_t(1u << static_cast<unsigned>(simple.pseudo));
@@ -61,9 +69,16 @@ CompoundResult TestCompound(const CompoundSelector& compound, Element& element, 
     return holds ? CompoundResult::Match : CompoundResult::MatchApartFromPseudoState;
 }
 
-Element* ParentElement(const Element& element) {
+inline bool Matches(const CompoundSelector& compound, Element& element, const MatchContext& context,
+                    bool record) {
+    if (IsName(compound)) return TestName(compound.simple[0], element);
+    return TestCompound(compound, element, context, record) == CompoundResult::Match;
+}
+
+inline Element* ParentElement(const Element& element) {
     Node* parent = element.GetParent();
-    if (!parent || !parent->IsElement() || parent->Is(dom::kIsDocument)) return nullptr;
+    if (!parent || (parent->GetFlags() & (dom::kIsElement | dom::kIsDocument)) != dom::kIsElement)
+        return nullptr;
     return static_cast<Element*>(parent);
 }
 
@@ -99,7 +114,7 @@ class LeftwardWalk {
 
   private:
     bool Test(size_t index, Element& element) const {
-        return TestCompound(selector_.compounds[index], element, context_, record_) == CompoundResult::Match;
+        return Matches(selector_.compounds[index], element, context_, record_);
     }
 
     Element* NearestAncestor(Element& from, size_t index) const {
@@ -181,8 +196,7 @@ class LeftwardWalk {
 
 bool MatchSelector(const ComplexSelector& selector, dom::Element& element, MatchContext& context,
                    bool recordDependencies) {
-    if (TestCompound(selector.key, element, context, recordDependencies) != CompoundResult::Match)
-        return false;
+    if (!Matches(selector.key, element, context, recordDependencies)) return false;
     if (!selector.HasCombinators()) return true;
     return LeftwardWalk(selector, context, recordDependencies).Run(element);
 }

@@ -7,6 +7,7 @@
 #include "css/style/style_sharing.h"
 #include "css/style/text_style_cache.h"
 #include "css/values/length_context.h"
+#include "css/values/match_state.h"
 #include "dom/document.h"
 
 namespace qorvex::layout {
@@ -21,8 +22,9 @@ struct StyleRun {
     StyleSharingTable& sharing;
     TextStyleCache& textStyles;
     RootStyles& rootStyles;
-    layout::IFontResolver* fonts;  // null without fonts
-    LengthContext metrics;         // viewport units, and the root's font size as it becomes known
+    const MatchState& nothingMatched;  // of an element that was never matched
+    layout::IFontResolver* fonts;      // null without fonts
+    LengthContext metrics;             // viewport units, and the root's font size as it becomes known
     bool rootFontSizeChanged = false;
 };
 

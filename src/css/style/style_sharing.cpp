@@ -15,33 +15,47 @@ uint64_t Mix(uint64_t hash, const void* pointer) {
     return (hash ^ reinterpret_cast<uintptr_t>(pointer)) * 0x9E3779B97F4A7C15ull + (hash >> 29);
 }
 
-bool SameSlots(const MatchState& a, const MatchState& b) {
-    if (a.slots().size() != b.slots().size()) return false;
-    for (uint32_t i = 0; i < a.slots().size(); ++i) {
-        if (a.slots()[i].declaration != b.slots()[i].declaration) return false;
-    }
-    return true;
-}
-
 }  // namespace
 
 StyleSharingTable::Key StyleSharingTable::MakeKey(const dom::Element& element, const LayoutStyleRefs& parent,
                                                   bool onlySiblings) {
     Key key{0, Addresses(element.GetStyle()), onlySiblings ? element.GetParent() : nullptr};
     uint64_t hash = Mix(Mix(1, parent.text.get()), parent.visual.get());
-    for (const MatchState::Slot& slot : element.GetMatchState().slots())
-        hash = Mix(hash, slot.declaration);
+    hash = Mix(hash, element.GetMatchState());
     key.hash = hash ^ (hash >> 32);
     return key;
 }
 
 const StyleSharingTable::Entry* StyleSharingTable::Find(const Key& key, const dom::Element& element,
                                                         const LayoutStyleRefs& parent) const {
-    const Entry& entry = entries_[key.hash % kEntries];
-    if (!entry.element || entry.run != run_ || !(entry.key == key)) return nullptr;
-    if (!SameSlots(entry.element->GetMatchState(), element.GetMatchState())) return nullptr;
-    const dom::Node* otherParent = entry.element->GetParent();
-    return otherParent && otherParent->GetStyle().SameGroups(parent) ? &entry : nullptr;
+    if (entries_.empty()) return nullptr;
+    const uint32_t first = FirstOfSet(key.hash);
+    for (uint32_t i = first; i < first + kWays; ++i) {
+        const Entry& entry = entries_[i];
+        if (entry.run != run_ || !(entry.key == key)) continue;
+        if (entry.element->GetMatchState() != element.GetMatchState()) continue;
+        const dom::Node* otherParent = entry.element->GetParent();
+        if (otherParent && otherParent->GetStyle().SameGroups(parent)) return &entry;
+    }
+    return nullptr;
+}
+
+void StyleSharingTable::Insert(const Key& key, dom::Element& element, uint32_t changeMask) {
+    if (entries_.empty()) entries_.resize(kFirstEntries);
+    if (++used_ * 2 > entries_.size() && entries_.size() < kLastEntries) {
+        CssVector<Entry> old = std::move(entries_);
+        entries_.resize(old.size() * 2);
+        for (const Entry& entry : old) {
+            if (entry.run == run_) Place(entry);
+        }
+    }
+    Place({&element, key, changeMask, run_});
+}
+
+void StyleSharingTable::Place(const Entry& entry) {
+    Entry* set = &entries_[FirstOfSet(entry.key.hash)];
+    if (set[0].run == run_) set[1] = set[0];
+    set[0] = entry;
 }
 
 }  // namespace qorvex::css

@@ -4,20 +4,18 @@
 //
 // Invariants, on which sharing is sound:
 // - an entry is good for one run: declarations, parents and pseudo states do not change inside it;
-// - equal slots mean equal values, since a slot points at a declaration and evaluating one depends on nothing
-// but the
-//   parent's style, the root's style and the custom properties in force, which are compared by handle;
+// - one match state means equal values, since evaluating a declaration depends on nothing but the parent's
+//   style, the root's style and the custom properties in force, which are compared by handle;
 // - the two elements had the same style before, so that they changed in the same way: a change mask is shared
-// too.
-//   Handles seen before are compared as bare addresses. None can have been reused: the second element has
-//   held the group since before the run.
+//   too. Handles seen before are compared as bare addresses. None can have been reused: the second element
+//   has held the group since before the run.
 #pragma once
 
 #include <array>
 #include <cstdint>
 
+#include "css/values/css_containers.h"
 #include "css/values/layout_style_refs.h"
-#include "css/values/match_state.h"
 
 namespace qorvex::dom {
 class Element;
@@ -42,19 +40,25 @@ class StyleSharingTable {
         uint32_t run = 0;
     };
 
-    void BeginRun() { ++run_; }
+    void BeginRun() { ++run_, used_ = 0; }
 
     static Key MakeKey(const dom::Element& element, const LayoutStyleRefs& parent, bool onlySiblings);
     // An element solved before in this run whose style this one may take; null if there is none.
     const Entry* Find(const Key& key, const dom::Element& element, const LayoutStyleRefs& parent) const;
-    void Insert(const Key& key, dom::Element& element, uint32_t changeMask) {
-        entries_[key.hash % kEntries] = {&element, key, changeMask, run_};
-    }
+    void Insert(const Key& key, dom::Element& element, uint32_t changeMask);
 
   private:
-    // Pages have a few hundred distinct styles; a lost entry costs one more cascade.
-    static constexpr size_t kEntries = 256;
-    std::array<Entry, kEntries> entries_ = {};
+    void Place(const Entry& entry);
+    // A style stands in one of the places of its set; the last comer takes the first. Pages have a few
+    // hundred distinct styles, and a lost entry costs one more cascade. The table grows with what it is asked
+    // for, so that a small page has a small one.
+    static constexpr uint32_t kWays = 2, kFirstEntries = 32, kLastEntries = 1024;
+    uint32_t FirstOfSet(uint64_t hash) const {
+        return static_cast<uint32_t>(hash) & (entries_.size() - 1) & ~(kWays - 1);
+    }
+
+    CssVector<Entry> entries_;
+    uint32_t used_ = 0;  // entries of this run
     uint32_t run_ = 0;
 };
 

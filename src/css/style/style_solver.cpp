@@ -45,22 +45,19 @@ void StyleSolver::Solve(Document& document, IAnimationSide* animations) {
     taken_.swap(document.GetStyleDirtyNodes());
     if (full) {
         document.GetSelectorDirtyElements().clear();
-        GatherAll(document);
-        MatchAll(document);
+        SolveBelow(document, Extent::All);
         document.ClearFullStyleSolve();
     } else {
         MatchDirtyElements(document);
-        Gather(document);
+        SolveBelow(document, Extent::WhatChanged);
     }
-    taken_.clear();
-    SolveGathered(document);
     if (rootStyles_.IsPending()) rootStyles_.Propagate(document);
     for (Node* node : lists.textTransform)
         node->OnComputedStyleChanged();
     UpdateLayoutPresence(document);
-    ClearDirtyProperties();
     RunAnimations(document, animations);
     lists.Clear();
+    GiveBackRoom();
 }
 
 // --- Who is matched
@@ -75,95 +72,138 @@ void StyleSolver::MatchDirtyElements(Document& document) {
     dirty.clear();
 }
 
-void StyleSolver::GatherAll(Document& document) {
-    queue_.clear();
-    elements_.clear();
-    texts_.clear();
-    for (const auto& child : document.GetChildren())
-        Visit(*child);
-    WalkGathered();
-    for (Node* node : queue_)
-        node->styleSolved = 0;
-}
-
-void StyleSolver::MatchAll(Document& document) {
-    const PseudoState pseudo(document);
-    MatchContext context(pseudo);
+// In a full solve every element is matched where it is solved: the walk comes to it once.
+void StyleSolver::MatchAfresh(Element& element, MatchContext& context) {
     constexpr uint16_t kDependencies = dom::kHoverDependent | dom::kActiveFocusDependent;
-    for (Element* element : elements_) {
-        element->pendingStyleBits &= static_cast<uint16_t>(~kDependencies);
-        element->GetDirtyProperties() = PropertySet::All();
-    }
-    for (Element* element : elements_)
-        matcher_.MatchElementStyle(*element, rules_.defaults, rules_.author, context);
+    element.pendingStyleBits &= static_cast<uint16_t>(~kDependencies);
+    element.GetDirtyProperties() = PropertySet::All();
+    matcher_.MatchElementStyle(element, rules_.defaults, rules_.author, context);
 }
 
 // --- Who is solved
 
-void StyleSolver::Gather(Document& document) {
-    queue_.clear();
-    elements_.clear();
-    texts_.clear();
-    for (Node* node : taken_) {
-        if (node != &document) {
-            Visit(*node);
-            continue;
-        }
-        for (const auto& child : document.GetChildren())
-            Visit(*child);
-    }
-    WalkGathered();
-    SortByDepth(elements_);
-}
-
-void StyleSolver::Visit(Node& node) {
-    if ((node.pendingStyleBits & dom::kGathered) || !node.IsInDocument()) return;
+void StyleSolver::AddRoot(Node& node) {
+    if (!node.IsInDocument() || (node.pendingStyleBits & dom::kGathered)) return;
     node.pendingStyleBits |= dom::kGathered;
-    queue_.push_back(&node);
+    roots_.push_back(&node);
 }
 
-// Breadth first, from what stands in the queue. A child is visited even if nothing of its own is dirty: it
-// may take a change from its parent.
-void StyleSolver::WalkGathered() {
-    for (uint32_t i = 0; i < queue_.size(); ++i) {
-        Node& node = *queue_[i];
-        if (node.IsElement()) {
-            elements_.push_back(static_cast<Element*>(&node));
-        } else if (node.IsText()) {
-            texts_.push_back(&node);
-        } else {
-            node.pendingStyleBits &= static_cast<uint16_t>(~dom::kGathered);
-        }
-        for (const auto& child : node.GetChildren())
-            Visit(*child);
+void StyleSolver::AddRoots(Document& document, Extent extent) {
+    roots_.clear();
+    rootsTaken_ = 0;
+    for (Node* node : taken_) {
+        if (node != &document) AddRoot(*node);
     }
+    if (extent == Extent::All || taken_.contains(&document)) {
+        for (const auto& child : document.GetChildren())
+            AddRoot(*child);
+    }
+    taken_.clear();
+    SortByDepth(roots_);
+    widest_ = std::max(widest_, roots_.size());
+}
+
+// Those that the walk has come to from above are done already.
+void StyleSolver::TakeRootsOfLevel(int32_t depth) {
+    for (; rootsTaken_ < roots_.size() && roots_[rootsTaken_]->GetDepth() == depth; ++rootsTaken_) {
+        Node* root = roots_[rootsTaken_];
+        if (root->pendingStyleBits & dom::kGathered) level_.push_back(root);
+    }
+}
+
+void StyleSolver::AddChildren(const Node& node) {
+    for (const auto& child : node.GetChildren())
+        nextLevel_.push_back(child.get());
+}
+
+// The children of the level above have read what was dirty there.
+void StyleSolver::FinishLevel() {
+    for (Element* element : solvedAbove_)
+        element->GetDirtyProperties().Clear();
+    solvedAbove_.clear();
+    solvedAbove_.swap(solved_);
+    widest_ = std::max(widest_, nextLevel_.size());
+    level_.swap(nextLevel_);
+    nextLevel_.clear();
+}
+
+// A page that was once solved whole and then changes in small steps does not keep the room of that one run;
+// it goes step by step, so that a page with large changes now and then keeps some.
+void StyleSolver::GiveBackRoom() {
+    constexpr uint32_t kSmall = 256;
+    const uint32_t wanted = std::max(std::exchange(widest_, 0u), kSmall);
+    const auto halve = [&](auto& list) {
+        if (list.capacity() / 4 < wanted) return;
+        list.clear();
+        const uint32_t half = list.capacity() / 2;
+        list.shrink_to_fit();
+        list.reserve(half);
+    };
+    halve(roots_);
+    halve(level_);
+    halve(nextLevel_);
+    halve(solved_);
+    halve(solvedAbove_);
 }
 
 // --- Solving
 
-void StyleSolver::SolveGathered(Document& document) {
+void StyleSolver::SolveBelow(Document& document, Extent extent) {
+    AddRoots(document, extent);
+    if (roots_.empty()) return;
     sharing_.BeginRun();
     StyleRun run{document,
                  counters_,
                  sharing_,
                  textStyles_,
                  rootStyles_,
+                 matcher_.GetNothing(),
                  document.GetHost().GetFontResolver(),
                  document.GetLengthContext()};
-    for (Element* element : elements_) {
-        element->pendingStyleBits &= static_cast<uint16_t>(~dom::kGathered);
-        const uint32_t mask = SolveElement(*element, run);
-        if (mask == 0) continue;
-        solved_.push_back(element);
-        if (mask != dom::kChangeSolved) document.NoteStyleChange(*element, mask);
+    const PseudoState pseudo(document);
+    MatchContext matching(pseudo);
+    level_.clear();
+    const auto visitFrom = [&](uint32_t first) {
+        for (uint32_t i = first; i < level_.size(); ++i) {
+            Node& node = *level_[i];
+            node.pendingStyleBits &= static_cast<uint16_t>(~dom::kGathered);
+            if (extent == Extent::All) {
+                node.styleSolved = 0;
+                if (node.IsElement()) MatchAfresh(static_cast<Element&>(node), matching);
+            }
+            if (SolveNode(node, run) || extent == Extent::All) AddChildren(node);
+        }
+    };
+    for (int32_t depth = roots_[0]->GetDepth();; ++depth) {
+        visitFrom(0);
+        const uint32_t reached = level_.size();
+        TakeRootsOfLevel(depth);
+        visitFrom(reached);
+        FinishLevel();
+        if (!level_.empty()) continue;
+        if (rootsTaken_ == roots_.size()) break;
+        depth = roots_[rootsTaken_]->GetDepth() - 1;
     }
-    for (Node* text : texts_)
-        SolveText(*text, run);
+    FinishLevel();
     rootFontSizeChanged_ |= run.rootFontSizeChanged;
 }
 
+// Must the children be looked at?
+bool StyleSolver::SolveNode(Node& node, StyleRun& run) {
+    if (!node.IsElement()) {
+        if (node.IsText()) SolveText(node, run);
+        return false;
+    }
+    auto& element = static_cast<Element&>(node);
+    const SolvedElement solved = SolveElement(element, run);
+    if (solved.changeMask != 0) {
+        solved_.push_back(&element);
+        if (solved.changeMask != dom::kChangeSolved) run.document.NoteStyleChange(element, solved.changeMask);
+    }
+    return solved.reachesChildren || run.rootFontSizeChanged;
+}
+
 void StyleSolver::SolveText(Node& text, StyleRun& run) {
-    text.pendingStyleBits &= static_cast<uint16_t>(~dom::kGathered);
     if (text.timesSolved < 2) ++text.timesSolved;
     uint32_t mask = SolveTextNode(text, run);
     if (!text.styleSolved) {
@@ -175,12 +215,6 @@ void StyleSolver::SolveText(Node& text, StyleRun& run) {
         mask |= dom::kChangeVisual;
     }
     if (mask != dom::kChangeSolved) run.document.NoteStyleChange(text, mask);
-}
-
-void StyleSolver::ClearDirtyProperties() {
-    for (Element* element : solved_)
-        element->GetDirtyProperties().Clear();
-    solved_.clear();
 }
 
 // --- Who comes into the layout, and who leaves it
@@ -237,11 +271,8 @@ void StyleSolver::RunAnimations(Document& document, IAnimationSide* animations) 
     if (lists.animation.empty() && lists.transition.empty()) return;
     animations->UpdateAnimations(document, view(lists.animation), view(lists.transition));
     taken_.swap(document.GetStyleDirtyNodes());
-    Gather(document);
-    taken_.clear();
-    SolveGathered(document);
+    SolveBelow(document, Extent::WhatChanged);
     if (rootStyles_.IsPending()) rootStyles_.Propagate(document);
-    ClearDirtyProperties();
 }
 
 }  // namespace qorvex::css

@@ -1,8 +1,11 @@
 // The frame's style step: who is looked at, in which order, and where the changes go.
 //
-// Invariants: parents are solved before their children; dirty properties stay on an element until the pass is
-// over, because its children read them; the lists below are kept from frame to frame for their memory, so
-// that a steady page allocates nothing here.
+// The walk goes down level by level from the dirty nodes, and below an element only as far as what it changed
+// may reach: a new background on the body costs the body, a new colour on it costs all who inherit it.
+//
+// Invariants: parents are solved before their children; dirty properties stay on an element until its
+// children have read them; the lists below are kept from frame to frame for their memory, so that a steady
+// page allocates nothing here.
 #pragma once
 
 #include "css/style/element_matching.h"
@@ -29,17 +32,21 @@ class StyleSolver {
     using NodeList = CssVector<dom::Node*>;
 
     void MatchDirtyElements(dom::Document& document);
-    void GatherAll(dom::Document& document);
-    void MatchAll(dom::Document& document);
-    void Gather(dom::Document& document);
-    void Visit(dom::Node& node);
-    void WalkGathered();
-    void SolveGathered(dom::Document& document);
+    // How much of the tree below the dirty nodes is looked at.
+    enum class Extent { WhatChanged, All };
+    void SolveBelow(dom::Document& document, Extent extent);
+    void AddRoots(dom::Document& document, Extent extent);
+    void AddRoot(dom::Node& node);
+    void TakeRootsOfLevel(int32_t depth);
+    void AddChildren(const dom::Node& node);
+    void FinishLevel();
+    void GiveBackRoom();
+    void MatchAfresh(dom::Element& element, MatchContext& context);
+    bool SolveNode(dom::Node& node, StyleRun& run);
     void SolveText(dom::Node& text, StyleRun& run);
     void UpdateLayoutPresence(dom::Document& document);
     void ExpandEntered(dom::Document& document);
     void RunAnimations(dom::Document& document, IAnimationSide* animations);
-    void ClearDirtyProperties();
 
     Rules rules_;
     StyleCounters& counters_;
@@ -49,10 +56,16 @@ class StyleSolver {
     RootStyles rootStyles_;
     bool rootFontSizeChanged_ = false;
 
-    NodeList queue_;
-    CssVector<dom::Element*> elements_;
-    NodeList texts_;
+    // The dirty nodes by depth, and how many of them were taken.
+    NodeList roots_;
+    uint32_t rootsTaken_ = 0;
+    NodeList level_;
+    NodeList nextLevel_;
+    // Elements with dirty properties: of the level in hand, and of the one above it.
     CssVector<dom::Element*> solved_;
+    CssVector<dom::Element*> solvedAbove_;
+    // The most that any of the lists held in this run.
+    uint32_t widest_ = 0;
     NodeSet<dom::Node*, MemoryTag::DOM> taken_;
 };
 

@@ -5,25 +5,17 @@
 namespace qorvex::css {
 
 LayoutStyleRefs::LayoutStyleRefs(const LayoutStyleRefs& other)
-    : layout(other.layout),
-      visual(other.visual),
-      text(other.text),
-      transform(other.transform),
+    : LaidOutStyle(other),
       animation(other.animation),
       transition(other.transition),
-      customProperties(other.customProperties),
-      written(other.written) {}
+      customProperties(other.customProperties) {}
 
 LayoutStyleRefs& LayoutStyleRefs::operator=(const LayoutStyleRefs& other) {
     if (this == &other) return *this;
-    layout = other.layout;
-    visual = other.visual;
-    text = other.text;
-    transform = other.transform;
+    LaidOutStyle::operator=(other);
     animation = other.animation;
     transition = other.transition;
     customProperties = other.customProperties;
-    written = other.written;
     return *this;
 }
 

@@ -52,7 +52,17 @@ struct RareStyle {
 // Index of the flag in `written`: the style groups in order, then the custom properties.
 inline constexpr size_t kCustomPropertiesFlag = kStyleGroupCount;
 
-struct LayoutStyleRefs {
+// What boxes and paint depend on, and all that the layout side keeps of a style.
+struct LaidOutStyle {
+    StyleHandle<LayoutStyle> layout;
+    StyleHandle<VisualStyle> visual;
+    StyleHandle<TextLayoutStyle> text;
+    StyleHandle<TransformStyle> transform;
+    // Set when a group is made private, cleared when layout has taken it over.
+    std::array<uint8_t, 7> written = {};
+};
+
+struct LayoutStyleRefs : LaidOutStyle {
     // All handles null; a node starts as a copy of DefaultStyles().
     LayoutStyleRefs() = default;
     LayoutStyleRefs(const LayoutStyleRefs& other);
@@ -60,16 +70,10 @@ struct LayoutStyleRefs {
     LayoutStyleRefs& operator=(const LayoutStyleRefs& other);
     LayoutStyleRefs& operator=(LayoutStyleRefs&&) noexcept = default;
 
-    StyleHandle<LayoutStyle> layout;
-    StyleHandle<VisualStyle> visual;
-    StyleHandle<TextLayoutStyle> text;
-    StyleHandle<TransformStyle> transform;
     StyleHandle<AnimationStyle> animation;
     StyleHandle<TransitionStyle> transition;
     RefPtr<const SharedCustomProperties> customProperties;  // null: none in force
     UniquePtr<RareStyle, MemoryTag::CSS> rare;
-    // Set when a group is made private, cleared when layout has taken it over.
-    std::array<uint8_t, 7> written = {};
 
     template <class Group>
     StyleHandle<Group>& Handle();

@@ -1,57 +1,52 @@
-// The winning declarations of one element, filled by selector matching and read by style solving.
+// The winning declarations of an element, filled by selector matching and read by style solving. Elements
+// that the same rules match share one state; it changes no more once it is filled.
+//
 // Declarations are borrowed from rules and from the element's own sets: the owner of a rule re-matches before
 // it dies.
 #pragma once
 
-#include <array>
 #include <cstdint>
+#include <span>
 
 #include "css/values/declaration.h"
+#include "css/values/property_set.h"
 
 namespace qorvex::css {
 
-class MatchState {
+// Counted without atomics: matching and solving have one thread.
+class MatchState : public RefCounted<MatchState, MemoryTag::CSS> {
   public:
-    static constexpr uint8_t kNoSlot = 255;
-
-    struct Slot {
-        const Declaration* declaration = nullptr;
-        uint8_t flags = 0;  // DeclarationFlags of the declaration
-        PropertyId property = PropertyId::kUnknown;
-    };
-
-    MatchState() { slotOfProperty_.fill(kNoSlot); }
-
-    // Costs one step per slot, not per property.
-    void Reset() {
-        for (const Slot& slot : slots_)
-            slotOfProperty_[IndexOf(slot.property)] = kNoSlot;
-        slots_.clear();
-        customProperties_.clear();
+    // Null when nothing was declared for the property.
+    const Declaration* Find(PropertyId id) const {
+        return properties_.Contains(id) ? slots_[properties_.CountBelow(id)] : nullptr;
     }
-
-    const Slot* Find(PropertyId id) const {
-        uint8_t slot = slotOfProperty_[IndexOf(id)];
-        return slot == kNoSlot ? nullptr : &slots_[slot];
-    }
-    void Store(const Declaration& declaration) {
-        PropertyId id = declaration.property();
-        uint8_t& index = slotOfProperty_[IndexOf(id)];
-        if (index == kNoSlot) {
-            index = static_cast<uint8_t>(slots_.size());
-            slots_.emplace_back();
-        }
-        slots_[index] = {&declaration, declaration.flags(), id};
-    }
-    const CssSmallVector<Slot, 2>& slots() const { return slots_; }
-
-    CustomPropertyMap& customProperties() { return customProperties_; }
+    // Which properties have a declaration, and which of these are computed from what stands around them.
+    const PropertySet& properties() const { return properties_; }
+    const PropertySet& inheriting() const { return inheriting_; }
+    const PropertySet& expressions() const { return expressions_; }
+    // Declared by the element's own sets, which may change without any rule changing.
+    const PropertySet& own() const { return own_; }
     const CustomPropertyMap& customProperties() const { return customProperties_; }
 
+    // --- Filling
+    void Clear();
+    void FillCustomProperties(const CustomPropertyMap& map) { customProperties_ = map; }
+    // `winners` is indexed by property and read where `properties` has a member.
+    void Fill(const PropertySet& properties, const PropertySet& own, const Declaration* const* winners);
+
+    // The properties whose declaration is not the same in both; all when a custom property differs, since any
+    // property may depend on it.
+    static PropertySet Difference(const MatchState& a, const MatchState& b);
+
   private:
-    std::array<uint8_t, kLonghandCount> slotOfProperty_;
-    CssSmallVector<Slot, 2> slots_;
+    PropertySet properties_;
+    PropertySet inheriting_;
+    PropertySet expressions_;
+    PropertySet own_;
+    CssVector<const Declaration*> slots_;  // in the order of `properties_`
     CustomPropertyMap customProperties_;
 };
+
+using MatchStatePtr = RefPtr<const MatchState>;
 
 }  // namespace qorvex::css

@@ -168,12 +168,12 @@ bool Parse(std::string_view text, TransitionProperty& out) {
         if (EqualsIgnoreCase(item, "all")) return true;
         target.kind = TransitionTargetKind::None;
         if (EqualsIgnoreCase(item, "none")) return true;
-        if (item.empty()) return false;
+        if (!IsIdentifier(item)) return false;
         target.property = FindProperty(item);
         if (target.property != PropertyId::kUnknown)
             target.kind = TransitionTargetKind::Property;
         else
-            LogWarning("Transition property ", item, " is not recognized.");
+            LogDebug("Transition property ", item, " is not recognized.");
         return true;
     });
 }

@@ -18,8 +18,12 @@ bool ParseUrl(std::string_view text, size_t start, CssString& out) {
     std::string_view url;
     if (!TakeFunction(text.substr(start), "url", url)) return false;
     if (!url.empty() && (url[0] == '"' || url[0] == '\'')) {
-        if (url.size() < 2 || url.back() != url[0]) return false;
+        const char quote = url[0];
+        if (url.size() < 2 || url.back() != quote) return false;
         url = url.substr(1, url.size() - 2);
+        if (HoldsUnescaped(url, quote)) return false;
+    } else if (HoldsUnescaped(url, '"') || HoldsUnescaped(url, '\'')) {
+        return false;
     }
     if (url.empty()) return false;
     out = url;
@@ -27,7 +31,7 @@ bool ParseUrl(std::string_view text, size_t start, CssString& out) {
 }
 
 void SerialiseUrl(std::string_view url, CssString& out) {
-    char quote = url.find('"') == std::string_view::npos ? '"' : '\'';
+    const char quote = QuoteFor(url);
     out.append("url(");
     out.push_back(quote);
     out.append(url);

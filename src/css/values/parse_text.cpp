@@ -18,17 +18,6 @@ void Serialise(const FontWeight& value, CssString& out) {
 
 namespace {
 
-bool IsNameByte(char c) {
-    return IsDigit(c) || (ToLower(c) >= 'a' && ToLower(c) <= 'z') || c == '-' || c == '_' || c == '\\' ||
-           static_cast<unsigned char>(c) >= 128;
-}
-
-bool IsIdentifier(std::string_view word) {
-    if (word.empty() || IsDigit(word[0])) return false;
-    if (word[0] == '-' && (word.size() == 1 || IsDigit(word[1]))) return false;
-    return std::all_of(word.begin(), word.end(), IsNameByte);
-}
-
 bool IsQuoted(std::string_view text) {
     return text.size() >= 2 && (text[0] == '"' || text[0] == '\'') && text.back() == text[0];
 }
@@ -56,17 +45,30 @@ bool ParseName(std::string_view text, CssString& out) {
     return !out.empty();
 }
 
+// Words that mean something else when they stand alone without quotes.
+bool IsReserved(std::string_view name) {
+    return EqualsIgnoreCase(name, "none") || EqualsIgnoreCase(name, "inherit") ||
+           EqualsIgnoreCase(name, "initial");
+}
+
+void SerialiseQuoted(std::string_view name, CssString& out) {
+    const char quote = QuoteFor(name);
+    out.push_back(quote);
+    out.append(name);
+    out.push_back(quote);
+}
+
 void SerialiseName(std::string_view name, CssString& out) {
-    bool plain = !name.empty() && !name.starts_with(' ') && !name.ends_with(' ') &&
+    bool plain = !name.empty() && !IsReserved(name) && !name.starts_with(' ') && !name.ends_with(' ') &&
                  name.find("  ") == std::string_view::npos;
     WordReader words(name);
     std::string_view word;
     while (plain && words.Next(word))
         plain = IsIdentifier(word);
-    char quote = name.find('"') == std::string_view::npos ? '"' : '\'';
-    if (!plain) out.push_back(quote);
-    out.append(name);
-    if (!plain) out.push_back(quote);
+    if (plain)
+        out.append(name);
+    else
+        SerialiseQuoted(name, out);
 }
 
 bool ParseSpacing(std::string_view text, SpacingKind& kind, Length& length) {
@@ -136,8 +138,10 @@ void Serialise(const AnimationName& value, CssString& out) {
     SerialiseList(value, "none", out, [](const CssString& name, CssString& text) {
         if (name.empty())
             text.append("none");
+        else if (IsIdentifier(name) && !IsReserved(name))
+            text.append(name);
         else
-            SerialiseName(name, text);
+            SerialiseQuoted(name, text);
     });
 }
 

@@ -24,6 +24,12 @@ class PropertySet {
     constexpr bool Empty() const { return (words_[0] | words_[1]) == 0; }
     constexpr void Clear() { words_[0] = words_[1] = 0; }
     constexpr int Count() const { return std::popcount(words_[0]) + std::popcount(words_[1]); }
+    // Members with a smaller number.
+    constexpr uint32_t CountBelow(PropertyId id) const {
+        const uint64_t below = Bit(id) - 1;
+        if (IndexOf(id) < 64) return static_cast<uint32_t>(std::popcount(words_[0] & below));
+        return static_cast<uint32_t>(std::popcount(words_[0]) + std::popcount(words_[1] & below));
+    }
     constexpr bool Intersects(const PropertySet& other) const {
         return ((words_[0] & other.words_[0]) | (words_[1] & other.words_[1])) != 0;
     }

@@ -1,5 +1,7 @@
 #include "css/values/text_reader.h"
 
+#include <algorithm>
+
 namespace qorvex::css {
 
 std::string_view Trim(std::string_view text) {
@@ -19,6 +21,29 @@ bool EqualsIgnoreCase(std::string_view a, std::string_view b) {
 
 bool StartsWithIgnoreCase(std::string_view text, std::string_view prefix) {
     return text.size() >= prefix.size() && EqualsIgnoreCase(text.substr(0, prefix.size()), prefix);
+}
+
+namespace {
+
+bool IsNameByte(char c) {
+    return IsDigit(c) || (ToLower(c) >= 'a' && ToLower(c) <= 'z') || c == '-' || c == '_' || c == '\\' ||
+           static_cast<unsigned char>(c) >= 128;
+}
+
+}  // namespace
+
+bool IsIdentifier(std::string_view word) {
+    if (word.empty() || IsDigit(word[0])) return false;
+    if (word[0] == '-' && (word.size() == 1 || IsDigit(word[1]))) return false;
+    return std::all_of(word.begin(), word.end(), IsNameByte);
+}
+
+bool HoldsUnescaped(std::string_view text, char c) {
+    for (size_t i = 0; i < text.size(); ++i) {
+        if (text[i] == c) return true;
+        if (text[i] == '\\') ++i;
+    }
+    return false;
 }
 
 bool TakeFunction(std::string_view text, std::string_view name, std::string_view& arguments) {

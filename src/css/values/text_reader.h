@@ -22,6 +22,15 @@ constexpr char ToLower(char c) {
 [[nodiscard]] bool EqualsIgnoreCase(std::string_view a, std::string_view b);
 [[nodiscard]] bool StartsWithIgnoreCase(std::string_view text, std::string_view prefix);
 
+// A name without quotes; escapes count as letters.
+[[nodiscard]] bool IsIdentifier(std::string_view word);
+// True when the character stands there without a backslash before it.
+[[nodiscard]] bool HoldsUnescaped(std::string_view text, char c);
+// The quotes that a text which was in quotes can be put into again; escapes in it are kept as written.
+[[nodiscard]] inline char QuoteFor(std::string_view text) {
+    return HoldsUnescaped(text, '"') ? '\'' : '"';
+}
+
 // For text "name(arguments)" with that name: the arguments, trimmed. Case is ignored.
 [[nodiscard]] bool TakeFunction(std::string_view text, std::string_view name, std::string_view& arguments);
 

@@ -6,11 +6,13 @@
 #include "core/logging/log.h"
 #include "core/memory/atoms.h"
 #include "css/parser/convert.h"
+#include "css/style/computed_serializer.h"
 #include "css/values/property_values.h"
 #include "css/values/value_text.h"
 #include "dom/document.h"
 #include "dom/document_host.h"
 #include "dom/style_engine.h"
+#include "script/class_installation.h"
 #include "script/member_callbacks.h"
 
 namespace qorvex::script {
@@ -34,6 +36,7 @@ bool RefuseComputed(const StyleHolder& holder, const ScriptCall& call, const cha
 }
 
 void SetDeclaration(dom::Element& element, Declaration declaration) {
+    css::ResolveImageUrls(declaration, element.GetDocument()->GetURL());
     if (element.EnsureInlineStyle().Set(std::move(declaration))) MarkInlineStyleChanged(element);
 }
 
@@ -83,18 +86,17 @@ const char* UnitName(LengthUnit unit) {
 }  // namespace
 
 void StyleHolder::Release() {
-    if (count_.fetch_sub(1, std::memory_order_acq_rel) == 1) Delete<MemoryTag::DOM>(this);
+    if (count_.fetch_sub(1, std::memory_order_acq_rel) == 1) delete this;
 }
 
 JSValueRef MakeStyleDeclaration(JSContextRef context, dom::Element& element, StyleForm form) {
     const JSClassRef style_class = GetScriptClassTable()[StyleHolder::kScriptClass];
-    auto* holder = New<StyleHolder, MemoryTag::DOM>(element, form);
+    auto* holder = new StyleHolder(element, form);
     const JSObjectRef object =
         JSObjectMake(context, style_class, PackPrivate(holder, StyleHolder::kScriptClass, false));
-    const ScriptingContext* page = GetScriptingContext(context);
-    if (page) {
-        JSObjectSetPrototype(context, object,
-                             page->prototypes[static_cast<size_t>(StyleHolder::kScriptClass)]);
+    if (ScriptingContext* page = GetScriptingContext(context)) {
+        if (const JSObjectRef prototype = GetPrototype(*page, StyleHolder::kScriptClass))
+            JSObjectSetPrototype(context, object, prototype);
     }
     return object;
 }
@@ -110,7 +112,7 @@ JSValueRef ReadStyleProperty(StyleHolder& holder, ScriptCall& call, PropertyId i
     if (!css::IsLonghand(id)) return JSValueMakeNull(call.context);
     css::CssString text;
     if (holder.IsComputed()) {
-        css::SerialiseValue(id, holder.element().GetStyle().Field(id), text);
+        css::SerialiseComputed(id, holder.element().GetStyle(), text);
         return ToScript(call.context, text.view());
     }
     const css::StyleDeclarationSet* style = holder.element().GetInlineStyle();

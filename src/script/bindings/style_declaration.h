@@ -12,6 +12,7 @@
 #include "css/values/property_id.h"
 #include "dom/element.h"
 #include "script/class_table.h"
+#include "script/pooled_memory.h"
 
 namespace qorvex::script {
 
@@ -26,6 +27,8 @@ class StyleHolder {
     static constexpr ScriptClass kScriptClass = ScriptClass::CSSStyleDeclaration;
     // What the argument-count errors of its methods call it.
     static constexpr const char* kErrorClassName = "ElementStyleExtractor";
+
+    QORVEX_POOLED(StyleHolder, 32)
 
     StyleHolder(dom::Element& element, StyleForm form) : element_(&element), form_(form) {}
 

@@ -97,8 +97,9 @@ void SetCustomProperty(StyleHolder& holder, std::string_view name, std::string_v
     const Atom atom = document.Intern(name.substr(2));
     if (!value.empty()) {
         const auto expression = static_cast<uint8_t>(css::FindExpressionFlags(value) | flags);
-        element.EnsureInlineStyle().SetCustomProperty(
-            atom, css::MakeCustomProperty(value, expression, document.GetStrings()));
+        css::CustomPropertyPtr record = css::MakeCustomProperty(value, expression, document.GetStrings());
+        if (!record) return;
+        element.EnsureInlineStyle().SetCustomProperty(atom, std::move(record));
     } else if (!InlineSet(holder) || !InlineSet(holder)->RemoveCustomProperty(atom)) {
         return;
     }
@@ -109,7 +110,7 @@ void SetProperty(StyleHolder& holder, ScriptCall& call, std::string_view name, J
                  std::optional<std::string_view> priority) {
     const uint8_t flags = priority && *priority == "important" ? css::kImportant : 0;
     const PropertyId id = css::FindProperty(name);
-    if (name.starts_with("--") && !holder.IsComputed()) {
+    if (name.size() > 2 && name.starts_with("--") && !holder.IsComputed()) {
         ScriptText text;
         if (text.Read(call.context, value, call.exception))
             SetCustomProperty(holder, name, text.view(), flags);

@@ -92,6 +92,10 @@ class Log final : public qorvex::Logging::ILogHandler {
             if (severity >= at_least) result.push_back(text);
         return result;
     }
+    std::vector<std::pair<qorvex::Logging::Severity, std::string>> LinesWithSeverity() const {
+        std::lock_guard<std::mutex> lock(mutex_);
+        return lines_;
+    }
     bool Contains(const std::string& text) const { return Count(text) > 0; }
     size_t Count(const std::string& text) const {
         size_t count = 0;

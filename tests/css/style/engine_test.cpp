@@ -317,7 +317,6 @@ TEST_F(Engine, DeepPagesAndDeepExpressionsAreSolvedWithoutRecursion) {
 
 // --- Memory: these records are in every element.
 
-static_assert(sizeof(MatchState) <= 200);
 static_assert(sizeof(LayoutStyleRefs) <= 72);
 static_assert(sizeof(PropertySet) == 16);
 

@@ -2,6 +2,7 @@
 
 #include "css/parser/convert.h"
 #include "css/style/computed_serializer.h"
+#include "css/values/value_text.h"
 #include "dom/parsed_html.h"
 #include "script/make_handle.h"
 
@@ -49,7 +50,9 @@ void StyleTest::AddSheet(std::string_view text, dom::Element* owner, std::string
 
 std::string StyleTest::Computed(const dom::Element& element, std::string_view property) {
     Solve();
-    return std::string(std::string_view(SerializeComputed(FindProperty(property), element.GetStyle())));
+    CssString out;
+    SerialiseComputed(FindProperty(property), element.GetStyle(), out);
+    return std::string(std::string_view(out));
 }
 
 std::string StyleTest::Computed(std::string_view id, std::string_view property) {
@@ -63,7 +66,11 @@ std::string StyleTest::DumpAll() {
         if (!node->IsElement() && !node->IsText()) continue;
         out.append(node->GetNodeName().view());
         out.append("\n");
-        AppendComputedStyle(node->GetStyle(), out);
+        for (size_t i = 0; i < kLonghandCount; ++i) {
+            const auto id = static_cast<PropertyId>(i);
+            SerialiseValue(id, node->GetStyle().Field(id), out);
+            out.append("\n");
+        }
         const TextLayoutDerived& text = *node->GetStyle().text;
         char line[128];
         std::snprintf(line, sizeof line, "%g %g %g %g %d %d\n", text.computedFontSize,

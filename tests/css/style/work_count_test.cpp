@@ -132,7 +132,10 @@ TEST_F(WorkCount, QuickRefusalTriesNoRuleOfOtherIdsAndTags) {
     Load("<p id='n7'></p>", sheet);
     host_->hovered = &Find("n7");
     EXPECT_EQ(Computed("n7", "width"), "1px");
-    EXPECT_EQ(engine_->GetAuthorRules().GetComplexKeys().size(), 200u);
+    const RuleIndex& rules = engine_->GetAuthorRules();
+    EXPECT_EQ(rules.GetComplexRuleCount(), 200u);
+    EXPECT_EQ(rules.FindById(Find("n7").GetId())->complex.size(), 1u);
+    EXPECT_TRUE(rules.GetUnkeyed().complex.empty());
 }
 
 }  // namespace

@@ -107,16 +107,33 @@ TEST_F(ComputedStyleTest, SetsKeepOrderAndSeeNoChange) {
     EXPECT_FALSE(set.Remove(PropertyId::Width));
 }
 
-TEST_F(ComputedStyleTest, MatchStateHoldsTheLastOfEach) {
-    MatchState state;
-    Declaration first = Declaration::Make<PropertyId::Width>(Extent::Pixels(1));
-    Declaration second = Declaration::Make<PropertyId::Width>(Extent::Pixels(2), kImportant);
-    state.Store(first);
-    state.Store(second);
-    ASSERT_EQ(state.slots().size(), 1u);
-    EXPECT_EQ(state.Find(PropertyId::Width)->declaration, &second);
-    state.Reset();
-    EXPECT_EQ(state.Find(PropertyId::Width), nullptr);
+TEST_F(ComputedStyleTest, MatchStatesTellWhatDiffers) {
+    const Declaration width = Declaration::Make<PropertyId::Width>(Extent::Pixels(1));
+    const Declaration color = Declaration::Inherit(PropertyId::Color);
+    const Declaration other = Declaration::Make<PropertyId::Color>(Color::White());
+    const Declaration delay = Declaration::Initial(PropertyId::TransitionDelay);
+    const auto fill = [](MatchState& state, std::initializer_list<const Declaration*> declarations) {
+        const Declaration* winners[kLonghandCount] = {};
+        PropertySet set;
+        for (const Declaration* declaration : declarations) {
+            winners[IndexOf(declaration->property())] = declaration;
+            set.Add(declaration->property());
+        }
+        state.Fill(set, {}, winners);
+    };
+    MatchState a, b, nothing;
+    fill(a, {&width, &color, &delay});
+    fill(b, {&width, &other});
+    EXPECT_EQ(a.Find(PropertyId::Width), &width);
+    EXPECT_EQ(a.Find(PropertyId::Color), &color);
+    EXPECT_EQ(a.Find(PropertyId::TransitionDelay), &delay);
+    EXPECT_EQ(a.Find(PropertyId::Height), nullptr);
+    EXPECT_EQ(a.inheriting().Count(), 1);
+    const PropertySet different = MatchState::Difference(a, b);
+    EXPECT_EQ(different.Count(), 2);
+    EXPECT_TRUE(different.Contains(PropertyId::Color) && different.Contains(PropertyId::TransitionDelay));
+    EXPECT_EQ(MatchState::Difference(a, nothing), a.properties());
+    EXPECT_TRUE(MatchState::Difference(a, a).Empty());
 }
 
 TEST_F(ComputedStyleTest, ExpressionsKeepTheirText) {

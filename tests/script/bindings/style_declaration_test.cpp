@@ -65,6 +65,10 @@ TEST_F(StyleDeclarationTest, WorksByNameAndAsText) {
     EXPECT_EQ(Run("s.setProperty('margin-top', '4px'); s.getPropertyValue('margin-top') + s.marginTop"),
               "4px4px");
     EXPECT_EQ(Run("s.setProperty('--own', ' 7px'); s.getPropertyValue('--own').trim()"), "7px");
+    // What cannot be a variable's value leaves the old one.
+    EXPECT_EQ(Run("s.setProperty('--own', 'var(--'); s.setProperty('--', '1px'); s.width = 'var(--own)';"
+                  "s.getPropertyValue('--own').trim()"),
+              "7px");
     EXPECT_EQ(
         Run("s.removeProperty('margin-top') + s.getPropertyValue('margin-top') + s.getPropertyValue('nope')"),
         "4px");

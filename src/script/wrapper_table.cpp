@@ -1,0 +1,236 @@
+#include "script/wrapper_table.h"
+
+#include <JavaScriptCore/JavaScript.h>
+
+#include "script/class_installation.h"
+#include "script/native_private.h"
+#include "script/scripting_context.h"
+#include "script/scripting_handle_enabled.h"
+
+namespace qorvex::script {
+
+namespace {
+
+// What the native behind a wrapper takes at least: an event 192 bytes, an element 600 and more. Script alone
+// would count 64, and a loop that makes elements could hold a hundred megabytes before the first collection.
+constexpr size_t kNativeBytes = 256;
+
+template <class F>
+decltype(auto) WithHandle(const void* packed, F&& use) {
+    const NativePrivate found = UnpackPrivate(packed);
+    auto* handle = static_cast<ScriptingHandleEnabled*>(found.object);
+    if (found.has_weak) return use(static_cast<ScriptingHandleEnabledRefCountedWithWeak*>(handle));
+    return use(static_cast<ScriptingHandleEnabledRefCounted*>(handle));
+}
+
+}  // namespace
+
+WrapperTable::~WrapperTable() {
+    if (page_) Stop();
+}
+
+void WrapperTable::Start(ScriptingContext& page) {
+    page_ = &page;
+    group_ = JSContextGetGroup(page.context);
+    AddHeapObserver(group_, *this);
+}
+
+void WrapperTable::Stop() {
+    if (!page_) return;
+    RemoveHeapObserver(*this);
+    HashMap<JSObjectRef, Entry, MemoryTag::DOM> entries;
+    entries.swap(entries_);
+    for (auto& [object, entry] : entries) {
+        if (entry.slot->weak) dead_weak_.push_back(entry.slot->weak);
+        WithHandle(entry.packed, [](auto* handle) { handle->DetachWrapper(); });
+        dead_.push_back(entry.packed);
+    }
+    for (const ScriptWeakRef reference : dead_weak_)
+        ReleaseWeakReference(group_, reference);
+    // Natives may still ask for wrappers while they end; they get none.
+    page_ = nullptr;
+    const auto dead = std::move(dead_);
+    for (const void* packed : dead)
+        WithHandle(packed, [](auto* handle) { handle->Release(); });
+    for (Chunk* chunk = chunks_.exchange(nullptr); chunk;) {
+        Chunk* next = chunk->next;
+        Delete<MemoryTag::DOM>(chunk);
+        chunk = next;
+    }
+    free_ = nullptr;
+    blanks_ = {};
+    let_go_.clear();
+    weak_.clear();
+    dead_weak_.clear();
+}
+
+JSObjectRef WrapperTable::Add(ScriptClass script_class, const void* packed) {
+    if (!page_ || !GetPrototype(*page_, script_class)) return nullptr;
+    Slot* slot =
+        HasPropertyRules(script_class) ? MakeWithRules(script_class, packed) : TakeBlank(script_class);
+    if (!slot) return nullptr;
+    entries_.insert_or_assign(slot->object, Entry{packed, slot});
+    return slot->object;
+}
+
+void WrapperTable::Hold(JSObjectRef wrapper) {
+    const Entry* entry = entries_.get(wrapper);
+    if (!entry || !entry->slot->weak) return;
+    // While the engine is entered no collection comes to its end, so the reference tells the truth until the
+    // root stands. One that had ended before is heard of on the way in: then there is no wrapper any more.
+    const ScriptEngineLock lock(page_->context);
+    entry = entries_.get(wrapper);
+    if (!entry || !GetWeakObject(entry->slot->weak)) return;
+    entry->slot->root.store(wrapper, std::memory_order_release);
+    ReleaseWeakReference(group_, std::exchange(entry->slot->weak, nullptr));
+}
+
+void WrapperTable::LetGo(JSObjectRef wrapper) {
+    const Entry* entry = entries_.get(wrapper);
+    if (!entry || entry->slot->let_go || entry->slot->weak) return;
+    // Most come back at once: the reference that a call holds, a node on its way from one parent to another.
+    entry->slot->let_go = true;
+    let_go_.push_back(entry->slot);
+}
+
+void WrapperTable::Settle() {
+    if (!page_ || (let_go_.empty() && dead_.empty() && dead_weak_.empty())) return;
+    {
+        const ScriptEngineLock lock(page_->context);
+        for (Slot* slot : let_go_)
+            TurnOver(slot);
+        let_go_.clear();
+        for (const ScriptWeakRef reference : dead_weak_)
+            ReleaseWeakReference(group_, reference);
+        dead_weak_.clear();
+    }
+    // Destructors may let go of others, and run script in the end.
+    const auto dead = std::move(dead_);
+    dead_.clear();
+    for (const void* packed : dead)
+        WithHandle(packed, [](auto* handle) { handle->Release(); });
+}
+
+void WrapperTable::TurnOver(Slot* slot) {
+    slot->let_go = false;
+    const Entry* entry = slot->object ? entries_.get(slot->object) : nullptr;
+    if (!entry || !WithHandle(entry->packed, [](auto* handle) { return handle->IsHeldByWrapperOnly(); }))
+        return;
+    slot->weak = MakeWeakReference(group_, slot->object);
+    slot->root.store(nullptr, std::memory_order_release);
+    if (!std::exchange(slot->listed, true)) weak_.push_back(slot);
+}
+
+void WrapperTable::MarkRoots(Marker& marker) {
+    for (Chunk* chunk = chunks_.load(std::memory_order_acquire); chunk;
+         chunk = chunk->next.load(std::memory_order_acquire)) {
+        for (Slot& slot : chunk->slots) {
+            if (const JSObjectRef object = slot.root.load(std::memory_order_acquire)) marker.Mark(object);
+        }
+    }
+}
+
+void WrapperTable::OnCollected() {
+    size_t kept = 0;
+    for (Slot* slot : weak_) {
+        if (slot->weak && GetWeakObject(slot->weak)) {
+            weak_[kept++] = slot;
+            continue;
+        }
+        slot->listed = false;
+        if (!slot->weak) continue;
+        const Entry* entry = entries_.get(slot->object);
+        WithHandle(entry->packed, [](auto* handle) { handle->DetachWrapper(); });
+        dead_.push_back(entry->packed);
+        dead_weak_.push_back(slot->weak);
+        entries_.erase(slot->object);
+        FreeSlot(slot);
+    }
+    weak_.resize(kept);
+}
+
+// --- Slots
+
+WrapperTable::Slot* WrapperTable::TakeSlot(JSObjectRef object) {
+    if (!free_) {
+        Chunk* chunk = New<Chunk, MemoryTag::DOM>();
+        for (Slot& slot : chunk->slots)
+            FreeSlot(&slot);
+        chunk->next.store(chunks_.load(std::memory_order_relaxed), std::memory_order_relaxed);
+        chunks_.store(chunk, std::memory_order_release);
+    }
+    Slot* slot = std::exchange(free_, free_->next);
+    slot->object = object;
+    slot->root.store(object, std::memory_order_release);
+    return slot;
+}
+
+void WrapperTable::FreeSlot(Slot* slot) {
+    slot->root.store(nullptr, std::memory_order_release);
+    slot->object = nullptr;
+    slot->weak = nullptr;
+    slot->next = free_;
+    free_ = slot;
+}
+
+// --- Objects
+
+WrapperTable::Slot* WrapperTable::TakeBlank(ScriptClass script_class) {
+    Blanks& blanks = blanks_[static_cast<size_t>(script_class)];
+    if (!blanks.first) MakeBlanks(script_class);
+    if (!blanks.first) return nullptr;
+    return std::exchange(blanks.first, blanks.first->next);
+}
+
+JSValueRef WrapperTable::AcceptBlanks(JSContextRef context, JSObjectRef, JSObjectRef, size_t count,
+                                      const JSValueRef objects[], JSValueRef*) {
+    ScriptingContext* page = GetScriptingContext(context);
+    Blanks* blanks = page ? page->wrappers.filling_ : nullptr;
+    for (size_t i = 0; blanks && i < count; ++i) {
+        Slot* slot = page->wrappers.TakeSlot(const_cast<JSObjectRef>(objects[i]));
+        slot->next = blanks->first;
+        blanks->first = slot;
+    }
+    return JSValueMakeUndefined(context);
+}
+
+void WrapperTable::MakeBlanks(ScriptClass script_class) {
+    // What has piled up since the last frame goes here too: a script may make objects without end.
+    Settle();
+    const auto index = static_cast<size_t>(script_class);
+    JSContextRef context = page_->context;
+    Blanks& blanks = blanks_[index];
+    filling_ = &blanks;
+    JSValueRef exception = nullptr;
+    if (!blanks.maker) {
+        const JSValueRef arguments[] = {page_->prototypes[index],
+                                        JSObjectMakeFunctionWithCallback(context, nullptr, AcceptBlanks)};
+        const JSValueRef maker =
+            JSObjectCallAsFunction(context, page_->builders[static_cast<size_t>(ClassBuilder::BlanksOf)],
+                                   nullptr, 2, arguments, &exception);
+        if (AsObject(context, maker)) {
+            blanks.maker = const_cast<JSObjectRef>(maker);
+            JSObjectSetPropertyAtIndex(context, page_->class_keeper,
+                                       static_cast<unsigned>(kClassKeeperUses + index), maker, nullptr);
+        }
+    }
+    if (blanks.maker) JSObjectCallAsFunction(context, blanks.maker, nullptr, 0, nullptr, &exception);
+    filling_ = nullptr;
+    if (blanks.first) return ReportNativeMemory(context, kBlanksAtOnce * kNativeBytes);
+    // The engine runs no script now: out of stack, or being stopped.
+    const JSObjectRef object = JSObjectMake(context, nullptr, nullptr);
+    JSObjectSetPrototype(context, object, page_->prototypes[index]);
+    blanks.first = TakeSlot(object);
+    blanks.first->next = nullptr;
+}
+
+WrapperTable::Slot* WrapperTable::MakeWithRules(ScriptClass script_class, const void* packed) {
+    JSClassRef engine_class = GetScriptClassTable()[script_class];
+    if (!engine_class) return nullptr;
+    if (let_go_.size() >= Chunk::kSlots || dead_.size() >= Chunk::kSlots) Settle();
+    const JSObjectRef object = JSObjectMake(page_->context, engine_class, const_cast<void*>(packed));
+    JSObjectSetPrototype(page_->context, object, page_->prototypes[static_cast<size_t>(script_class)]);
+    return TakeSlot(object);
+}
+
+}  // namespace qorvex::script

@@ -1,0 +1,100 @@
+// What a node of a settled page costs, everything counted: the node, its display element and link, its layout
+// handle, its share of style groups and of match states, its place in the lists of its parent, and Yoga's
+// node.
+#include <malloc.h>
+#include <yoga/Yoga.h>
+
+#include "css/style/style_fixture.h"
+#include "display/dirty_region.h"
+#include "dom/character_data.h"
+#include "layout/perform_layout.h"
+
+namespace qorvex::css::test {
+namespace {
+
+// A block of the heap costs more than was asked for.
+constexpr size_t kBlockOverhead = 16;
+
+size_t YogaNodeBytes() {
+    YGNode* node = YGNodeNew();
+    const size_t bytes = malloc_usable_size(node) + kBlockOverhead + sizeof(YGNode*);
+    YGNodeFree(node);
+    return bytes;
+}
+
+class Memory : public StyleTest {
+  protected:
+    // Bytes of one more node below the body, on average over many.
+    size_t BytesOf(std::string_view node, std::string_view bodyDisplay, std::string_view sheet) {
+        constexpr int kFew = 500, kMany = 1500;
+        const size_t few = BytesOfPage(node, kFew, bodyDisplay, sheet);
+        const size_t many = BytesOfPage(node, kMany, bodyDisplay, sheet);
+        return (many - few) / (kMany - kFew);
+    }
+
+  private:
+    size_t BytesOfPage(std::string_view node, int count, std::string_view bodyDisplay,
+                       std::string_view sheet) {
+        std::string body;
+        // In rows, so that the capacity of one long list does not count.
+        for (int i = 0; i < count; ++i)
+            body += (i % 20 ? "" : i ? "</section><section>" : "<section>") + std::string(node);
+        Load("", "body { display: " + std::string(bodyDisplay) + " } " + std::string(sheet));
+        Settle();
+        const size_t bytes = allocator_.LiveBytes(), blocks = allocator_.LiveBlocks();
+        Body().SetInnerHTML(body + "</section>");
+        Settle();
+        size_t flexNodes = 0;
+        for (dom::Node* at = &Body(); at; at = at->GetNextInTree(&Body())) {
+            if (const layout::LayoutHandle* handle = at->GetLayoutHandle())
+                flexNodes += handle->node().flex != nullptr;
+        }
+        return allocator_.LiveBytes() - bytes + (allocator_.LiveBlocks() - blocks) * kBlockOverhead +
+               flexNodes * YogaNodeBytes();
+    }
+
+    // Frames until the sets of changed nodes have given their memory back.
+    void Settle() {
+        for (int i = 0; i < 24; ++i) {
+            Body().SetAttribute("title", i % 2 ? "a" : "b");
+            Body().MarkStyleDirty();
+            Solve();
+            const layout::LayoutWork work = document_->UpdateLayoutStyles(false);
+            layout::LayoutUpdatePtr update = MakeRef<layout::LayoutUpdateData>();
+            document_->CommitLayout(*update, nullptr, nullptr);
+            dsp::DirtyRegion dirty;
+            layout::LayoutPass pass{*update, document_->GetLayoutTree().Root(), 800, 600, dirty};
+            if (work == layout::LayoutWork::Layout) layout::PerformLayout(pass);
+            layout::SyncTrees(*update);
+        }
+    }
+};
+
+constexpr std::string_view kSheet =
+    ".row { display: flex; width: 50px; margin: 2px; padding: 4px; border: 1px solid red; color: blue }";
+
+TEST_F(Memory, AStyledElementOfASimplePage) {
+    const size_t bytes =
+        BytesOf("<div class='row'></div>", "simple", ".row { width: 50px; padding: 4px; color: red }");
+    RecordProperty("bytes", static_cast<int>(bytes));
+    EXPECT_LT(bytes, 1000u);
+}
+
+// Yoga's own node comes on top, and costs two thirds of all the rest.
+TEST_F(Memory, AStyledElementOfAFlexPage) {
+    const size_t bytes = BytesOf("<div class='row'></div>", "block", kSheet);
+    RecordProperty("bytes", static_cast<int>(bytes));
+    EXPECT_LT(bytes - YogaNodeBytes(), 1000u);
+}
+
+// Without its glyphs: this page has no fonts.
+TEST_F(Memory, ATextOfTenCharacters) {
+    // The element around it is taken off.
+    const size_t with = BytesOf("<div class='row'>0123456789</div>", "simple", ".row { color: red }");
+    const size_t without = BytesOf("<div class='row'></div>", "simple", ".row { color: red }");
+    RecordProperty("bytes", static_cast<int>(with - without));
+    EXPECT_LT(with - without, 1130u);
+}
+
+}  // namespace
+}  // namespace qorvex::css::test
