@@ -88,6 +88,12 @@ inline constexpr size_t kMaxGradientTiles = 4096;
 inline constexpr float kSmallestFitSize = 6;
 inline constexpr float kLargestFitSize = 8192;
 
+/// Characters of one font whose shapes are made ahead; more than a page of Chinese shows at once.
+inline constexpr size_t kPreloadedCharacters = 4096;
+
+/// Bytes of a glyph table and of all pages of a bitmap font that a client gives.
+inline constexpr size_t kBitmapFontBytes = 256 * 1024 * 1024;
+
 /// Parentheses open at once in a CSS value or selector; beyond it a parse ends with "memory exhausted". Each
 /// level stands for two entries of a parser stack of 10,000.
 inline constexpr size_t kMaxCssNesting = 5000;

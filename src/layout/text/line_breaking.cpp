@@ -2,6 +2,8 @@
 
 #include <qorvex/text_services.h>
 
+#include <limits>
+
 namespace qorvex::layout {
 
 namespace {
@@ -50,14 +52,15 @@ class LineBreaker {
   private:
     void AddCharacter(uint32_t i) {
         const float advance = request_.advances[i];
-        if (i > wordStart_ && wraps_ && MayBreakBefore(i, advance)) {
+        const bool whole = request_.clusterStarts == nullptr || request_.clusterStarts[i] != 0;
+        if (i > wordStart_ && wraps_ && whole && MayBreakBefore(i, advance)) {
             FinishWord(i);
             wordStart_ = i;
         }
         wordWidth_ += advance;
     }
 
-    bool MayBreakBefore(uint32_t i, float advance) const {
+    bool MayBreakBefore(uint32_t i, float advance) {
         switch (request_.style.overflowWrap) {
             case css::OverflowWrapMode::Anywhere:
                 return true;
@@ -67,11 +70,21 @@ class LineBreaker {
             default:
                 break;
         }
-        if (request_.iterator == nullptr) return false;
-        // Not behind ASCII punctuation, where a dictionary of line breaks would cut paths and numbers.
-        if (IsAsciiPunctuation(request_.characters.codes[i - 1])) return false;
+        return request_.iterator != nullptr && IsCandidate(i);
+    }
+
+    // Not behind ASCII punctuation, where a dictionary of line breaks would cut paths and numbers; two other
+    // ASCII characters are never parted.
+    bool IsCandidate(uint32_t i) {
+        const uint32_t before = request_.characters.codes[i - 1];
+        if (before < 0x80 && (request_.characters.codes[i] < 0x80 || IsAsciiPunctuation(before)))
+            return false;
         const auto offset = static_cast<int>(request_.characters.offsets[i]);
-        return request_.iterator->GetBoundaryAfter(offset - 1) == offset;
+        // Until the boundary that was found last there is no other one.
+        if (offset < nextCandidate_) return false;
+        if (offset > nextCandidate_) nextCandidate_ = request_.iterator->GetBoundaryAfter(offset - 1);
+        if (nextCandidate_ < 0) nextCandidate_ = std::numeric_limits<int>::max();
+        return nextCandidate_ == offset;
     }
 
     // The word from wordStart_ to `end` joins the line, or the line ends before it.
@@ -111,6 +124,7 @@ class LineBreaker {
     float lineWidth_;
     float wordWidth_ = 0;
     float pendingSpace_ = 0;
+    int nextCandidate_ = -1;
 };
 
 }  // namespace
