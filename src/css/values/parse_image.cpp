@@ -2,25 +2,10 @@
 #include "core/logging/log.h"
 #include "css/values/gradient_text.h"
 #include "css/values/number_parser.h"
+#include "css/values/text_reader.h"
 #include "css/values/value_parsers.h"
 
 namespace qorvex::css {
-
-namespace {
-
-bool HoldsUnescaped(std::string_view text, char quote) {
-    for (size_t i = 0; i < text.size(); ++i) {
-        if (text[i] == quote) return true;
-        if (text[i] == '\\') ++i;
-    }
-    return false;
-}
-
-}  // namespace
-
-char QuoteFor(std::string_view text) {
-    return HoldsUnescaped(text, '"') ? '\'' : '"';
-}
 
 bool ParseUrl(std::string_view text, size_t start, CssString& out) {
     if (start >= text.size() || !StartsWithIgnoreCase(text.substr(start), "url(")) {

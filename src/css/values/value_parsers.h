@@ -48,8 +48,6 @@ void SerialiseShadow(const ShadowItem& shadow, bool isBox, CssString& out);
 // replaced.
 [[nodiscard]] bool ParseUrl(std::string_view text, size_t start, CssString& out);
 void SerialiseUrl(std::string_view url, CssString& out);
-// The quote that may stand around a text, whose own escapes stay as they were written.
-[[nodiscard]] char QuoteFor(std::string_view text);
 
 // Shortest decimal form that reads back to the same float; no exponent.
 void AppendNumber(float value, CssString& out);
