@@ -16,6 +16,14 @@ bool IsAsciiPunctuation(uint32_t code) {
            (code >= '{' && code <= '~');
 }
 
+// Letters of alphabets that part words by spaces, between two of which no line ends (Unicode Annex 14, LB28).
+bool IsSpacedLetter(uint32_t code) {
+    if (code < 0x80) return (code | 0x20) >= 'a' && (code | 0x20) <= 'z';
+    return (code >= 0xC0 && code <= 0x24F) || (code >= 0x388 && code <= 0x481) ||
+           (code >= 0x48A && code <= 0x52F) || (code >= 0x5D0 && code <= 0x5EA) ||
+           (code >= 0x620 && code <= 0x64A);
+}
+
 // One pass over the characters. A word grows until a break is possible, then joins the line or starts the
 // next one; spaces between words count only when a word follows them on the same line.
 class LineBreaker {
@@ -77,8 +85,10 @@ class LineBreaker {
     // ASCII characters are never parted.
     bool IsCandidate(uint32_t i) {
         const uint32_t before = request_.characters.codes[i - 1];
-        if (before < 0x80 && (request_.characters.codes[i] < 0x80 || IsAsciiPunctuation(before)))
-            return false;
+        const uint32_t code = request_.characters.codes[i];
+        if (before < 0x80 && (code < 0x80 || IsAsciiPunctuation(before))) return false;
+        // What the rules say at once need not be asked for.
+        if (IsSpacedLetter(before) && IsSpacedLetter(code)) return false;
         const auto offset = static_cast<int>(request_.characters.offsets[i]);
         // Until the boundary that was found last there is no other one.
         if (offset < nextCandidate_) return false;

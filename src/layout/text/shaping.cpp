@@ -37,6 +37,8 @@ bool Covers(const fresco::IFont& font, const uint32_t* codes, size_t count) {
 // on a letter of another font stands beside it.
 void KeepUnitsTogether(const Characters& characters, const LoadedTypefaces& typefaces, GlyphMap& map) {
     const auto& codes = characters.codes;
+    const auto other = [&](uint8_t font) { return font != map.fonts[0]; };
+    if (std::none_of(map.fonts.begin(), map.fonts.end(), other)) return;
     for (size_t first = 0; first < codes.size();) {
         const size_t end = UnitEnd(codes, first);
         bool mixed = false;
