@@ -14,16 +14,17 @@ class TintSource final : public PixelSource {
         for (int i = 0; i < 3; ++i)
             factors_[i] = uint32_t(std::clamp(channels[i], 0.0f, 1.0f) * 256 + 0.5f);
     }
-    void Fetch(int x, int y, int count, uint32_t* out) override {
-        inner_.Fetch(x, y, count, out);
+    const uint32_t* Fetch(int x, int y, int count, uint32_t* room) override {
+        const uint32_t* pixels = inner_.Fetch(x, y, count, room);
         for (int i = 0; i < count; ++i) {
-            uint32_t pixel = out[i] & 0xFF000000;
+            uint32_t pixel = pixels[i] & 0xFF000000;
             for (int channel = 0; channel < 3; ++channel) {
                 const int shift = channel * 8;
-                pixel |= ((out[i] >> shift & 0xFF) * factors_[channel] >> 8) << shift;
+                pixel |= ((pixels[i] >> shift & 0xFF) * factors_[channel] >> 8) << shift;
             }
-            out[i] = pixel;
+            room[i] = pixel;
         }
+        return room;
     }
 
   private:
@@ -90,7 +91,8 @@ bool CpuBackend::DrawColorGlyph(const FontFace& face, uint32_t glyph, float size
     }
     Homography toPlane;
     if (!PlaneAt(0).Invert(&toPlane)) return true;
-    ImageSource source(*texture, placement, toPlane, std::clamp(paint.color.a * paint.opacity, 0.0f, 1.0f));
+    ImageSource source(shared_.resources, *texture, placement, toPlane,
+                       std::clamp(paint.color.a * paint.opacity, 0.0f, 1.0f));
     TintSource tinted(source, paint.color);
     Ink ink;
     ink.source = &tinted;

@@ -96,8 +96,7 @@ bool Parse(std::string_view text, FontFamily& out) {
 }
 
 void Serialise(const FontFamily& value, CssString& out) {
-    SerialiseList(value, "", out,
-                  [](const CssString& name, CssString& text) { SerialiseName(name, true, text); });
+    SerialiseList(value, "", out, [](const CssString& name, CssString& text) { SerialiseName(name, text); });
 }
 
 bool Parse(std::string_view text, LetterSpacing& out) {
