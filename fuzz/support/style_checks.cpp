@@ -26,7 +26,8 @@ void CheckRoundTrip(const Declaration& declaration, StringPool& strings) {
 void CheckComputedStyle(const LayoutStyleRefs& style) {
     for (size_t i = 0; i < kLonghandCount; ++i) {
         const auto id = static_cast<PropertyId>(i);
-        const CssString text = SerializeComputed(id, style);
+        CssString text;
+        SerialiseComputed(id, style, text);
         Declaration declaration;
         // What a shorter text means is inherited or the initial value; everything else has to read back.
         if (!ParseLonghand(id, text.view(), declaration))
