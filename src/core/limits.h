@@ -72,7 +72,7 @@ inline constexpr size_t kSubstitutedTextBytes = 1024 * 1024;
 /// Parsed selectors of script queries that are kept for the next query with the same text.
 inline constexpr size_t kCachedQueries = 64;
 
-/// Notes on siblings in one pass of matching, 60 bytes each: one for each sibling combinator and depth in use.
+/// Notes on siblings in one pass of matching, 60 bytes each: one per sibling combinator and depth in use.
 inline constexpr size_t kSiblingScans = size_t{1} << 18;
 
 /// Sets of rules whose cascade is remembered for the next element that they match.

@@ -112,7 +112,7 @@ TEST_F(HostilePages, SheetsOfManyRules) {
 }
 
 TEST_F(HostilePages, VariablesByTheThousand) {
-    const size_t count = 8000 / kShrink;
+    const size_t count = 100000 / kShrink;
     std::string block, rules;
     for (size_t i = 0; i < count; ++i) {
         const std::string declaration = "--v" + std::to_string(i) + ":" + std::to_string(i) + "px;";
@@ -122,6 +122,24 @@ TEST_F(HostilePages, VariablesByTheThousand) {
     Load(PageWith("p{" + block + "}" + rules + "p{width:var(--v" + std::to_string(count - 1) + ")}",
                   "<p id=a></p><p style='" + block + "'></p>"));
     EXPECT_EQ(Computed("#a")["width"], std::to_string(count - 1) + "px");
+}
+
+// Rules that look at siblings, for many siblings: none, one and all of them find what they look for.
+TEST_F(HostilePages, SiblingsByTheThousand) {
+    const size_t count = 60000 / kShrink;
+    Load(PageWith("q ~ p{left:1px}#f ~ p{top:2px}p ~ p{width:3px}p + p{height:4px}q + p{left:5px}",
+                  "<p id=f></p>" + Repeat("<p></p>", count) + "<p id=a></p>"));
+    Style style = Computed("#a");
+    EXPECT_EQ(style["left"], "auto");
+    EXPECT_EQ(style["top"], "2px");
+    EXPECT_EQ(style["width"], "3px");
+    EXPECT_EQ(style["height"], "4px");
+
+    std::string sheet;
+    for (size_t i = 0; i < 1000 / kShrink; ++i)
+        sheet += "q" + std::to_string(i) + " ~ p{left:1px}";
+    Load(PageWith(sheet + "p ~ p{width:3px}", Repeat("<p></p>", 2000 / kShrink) + "<p id=a></p>"));
+    EXPECT_EQ(Computed("#a")["width"], "3px");
 }
 
 TEST_F(HostilePages, SelectorsOf64Kilobytes) {

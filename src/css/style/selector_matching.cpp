@@ -185,8 +185,8 @@ class LeftwardWalk {
         const auto children = from.GetParent()->GetChildren();
         const size_t place = IndexOf(from);
         const RunPlace run = context_.siblings && place > kFew
-                            ? RememberedRun(*from.GetParent(), place, first, index)
-                            : NearestRun(children, place, 0, first, index);
+                                 ? RememberedRun(*from.GetParent(), place, first, index)
+                                 : NearestRun(children, place, 0, first, index);
         if (run.match == SiblingMemo::kNowhere) return nullptr;
         place_ = run.start;
         return static_cast<Element*>(children[run.start].get());

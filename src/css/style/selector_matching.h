@@ -4,8 +4,8 @@
 // ancestor and does not come back for a higher one when the rest then fails.
 //
 // Invariants: matching never recurses and never backtracks over more than the siblings of one element, so its
-// cost is bounded by the selector times the siblings and ancestors looked at; over a whole pass each sibling is
-// looked at a fixed number of times.
+// cost is bounded by the selector times the siblings and ancestors looked at; over a whole pass each sibling
+// is looked at a fixed number of times.
 #pragma once
 
 #include "css/parser/selector.h"
