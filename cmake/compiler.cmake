@@ -49,3 +49,12 @@ if(QORVEX_MOLD)
 endif()
 
 find_package(Threads REQUIRED)
+
+# qorvex_uses_rapidjson(TARGET...): its stack adds to a null pointer before its first push.
+function(qorvex_uses_rapidjson)
+    if(QORVEX_SANITIZE MATCHES "undefined")
+        foreach(target ${ARGN})
+            target_compile_options(${target} PRIVATE "-fsanitize-ignorelist=${CMAKE_SOURCE_DIR}/cmake/rapidjson_ignore.txt")
+        endforeach()
+    endif()
+endfunction()

@@ -100,6 +100,18 @@ constexpr OptionRow kRows[] = {
      }},
     {"--default-font", "NAME", "family of last resort",
      [](std::string_view text, Options& o) { return Store(text, o.default_font); }},
+    {"--bitmap-font", "FILE", "register a BMFont table with the images beside it; may be repeated",
+     [](std::string_view text, Options& o) {
+         o.bitmap_fonts.emplace_back(text);
+         return !text.empty();
+     }},
+    {"--no-text-services", "", "leave out bidirectional text, line breaks by language and case mapping",
+     [](std::string_view, Options& o) {
+         o.text_services = false;
+         return true;
+     }},
+    {"--translations", "FILE", "texts for elements with a data-l10n-id, as JSON",
+     [](std::string_view text, Options& o) { return Store(text, o.translations_file); }},
 };
 
 const OptionRow* FindRow(std::string_view name) {

@@ -31,6 +31,9 @@ struct Options {
     bool strict = false;
     std::vector<std::string> fonts;
     std::string default_font;
+    std::vector<std::string> bitmap_fonts;
+    bool text_services = true;
+    std::string translations_file;
     std::string page;
 
     // True when the run has a result to write and so needs no window.

@@ -11,6 +11,8 @@
 #include <cstdio>
 #include <filesystem>
 
+#include "bitmap_font.h"
+
 namespace player {
 namespace fs = std::filesystem;
 using namespace qorvex;
@@ -93,6 +95,8 @@ bool Session::Start(std::string& error) {
         unruly_->Spare(page_url_);
     }
 
+    if (!options_.translations_file.empty() && !localization_.AddFile(options_.translations_file, error))
+        return false;
     engine_options_ = FontOptions(options_.fonts);
     if (!options_.stats_file.empty()) engine_options_ = engine_options_ + ' ' + kCountAllocationsOption;
     LibraryParams params;
@@ -119,7 +123,13 @@ bool Session::Start(std::string& error) {
     system_settings.ResourceHandler = resources_.get();
     if (unruly_) system_settings.ResourceHandler = unruly_.get();
     system_settings.EmbeddedFallbackFont = kLargeFallbackFont;
+    if (options_.text_services) {
+        system_settings.InternationalizationManager = &internationalization_;
+        system_settings.TextTransformationManager = &text_transformation_;
+        system_settings.LocalizationManager = &localization_;
+    }
     system_ = library_->CreateSystem(system_settings);
+    if (!AddBitmapFonts(error)) return false;
 
     ViewSettings view_settings;
     view_settings.Listener = this;
@@ -137,6 +147,26 @@ bool Session::Start(std::string& error) {
     view_renderer_ = system_renderer_->CreateViewRenderer(view_);
     SetTarget();
     stats_->SetEnabled(view_, true);
+    return true;
+}
+
+bool Session::AddBitmapFonts(std::string& error) {
+    for (const std::string& path : options_.bitmap_fonts) {
+        BitmapFont font;
+        if (!font.Load(path, error)) return false;
+        std::vector<const void*> pages;
+        std::vector<std::uint32_t> sizes;
+        for (const std::string& page : font.pages) {
+            pages.push_back(page.data());
+            sizes.push_back(static_cast<std::uint32_t>(page.size()));
+        }
+        UserFontDescription description;
+        description.FamilyName = font.family.c_str();
+        description.Description = font.table.data();
+        description.DescriptionSize = static_cast<std::uint32_t>(font.table.size());
+        system_->AddUserFontFromEncodedImages(pages.data(), sizes.data(), static_cast<unsigned>(pages.size()),
+                                              description);
+    }
     return true;
 }
 

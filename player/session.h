@@ -13,6 +13,8 @@
 #include "host/counting_allocator.h"
 #include "host/file_system.h"
 #include "host/folder_resource_handler.h"
+#include "host/icu_text_services.h"
+#include "host/json_localization.h"
 #include "host/manual_clock.h"
 #include "host/print_log_handler.h"
 #include "host/software_render_target.h"
@@ -67,6 +69,7 @@ class Session final : public qorvex::IViewListener {
   private:
     Session(const Options& options, bool headless);
     bool Start(std::string& error);
+    bool AddBitmapFonts(std::string& error);
     void SetTarget();
     void OnLoadFailed(const char* url, const char* error) override;
     static void OnFrameComplete(void* session, std::uint32_t view, std::uint32_t frame, std::uint32_t);
@@ -84,6 +87,9 @@ class Session final : public qorvex::IViewListener {
     qorvex::host::CountingAllocator allocator_;
     qorvex::host::PrintLogHandler log_;
     qorvex::host::FileSystem files_;
+    qorvex::host::IcuInternationalization internationalization_;
+    qorvex::host::IcuTextTransformation text_transformation_;
+    qorvex::host::JsonLocalization localization_;
     std::unique_ptr<qorvex::host::FolderResourceHandler> resources_;
     std::unique_ptr<qorvex::host::UnrulyResourceHandler> unruly_;
     qorvex::host::WorkerPool pool_;

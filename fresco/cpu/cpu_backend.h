@@ -91,8 +91,9 @@ class CpuBackend final : public Backend {
 
     // --- text
     void DrawRun(const GlyphRunParams& run, const Glyph* glyphs, uint32_t count, bool stroke);
+    // `field`: from distance fields, where glyphs have them.
     void DrawCachedRun(const FontFace& face, const GlyphRunParams& run, const Glyph* glyphs, uint32_t count,
-                       const Homography& plane, const Ink& ink);
+                       bool field, const Homography& plane, const Ink& ink);
     bool DrawColorGlyph(const FontFace& face, uint32_t glyph, float size, Point at, const Paint& paint);
 
     // --- clips

@@ -4,8 +4,38 @@
 
 namespace fresco::cpu {
 
+namespace {
+
+// A source whose colours are multiplied by one colour.
+class TintSource final : public PixelSource {
+  public:
+    TintSource(PixelSource& inner, const Color& color) : inner_(inner) {
+        const float channels[] = {color.r, color.g, color.b};
+        for (int i = 0; i < 3; ++i)
+            factors_[i] = uint32_t(std::clamp(channels[i], 0.0f, 1.0f) * 256 + 0.5f);
+    }
+    const uint32_t* Fetch(int x, int y, int count, uint32_t* room) override {
+        const uint32_t* pixels = inner_.Fetch(x, y, count, room);
+        for (int i = 0; i < count; ++i) {
+            uint32_t pixel = pixels[i] & 0xFF000000;
+            for (int channel = 0; channel < 3; ++channel) {
+                const int shift = channel * 8;
+                pixel |= ((pixels[i] >> shift & 0xFF) * factors_[channel] >> 8) << shift;
+            }
+            room[i] = pixel;
+        }
+        return room;
+    }
+
+  private:
+    PixelSource& inner_;
+    uint32_t factors_[3];
+};
+
+}  // namespace
+
 void CpuBackend::DrawCachedRun(const FontFace& face, const GlyphRunParams& run, const Glyph* glyphs,
-                               uint32_t count, const Homography& plane, const Ink& ink) {
+                               uint32_t count, bool field, const Homography& plane, const Ink& ink) {
     constexpr double kFar = 1 << 22;
     const IRect& clip = clip_.bounds();
     const float size = float(run.size * plane.xx);
@@ -22,7 +52,7 @@ void CpuBackend::DrawCachedRun(const FontFace& face, const GlyphRunParams& run, 
             const int64_t quarter = std::llrint(at.x * GlyphCache::kSubpixels);
             const int subpixel = int(quarter & (GlyphCache::kSubpixels - 1));
             const int x = int((quarter - subpixel) / GlyphCache::kSubpixels), y = int(std::lrint(at.y));
-            const GlyphBitmap& bitmap = cache.Get(face, glyphs[i].index, size, subpixel);
+            const GlyphBitmap& bitmap = cache.Get(face, glyphs[i].index, size, subpixel, field);
             const IRect box{x + bitmap.left, y + bitmap.top, x + bitmap.left + bitmap.width,
                             y + bitmap.top + bitmap.height};
             const IRect visible = Intersect(box, clip);
@@ -54,7 +84,20 @@ bool CpuBackend::DrawColorGlyph(const FontFace& face, uint32_t glyph, float size
     if (!texture) return true;
     const Rect target{at.x + picture->left * size, at.y + picture->top * size, 0, picture->emWidth * size,
                       picture->emHeight * size};
-    DrawTexture(*texture, target, {.source = {}, .target = target}, paint);
+    const ImageSource::Placement placement{.source = {}, .target = target};
+    if (!picture->tinted) {
+        DrawTexture(*texture, target, placement, paint);
+        return true;
+    }
+    Homography toPlane;
+    if (!PlaneAt(0).Invert(&toPlane)) return true;
+    ImageSource source(shared_.resources, *texture, placement, toPlane,
+                       std::clamp(paint.color.a * paint.opacity, 0.0f, 1.0f));
+    TintSource tinted(source, paint.color);
+    Ink ink;
+    ink.source = &tinted;
+    ink.blend = paint.blend;
+    DrawRect(target, ink);
     return true;
 }
 
@@ -70,8 +113,10 @@ void CpuBackend::DrawRun(const GlyphRunParams& run, const Glyph* glyphs, uint32_
     const bool upright = plane.IsScaleTranslate() && scale > 0 && std::abs(plane.yy - scale) < 1e-3 * scale;
     const bool cached =
         upright && !stroke && run.size * scale <= GlyphCache::kMaxSize && run.size * scale >= 0.5;
+    const bool field =
+        (run.flags & kGlyphsSdf) || (face->GetSdfMode() == SdfMode::Always && !(run.flags & kGlyphsPlain));
     const bool pictures = face->HasColorGlyphs() && !stroke;
-    if (cached && !pictures) return DrawCachedRun(*face, run, glyphs, count, plane, ink);
+    if (cached && !pictures) return DrawCachedRun(*face, run, glyphs, count, field, plane, ink);
     const float unit = run.size / face->GetUnitsPerEm();
     for (uint32_t i = 0; i < count; ++i) {
         const Point at{run.x + glyphs[i].x + run.letterSpacing * float(i), run.y + glyphs[i].y};
@@ -80,7 +125,7 @@ void CpuBackend::DrawRun(const GlyphRunParams& run, const Glyph* glyphs, uint32_
             GlyphRunParams one = run;
             one.x = at.x, one.y = at.y;
             const Glyph glyph{glyphs[i].index, 0, 0};
-            DrawCachedRun(*face, one, &glyph, 1, plane, ink);
+            DrawCachedRun(*face, one, &glyph, 1, field, plane, ink);
             continue;
         }
         const GlyphOutline& outline = face->GetOutline(glyphs[i].index);

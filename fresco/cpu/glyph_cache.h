@@ -34,9 +34,9 @@ class GlyphCache {
     class Reader {
       public:
         explicit Reader(GlyphCache& cache) : cache_(cache), lock_(cache.mutex_) {}
-        // `size` in device pixels per em.
-        const GlyphBitmap& Get(const FontFace& face, uint32_t glyph, float size, int subpixel) {
-            return cache_.Get(face, glyph, size, subpixel);
+        // `size` in device pixels per em. `field`: from the glyph's distance field, where it has one.
+        const GlyphBitmap& Get(const FontFace& face, uint32_t glyph, float size, int subpixel, bool field) {
+            return cache_.Get(face, glyph, size, subpixel, field);
         }
         // A glyph that is a picture; null without memory.
         Texture* GetPicture(const FontFace& face, uint32_t glyph, const ColorGlyph& picture) {
@@ -54,7 +54,7 @@ class GlyphCache {
 
   private:
     struct Key {
-        uint32_t font, glyph, size;  // size in 64ths, with the subpixel in the low bits
+        uint32_t font, glyph, size;  // size in 64ths, with field and subpixel in the low bits
         bool operator==(const Key&) const = default;
     };
     struct KeyHash {
@@ -64,7 +64,11 @@ class GlyphCache {
         }
     };
 
-    const GlyphBitmap& Get(const FontFace& face, uint32_t glyph, float size, int subpixel);
+    const GlyphBitmap& Get(const FontFace& face, uint32_t glyph, float size, int subpixel, bool field);
+    void FromOutline(const FontFace& face, uint32_t glyph, double size, int subpixel, GlyphBitmap& out);
+    void FromField(const DistanceField& field, double size, int subpixel, GlyphBitmap& out);
+    // Room for the coverage, cut to what a glyph may reach; null when nothing is left.
+    uint8_t* Reserve(const IRect& wanted, double size, GlyphBitmap& out);
     Texture* GetPicture(const FontFace& face, uint32_t glyph, const ColorGlyph& picture);
     uint8_t* TakeBytes(size_t count);
 

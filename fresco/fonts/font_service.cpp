@@ -4,13 +4,20 @@
 #include FT_FREETYPE_H
 #include FT_MODULE_H
 
+#include <hb.h>
+
 #include "fresco/core/log.h"
+#include "fresco/fonts/bitmap_face.h"
 
 namespace fresco {
 namespace {
 
-// The largest fonts there are (all of CJK in one collection) stay below this.
+// The largest fonts there are (all of CJK in one collection) stay below this, packed or not.
 constexpr size_t kMaxFontBytes = size_t(128) << 20;
+// A glyph table has a line of some hundred bytes for a character.
+constexpr size_t kMaxTableBytes = size_t(16) << 20;
+// Instances of a variable font that names find; usual ones have 9 weights, upright and slanted.
+constexpr uint32_t kMaxInstances = 64;
 constexpr size_t kFontAlignment = 16;
 
 // FreeType's own memory, from the client. Blocks carry their size in front for Realloc.
@@ -20,6 +27,8 @@ struct BlockHeader {
 };
 
 void* FtAllocate(FT_Memory, long size) {
+    // A packed font says itself how large it becomes.
+    if (size <= 0 || size_t(size) > 2 * kMaxFontBytes) return nullptr;
     auto* header =
         static_cast<BlockHeader*>(HeapAllocate(size_t(size) + sizeof(BlockHeader), kFontAlignment));
     if (!header) return nullptr;
@@ -40,9 +49,9 @@ void* FtReallocate(FT_Memory memory, long, long newSize, void* block) {
     return moved;
 }
 
-bool ReadAll(IStreamReader* stream, Vector<uint8_t>* bytes) {
+bool ReadAll(IStreamReader* stream, Vector<uint8_t>* bytes, size_t most = kMaxFontBytes) {
     const size_t size = stream ? stream->GetSize() : 0;
-    if (size == 0 || size > kMaxFontBytes) return false;
+    if (size == 0 || size > most) return false;
     bytes->resize(size);
     size_t done = 0;
     while (done < size) {
@@ -82,13 +91,28 @@ FontService::~FontService() {
     HeapDelete(memory_);
 }
 
-void FontService::Configure(void*) {
-    FRESCO_WARN("IFontService::Configure is not available in this build");
+void FontService::Configure(void* argument) {
+    const auto* wanted = static_cast<const FontServiceConfiguration*>(argument);
+    if (!wanted) return;
+    if (wanted->structSize < sizeof(FontServiceConfiguration)) {
+        FRESCO_WARN("IFontService::Configure: the configuration is of another version");
+        return;
+    }
+    if (wanted->language)
+        settings_.language = *wanted->language ? hb_language_from_string(wanted->language, -1) : nullptr;
+    if (wanted->keptGlyphs) settings_.keptGlyphs = wanted->keptGlyphs;
 }
 
-FontId FontService::RegisterBitmapFont(IStreamReader*, const BitmapFontDescription&) {
-    FRESCO_WARN("IFontService::RegisterBitmapFont is not available in this build");
-    return kNoId;
+FontId FontService::RegisterBitmapFont(IStreamReader* stream, const BitmapFontDescription& description) {
+    Vector<uint8_t> table;
+    std::unique_ptr<BitmapFace, HeapDeleter<BitmapFace>> face(HeapNew<BitmapFace>());
+    if (!face || !ReadAll(stream, &table, kMaxTableBytes)) return kNoId;
+    const std::string_view text(reinterpret_cast<const char*>(table.data()), table.size());
+    std::lock_guard lock(mutex_);
+    const FontId id = nextId_;
+    if (!face->Load(text, description, id)) return kNoId;
+    Keep(std::move(face));
+    return id;
 }
 
 uint32_t FontService::GetFaceCount(IStreamReader* stream) {
@@ -116,28 +140,54 @@ std::shared_ptr<FontData> FontService::ShareData(Vector<uint8_t> bytes) {
     return data;
 }
 
-bool FontService::AddFace(std::shared_ptr<FontData> data, uint32_t faceIndex, SdfMode sdf, FontId id) {
-    std::unique_ptr<FontFace, HeapDeleter<FontFace>> face(HeapNew<FontFace>());
-    if (!library_ || !face || !face->Load(library_, std::move(data), faceIndex, sdf, id)) return false;
-    faces_[id] = std::move(face);
+FontService::ScalablePtr FontService::MakeFace(std::shared_ptr<FontData> data, uint32_t faceIndex,
+                                               SdfMode sdf, FontId id) {
+    ScalablePtr face(library_ ? HeapNew<ScalableFace>(settings_) : nullptr);
+    return face && face->Load(library_, std::move(data), faceIndex, sdf, id) ? std::move(face) : nullptr;
+}
+
+template <class Face>
+void FontService::Keep(std::unique_ptr<Face, HeapDeleter<Face>> face) {
+    const FontId id = face->GetId();
+    faces_[id].reset(face.release());
     order_.push_back(id);
     nextId_ = std::max(nextId_, id + 1);
+}
+
+bool FontService::AddFace(std::shared_ptr<FontData> data, uint32_t faceIndex, SdfMode sdf, FontId id,
+                          uint32_t wantedFlags) {
+    ScalablePtr face = MakeFace(data, faceIndex, sdf, id);
+    if (!face) return false;
+    if (wantedFlags != kAnyStyle && face->GetInstanceCount() > 0) {
+        const uint32_t instance = face->FindInstance(wantedFlags);
+        if (instance != faceIndex) {
+            if (ScalablePtr better = MakeFace(std::move(data), instance, sdf, id)) face = std::move(better);
+        }
+    }
+    Keep(std::move(face));
     return true;
 }
 
-FontId FontService::LoadFace(IStreamReader* stream, uint32_t faceIndex, SdfMode sdf) {
+void FontService::AddInstances(const std::shared_ptr<FontData>& data, uint32_t faceIndex, SdfMode sdf) {
+    const auto& face = static_cast<const ScalableFace&>(*faces_.find(order_.back())->second);
+    const uint32_t count = std::min(face.GetInstanceCount(), kMaxInstances);
+    for (uint32_t instance = 1; instance <= count; ++instance)
+        AddFace(data, faceIndex | instance << 16, sdf, nextId_, kAnyStyle);
+}
+
+FontId FontService::LoadFace(IStreamReader* stream, uint32_t faceIndex, SdfMode sdf, uint32_t wantedFlags) {
     Vector<uint8_t> bytes;
     if (!ReadAll(stream, &bytes)) return kNoId;
     std::lock_guard lock(mutex_);
     const FontId id = nextId_;
-    return AddFace(ShareData(std::move(bytes)), faceIndex, sdf, id) ? id : kNoId;
+    return AddFace(ShareData(std::move(bytes)), faceIndex, sdf, id, wantedFlags) ? id : kNoId;
 }
 
 bool FontService::LoadFaceAs(FontId id, const void* data, size_t size, uint32_t faceIndex, SdfMode sdf) {
     const auto* begin = static_cast<const uint8_t*>(data);
     std::lock_guard lock(mutex_);
     if (id == kNoId || id >= kNoId - 1 || faces_.count(id)) return false;
-    return AddFace(ShareData(Vector<uint8_t>(begin, begin + size)), faceIndex, sdf, id);
+    return AddFace(ShareData(Vector<uint8_t>(begin, begin + size)), faceIndex, sdf, id, kAnyStyle);
 }
 
 FontId FontService::FindFont(const char* family, uint32_t flags) {
@@ -155,8 +205,8 @@ bool FontService::LoadSystemFonts() {
         Vector<uint8_t> bytes;
         if (!ReadAll(reader, &bytes)) return;
         const std::shared_ptr<FontData> data = ShareData(std::move(bytes));
-        for (uint32_t face = 0; AddFace(data, face, SdfMode::WhenLarge, nextId_); ++face) {
-        }
+        for (uint32_t face = 0; AddFace(data, face, SdfMode::WhenLarge, nextId_, kAnyStyle); ++face)
+            AddInstances(data, face, SdfMode::WhenLarge);
     });
     order_.insert(order_.end(), loaded.begin(), loaded.end());
     return opened;

@@ -3,7 +3,7 @@
 #pragma once
 #include <shared_mutex>
 
-#include "fresco/fonts/font_face.h"
+#include "fresco/fonts/scalable_face.h"
 #include "fresco/fonts/system_fonts.h"
 
 struct FT_MemoryRec_;
@@ -17,7 +17,7 @@ class FontService final : public IFontService {
 
     void Configure(void* argument) override;
     uint32_t GetFaceCount(IStreamReader* stream) override;
-    FontId LoadFace(IStreamReader* stream, uint32_t faceIndex, SdfMode sdf) override;
+    FontId LoadFace(IStreamReader* stream, uint32_t faceIndex, SdfMode sdf, uint32_t wantedFlags) override;
     FontId RegisterBitmapFont(IStreamReader* stream, const BitmapFontDescription& description) override;
     FontId FindFont(const char* family, uint32_t flags) override;
     IFont* GetFont(FontId id) override { return FindFace(id); }
@@ -35,11 +35,18 @@ class FontService final : public IFontService {
     FontId FindLoaded(const char* family, uint32_t flags) const;
     bool LoadSystemFonts();
     std::shared_ptr<FontData> ShareData(Vector<uint8_t> bytes);
-    bool AddFace(std::shared_ptr<FontData> data, uint32_t faceIndex, SdfMode sdf, FontId id);
+    using ScalablePtr = std::unique_ptr<ScalableFace, HeapDeleter<ScalableFace>>;
+    ScalablePtr MakeFace(std::shared_ptr<FontData> data, uint32_t faceIndex, SdfMode sdf, FontId id);
+    template <class Face>
+    void Keep(std::unique_ptr<Face, HeapDeleter<Face>> face);
+    bool AddFace(std::shared_ptr<FontData> data, uint32_t faceIndex, SdfMode sdf, FontId id,
+                 uint32_t wantedFlags);
+    void AddInstances(const std::shared_ptr<FontData>& data, uint32_t faceIndex, SdfMode sdf);
 
     mutable std::shared_mutex mutex_;
     FT_MemoryRec_* memory_ = nullptr;
     FT_LibraryRec_* library_ = nullptr;
+    ShapeSettings settings_;  // before the faces, which read them
     HashMap<FontId, std::unique_ptr<FontFace, HeapDeleter<FontFace>>> faces_;
     Vector<FontId> order_;  // as loaded: FindFont takes the last match
     FontId nextId_ = 0;

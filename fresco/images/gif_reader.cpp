@@ -77,9 +77,10 @@ void GifAnimation::Close() {
     int error = 0;
     if (file_) DGifCloseFile(file_, &error);
     file_ = nullptr;
-    canvas_ = {};
-    restore_ = {};
-    line_ = {};
+    // Emptied alone, the thread would keep the memory, and past the end of the client's allocator.
+    Vector<uint32_t>().swap(canvas_);
+    Vector<uint32_t>().swap(restore_);
+    Vector<uint8_t>().swap(line_);
 }
 
 bool GifAnimation::Open(const uint8_t* data, size_t size) {

@@ -92,8 +92,8 @@ dom::Document& Page::Load(std::string_view html, std::string_view url,
 void CheckTree(dom::Document& document) {
     for (dom::Node* node = document.GetNextInTree(&document); node; node = node->GetNextInTree(&document)) {
         Require(node->GetParent() && node->GetDocument() == &document, "a node of the tree has its parent");
-        Require(node->IsInDocument() && node->GetDepth() == node->GetParent()->GetDepth() + 1,
-                "depth counts the parents");
+        Require(node->IsInDocument(), "a node below the document is in it");
+        Require(node->GetDepth() == node->GetParent()->GetDepth() + 1, "depth counts the parents");
         Require(node->GetParent()->GetChildren()[node->GetIndexInParent()].get() == node,
                 "a child stands where it says");
     }

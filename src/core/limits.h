@@ -72,6 +72,9 @@ inline constexpr size_t kSubstitutedTextBytes = 1024 * 1024;
 /// Parsed selectors of script queries that are kept for the next query with the same text.
 inline constexpr size_t kCachedQueries = 64;
 
+/// Notes on siblings in one pass of matching, 60 bytes each: one for each sibling combinator and depth in use.
+inline constexpr size_t kSiblingScans = size_t{1} << 18;
+
 /// Sets of rules whose cascade is remembered for the next element that they match.
 inline constexpr size_t kCachedMatches = 2048;
 
@@ -87,6 +90,12 @@ inline constexpr size_t kMaxGradientTiles = 4096;
 /// screen.
 inline constexpr float kSmallestFitSize = 6;
 inline constexpr float kLargestFitSize = 8192;
+
+/// Characters of one font whose shapes are made ahead; more than a page of Chinese shows at once.
+inline constexpr size_t kPreloadedCharacters = 4096;
+
+/// Bytes of a glyph table and of all pages of a bitmap font that a client gives.
+inline constexpr size_t kBitmapFontBytes = 256 * 1024 * 1024;
 
 /// Parentheses open at once in a CSS value or selector; beyond it a parse ends with "memory exhausted". Each
 /// level stands for two entries of a parser stack of 10,000.

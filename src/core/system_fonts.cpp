@@ -1,8 +1,11 @@
 // Fonts that the client registers with a system.
+#include <cstring>
+
 #include "core/library_impl.h"
+#include "core/limits.h"
+#include "core/logging/log.h"
 #include "core/memory/thread_scope.h"
 #include "core/system_impl.h"
-#include "core/unavailable.h"
 
 namespace qorvex {
 
@@ -36,15 +39,74 @@ void SystemImpl::AddUserFont(const char* url, const FontDescription& description
     }
 }
 
-void SystemImpl::AddUserFontFromImages(const UserFontImage*, unsigned, const UserFontDescription&) {
-    ThreadScope scope;
-    LogUnavailable("System::AddUserFontFromImages");
+namespace {
+
+layout::BitmapFontSourcePtr StartBitmapFont(const UserFontDescription& description) {
+    auto source = MakeRef<layout::BitmapFontSource>();
+    if (description.FamilyName) source->family = description.FamilyName;
+    if (description.Description && description.DescriptionSize <= limits::kBitmapFontBytes)
+        source->table = std::string_view(description.Description, description.DescriptionSize);
+    return source;
 }
 
-void SystemImpl::AddUserFontFromEncodedImages(const void**, const uint32_t*, unsigned,
-                                              const UserFontDescription&) {
+layout::BitmapFontPage CopyPage(const void* bytes, size_t size) {
+    layout::BitmapFontPage page;
+    const auto* first = static_cast<const uint8_t*>(bytes);
+    if (bytes && size <= limits::kBitmapFontBytes) page.bytes.assign(first, first + size);
+    return page;
+}
+
+// Rows without the space between them.
+layout::BitmapFontPage CopyPixels(const UserFontImage& image) {
+    constexpr size_t kPixelBytes = 4;
+    const size_t row = image.Width * kPixelBytes;
+    layout::BitmapFontPage page;
+    if (!image.Pixels || image.RowPitch < row || row * image.Height > limits::kBitmapFontBytes) return page;
+    page.width = image.Width;
+    page.height = image.Height;
+    page.bytes.resize(row * image.Height);
+    for (size_t y = 0; y < image.Height; ++y)
+        std::memcpy(page.bytes.data() + y * row,
+                    static_cast<const uint8_t*>(image.Pixels) + y * image.RowPitch, row);
+    return page;
+}
+
+}  // namespace
+
+void SystemImpl::AddBitmapFont(const UserFontDescription& description, layout::BitmapFontSourcePtr source) {
+    if (description.Weight > layout::kHeaviestWeight) {
+        AssertFailure("Invalid font weight passed as font description");
+        return;
+    }
+    if (!fonts_) return;
+    layout::FontDescription made;
+    made.family = strings_.Intern(source->family.view());
+    made.style = description.Italic ? layout::kItalicStyle : layout::kNormalStyle;
+    constexpr uint8_t kBoldWeight = 7;
+    made.weight = description.Weight ? description.Weight
+                  : description.Bold ? kBoldWeight
+                                     : layout::kNormalWeight;
+    fonts_->AddBitmapFont(made, std::move(source));
+}
+
+void SystemImpl::AddUserFontFromImages(const UserFontImage* images, unsigned count,
+                                       const UserFontDescription& description) {
     ThreadScope scope;
-    LogUnavailable("System::AddUserFontFromEncodedImages");
+    layout::BitmapFontSourcePtr source = StartBitmapFont(description);
+    for (unsigned i = 0; images && i < count; ++i)
+        source->pages.push_back(CopyPixels(images[i]));
+    AddBitmapFont(description, std::move(source));
+}
+
+void SystemImpl::AddUserFontFromEncodedImages(const void** data, const uint32_t* sizes, unsigned count,
+                                              const UserFontDescription& description) {
+    ThreadScope scope;
+    layout::BitmapFontSourcePtr source = StartBitmapFont(description);
+    for (unsigned i = 0; data && sizes && i < count; ++i) {
+        source->pages.push_back(CopyPage(data[i], sizes[i]));
+        source->pages.back().encoded = true;
+    }
+    AddBitmapFont(description, std::move(source));
 }
 
 void SystemImpl::RemoveUserFont(const FontDescription& description) {

@@ -64,6 +64,7 @@ class SystemImpl final : public System, public IViewLifetimeTracker {
     void CheckParts(const SystemSettings& settings) const;
     void StartInspector(const SystemSettings& settings);
     void CreateFontManager(const SystemSettings& settings);
+    void AddBitmapFont(const UserFontDescription& description, layout::BitmapFontSourcePtr source);
     layout::FontDescription MakeFontDescription(const FontDescription& description);
 
     LibraryImpl& library_;

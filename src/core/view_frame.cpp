@@ -145,7 +145,8 @@ layout::LayoutWork ViewImpl::SolveFrame() {
 }
 
 TaskPtr ViewImpl::MakePreloadTask() {
-    return TaskPtr();
+    if (!services_.preload_font_data || !services_.fonts || !document_) return TaskPtr();
+    return document_->TakeFontPreload(services_.fonts->Service());
 }
 
 // The one place where a frame waits for the one before it: the main thread has done all its own work and

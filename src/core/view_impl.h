@@ -114,6 +114,9 @@ class ViewImpl final : public View,
     ITextTransformationManager* GetTextTransformationManager() override {
         return services_.text_transformation;
     }
+    IInternationalizationManager* GetInternationalizationManager() override {
+        return services_.internationalization;
+    }
     dsp::DirtyRegion* GetDirtyRegion() override { return &dirty_region_; }
     void RequestFrames(uint32_t count) override;
     void OnDOMBuilt(dom::Document& document) override;

@@ -31,6 +31,8 @@ class IDisplayElement : public AtomicRefCounted<IDisplayElement, MemoryTag::Rend
         kPaintsBox = 1u << 0,  // paints backgrounds and borders
         kMeasures = 1u << 1,   // its size comes from Measure; it is a leaf of the box layout
         kHasMask = 1u << 2,
+        kIsText = 1u << 3,         // a DisplayText
+        kFlowsChildren = 1u << 4,  // a DisplayParagraph: it gives its children their boxes
     };
 
     IDisplayElement(const IDisplayElement&) = delete;

@@ -1,8 +1,11 @@
 #include "display/display_text.h"
 
+#include <qorvex/text_services.h>
+
 #include <cmath>
 
 #include "core/logging/log.h"
+#include "display/paint_context.h"
 #include "layout/layout_store.h"
 #include "layout/text/text_layout.h"
 
@@ -21,9 +24,22 @@ bool SameExtent(float a, float b) {
 
 }  // namespace
 
+void DisplayText::DestroyIterator::operator()(i18n::IBreakIterator* iterator) const {
+    iterator->Destroy();
+}
+
+DisplayText::DisplayText(layout::NodeLinkPtr link, IInternationalizationManager* i18n)
+    : IDisplayElement(kMeasures | kIsText), link_(std::move(link)) {
+    if (i18n != nullptr) iterator_.reset(i18n->CreateBreakIterator(i18n::BreakIteratorBoundary::Line));
+}
+
+DisplayText::~DisplayText() = default;
+
 void DisplayText::SetText(std::string_view text) {
     if (text == text_.view()) return;
+    if (iterator_) iterator_->ClearText();
     text_ = text;
+    if (iterator_) iterator_->SetText(text_.data(), static_cast<unsigned>(text_.size()));
     laidOut_ = false;
 }
 
@@ -31,34 +47,35 @@ uint32_t DisplayText::TextLength() const {
     return static_cast<uint32_t>(text_.size());
 }
 
-bool DisplayText::Holds(const layout::TextStyle& style, float width, float height) const {
-    if (!laidOut_ || !SameTextStyle(style, style_)) return false;
-    if (style.fit != css::FontFitModeType::None && !SameExtent(height, availableHeight_)) return false;
-    if (SameExtent(width, availableWidth_)) return true;
+bool DisplayText::Holds(const Parameters& wanted) const {
+    if (!laidOut_ || !SameTextStyle(wanted.style, laid_.style)) return false;
+    if (!Near(wanted.firstLineOffset, laid_.firstLineOffset)) return false;
+    const bool fits = wanted.style.fit != css::FontFitModeType::None;
+    if (!fits && !Near(wanted.style.usedSize, laid_.style.usedSize)) return false;
+    if (fits && !SameExtent(wanted.height, laid_.height)) return false;
+    if (SameExtent(wanted.width, laid_.width)) return true;
     // Lines that fit a narrower width without a break are the same in a wider one, and the other way round.
-    const bool followsWidth = style.fit != css::FontFitModeType::None ||
-                              style.align != css::TextAlignType::Left ||
-                              style.overflow != css::TextOverflowMode::Clip;
-    return !followsWidth && !info_.wrapped && !(width < info_.width);
+    const bool followsWidth = fits || wanted.style.align != css::TextAlignType::Left ||
+                              wanted.style.overflow != css::TextOverflowMode::Clip ||
+                              wanted.firstLineOffset > 0;
+    return !followsWidth && !info_.wrapped && !(wanted.width < info_.width);
 }
 
-bool DisplayText::EnsureLayout(const layout::LayoutNode& node, fresco::IFontService* fonts, float width,
-                               float height) {
-    const css::TextLayoutStyle* group = node.style.text.get();
-    if (fonts == nullptr || group == nullptr) return false;
-    const layout::TextStyle style = layout::MakeTextStyle(*group);
-    if (Holds(style, width, height)) return true;
-    if (!LayoutText({text_.view(), style, width, height, *fonts}, info_)) {
+bool DisplayText::EnsureLayout(const layout::LayoutNode& node, const layout::TextServices& services,
+                               const Parameters& wanted) {
+    if (services.fonts == nullptr) return false;
+    if (Holds(wanted)) return true;
+    if (!LayoutText({text_.view(), wanted.style, wanted.width, wanted.height, *services.fonts,
+                     iterator_.get(), services.i18n, wanted.firstLineOffset},
+                    info_)) {
         LogDebug("Measuring text without typeface");
         info_.Clear();
         laidOut_ = false;
         return false;
     }
-    style_ = style;
-    availableWidth_ = width;
-    availableHeight_ = height;
-    laidOut_ = true;
-    SetInkOverflow(std::ceil(info_.usedSize * kOverhang + group->computedStrokeWidth));
+    laid_ = wanted;
+    laidOut_ = unpublished_ = true;
+    SetInkOverflow(std::ceil(info_.usedSize * kOverhang + node.style.text->computedStrokeWidth));
     return true;
 }
 
@@ -66,12 +83,73 @@ void DisplayText::Measure(layout::LayoutHandle& handle, float availableWidth, fl
                           MeasureMode widthMode, MeasureMode heightMode, layout::Size& out) {
     if (widthMode == MeasureMode::Undefined) availableWidth = NAN;
     if (heightMode == MeasureMode::Undefined) availableHeight = NAN;
-    if (!EnsureLayout(handle.node(), handle.store().fonts, availableWidth, availableHeight)) {
-        out = {};
-        return;
-    }
+    placed_.clear();
+    out = {};
+    const css::TextLayoutStyle* group = handle.node().style.text.get();
+    if (group == nullptr) return;
+    const layout::TextServices& services = handle.store().text;
+    Parameters wanted{layout::MakeTextStyle(*group), availableWidth, availableHeight};
+    wanted.style.complexText = services.complexText;
+    if (!EnsureLayout(handle.node(), services, wanted)) return;
     out.width = std::ceil(info_.width);
     out.height = std::ceil(info_.height);
+}
+
+const layout::TextInfo* DisplayText::LayoutInline(layout::LayoutHandle& handle,
+                                                  const InlineTextRequest& request) {
+    const css::TextLayoutStyle* group = handle.node().style.text.get();
+    if (group == nullptr) return nullptr;
+    const layout::TextServices& services = handle.store().text;
+    Parameters wanted{layout::MakeTextStyle(*group), request.width, NAN, request.firstLineOffset};
+    // Both belong to the paragraph, which aligns whole lines and fits all of its text at once.
+    wanted.style.align = css::TextAlignType::Left;
+    wanted.style.fit = css::FontFitModeType::None;
+    wanted.style.complexText = services.complexText;
+    wanted.style.usedSize = wanted.style.fontSize * request.scale;
+    return EnsureLayout(handle.node(), services, wanted) ? &info_ : nullptr;
+}
+
+void DisplayText::PlaceLines(const layout::LinePlacement* lines, size_t count) {
+    placed_.assign(lines, lines + count);
+    unpublished_ = true;
+}
+
+void DisplayText::OffsetLine(uint32_t lineIndex, float offset, uint8_t alignment) {
+    using css::TextAlignType;
+    if (lineIndex >= placed_.size()) return;
+    const auto align = static_cast<TextAlignType>(alignment);
+    const float part = align == TextAlignType::Center ? 0.5f : align == TextAlignType::Right ? 1.0f : 0.0f;
+    placed_[lineIndex].x += offset * part;
+}
+
+void DisplayText::GrowLastLine(float amount) {
+    if (info_.lines.empty()) return;
+    info_.lines.back().height += amount;
+    info_.height += amount;
+}
+
+void DisplayText::Publish(PaintContext& context) {
+    if (!unpublished_ || !link_ || context.family == nullptr) return;
+    unpublished_ = false;
+    auto style = MakeRef<layout::TextFontStyle>();
+    for (const uint32_t font : laid_.style.typefaces)
+        if (style->font == css::kNoTypeface) style->font = font;
+    style->size = info_.usedSize;
+    style->letterSpacing = laid_.style.letterSpacing;
+    if (!info_.lines.empty()) {
+        style->lineHeight = info_.lines[0].height;
+        style->baseline = info_.lines[0].baseline;
+    }
+    using layout::DOMTaskKind;
+    if (!publishedStyle_ || !publishedStyle_->Same(*style)) {
+        publishedStyle_ = style;
+        SendToDOM(*context.family, DOMTaskKind::UpdateFontStyleDataInDOM, link_, std::move(style),
+                  layout::Delivery::ThroughChannel);
+    }
+    auto positions = MakeRef<layout::TextPositions>();
+    ComputeTextPositions(info_, text_.view(), laid_.style.whiteSpace, Placements(), *positions);
+    SendToDOM(*context.family, DOMTaskKind::UpdateTextPositionsInDOM, link_, std::move(positions),
+              layout::Delivery::ThroughChannel);
 }
 
 }  // namespace qorvex::dsp

@@ -2,21 +2,37 @@
 // that only moves or colours text lays nothing out.
 #pragma once
 
+#include <memory>
 #include <string_view>
 
 #include "core/memory/containers.h"
 #include "display/display_element.h"
+#include "layout/node_link.h"
 #include "layout/text/text_info.h"
+#include "layout/text/text_positions.h"
+#include "layout/text/text_services.h"
 
-namespace fresco {
-class IFontService;
+namespace qorvex {
+class IInternationalizationManager;
+namespace i18n {
+class IBreakIterator;
 }
+}  // namespace qorvex
 
 namespace qorvex::dsp {
 
+// A layout inside an inline flow. `scale` is what font-fit-mode makes of all sizes of the flow.
+struct InlineTextRequest {
+    float width = 0;  // NaN: not known
+    float firstLineOffset = 0;
+    float scale = 1;
+};
+
 class DisplayText final : public IDisplayElement {
   public:
-    DisplayText() : IDisplayElement(kMeasures) {}
+    // The link (may be null) is told where the characters stand. The manager may be null.
+    explicit DisplayText(layout::NodeLinkPtr link = nullptr, IInternationalizationManager* i18n = nullptr);
+    ~DisplayText() override;
 
     // Already transformed (text-transform) UTF-8. On the layout thread, or at the commit.
     void SetText(std::string_view text);
@@ -27,20 +43,46 @@ class DisplayText final : public IDisplayElement {
                fresco::CommandBuffer& buffer) override;
     void Measure(layout::LayoutHandle& handle, float availableWidth, float availableHeight,
                  MeasureMode widthMode, MeasureMode heightMode, layout::Size& out) override;
+    void OffsetLine(uint32_t lineIndex, float offset, uint8_t alignment) override;
+    void GrowLastLine(float amount) override;
     uint32_t TextLength() const override;
 
+    // For a paragraph: null without a loaded typeface. Lines stand at their left edges until they are placed.
+    const layout::TextInfo* LayoutInline(layout::LayoutHandle& handle, const InlineTextRequest& request);
+    // Where each line of that layout stands.
+    void PlaceLines(const layout::LinePlacement* lines, size_t count);
+
   private:
+    struct Parameters {
+        layout::TextStyle style;
+        float width = 0;
+        float height = 0;
+        float firstLineOffset = 0;
+    };
+    struct DestroyIterator {
+        void operator()(i18n::IBreakIterator* iterator) const;
+    };
+
     // Lays out when the style, the text or the available box differ from those of the stored lines. False
     // without a loaded typeface.
-    bool EnsureLayout(const layout::LayoutNode& node, fresco::IFontService* fonts, float width, float height);
-    [[nodiscard]] bool Holds(const layout::TextStyle& style, float width, float height) const;
+    bool EnsureLayout(const layout::LayoutNode& node, const layout::TextServices& services,
+                      const Parameters& wanted);
+    [[nodiscard]] bool Holds(const Parameters& wanted) const;
+    void Publish(PaintContext& context);
+    void PaintShadows(PaintContext& context, const layout::LayoutNode& node, layout::Point corner,
+                      fresco::CommandBuffer& buffer) const;
+    const layout::LinePlacement* Placements() const { return placed_.empty() ? nullptr : placed_.data(); }
 
     TaggedString<MemoryTag::Rendering> text_;
     layout::TextInfo info_;
-    layout::TextStyle style_;  // of info_
-    float availableWidth_ = 0;
-    float availableHeight_ = 0;
+    Parameters laid_;  // of info_
     bool laidOut_ = false;
+    bool unpublished_ = false;
+    // Lines of an inline flow; empty elsewhere.
+    Vector<layout::LinePlacement, MemoryTag::LayoutData> placed_;
+    layout::NodeLinkPtr link_;
+    std::unique_ptr<i18n::IBreakIterator, DestroyIterator> iterator_;
+    qsl::RefPtr<layout::TextFontStyle> publishedStyle_;
 };
 
 }  // namespace qorvex::dsp

@@ -8,6 +8,10 @@
 
 #include <fresco/paint.h>
 
+namespace qorvex {
+struct TaskFamilyHandle;
+}
+
 namespace qorvex::dsp {
 
 class PathCache;
@@ -29,6 +33,8 @@ class PaintContext {
     bool snapToPixels = true;
     bool partialRedraw = false;
     bool showDirtyRects = false;
+    // Where results for the DOM go; null: nobody wants them.
+    const TaskFamilyHandle* family = nullptr;
 };
 
 inline fresco::Color ToFresco(const css::Color& color) {

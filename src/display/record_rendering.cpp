@@ -160,7 +160,8 @@ class FrameRecorder {
                             request_.scaleY,
                             pass_.snapToPixels,
                             record_.isPartial,
-                            request_.showPaintRectangles};
+                            request_.showPaintRectangles,
+                            request_.family};
     }
 
     LayoutPass& pass_;

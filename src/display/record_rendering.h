@@ -5,6 +5,10 @@
 #include "display/render_caches.h"
 #include "layout/perform_layout.h"
 
+namespace qorvex {
+struct TaskFamilyHandle;
+}
+
 namespace qorvex::dsp {
 
 struct RecordRequest {
@@ -17,6 +21,8 @@ struct RecordRequest {
     uint32_t frameNumber = 0;
     // Buffers queued by other tasks (uploads, releases): they go first. Taken over.
     BufferList resourceBuffers{};
+    // Of the view, for results that elements have for the DOM; null: nobody wants them.
+    const TaskFamilyHandle* family = nullptr;
 };
 
 // Body of the task RecordRendering; takes the pass's dirty region and leaves it empty.

@@ -3,6 +3,7 @@
 
 #include "core/memory/atoms.h"
 #include "dom/node.h"
+#include "layout/text/text_positions.h"
 
 namespace qorvex::dom {
 
@@ -56,6 +57,14 @@ class Text final : public CharacterData {
     // Hands the shown text to the display element; at the commit, while the layout side is idle.
     void CommitDisplayedText();
 
+    // As of the last painted layout; null, with a line in the log, before the first one.
+    const layout::TextPositions* GetTextPositions() const;
+    const layout::TextFontStyle* GetFontStyle() const { return font_style_.get(); }
+    void TakeTextPositions(qsl::RefPtr<layout::TextPositions> positions) {
+        positions_ = std::move(positions);
+    }
+    void TakeFontStyle(qsl::RefPtr<layout::TextFontStyle> style) { font_style_ = std::move(style); }
+
   protected:
     void OnTextChanged() override;
 
@@ -63,6 +72,8 @@ class Text final : public CharacterData {
     void UpdateTransformedText();
 
     UniquePtr<NodeText, MemoryTag::DOM> transformed_;
+    qsl::RefPtr<layout::TextPositions> positions_;
+    qsl::RefPtr<layout::TextFontStyle> font_style_;
 };
 
 class Comment final : public CharacterData {

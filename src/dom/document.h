@@ -16,6 +16,7 @@
 #include "dom/change_mask.h"
 #include "dom/element.h"
 #include "dom/event_listeners.h"
+#include "dom/font_usage.h"
 #include "dom/observer_hooks.h"
 #include "layout/layout_tree.h"
 #include "layout/layout_update.h"
@@ -154,6 +155,9 @@ class Document : public Element {
     void SetViewSize(uint32_t width, uint32_t height);
     css::LengthContext GetLengthContext() const;
     layout::LayoutTree& GetLayoutTree() { return layout_tree_; }
+    // A task that makes the shapes of characters that the document is about to show for the first time; null
+    // when there are none.
+    TaskPtr TakeFontPreload(fresco::IFontService& service);
     bool IsLayoutTreeBuilt() const { return layout_tree_built_; }
     void RequestLayoutTreeRebuild();
     void RebuildLayoutTree();
@@ -287,6 +291,7 @@ class Document : public Element {
     NodeSet visual_changes_;
     NodeSet restyle_changes_;
     NodeSet text_commits_;
+    FontUsage font_usage_;
     Vector<NodeText, MemoryTag::DOM> removed_composition_ids_;
     Vector<LayoutTask, MemoryTag::DOM> layout_tasks_;
     uint32_t view_width_ = 0;

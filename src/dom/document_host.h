@@ -10,6 +10,7 @@
 
 namespace qorvex {
 class URL;
+class IInternationalizationManager;
 class ILocalizationManager;
 class ITextTransformationManager;
 }  // namespace qorvex
@@ -51,6 +52,7 @@ class IDocumentHost {
     virtual Node* GetActiveNode() const { return nullptr; }
     virtual ILocalizationManager* GetLocalizationManager() { return nullptr; }
     virtual ITextTransformationManager* GetTextTransformationManager() { return nullptr; }
+    virtual IInternationalizationManager* GetInternationalizationManager() { return nullptr; }
 
     // What has to be painted anew because a node left the layout; null while nothing is painted.
     virtual dsp::DirtyRegion* GetDirtyRegion() { return nullptr; }

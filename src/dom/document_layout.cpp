@@ -52,7 +52,8 @@ void Document::RebuildLayoutTree() {
     }
     Node& root = *html_;
     layout::FontManager* fonts = host_->GetFontManager();
-    layout_tree_.SetFonts(fonts ? &fonts->Service() : nullptr);
+    layout_tree_.SetTextServices(
+        {fonts ? &fonts->Service() : nullptr, host_->GetInternationalizationManager()});
     root.layout_node_ = layout_tree_.CreateRoot({.style = root.style_,
                                                  .display = root.display_element_,
                                                  .link = root.GetLayoutLink(),
@@ -158,6 +159,14 @@ layout::LayoutWork Document::UpdateLayoutStyles(bool force_full_layout) {
 
 void Document::QueueTextCommit(Text& text) {
     text_commits_.insert(&text);
+}
+
+TaskPtr Document::TakeFontPreload(fresco::IFontService& service) {
+    for (Node* node : text_commits_) {
+        const css::LayoutStyleRefs& style = node->GetStyle();
+        if (style.text) font_usage_.Add(style.text->typefaces, static_cast<Text*>(node)->GetDisplayedText());
+    }
+    return font_usage_.TakeTask(service);
 }
 
 void Document::CommitLayout(layout::LayoutUpdateData& update, dsp::DirtyRegion* dirty,

@@ -2,6 +2,7 @@
 
 #include "core/logging/log.h"
 #include "core/memory/atoms.h"
+#include "display/display_paragraph.h"
 #include "display/page_elements.h"
 #include "dom/document.h"
 #include "dom/document_host.h"
@@ -41,6 +42,27 @@ HTMLBodyElement::~HTMLBodyElement() {
 
 dsp::DisplayElementPtr HTMLBodyElement::CreateDisplayElement() {
     return MakeRef<dsp::DisplayBody>();
+}
+
+namespace {
+constexpr std::string_view kInlineAttribute = "qor-inline";
+}
+
+dsp::DisplayElementPtr HTMLParagraphElement::CreateDisplayElement() {
+    if (HasAttribute(kInlineAttribute)) return MakeRef<dsp::DisplayParagraph>();
+    return HTMLElement::CreateDisplayElement();
+}
+
+void HTMLParagraphElement::AttributeChanged(AttributeName name, std::optional<Atom> old_value,
+                                            std::optional<Atom> new_value) {
+    HTMLElement::AttributeChanged(name, old_value, new_value);
+    if (name.is_data || name.name.view() != kInlineAttribute) return;
+    if (old_value.has_value() == new_value.has_value() || !display_element_) return;
+    display_element_ = CreateDisplayElement();
+    if (layout::LayoutHandle* handle = GetLayoutHandle()) {
+        GetDocument()->GetLayoutTree().SetDisplayElement(*handle, display_element_);
+        MarkLayoutDirty();
+    }
 }
 
 void DOM_A::PostDispatch(Event& event) {

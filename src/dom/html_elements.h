@@ -8,7 +8,6 @@ namespace qorvex::dom {
 
 // X(Class, extra node flags)
 #define QORVEX_PLAIN_HTML_ELEMENTS(X)    \
-    X(HTMLParagraphElement, 0)           \
     X(HTMLPreElement, 0)                 \
     X(HTMLDivElement, 0)                 \
     X(HTMLSpanElement, 0)                \
@@ -27,6 +26,18 @@ namespace qorvex::dom {
     };
 QORVEX_PLAIN_HTML_ELEMENTS(QORVEX_DECLARE)
 #undef QORVEX_DECLARE
+
+// With the attribute qor-inline its text and inline boxes share lines.
+class HTMLParagraphElement final : public HTMLElement {
+    QORVEX_SCRIPT_CLASS(HTMLParagraphElement)
+  public:
+    HTMLParagraphElement(Document& document, css::TagId tag) : HTMLElement(document, tag) {}
+
+  protected:
+    void AttributeChanged(AttributeName name, std::optional<Atom> old_value,
+                          std::optional<Atom> new_value) override;
+    dsp::DisplayElementPtr CreateDisplayElement() override;
+};
 
 // The root of a page. Its layout handle is the root of the layout tree.
 class HTMLHtmlElement final : public HTMLElement {

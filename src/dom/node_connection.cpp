@@ -1,7 +1,8 @@
 // Joining the document and leaving it: the walks that tell every node of a subtree.
 //
 // Page code runs inside these walks (scripts run when they arrive), so each step looks at the tree as it
-// stands: a child that has gone is not visited, a child that moved up into its place is.
+// stands. When a child is not where the walk met it any more, its siblings are looked at again from the
+// first: what has been told already is passed over, and nobody who moved up is missed.
 
 #include "core/logging/log.h"
 #include "dom/document.h"
@@ -15,6 +16,12 @@ namespace {
 struct WalkFrame {
     RefPtr<Node> node;
     size_t next_child;
+
+    void Leave(const Node& child) {
+        const auto siblings = node->GetChildren();
+        const bool in_place = next_child < siblings.size() && siblings[next_child] == &child;
+        next_child = in_place ? next_child + 1 : 0;
+    }
 };
 using WalkStack = SmallVector<WalkFrame, 8, MemoryTag::DOM>;
 }  // namespace
@@ -32,8 +39,11 @@ void Node::ConnectSubtree() {
         WalkFrame& top = stack.back();
         Node& node = *top.node;
         if (node.IsInDocument() && top.next_child < node.children_.size()) {
-            RefPtr<Node> child = node.children_[top.next_child++];
-            if (child->IsInDocument()) continue;  // page code brought it in already
+            RefPtr<Node> child = node.children_[top.next_child];
+            if (child->IsInDocument()) {  // page code brought it in already
+                ++top.next_child;
+                continue;
+            }
             child->OnInsertedIntoDocument();
             stack.push_back({std::move(child), 0});
             continue;
@@ -41,6 +51,7 @@ void Node::ConnectSubtree() {
         const RefPtr<Node> done = std::move(top.node);
         stack.pop_back();
         if (done->IsInDocument()) done->OnSubtreeInserted();
+        if (!stack.empty()) stack.back().Leave(*done);
     }
 }
 
@@ -72,10 +83,7 @@ void Node::DisconnectSubtree() {
         done->OnSubtreeRemoved();
         if (stack.empty()) break;
         done->SetFlag(kBeingRemoved, false);
-        // Advance only if the slot still holds the child, so that one that removed itself skips nobody.
-        WalkFrame& parent = stack.back();
-        const NodeVector& siblings = parent.node->children_;
-        if (parent.next_child < siblings.size() && siblings[parent.next_child] == done) ++parent.next_child;
+        stack.back().Leave(*done);
     }
 }
 

@@ -36,7 +36,10 @@ RefPtr<Text> Text::SplitText(size_t offset) {
 void Text::OnInsertedIntoDocument() {
     transformed_.reset();
     CharacterData::OnInsertedIntoDocument();
-    if (!display_element_) display_element_ = MakeRef<dsp::DisplayText>();
+    if (!display_element_) {
+        display_element_ = MakeRef<dsp::DisplayText>(
+            GetLayoutLink(), GetDocument()->GetHost().GetInternationalizationManager());
+    }
     GetDocument()->QueueTextCommit(*this);
 }
 
@@ -65,6 +68,14 @@ void Text::UpdateTransformedText() {
             transformed_ = MakeUnique<NodeText, MemoryTag::DOM>(std::move(transformed));
             break;
     }
+}
+
+const layout::TextPositions* Text::GetTextPositions() const {
+    if (!font_style_) {
+        LogError("Failed to calculate text positions! Font style data is missing.");
+        return nullptr;
+    }
+    return positions_.get();
 }
 
 void Text::CommitDisplayedText() {

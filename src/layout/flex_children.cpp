@@ -35,7 +35,11 @@ static void SyncOneLevel(LayoutHandle& handle, const HandleSet* changed, TempVec
     if (!node.flags.measuredByDisplayElement) YGNodeSetMeasureFunc(owner, nullptr);
     const uint32_t wanted = FlexChildCount(node);
     if (wanted == 0 && !node.children.empty() && !node.flags.measuredByDisplayElement) ReportDepth(handle);
-    for (uint32_t i = 0; i < wanted; ++i) {
+    const bool flows = node.display && node.display->Has(dsp::IDisplayElement::kFlowsChildren);
+    if (flows) handle.store().flowsText = true;
+    // What a paragraph flows is no child of its node, but the flow asks Yoga for edges and sizes of it.
+    const uint32_t known = flows ? static_cast<uint32_t>(node.children.size()) : wanted;
+    for (uint32_t i = 0; i < known; ++i) {
         LayoutHandle& child = *node.children[i];
         if (child.node().flex != nullptr) continue;
         child.store().MakeFlexNode(child);

@@ -1,6 +1,7 @@
 #include "layout/flex_results.h"
 
 #include "core/memory/temp_vector.h"
+#include "display/display_paragraph.h"
 #include "display/transforms.h"
 #include "layout/layout_store.h"
 
@@ -115,6 +116,10 @@ void ReadYogaResults(const FlexReadRoot& root, LayoutPass& pass) {
         Place(entry, pass);
         const bool moved = node.box.x != old.box.x || node.box.y != old.box.y;
         if (isNew || moved) NoteBoxChange(*entry.handle, old, pass);
+
+        const bool placed = isNew || moved || root.everything;
+        if (placed && node.display && node.display->Has(dsp::IDisplayElement::kFlowsChildren))
+            static_cast<dsp::DisplayParagraph&>(*node.display).PlaceContent(*entry.handle, pass);
 
         const bool descend =
             root.everything || isNew || moved || (entry.containerChanged && node.absoluteBelow);

@@ -7,14 +7,11 @@
 
 #include "layout/layout_handle.h"
 #include "layout/object_pool.h"
+#include "layout/text/text_services.h"
 
 #include <mutex>
 
 struct YGConfig;
-
-namespace fresco {
-class IFontService;
-}
 
 namespace qorvex::layout {
 
@@ -39,8 +36,10 @@ class LayoutStore : public AtomicRefCounted<LayoutStore, MemoryTag::LayoutNodes>
         friend bool operator==(const Metrics&, const Metrics&) = default;
     };
     Metrics metrics;
-    // Where text finds its fonts; set by the document before the first layout. Null: no text is measured.
-    fresco::IFontService* fonts = nullptr;
+    // Set by the document before the first layout.
+    TextServices text;
+    // Some paragraph of the tree flows its children; never taken back.
+    bool flowsText = false;
     // The warning about the depth limit is given once a tree.
     bool reportedDepth = false;
     EdgesCache recentEdges;

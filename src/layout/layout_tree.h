@@ -33,8 +33,8 @@ class LayoutTree {
     LayoutTree& operator=(const LayoutTree&) = delete;
     ~LayoutTree();
 
-    // Where the text of this tree finds its fonts. Before the first layout.
-    void SetFonts(fresco::IFontService* fonts) { store_->fonts = fonts; }
+    // Before the first layout.
+    void SetTextServices(const TextServices& services) { store_->text = services; }
 
     LayoutHandle* Root() const { return root_.get(); }
     HandlePtr CreateRoot(NewNode&& node);

@@ -3,6 +3,7 @@
 #include "core/logging/log.h"
 #include "core/memory/temp_vector.h"
 #include "css/values/length_context.h"
+#include "display/display_paragraph.h"
 #include "display/transforms.h"
 #include "layout/flex_children.h"
 #include "layout/flex_measure.h"
@@ -30,6 +31,10 @@ bool TakeMetrics(LayoutPass& pass, LayoutStore::Engine engine) {
     return !same;
 }
 
+bool FlowsChildren(const LayoutNode& node) {
+    return node.display && node.display->Has(dsp::IDisplayElement::kFlowsChildren);
+}
+
 void SyncAllStyles(LayoutPass& pass, FlexStyleContext& context) {
     const TempMark mark;
     TempVector<LayoutHandle*> stack;
@@ -38,7 +43,8 @@ void SyncAllStyles(LayoutPass& pass, FlexStyleContext& context) {
         LayoutHandle* handle = stack.back();
         stack.pop_back();
         if (SyncStyleToYoga(*handle, context)) ++pass.update.counters.synced;
-        if (YGNodeGetChildCount(handle->node().flex) == 0) continue;
+        dsp::InvalidateParagraphs(*handle);
+        if (YGNodeGetChildCount(handle->node().flex) == 0 && !FlowsChildren(handle->node())) continue;
         for (const HandlePtr& child : handle->node().children)
             stack.push_back(child.get());
     }
@@ -53,6 +59,7 @@ void PerformFlexLayout(LayoutPass& pass, const css::LengthContext& lengths) {
     } else {
         pass.update.changed.ForEach([&](LayoutHandle& handle) {
             if (SyncStyleToYoga(handle, context)) ++pass.update.counters.synced;
+            dsp::InvalidateParagraphs(handle);
         });
     }
     YGNodeCalculateLayout(pass.root->node().flex, static_cast<float>(pass.viewWidth),

@@ -1,6 +1,7 @@
 #include "layout/simple_layout.h"
 
 #include "core/memory/temp_vector.h"
+#include "display/display_paragraph.h"
 #include "layout/flex_children.h"
 #include "layout/flex_measure.h"
 #include "layout/flex_results.h"
@@ -83,6 +84,21 @@ void FitAutoSizes(LayoutNode& node, const LayoutStyle& style) {
     if (!style.height.IsLength()) node.box.height = sum.height;
 }
 
+// A paragraph reads edges and sizes of what it flows from the nodes of the flex engine.
+void SyncFlow(LayoutHandle& paragraph, LayoutPass& pass, const LengthContext& lengths) {
+    EnsureFlexTree(paragraph);
+    FlexStyleContext context{lengths, false, pass.root};
+    const TempMark mark;
+    TempVector<LayoutHandle*> queue;
+    queue.push_back(&paragraph);
+    for (uint32_t next = 0; next < queue.size(); ++next) {
+        SyncStyleToYoga(*queue[next], context);
+        for (const HandlePtr& child : queue[next]->node().children)
+            queue.push_back(child.get());
+    }
+    dsp::InvalidateParagraphs(paragraph);
+}
+
 void LayoutSimpleSubtree(LayoutHandle& handle, LayoutPass& pass, LengthContext lengths, Containers in) {
     LayoutNode& node = handle.node();
     if (node.IsBeyondLimit()) return;
@@ -97,6 +113,7 @@ void LayoutSimpleSubtree(LayoutHandle& handle, LayoutPass& pass, LengthContext l
     node.box.x = place.x;
     node.box.y = place.y;
     if (node.flags.measuredByDisplayElement) {
+        if (node.display->Has(dsp::IDisplayElement::kFlowsChildren)) SyncFlow(handle, pass, lengths);
         Size size;
         node.display->Measure(handle, kUnknown, kUnknown, dsp::MeasureMode::Undefined,
                               dsp::MeasureMode::Undefined, size);
@@ -109,6 +126,11 @@ void LayoutSimpleSubtree(LayoutHandle& handle, LayoutPass& pass, LengthContext l
     }
     const Containers below{node.flags.isPositioned || in.positioned == nullptr ? &node : in.positioned,
                            node.flags.containsFixedDescendants ? &handle : in.fixed};
+    if (node.display && node.display->Has(dsp::IDisplayElement::kFlowsChildren)) {
+        static_cast<dsp::DisplayParagraph&>(*node.display).PlaceContent(handle, pass);
+        NoteBoxChange(handle, old, pass);
+        return;
+    }
     for (const HandlePtr& child : node.children) {
         LayoutNode& childNode = child->node();
         if (childNode.style.layout->display != css::CSSDisplay::Flex) {
@@ -132,7 +154,10 @@ LayoutHandle* TopMostChanged(LayoutHandle& handle, const LayoutPass& pass) {
     for (LayoutHandle* parent = handle.node().parent; parent != nullptr; parent = parent->node().parent) {
         const LayoutNode& node = parent->node();
         // Inside a flex element the run of Yoga begins at that element.
-        if (pass.update.changed.Contains(parent) || node.style.layout->display == css::CSSDisplay::Flex)
+        // Inside a paragraph the lines begin at that paragraph.
+        const bool flows = node.display && node.display->Has(dsp::IDisplayElement::kFlowsChildren);
+        if (pass.update.changed.Contains(parent) || node.style.layout->display == css::CSSDisplay::Flex ||
+            flows)
             top = parent;
     }
     return top;
@@ -190,8 +215,11 @@ void LayoutFlexInSimple(const LengthContext& lengths, LayoutPass& pass, LayoutHa
         LayoutHandle* current = queue[next];
         if (everything || pass.update.changed.Contains(current)) {
             if (SyncStyleToYoga(*current, context)) ++pass.update.counters.synced;
+            dsp::InvalidateParagraphs(*current);
         }
-        if (YGNodeGetChildCount(current->node().flex) == 0) continue;
+        const LayoutNode& node = current->node();
+        const bool flows = node.display && node.display->Has(dsp::IDisplayElement::kFlowsChildren);
+        if (YGNodeGetChildCount(node.flex) == 0 && !flows) continue;
         for (const HandlePtr& child : current->node().children)
             queue.push_back(child.get());
     }

@@ -223,6 +223,26 @@ TEST_F(TreeTest, ANodeThatRemovesItselfSkipsNobody) {
         EXPECT_FALSE(node->IsInDocument());
 }
 
+TEST_F(TreeTest, AScriptThatTakesItsSiblingsAwayLeavesNobodyOut) {
+    LoadEmpty();
+    RefPtr<Element> box = Make("div", "box");
+    for (const char* id : {"a", "b", "s", "c", "d"})
+        box->AppendChild(Make(std::string_view(id) == "s" ? "script" : "p", id));
+    box->GetChildren()[2]->AppendChild(document_->CreateTextNode("take"));
+    host_->on_script = [&](std::string_view) {
+        box->RemoveChild(box->GetFirstChild());
+        box->RemoveChild(box->GetFirstChild());
+    };
+    Body().AppendChild(box);
+    EXPECT_EQ(BodyShape(), "body(div#box(script#s('take') p#c p#d))");
+    for (const char* id : {"box", "s", "c", "d"}) {
+        Element* element = document_->GetElementById(id);
+        ASSERT_NE(element, nullptr) << id;
+        EXPECT_TRUE(element->IsInDocument());
+        EXPECT_EQ(element->GetDepth(), element->GetParent()->GetDepth() + 1);
+    }
+}
+
 TEST_F(TreeTest, DeepTreesAreMadeWalkedAndTakenApart) {
     LoadEmpty();
     constexpr int kDepth = 100000;

@@ -44,6 +44,7 @@ class ClientLibrary final : public fresco::IRenderingLibrary {
     fresco::IScene* CreateScene(const fresco::SceneParams& params) override {
         return scene = inner_.CreateScene(params);
     }
+    void SetPaintHelpers(fresco::IPaintHelpers* helpers) override { inner_.SetPaintHelpers(helpers); }
     void Forward(uint64_t first, uint64_t second, uint64_t third) override {
         forwarded = first * 100 + second * 10 + third;
     }

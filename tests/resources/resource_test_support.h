@@ -10,6 +10,7 @@
 #include "core/frame/client.h"
 #include "core/logging/logger.h"
 #include "core/memory/allocator.h"
+#include "core/memory/object_pool.h"
 #include "core/memory/thread_scope.h"
 #include "core/tasks/task_system.h"
 #include "css/values/layout_style_refs.h"
@@ -37,6 +38,7 @@ class ResourceTest : public testing::Test {
         tasks->DestroyFamily(1);
         Delete<MemoryTag::General>(tasks);
         css::DestroyDefaultStyles();
+        FreePoolChunks();
         CloseThreadScope();
         EndLogging();
         FreeIdleThreadRecords();

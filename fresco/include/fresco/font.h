@@ -75,6 +75,7 @@ class IFont {
     // False, with all advances 0, when the size or a glyph is not valid.
     virtual bool GetAdvances(const uint32_t* glyphs, size_t count, float size, float* advances) const = 0;
     // False when there is nothing to give to the sink.
+    // Runs of mixed scripts are shaped script by script. Results are kept by the text of the run.
     virtual bool Shape(const ShapeRequest& request, IShapeSink& sink) const = 0;
     virtual void MarkAsUserBitmapFont() = 0;
     // Loads the outlines of the glyphs, so that a later draw need not.
@@ -86,22 +87,48 @@ class IFont {
     ~IFont() = default;
 };
 
-// A font made of pictures, one glyph after the other.
+// RGBA8, premultiplied.
+struct BitmapFontImage {
+    const void* pixels = nullptr;
+    uint32_t width = 0, height = 0;
+    uint32_t rowPitch = 0;  // bytes
+};
+
+// A font of pictures. Everything is copied. Its glyphs are multiplied by the colour of the text: white
+// pictures take that colour, others show as they are in white text.
 struct BitmapFontDescription {
     const char* family = nullptr;
     uint32_t flags = 0;
-    const ImageId* images = nullptr;
+    const BitmapFontImage* images = nullptr;  // the pages that the glyph table points into
     uint32_t imageCount = 0;
 };
+
+// What IFontService::Configure takes the address of. Read during the call.
+struct FontServiceConfiguration {
+    uint32_t structSize = sizeof(FontServiceConfiguration);
+    // BCP 47: the language of text that does not tell its own; it chooses between regional forms of
+    // characters that the same code stands for. Null: as it was; empty: none.
+    const char* language = nullptr;
+    // Glyphs of shaped text that each face keeps. 0: as it was (32,768 at the start).
+    uint32_t keptGlyphs = 0;
+};
+
+// For LoadFace: any instance will do.
+inline constexpr uint32_t kAnyStyle = 0xFFFFFFFF;
 
 class IFontService {
   public:
     virtual ~IFontService() = default;
+    // The address of a FontServiceConfiguration; null does nothing. Holds for text that is shaped afterwards.
     virtual void Configure(void* argument) = 0;
     // 0 when the stream is no font. The reader stays the caller's.
     virtual uint32_t GetFaceCount(IStreamReader* stream) = 0;
-    // kNoId when the stream or the face is not usable. The stream is read to its end and not kept.
-    virtual FontId LoadFace(IStreamReader* stream, uint32_t faceIndex, SdfMode sdf) = 0;
+    // kNoId when the stream or the face is not usable. The stream is read to its end and not kept. A variable
+    // font shows the named instance in the high half of the index (from 1), or the one that comes nearest to
+    // the wanted flag word.
+    virtual FontId LoadFace(IStreamReader* stream, uint32_t faceIndex, SdfMode sdf,
+                            uint32_t wantedFlags = kAnyStyle) = 0;
+    // The stream holds the glyph table in the text form of AngelCode's BMFont. kNoId when it is not usable.
     virtual FontId RegisterBitmapFont(IStreamReader* stream, const BitmapFontDescription& description) = 0;
     // Exact match of the flag word; family names compare without regard to ASCII case. The face that was
     // loaded last wins. kNoId when absent.

@@ -83,7 +83,11 @@ struct Glyph {
     float x = 0, y = 0;
 };
 
-enum GlyphRunFlags : uint32_t { kGlyphsSdf = 1 };
+// Neither flag: as the face was loaded. Both: the field.
+enum GlyphRunFlags : uint32_t {
+    kGlyphsSdf = 1,    // from a distance field
+    kGlyphsPlain = 2,  // from the outline
+};
 
 struct GlyphRunParams {
     FontId font = kNoId;

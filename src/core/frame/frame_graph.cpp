@@ -93,7 +93,9 @@ void PushFrameGraph(TaskSystem& tasks, FrameGraphRequest request) {
         request.synchronous_done ? MakeUnblockSynchronousTask(request.synchronous_done) : TaskPtr();
 
     if (request.scheduled) tasks.AddDependent(*request.scheduled, layout ? *layout : *visual);
-    if (request.preload && layout) tasks.AddDependent(*request.preload, *layout);
+    // Where layout runs elsewhere it does not wait: a client that serves resource work on the thread that
+    // paints would wait for itself, and glyphs that are not there yet are loaded when they are first drawn.
+    if (request.preload && layout && request.synchronous_done) tasks.AddDependent(*request.preload, *layout);
     if (layout) tasks.AddDependent(*layout, *visual);
     tasks.AddDependent(*visual, *record);
     tasks.AddDependent(*record, *signal);

@@ -79,7 +79,8 @@ void RecordFrame(FrameData& frame) {
                                .showPaintRectangles = frame.show_paint_rectangles,
                                .record = frame.should_record,
                                .frameNumber = frame.frame_id,
-                               .resourceBuffers = {}};
+                               .resourceBuffers = {},
+                               .family = &frame.family};
     dsp::FrameRecord record = dsp::RecordRendering(pass, std::move(request));
     if (!record.Empty()) {
         SharedRecord held = MakeRef<HeldRecord>(std::move(record));

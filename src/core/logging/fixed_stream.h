@@ -30,6 +30,12 @@ class FixedStream {
         return *this << std::string_view(digits, static_cast<size_t>(result.ptr - digits));
     }
 
+    // A zero in a page's text would end the line for whoever reads it as a C string.
+    void BlankZeros() {
+        for (char* at = buffer_; (at = static_cast<char*>(std::memchr(at, '\0', size_ - (at - buffer_))));)
+            *at = ' ';
+    }
+
     std::string_view view() const { return {buffer_, size_}; }
     const char* Terminated() {
         buffer_[size_] = '\0';

@@ -102,6 +102,7 @@ void WriteLogLine(Logging::Severity severity, std::span<const LogPiece> pieces) 
     stream.Reset();
     for (const LogPiece& piece : pieces)
         WritePiece(stream, piece);
+    stream.BlankZeros();
     const auto length = static_cast<unsigned>(stream.view().size() + 1);
     logger->handler->WriteLog(severity, stream.Terminated(), length);
     logger->streams.Push(index);

@@ -33,6 +33,9 @@ bool UpdateCustomProperties(LayoutStyleRefs& style, const LayoutStyleRefs& paren
         if (style.customProperties && IsOverlayOf(style.customProperties->map, above, own)) return false;
         auto map = MakeRef<SharedCustomProperties>();
         if (above) map->map = *above;
+        // Entries come in the order of their hashes: a table that grew under them would crowd them in one
+        // place.
+        map->map.reserve(map->map.size() + own.size());
         for (const auto& entry : own)
             map->map.insert_or_assign(entry.first, entry.second);
         style.customProperties = std::move(map);

@@ -27,6 +27,9 @@ class ElementMatcher {
     // By position, for the inspector; what depends on pseudo classes is not recorded.
     CssVector<uint64_t> GetMatchedRuleIds(RuleIndex& index, dom::Element& element, MatchContext& context);
 
+    // For the passes of matching.
+    SiblingMemo& GetSiblingMemo() { return siblings_; }
+
     // What an element has that was never matched.
     const MatchState& GetNothing() const { return *nothing_; }
 
@@ -72,6 +75,7 @@ class ElementMatcher {
     RefPtr<MatchState> TakeSpare();
 
     StyleCounters& counters_;
+    SiblingMemo siblings_;
     RefPtr<MatchState> nothing_ = MakeRef<MatchState>();
     // The rest is kept between elements for its memory.
     Candidates candidates_;

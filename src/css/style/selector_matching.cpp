@@ -94,13 +94,15 @@ class LeftwardWalk {
             switch (selector_.combinators[index]) {
                 case Combinator::Descendant:
                     at = NearestAncestor(*at, index);
+                    place_ = kUnknown;
                     break;
                 case Combinator::Child:
                     at = ParentElement(*at);
+                    place_ = kUnknown;
                     if (at && !Test(index, *at)) at = nullptr;
                     break;
                 case Combinator::Adjacent:
-                    at = AdjacentRun(*at, index, index);
+                    at = Adjacent(*at, index);
                     break;
                 case Combinator::Sibling:
                     at = NearestSiblingRun(*at, index);
@@ -113,6 +115,13 @@ class LeftwardWalk {
     }
 
   private:
+    using Siblings = std::span<const RefPtr<Node>>;
+    // Where the first compound of a run matches, and where the last one does.
+    struct RunPlace {
+        uint32_t match = SiblingMemo::kNowhere;
+        uint32_t start = SiblingMemo::kNowhere;
+    };
+
     bool Test(size_t index, Element& element) const {
         return Matches(selector_.compounds[index], element, context_, record_);
     }
@@ -126,40 +135,41 @@ class LeftwardWalk {
 
     // Where the element stands among its parent's children.
     size_t IndexOf(const Element& element) {
+        // Known where the last step went along siblings.
+        if (place_ != kUnknown) return place_;
+        if (context_.siblings) return context_.siblings->IndexOf(element);
         const auto children = element.GetParent()->GetChildren();
-        if (context_.hintParent == element.GetParent()) {
-            // Matching goes through siblings in order, so the element is where the last one was or soon
-            // behind it.
-            const size_t end = std::min(context_.hintIndex + 4, children.size());
-            for (size_t i = context_.hintIndex; i < end; ++i) {
-                if (children[i].get() == &element) return context_.hintIndex = i;
-            }
-        }
         size_t index = 0;
         while (children[index].get() != &element)
             ++index;
-        context_.hintParent = element.GetParent();
-        return context_.hintIndex = index;
+        return index;
     }
 
-    static Element* PreviousElement(std::span<const RefPtr<Node>> children, size_t& index) {
+    Element* PreviousElement(Siblings children, size_t& index) const {
         while (index > 0) {
+            if (context_.siblings) context_.siblings->CountStep();
             Node* node = children[--index].get();
             if (node->IsElement()) return static_cast<Element*>(node);
         }
         return nullptr;
     }
 
-    // The compounds first to last, joined by "+", must match the elements straight before `from`.
-    Element* AdjacentRun(Element& from, size_t first, size_t last) {
-        if (!from.GetParent()) return nullptr;
-        const auto children = from.GetParent()->GetChildren();
-        size_t place = IndexOf(from);
+    // The compounds first to last, joined by "+", must match the elements straight before `place`, which ends
+    // at the leftmost of them.
+    Element* AdjacentRun(Siblings children, size_t& place, size_t first, size_t last) const {
         Element* at = nullptr;
         for (size_t index = first; index <= last; ++index) {
             at = PreviousElement(children, place);
             if (!at || !Test(index, *at)) return nullptr;
         }
+        return at;
+    }
+
+    Element* Adjacent(Element& from, size_t index) {
+        if (!from.GetParent()) return nullptr;
+        size_t place = IndexOf(from);
+        Element* at = AdjacentRun(from.GetParent()->GetChildren(), place, index, index);
+        place_ = place;
         return at;
     }
 
@@ -173,23 +183,51 @@ class LeftwardWalk {
                selector_.combinators[index + 1] == Combinator::Adjacent)
             ++index;
         const auto children = from.GetParent()->GetChildren();
-        size_t place = IndexOf(from);
-        while (Element* candidate = PreviousElement(children, place)) {
-            if (!Test(first, *candidate)) continue;
-            size_t runPlace = place;
-            Element* at = candidate;
-            for (size_t next = first + 1; next <= index && at; ++next) {
-                at = PreviousElement(children, runPlace);
-                if (at && !Test(next, *at)) at = nullptr;
-            }
-            if (at) return at;
-        }
-        return nullptr;
+        const size_t place = IndexOf(from);
+        const RunPlace run = context_.siblings && place > kFew
+                            ? RememberedRun(*from.GetParent(), place, first, index)
+                            : NearestRun(children, place, 0, first, index);
+        if (run.match == SiblingMemo::kNowhere) return nullptr;
+        place_ = run.start;
+        return static_cast<Element*>(children[run.start].get());
     }
+
+    // The run whose first compound matches nearest before `place`, but not before `end`.
+    RunPlace NearestRun(Siblings children, size_t place, size_t end, size_t first, size_t last) const {
+        while (place > end) {
+            Element* candidate = PreviousElement(children, place);
+            if (!candidate || place < end) break;
+            if (!Test(first, *candidate)) continue;
+            size_t start = place;
+            if (first == last || AdjacentRun(children, start, first + 1, last))
+                return {static_cast<uint32_t>(place), static_cast<uint32_t>(start)};
+        }
+        return {};
+    }
+
+    // The same from `place` to the first child, of which only what this pass has not yet seen is walked.
+    RunPlace RememberedRun(const Node& parent, size_t place, size_t first, size_t last) const {
+        SiblingMemo::Scan& scan = context_.siblings->Find(&selector_.compounds[first], parent);
+        const RunPlace known{scan.match, scan.runStart};
+        const bool reaches = place >= scan.scannedTo;
+        // The match nearest to a farther place, if it lies before this one, is the nearest to this one too.
+        if (!reaches && (known.match == SiblingMemo::kNowhere || known.match < place)) return known;
+        RunPlace run = NearestRun(parent.GetChildren(), place, reaches ? scan.scannedTo : 0, first, last);
+        if (reaches && run.match == SiblingMemo::kNowhere) run = known;
+        scan.scannedTo = static_cast<uint32_t>(place);
+        scan.match = run.match;
+        scan.runStart = run.start;
+        return run;
+    }
+
+    static constexpr size_t kUnknown = SIZE_MAX;
+    // So few siblings are walked sooner than looked up.
+    static constexpr size_t kFew = 16;
 
     const ComplexSelector& selector_;
     MatchContext& context_;
     const bool record_;
+    size_t place_ = kUnknown;  // of the element that the walk has come to
 };
 
 }  // namespace

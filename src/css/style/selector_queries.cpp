@@ -3,6 +3,7 @@
 #include "core/limits.h"
 #include "core/logging/log.h"
 #include "css/parser/convert.h"
+#include "css/style/element_walk.h"
 #include "css/style/selector_matching.h"
 #include "dom/document.h"
 
@@ -10,33 +11,6 @@ namespace qorvex::css {
 
 using dom::Element;
 using dom::Node;
-
-namespace {
-
-// Visits the elements below `root` in document order until `visit` answers false. The stack holds how far the
-// walk has come in each ancestor, since nodes have no links to their siblings.
-template <class Visitor>
-void ForEachElementBelow(Node& root, Visitor&& visit) {
-    struct Level {
-        Node* node;
-        size_t next;
-    };
-    CssSmallVector<Level, 16> stack;
-    stack.push_back({&root, 0});
-    while (!stack.empty()) {
-        Level& level = stack.back();
-        const auto children = level.node->GetChildren();
-        if (level.next == children.size()) {
-            stack.pop_back();
-            continue;
-        }
-        Node& child = *children[level.next++];
-        if (child.IsElement() && !visit(static_cast<Element&>(child))) return;
-        if (child.HasChildNodes()) stack.push_back({&child, 0});
-    }
-}
-
-}  // namespace
 
 const SelectorQueries::SelectorList* SelectorQueries::Parse(std::string_view text,
                                                             std::string_view operation) {
@@ -81,7 +55,7 @@ Element* SelectorQueries::QuerySelector(Node& root, std::string_view text) {
     const SelectorList* selectors = Parse(text, "QuerySelector");
     if (!selectors) return nullptr;
     const PseudoState pseudo(*root.GetDocument());
-    MatchContext context(pseudo);
+    MatchContext context(pseudo, &siblings_);
     Element* found = nullptr;
     for (const ComplexSelector& selector : *selectors) {
         ForEachElementBelow(root, [&](Element& element) {
@@ -98,7 +72,7 @@ void SelectorQueries::QuerySelectorAll(Node& root, std::string_view text,
     const SelectorList* selectors = Parse(text, "QuerySelector");
     if (!selectors) return;
     const PseudoState pseudo(*root.GetDocument());
-    MatchContext context(pseudo);
+    MatchContext context(pseudo, &siblings_);
     for (const ComplexSelector& selector : *selectors) {
         ForEachElementBelow(root, [&](Element& element) {
             if (MatchSelector(selector, element, context, false)) matches.push_back(&element);

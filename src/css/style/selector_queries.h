@@ -8,6 +8,7 @@
 
 #include "core/memory/string_pool.h"
 #include "css/parser/selector.h"
+#include "css/style/sibling_memo.h"
 
 namespace qorvex::dom {
 class Element;
@@ -33,6 +34,7 @@ class SelectorQueries {
 
     StringPool& strings_;
     CssHashMap<CssString, SelectorList> cache_;
+    SiblingMemo siblings_;
 };
 
 }  // namespace qorvex::css

@@ -4,6 +4,7 @@
 
 #include "core/logging/log.h"
 #include "css/style/element_solver.h"
+#include "css/style/element_walk.h"
 #include "css/style/text_node_solver.h"
 #include "dom/document_host.h"
 
@@ -66,9 +67,26 @@ void StyleSolver::MatchDirtyElements(Document& document) {
     dom::NodeSet& dirty = document.GetSelectorDirtyElements();
     if (dirty.empty()) return;
     pseudo_.Take(document);
-    MatchContext context(pseudo_);
-    for (Node* node : dirty)
-        matcher_.MatchElementStyle(static_cast<Element&>(*node), rules_.defaults, rules_.author, context);
+    MatchContext context(pseudo_, &matcher_.GetSiblingMemo());
+    const auto match = [&](Node& node) {
+        matcher_.MatchElementStyle(static_cast<Element&>(node), rules_.defaults, rules_.author, context);
+    };
+    // The set has no order. Where rules look at siblings, order spares walks along them; a few elements are
+    // not worth a way through the document.
+    constexpr size_t kFew = 64;
+    const bool inOrder = dirty.size() > kFew && (rules_.author.GetSiblingInvalidatingRules() > 0 ||
+                                                 rules_.defaults.GetSiblingInvalidatingRules() > 0);
+    if (inOrder) {
+        size_t left = dirty.size();
+        ForEachElementBelow(document, [&](Element& element) {
+            if (!dirty.contains(&element)) return true;
+            match(element);
+            return --left > 0;
+        });
+    }
+    for (Node* node : dirty) {
+        if (!inOrder || !node->IsInDocument()) match(*node);
+    }
     dirty.clear();
     pseudo_.Forget();
 }
@@ -162,7 +180,7 @@ void StyleSolver::SolveBelow(Document& document, Extent extent) {
                  document.GetHost().GetFontResolver(),
                  document.GetLengthContext()};
     if (extent == Extent::All) pseudo_.Take(document);
-    MatchContext matching(pseudo_);
+    MatchContext matching(pseudo_, &matcher_.GetSiblingMemo());
     level_.clear();
     const auto visitFrom = [&](uint32_t first) {
         for (uint32_t i = first; i < level_.size(); ++i) {

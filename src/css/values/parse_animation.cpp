@@ -163,7 +163,7 @@ void Serialise(const TimingFunctionList& value, CssString& out) {
 
 bool Parse(std::string_view text, TransitionProperty& out) {
     if (EqualsIgnoreCase(text, "none")) return true;
-    return ParseList(text, out, [](std::string_view item, TransitionTarget& target) {
+    const bool read = ParseList(text, out, [](std::string_view item, TransitionTarget& target) {
         target = TransitionTarget();
         if (EqualsIgnoreCase(item, "all")) return true;
         target.kind = TransitionTargetKind::None;
@@ -176,6 +176,9 @@ bool Parse(std::string_view text, TransitionProperty& out) {
             LogDebug("Transition property ", item, " is not recognized.");
         return true;
     });
+    // A name that is no property leaves nothing to run, as "none" does.
+    if (out.items.size() == 1 && out.items[0].kind == TransitionTargetKind::None) out.items.clear();
+    return read;
 }
 
 void Serialise(const TransitionProperty& value, CssString& out) {

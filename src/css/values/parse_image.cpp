@@ -2,6 +2,7 @@
 #include "core/logging/log.h"
 #include "css/values/gradient_text.h"
 #include "css/values/number_parser.h"
+#include "css/values/text_reader.h"
 #include "css/values/value_parsers.h"
 
 namespace qorvex::css {
@@ -25,7 +26,8 @@ bool ParseUrl(std::string_view text, size_t start, CssString& out) {
     } else if (HoldsUnescaped(url, '"') || HoldsUnescaped(url, '\'')) {
         return false;
     }
-    if (url.empty()) return false;
+    // With both quotes in it there is no text for it.
+    if (url.empty() || HoldsUnescaped(url, QuoteFor(url))) return false;
     out = url;
     return true;
 }

@@ -60,7 +60,8 @@ void SerialiseQuoted(std::string_view name, CssString& out) {
 
 void SerialiseName(std::string_view name, CssString& out) {
     bool plain = !name.empty() && !IsReserved(name) && !name.starts_with(' ') && !name.ends_with(' ') &&
-                 name.find("  ") == std::string_view::npos;
+                 name.find("  ") == std::string_view::npos &&
+                 name.find_first_of("\t\n\r\f") == std::string_view::npos;
     WordReader words(name);
     std::string_view word;
     while (plain && words.Next(word))
@@ -95,7 +96,7 @@ bool Parse(std::string_view text, FontFamily& out) {
 }
 
 void Serialise(const FontFamily& value, CssString& out) {
-    SerialiseList(value, "", out, SerialiseName);
+    SerialiseList(value, "", out, [](const CssString& name, CssString& text) { SerialiseName(name, text); });
 }
 
 bool Parse(std::string_view text, LetterSpacing& out) {

@@ -92,6 +92,8 @@ bool ExpandAnimation(std::string_view text, ShorthandOutput& out) {
         timings.items.push_back(timing.value_or(TimingFunction()));
         states.items.push_back(state.value_or(AnimationPlayStateItem::Running));
     }
+    // "none" alone is the empty list, as in the longhand.
+    if (names.size() == 1 && names[0].empty()) names.items.clear();
     out.Add(Declaration::Make<PropertyId::AnimationName>(std::move(names)));
     out.Add(Declaration::Make<PropertyId::AnimationDuration>(std::move(durations)));
     out.Add(Declaration::Make<PropertyId::AnimationIterationCount>(std::move(counts)));
@@ -123,6 +125,8 @@ bool ExpandTransition(std::string_view text, ShorthandOutput& out) {
         delays.items.push_back(delay.value_or(Time()));
         timings.items.push_back(timing.value_or(TimingFunction()));
     }
+    // "none" alone is the empty list, as in the longhand.
+    if (targets.size() == 1 && targets[0].kind == TransitionTargetKind::None) targets.items.clear();
     out.Add(Declaration::Make<PropertyId::TransitionProperty>(std::move(targets)));
     out.Add(Declaration::Make<PropertyId::TransitionDuration>(std::move(durations)));
     out.Add(Declaration::Make<PropertyId::TransitionDelay>(std::move(delays)));

@@ -161,7 +161,9 @@ void FontManager::LoadFaces(fresco::IFontService& service, TaskFamilyHandle fami
         const bool all = !description.IsExplicit() && IsCollection(url.GetText().view());
         const uint32_t count = all ? service.GetFaceCount(reader) : 1;
         for (uint32_t face = 0; face < count; ++face) {
-            const fresco::FontId id = service.LoadFace(reader, face, sdf);
+            // A variable font shows the weight that the description asks for, where it names one.
+            const uint32_t wanted = description.weight != 0 ? ToFontFlags(description) : fresco::kAnyStyle;
+            const fresco::FontId id = service.LoadFace(reader, face, sdf, wanted);
             if (id == fresco::kNoId) continue;
             ++usable;
             post([&manager, id, description] { manager.OnFaceLoaded(id, description, description); });

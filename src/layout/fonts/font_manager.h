@@ -13,6 +13,7 @@
 #include "core/memory/string_pool.h"
 #include "core/tasks/task_system.h"
 #include "css/parser/stylesheet.h"
+#include "layout/fonts/bitmap_font_source.h"
 #include "layout/fonts/font_description.h"
 #include "layout/fonts/font_resolver.h"
 #include "layout/fonts/font_resource_loader.h"
@@ -50,6 +51,8 @@ class FontManager final : public IFontResolver {
     // Loads a font file for a description that has no font yet. useSDF: 0 off, 1 on, 2 auto.
     void AddFontDescription(const FontDescription& description, const URL& url, uint32_t useSDF);
     bool RemoveFontDescription(const FontDescription& description);
+    // A font of pictures; replaces a font of the description that is there.
+    void AddBitmapFont(const FontDescription& description, BitmapFontSourcePtr source);
 
     void ResolveTypefaces(const css::FontFamily& families, css::FontStyle style, uint8_t weight,
                           const NodeLinkPtr& waiter, TypefaceList& out) override;
@@ -64,6 +67,7 @@ class FontManager final : public IFontResolver {
                           fresco::IStreamReader* reader, const FontDescription& description, const URL& url,
                           fresco::SdfMode sdf);
     void OnFaceLoaded(fresco::FontId id, FontDescription description, const FontDescription& asked);
+    void CreateBitmapFont(const FontDescription& description, const BitmapFontSource* source);
     void OnLoadFailed(const FontDescription& description);
     void TellWaiters(const FontDescription& description);
 

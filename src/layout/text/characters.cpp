@@ -1,5 +1,7 @@
 #include "layout/text/characters.h"
 
+#include <algorithm>
+
 #include "layout/text/text_style.h"
 
 namespace qorvex::layout {
@@ -32,20 +34,28 @@ uint32_t NextCode(std::string_view text, size_t& at) {
 
 void DecodeCharacters(std::string_view utf8, css::WhiteSpaceMode whiteSpace, Characters& out) {
     const bool collapse = CollapsesSpaces(whiteSpace);
-    out.codes.reserve(utf8.size());
-    out.offsets.reserve(utf8.size());
+    out.codes.resize(utf8.size());
+    out.offsets.resize(utf8.size());
+    uint32_t* codes = out.codes.data();
+    uint32_t* offsets = out.offsets.data();
+    size_t count = 0;
+    uint32_t highest = 0;
     for (size_t at = 0; at < utf8.size();) {
         const auto offset = static_cast<uint32_t>(at);
         uint32_t code = NextCode(utf8, at);
         // A line feed that belongs to a carriage return before it is one line end; a lone return is a blank.
         if (code == 0x0D) code = at < utf8.size() && utf8[at] == '\n' ? 0x20 : 0x0A;
-        if (collapse && ClassOf(code) != CharacterClass::Other) {
-            if (!out.codes.empty() && out.codes.back() == ' ') continue;
+        if (collapse && code <= 0x85 && ClassOf(code) != CharacterClass::Other) {
+            if (count > 0 && codes[count - 1] == ' ') continue;
             code = ' ';
         }
-        out.codes.push_back(code);
-        out.offsets.push_back(offset);
+        highest = std::max(highest, code);
+        codes[count] = code;
+        offsets[count++] = offset;
     }
+    out.codes.resize(count);
+    out.offsets.resize(count);
+    out.highest = highest;
     // The width of a space at the end is added to the line instead, so that it neither wraps nor draws.
     if (collapse && !out.codes.empty() && out.codes.back() == ' ') {
         out.codes.pop_back();

@@ -23,25 +23,26 @@ LineMetrics MetricsOf(const fresco::IFont& font, const TextStyle& style, bool ap
     return {std::round(-metrics.ascent + metrics.lineGap + (height - content) * 0.5f), std::round(height)};
 }
 
-// Tabs and their like have no glyph of their own: they show as blanks.
-uint32_t ShownCode(uint32_t code) {
-    return ClassOf(code) == CharacterClass::Space ? 0x20 : code;
-}
-
-// Gives the font's glyphs to the characters from first to end that have none yet.
-void MapSpan(const Characters& characters, const fresco::IFont& font, uint8_t index, size_t first, size_t end,
-             GlyphMap& out) {
+// Gives the font's glyphs to the characters from first to end that have none yet; returns how many stay
+// without.
+size_t MapSpan(const Characters& characters, const fresco::IFont& font, uint8_t index, size_t first,
+               size_t end, GlyphMap& out) {
     TempMark mark;
     TempVector<uint32_t> codes(end - first);
     TempVector<uint32_t> glyphs(end - first);
     for (size_t i = first; i < end; ++i)
         codes[i - first] = ShownCode(characters.codes[i]);
     font.GetGlyphIndices(codes.data(), codes.size(), glyphs.data());
+    size_t missing = 0;
     for (size_t i = first; i < end; ++i) {
-        if (glyphs[i - first] == 0) continue;
+        if (glyphs[i - first] == 0) {
+            ++missing;
+            continue;
+        }
         out.glyphs[i] = glyphs[i - first];
         out.fonts[i] = index;
     }
+    return missing;
 }
 
 // A space between two characters of one font takes that font, so that it does not split their run.
@@ -89,8 +90,7 @@ void LoadTypefaces(const TextStyle& style, fresco::IFontService& service, bool a
     }
 }
 
-void MapGlyphs(const Characters& characters, const LoadedTypefaces& typefaces, const TextStyle& style,
-               GlyphMap& out) {
+void MapFonts(const Characters& characters, const LoadedTypefaces& typefaces, GlyphMap& out) {
     const size_t count = characters.codes.size();
     out.glyphs.resize(count, 0u);
     out.fonts.resize(count, kNoFont);
@@ -98,7 +98,9 @@ void MapGlyphs(const Characters& characters, const LoadedTypefaces& typefaces, c
     for (size_t i = 0; i < count; ++i) {
         if (ClassOf(characters.codes[i]) == CharacterClass::LineFeed) out.fonts[i] = 0;
     }
-    for (size_t font = 0; font < typefaces.fonts.size(); ++font) {
+    size_t missing = count;
+    for (size_t font = 0; font < typefaces.fonts.size() && missing > 0; ++font) {
+        missing = 0;
         for (size_t first = 0; first < count;) {
             if (out.fonts[first] != kNoFont) {
                 ++first;
@@ -107,12 +109,18 @@ void MapGlyphs(const Characters& characters, const LoadedTypefaces& typefaces, c
             size_t end = first + 1;
             while (end < count && out.fonts[end] == kNoFont)
                 ++end;
-            MapSpan(characters, *typefaces.fonts[font], static_cast<uint8_t>(font), first, end, out);
+            missing +=
+                MapSpan(characters, *typefaces.fonts[font], static_cast<uint8_t>(font), first, end, out);
             first = end;
         }
     }
     std::replace(out.fonts.begin(), out.fonts.end(), kNoFont, uint8_t{0});
     JoinSpaces(characters, typefaces, out);
+}
+
+void MapGlyphs(const Characters& characters, const LoadedTypefaces& typefaces, const TextStyle& style,
+               GlyphMap& out) {
+    MapFonts(characters, typefaces, out);
     MeasureAdvances(characters, typefaces, style, out);
 }
 

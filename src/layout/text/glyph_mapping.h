@@ -34,7 +34,14 @@ struct GlyphMap {
 void LoadTypefaces(const TextStyle& style, fresco::IFontService& service, bool applyLineHeight,
                    LoadedTypefaces& out);
 
-// Every character gets the first font that has it, else the box of the first font.
+// Tabs and their like have no glyph of their own: they show as blanks.
+[[nodiscard]] inline uint32_t ShownCode(uint32_t code) {
+    return ClassOf(code) == CharacterClass::Space ? 0x20 : code;
+}
+
+// Every character gets the first font that has it, else the box of the first font. Advances stay 0.
+void MapFonts(const Characters& characters, const LoadedTypefaces& typefaces, GlyphMap& out);
+// The same with advances.
 void MapGlyphs(const Characters& characters, const LoadedTypefaces& typefaces, const TextStyle& style,
                GlyphMap& out);
 

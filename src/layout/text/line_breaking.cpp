@@ -2,6 +2,8 @@
 
 #include <qorvex/text_services.h>
 
+#include <limits>
+
 namespace qorvex::layout {
 
 namespace {
@@ -12,6 +14,14 @@ constexpr float kSlack = 0.01f;
 bool IsAsciiPunctuation(uint32_t code) {
     return (code >= '!' && code <= '/') || (code >= ':' && code <= '@') || (code >= '[' && code <= '`') ||
            (code >= '{' && code <= '~');
+}
+
+// Letters of alphabets that part words by spaces, between two of which no line ends (Unicode Annex 14, LB28).
+bool IsSpacedLetter(uint32_t code) {
+    if (code < 0x80) return (code | 0x20) >= 'a' && (code | 0x20) <= 'z';
+    return (code >= 0xC0 && code <= 0x24F) || (code >= 0x388 && code <= 0x481) ||
+           (code >= 0x48A && code <= 0x52F) || (code >= 0x5D0 && code <= 0x5EA) ||
+           (code >= 0x620 && code <= 0x64A);
 }
 
 // One pass over the characters. A word grows until a break is possible, then joins the line or starts the
@@ -50,14 +60,15 @@ class LineBreaker {
   private:
     void AddCharacter(uint32_t i) {
         const float advance = request_.advances[i];
-        if (i > wordStart_ && wraps_ && MayBreakBefore(i, advance)) {
+        const bool whole = request_.clusterStarts == nullptr || request_.clusterStarts[i] != 0;
+        if (i > wordStart_ && wraps_ && whole && MayBreakBefore(i, advance)) {
             FinishWord(i);
             wordStart_ = i;
         }
         wordWidth_ += advance;
     }
 
-    bool MayBreakBefore(uint32_t i, float advance) const {
+    bool MayBreakBefore(uint32_t i, float advance) {
         switch (request_.style.overflowWrap) {
             case css::OverflowWrapMode::Anywhere:
                 return true;
@@ -67,11 +78,23 @@ class LineBreaker {
             default:
                 break;
         }
-        if (request_.iterator == nullptr) return false;
-        // Not behind ASCII punctuation, where a dictionary of line breaks would cut paths and numbers.
-        if (IsAsciiPunctuation(request_.characters.codes[i - 1])) return false;
+        return request_.iterator != nullptr && IsCandidate(i);
+    }
+
+    // Not behind ASCII punctuation, where a dictionary of line breaks would cut paths and numbers; two other
+    // ASCII characters are never parted.
+    bool IsCandidate(uint32_t i) {
+        const uint32_t before = request_.characters.codes[i - 1];
+        const uint32_t code = request_.characters.codes[i];
+        if (before < 0x80 && (code < 0x80 || IsAsciiPunctuation(before))) return false;
+        // What the rules say at once need not be asked for.
+        if (IsSpacedLetter(before) && IsSpacedLetter(code)) return false;
         const auto offset = static_cast<int>(request_.characters.offsets[i]);
-        return request_.iterator->GetBoundaryAfter(offset - 1) == offset;
+        // Until the boundary that was found last there is no other one.
+        if (offset < nextCandidate_) return false;
+        if (offset > nextCandidate_) nextCandidate_ = request_.iterator->GetBoundaryAfter(offset - 1);
+        if (nextCandidate_ < 0) nextCandidate_ = std::numeric_limits<int>::max();
+        return nextCandidate_ == offset;
     }
 
     // The word from wordStart_ to `end` joins the line, or the line ends before it.
@@ -111,6 +134,7 @@ class LineBreaker {
     float lineWidth_;
     float wordWidth_ = 0;
     float pendingSpace_ = 0;
+    int nextCandidate_ = -1;
 };
 
 }  // namespace

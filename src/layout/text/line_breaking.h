@@ -24,9 +24,10 @@ struct BreakRequest {
     const Characters& characters;
     const float* advances;  // one for each character, letter spacing included
     const TextStyle& style;
-    float available;                 // NaN: lines end at line feeds alone
-    float firstLineOffset;           // taken on the first line by content before this text
-    i18n::IBreakIterator* iterator;  // null: lines break at spaces alone; holds the text already
+    float available;                         // NaN: lines end at line feeds alone
+    float firstLineOffset;                   // taken on the first line by content before this text
+    i18n::IBreakIterator* iterator;          // null: lines break at spaces alone; holds the text already
+    const uint8_t* clusterStarts = nullptr;  // null: a line may break before each character
 };
 
 void BreakLines(const BreakRequest& request, TempVector<LineSpan>& out);

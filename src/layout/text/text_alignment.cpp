@@ -11,6 +11,7 @@ using css::TextAlignType;
 void MoveLine(TextInfo& info, TextLineInfo& line, float distance) {
     if (distance == 0) return;
     line.x += distance;
+    line.extent += distance;
     for (uint32_t i = 0; i < line.runCount; ++i)
         info.runs[line.firstRun + i].x += distance;
     line.ellipsis.x += distance;

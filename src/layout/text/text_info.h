@@ -37,18 +37,30 @@ struct TextLineInfo {
     uint32_t runCount = 0;
     uint32_t firstCharacter = 0;
     uint32_t endCharacter = 0;
-    float x = 0;  // that alignment gave the line
-    float width = 0;
+    float x = 0;       // that alignment gave the line
+    float width = 0;   // of the widest line, after alignment
+    float extent = 0;  // where the line's own content ends; counted from the line's start
     float height = 0;
     float baseline = 0;          // from the line's top
     bool endsParagraph = false;  // by a line feed or the end of the text
     TextEllipsis ellipsis;
 };
 
+// Where a line of an inline flow stands, from the corner of the text's box.
+struct LinePlacement {
+    float x = 0;
+    float baseline = 0;
+};
+
 struct TextInfo {
     TextArray<TextLineInfo> lines;
     TextArray<TextRun> runs;
     TextArray<fresco::Glyph> glyphs;  // one for each character, spaces included, in the plain path
+    // For each glyph the character that its cluster begins with; empty where glyph i of a run is its
+    // character i.
+    TextArray<uint32_t> clusters;
+    // For each character the edge in its run at which reading it begins; empty with `clusters`.
+    TextArray<float> positions;
     float width = 0;
     float height = 0;
     float usedSize = 0;    // font size of this layout in pixels
@@ -58,6 +70,8 @@ struct TextInfo {
         lines.clear();
         runs.clear();
         glyphs.clear();
+        clusters.clear();
+        positions.clear();
         width = height = 0;
         wrapped = false;
     }

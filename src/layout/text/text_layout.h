@@ -8,9 +8,12 @@
 namespace fresco {
 class IFontService;
 }
-namespace qorvex::i18n {
+namespace qorvex {
+class IInternationalizationManager;
+namespace i18n {
 class IBreakIterator;
 }
+}  // namespace qorvex
 
 namespace qorvex::layout {
 
@@ -20,13 +23,17 @@ struct TextRequest {
     float availableWidth;   // pixels; NaN when not known
     float availableHeight;  // read by font-fit-mode alone
     fresco::IFontService& fonts;
-    i18n::IBreakIterator* iterator = nullptr;  // holds the text
+    i18n::IBreakIterator* iterator = nullptr;      // holds the text
+    IInternationalizationManager* i18n = nullptr;  // read by the complex path alone
     float firstLineOffset = 0;
     bool applyLineHeight = true;
 };
 
-// One layout at style.usedSize. False, with an empty result, when no typeface is loaded.
+// One layout at style.usedSize, by the path that the text needs. False, with an empty result, when no
+// typeface is loaded.
 bool CalculateTextRunsAndGlyphs(const TextRequest& request, TextInfo& out);
+// The complex path, whatever the text.
+bool CalculateTextRunsAndGlyphsForComplexText(const TextRequest& request, TextInfo& out);
 
 // The same under font-fit-mode: the largest (fit) or the first smaller (shrink) size that the available box
 // holds.

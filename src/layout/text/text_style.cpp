@@ -21,7 +21,7 @@ bool SameTextStyle(const TextStyle& a, const TextStyle& b) {
     return a.typefaces == b.typefaces && Near(a.fontSize, b.fontSize) &&
            Near(a.letterSpacing, b.letterSpacing) && Near(a.lineHeight, b.lineHeight) && a.align == b.align &&
            a.fit == b.fit && a.overflowWrap == b.overflowWrap && a.whiteSpace == b.whiteSpace &&
-           a.overflow == b.overflow;
+           a.overflow == b.overflow && a.complexText == b.complexText;
 }
 
 }  // namespace qorvex::layout

@@ -22,6 +22,7 @@ struct TextStyle {
     css::OverflowWrapMode overflowWrap = css::OverflowWrapMode::Normal;
     css::WhiteSpaceMode whiteSpace = css::WhiteSpaceMode::Normal;
     css::TextOverflowMode overflow = css::TextOverflowMode::Clip;
+    bool complexText = true;  // shaping and directions, where the text needs them
 };
 
 [[nodiscard]] TextStyle MakeTextStyle(const css::TextLayoutStyle& style);

@@ -23,6 +23,16 @@ class Engine : public StyleTest {
     Ruleset Rule(std::string_view text) { return MakeStylesheet(text, {}, host_->strings)->rules[0]; }
 };
 
+// Work that grew with the square of their number would take minutes here.
+TEST_F(Engine, OneElementMayHaveThousandsOfCustomProperties) {
+    std::string sheet = "#a {";
+    for (int i = 0; i < 100000; ++i)
+        sheet += "--n" + std::to_string(i) + ":" + std::to_string(i) + "px;";
+    Load("<p id='a'>x</p>", sheet + "} p#a { --n99999: 1px; width: var(--n99999); height: var(--n7) }");
+    EXPECT_EQ(Computed("a", "width"), "1px");
+    EXPECT_EQ(Computed("a", "height"), "7px");
+}
+
 TEST_F(Engine, Queries) {
     Load(
         "<div id='a' class='x'><p id='b' class='y'><i id='c' class='x y'></i></p></div><p id='d' "

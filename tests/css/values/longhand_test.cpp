@@ -186,10 +186,12 @@ constexpr Case kCases[] = {
     {"perspective-origin", "left", "0% 50%"},
     // Text
     {"font-family", "\"A B\",C D,serif", "A B, C D, serif"},
+    {"font-family", "\"a\tb\", \"None\", 'x\\\"y'", "\"a\tb\", \"None\", \"x\\\"y\""},
     {"font-family", "12px", kRefused},
     {"font-family", "a,,b", kRefused},
     // Lists
     {"animation-name", "none", "none"},
+    {"animation-name", "'a b', \"c\"", "\"a b\", c"},
     {"animation-name", "a,none", "a, none"},
     {"animation-duration", "500ms,2s", "0.5s, 2s"},
     {"animation-duration", "-1s", kRefused},

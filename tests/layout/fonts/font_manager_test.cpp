@@ -141,5 +141,44 @@ TEST_F(FontManagerTest, FailedAndLateAnswersLeaveNothingBehind) {
     EXPECT_TRUE(log_.Contains("to closed channel"));
 }
 
+// A page of 2 by 2 white pixels with one glyph.
+BitmapFontSourcePtr Tiles(const char* table) {
+    auto source = MakeRef<BitmapFontSource>();
+    source->family = "Tiles";
+    source->table = table;
+    BitmapFontPage page;
+    page.width = page.height = 2;
+    page.bytes.resize(16, uint8_t{255});
+    source->pages.push_back(std::move(page));
+    return source;
+}
+
+TEST_F(FontManagerTest, BitmapFontsMakeTextWaitAndReplaceEachOther) {
+    constexpr char kTable[] =
+        "info size=2\ncommon lineHeight=2 base=2\nchar id=65 width=2 height=2 xadvance=2\n";
+    const FontDescription tiles{strings.Intern("Tiles"), kNormalStyle, kNormalWeight};
+    manager->AddBitmapFont(tiles, Tiles(kTable));
+    EXPECT_EQ(Resolve("Tiles", 4)[0], css::kNoTypeface);
+    RunAll();
+    EXPECT_EQ(link.told, 1);
+    const uint32_t first = Resolve("Tiles", 4)[0];
+    EXPECT_NE(first, css::kNoTypeface);
+    manager->AddBitmapFont(tiles, Tiles(kTable));
+    RunAll();
+    EXPECT_TRUE(log_.Contains("Bitmap font Tiles already loaded, will replace its description!"));
+    EXPECT_NE(Resolve("Tiles", 4)[0], first);
+    // What cannot be used leaves the font that is there.
+    const uint32_t second = Resolve("Tiles", 4)[0];
+    manager->AddBitmapFont(tiles, Tiles("nonsense"));
+    RunAll();
+    EXPECT_TRUE(log_.Contains("Unable to load user font Tiles"));
+    BitmapFontSourcePtr broken = Tiles(kTable);
+    broken->pages[0].encoded = true;
+    manager->AddBitmapFont(tiles, broken);
+    RunAll();
+    EXPECT_TRUE(log_.Contains("Cannot load image for user font"));
+    EXPECT_EQ(Resolve("Tiles", 4)[0], second);
+}
+
 }  // namespace
 }  // namespace qorvex::layout

@@ -1,0 +1,76 @@
+// A face of a font file (TrueType, CFF, WOFF, WOFF2, collections, named instances of variable fonts): tables
+// through HarfBuzz, shapes through FreeType.
+//
+// Glyph lookup, advances, metrics and shaping stand on immutable HarfBuzz objects, so layout threads need no
+// lock for them; FT_Face is not safe to share and is touched under `mutex_` alone, when a shape is asked for
+// the first time.
+#pragma once
+#include <array>
+#include <mutex>
+
+#include "fresco/fonts/font_face.h"
+#include "fresco/fonts/shape_cache.h"
+
+struct FT_FaceRec_;
+struct FT_LibraryRec_;
+struct hb_face_t;
+
+namespace fresco {
+
+class ScalableFace final : public FontFace {
+  public:
+    explicit ScalableFace(const ShapeSettings& settings) : shapes_(settings) {}
+    ~ScalableFace() override;
+
+    // `library` is used under the lock of the service. The high half of the index names an instance of a
+    // variable font, from 1.
+    bool Load(FT_LibraryRec_* library, std::shared_ptr<FontData> data, uint32_t faceIndex, SdfMode sdf,
+              FontId id);
+    // The index, with an instance in its high half, whose style comes nearest to a flag word.
+    uint32_t FindInstance(uint32_t flags) const;
+    uint32_t GetInstanceCount() const;
+
+    void GetGlyphIndices(const uint32_t* codePoints, size_t count, uint32_t* glyphs) const override;
+    FontMetrics GetMetrics(float size) const override;
+    bool GetAdvances(const uint32_t* glyphs, size_t count, float size, float* advances) const override;
+    bool Shape(const ShapeRequest& request, IShapeSink& sink) const override;
+    void PreloadGlyphs(const uint32_t* codePoints, size_t count) const override;
+
+    const GlyphOutline& GetOutline(uint32_t glyph) const override;
+    const ColorGlyph* GetColorGlyph(uint32_t glyph) const override;
+    const DistanceField* GetDistanceField(uint32_t glyph) const override;
+
+  private:
+    // Code points below this are looked up in a table: Latin and what it borders on.
+    static constexpr uint32_t kTabledCodes = 0x300;
+    static constexpr uint32_t kUnknownAdvance = 0xFFFF;
+
+    template <class T>
+    using ShapeMap = HashMap<uint32_t, std::unique_ptr<T, HeapDeleter<T>>>;
+
+    bool MakeShaper();
+    void ReadNames();
+    void ReadMetrics();
+    uint32_t StyleOfInstance(uint32_t instance) const;
+    uint32_t Advance(uint32_t glyph) const;
+    void LoadOutline(uint32_t glyph, GlyphOutline& out) const;
+    void LoadPicture(uint32_t glyph, ColorGlyph& out) const;
+    void LoadDistances(uint32_t glyph, DistanceField& out) const;
+
+    FT_FaceRec_* face_ = nullptr;
+    hb_face_t* hbFace_ = nullptr;
+    hb_font_t* hbFont_ = nullptr;
+    bool hasLayers_ = false;   // COLR
+    FontMetrics unitMetrics_;  // in font units
+    std::array<uint16_t, kTabledCodes> tabled_{};
+    // In font units, filled as they are asked for: a font of all Chinese characters has 65,535.
+    mutable Vector<std::atomic<uint16_t>> advances_;
+    mutable ShapeCache shapes_;
+
+    mutable std::mutex mutex_;
+    mutable ShapeMap<GlyphOutline> outlines_;
+    mutable ShapeMap<ColorGlyph> pictures_;
+    mutable ShapeMap<DistanceField> fields_;
+};
+
+}  // namespace fresco

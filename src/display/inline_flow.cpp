@@ -1,0 +1,260 @@
+#include "display/inline_flow.h"
+
+#include <yoga/Yoga.h>
+
+#include <algorithm>
+#include <cmath>
+
+#include "display/display_text.h"
+#include "layout/flex_results.h"
+#include "layout/layout_store.h"
+
+namespace qorvex::dsp {
+
+using layout::LayoutHandle;
+using layout::LayoutNode;
+using layout::LayoutPass;
+using layout::Point;
+using layout::Rect;
+using layout::Size;
+
+namespace {
+
+float Finite(float value) {
+    return std::isfinite(value) ? value : 0;
+}
+
+bool IsText(const LayoutNode& node) {
+    return node.display && node.display->Has(IDisplayElement::kIsText);
+}
+
+// Its content flows with the lines around it; without content it is a box like others.
+bool IsInline(const LayoutNode& node) {
+    return node.style.layout->display == css::CSSDisplay::Inline && !node.children.empty() &&
+           !node.flags.measuredByDisplayElement;
+}
+
+// Edges that Yoga has resolved for a node of its own tree; percentages have no base there and count as 0.
+struct OuterEdges {
+    layout::Edges border, padding, margin;
+    explicit OuterEdges(const LayoutNode& node) {
+        const YGNodeConstRef flex = node.flex;
+        const auto points = [&](YGValue value) {
+            return value.unit == YGUnitPoint ? Finite(value.value) : 0.0f;
+        };
+        const auto read = [&](layout::Edges& out, auto get) {
+            out = {get(YGEdgeLeft), get(YGEdgeRight), get(YGEdgeTop), get(YGEdgeBottom)};
+        };
+        read(border, [&](YGEdge edge) { return Finite(YGNodeStyleGetBorder(flex, edge)); });
+        read(padding, [&](YGEdge edge) { return points(YGNodeStyleGetPadding(flex, edge)); });
+        read(margin, [&](YGEdge edge) { return points(YGNodeStyleGetMargin(flex, edge)); });
+    }
+    float Left() const { return margin.left + border.left + padding.left; }
+    float Right() const { return margin.right + border.right + padding.right; }
+};
+
+}  // namespace
+
+void InlineFlow::Clear() {
+    items_.clear();
+    pieces_.clear();
+    lines_.clear();
+    outOfFlow_.clear();
+}
+
+Size InlineFlow::Flow(LayoutHandle& paragraph, float width, float scale) {
+    Clear();
+    Cursor cursor{width, scale};
+    lines_.push_back({});
+    Walk(paragraph, cursor, 0);
+    lines_.back().width = cursor.x;
+    Size size;
+    for (Line& line : lines_) {
+        line.top = size.height;
+        size.height += line.ascent + line.descent;
+        size.width = std::max(size.width, line.width);
+    }
+    return size;
+}
+
+void InlineFlow::Walk(LayoutHandle& parent, Cursor& cursor, uint32_t depth) {
+    if (depth >= limits::kMaxLayoutDepth) return;
+    for (const layout::HandlePtr& child : parent.node().children) {
+        const LayoutNode& node = child->node();
+        if (node.style.layout->display == css::CSSDisplay::None) continue;
+        if (node.flags.isAbsolute || node.flags.isFixed) {
+            if (node.flex != nullptr) outOfFlow_.push_back(child.get());
+        } else if (IsText(node))
+            AddText(*child, cursor);
+        else if (node.flex == nullptr)
+            continue;  // beyond the depth limit
+        else if (IsInline(node))
+            AddInline(*child, cursor, depth);
+        else
+            AddBox(*child, cursor);
+    }
+}
+
+void InlineFlow::NewLine(Cursor& cursor) {
+    lines_.back().width = cursor.x;
+    lines_.push_back({});
+    cursor.x = 0;
+}
+
+void InlineFlow::AddPiece(Item& item, Cursor& cursor, const Piece& piece) {
+    Line& line = lines_.back();
+    line.ascent = std::max(line.ascent, piece.ascent);
+    line.descent = std::max(line.descent, piece.descent);
+    pieces_.push_back(piece);
+    item.endPiece = static_cast<uint32_t>(pieces_.size());
+    cursor.x = piece.x + piece.width;
+}
+
+void InlineFlow::AddText(LayoutHandle& handle, Cursor& cursor) {
+    auto& text = static_cast<DisplayText&>(*handle.node().display);
+    const auto first = static_cast<uint32_t>(pieces_.size());
+    items_.push_back({&handle, Kind::Text, first, first});
+    const float offset = cursor.x;
+    const layout::TextInfo* info = text.LayoutInline(handle, {cursor.width, offset, cursor.scale});
+    if (info == nullptr) return;
+    for (uint32_t i = 0; i < info->lines.size(); ++i) {
+        const layout::TextLineInfo& line = info->lines[i];
+        // The first word did not fit behind what is there: the text begins on the next line.
+        const bool skipped =
+            i == 0 && line.runCount == 0 && info->lines.size() > 1 && offset > 0 && !line.endsParagraph;
+        if (i > 0) NewLine(cursor);
+        if (skipped) continue;
+        const float start = i == 0 ? offset : 0;
+        AddPiece(items_.back(), cursor,
+                 {static_cast<uint32_t>(lines_.size() - 1), i, start, std::max(line.extent - start, 0.0f),
+                  line.baseline, line.height - line.baseline});
+    }
+}
+
+void InlineFlow::AddBox(LayoutHandle& handle, Cursor& cursor) {
+    LayoutNode& node = handle.node();
+    YGNodeCalculateLayout(node.flex, YGUndefined, YGUndefined, YGDirectionLTR);
+    const OuterEdges edges(node);
+    const float width = Finite(YGNodeLayoutGetWidth(node.flex)) + edges.margin.left + edges.margin.right;
+    const float height = Finite(YGNodeLayoutGetHeight(node.flex)) + edges.margin.top + edges.margin.bottom;
+    if (cursor.x > 0 && cursor.x + width > cursor.width + layout::kLengthTolerance) NewLine(cursor);
+    const auto first = static_cast<uint32_t>(pieces_.size());
+    items_.push_back({&handle, Kind::Box, first, first});
+    AddPiece(items_.back(), cursor,
+             {static_cast<uint32_t>(lines_.size() - 1), 0, cursor.x, width, height, 0});
+}
+
+void InlineFlow::AddInline(LayoutHandle& handle, Cursor& cursor, uint32_t depth) {
+    const OuterEdges edges(handle.node());
+    const auto open = static_cast<uint32_t>(items_.size());
+    const auto first = static_cast<uint32_t>(pieces_.size());
+    items_.push_back({&handle, Kind::Inline, first, first});
+    cursor.x += edges.Left();
+    Walk(handle, cursor, depth + 1);
+    cursor.x += edges.Right();
+    items_[open].endPiece = static_cast<uint32_t>(pieces_.size());
+}
+
+// --- Placing
+
+void InlineFlow::AlignLines(css::TextAlignType align, float width) {
+    const float part = align == css::TextAlignType::Center  ? 0.5f
+                       : align == css::TextAlignType::Right ? 1.0f
+                                                            : 0.0f;
+    for (Line& line : lines_)
+        line.shift = std::max(width - line.width, 0.0f) * part;
+}
+
+Rect InlineFlow::Around(uint32_t firstPiece, uint32_t endPiece, Point origin) const {
+    if (firstPiece == endPiece) return {origin.x, origin.y, 0, 0, 0};
+    float left = 0, top = 0, right = 0, bottom = 0;
+    for (uint32_t i = firstPiece; i < endPiece; ++i) {
+        const Piece& piece = pieces_[i];
+        const Line& line = lines_[piece.line];
+        const float x = line.shift + piece.x;
+        const float y = line.top + line.ascent - piece.ascent;
+        const bool start = i == firstPiece;
+        left = start ? x : std::min(left, x);
+        top = start ? y : std::min(top, y);
+        right = start ? x + piece.width : std::max(right, x + piece.width);
+        const float end = y + piece.ascent + piece.descent;
+        bottom = start ? end : std::max(bottom, end);
+    }
+    return {origin.x + left, origin.y + top, 0, right - left, bottom - top};
+}
+
+void InlineFlow::PlaceText(LayoutPass& pass, const Item& item, Point origin) {
+    LayoutNode& node = item.handle->node();
+    const layout::OldBox old(node);
+    node.box = Around(item.firstPiece, item.endPiece, origin);
+    auto& text = static_cast<DisplayText&>(*node.display);
+    const TempMark mark;
+    TempVector<layout::LinePlacement> places;
+    places.resize(text.Info().lines.size(), layout::LinePlacement{});
+    for (uint32_t i = item.firstPiece; i < item.endPiece; ++i) {
+        const Piece& piece = pieces_[i];
+        const Line& line = lines_[piece.line];
+        if (piece.textLine < places.size()) {
+            places[piece.textLine] = {origin.x + line.shift - node.box.x,
+                                      origin.y + line.top + line.ascent - node.box.y};
+        }
+    }
+    text.PlaceLines(places.data(), places.size());
+    NoteBoxChange(*item.handle, old, pass);
+}
+
+void InlineFlow::PlaceBox(LayoutPass& pass, const Item& item, Point origin) {
+    LayoutNode& node = item.handle->node();
+    const Rect outer = Around(item.firstPiece, item.endPiece, origin);
+    const OuterEdges edges(node);
+    layout::FlexReadRoot root{item.handle, nullptr, {}, pass.everything};
+    root.origin = {outer.x + edges.margin.left - Finite(YGNodeLayoutGetLeft(node.flex)),
+                   outer.y + edges.margin.top - Finite(YGNodeLayoutGetTop(node.flex))};
+    ReadYogaResults(root, pass);
+}
+
+void InlineFlow::PlaceInline(LayoutPass& pass, const Item& item, Point origin) {
+    LayoutNode& node = item.handle->node();
+    const layout::OldBox old(node);
+    const OuterEdges edges(node);
+    node.edges.Set({edges.border, edges.padding, edges.margin}, item.handle->store().recentEdges);
+    const Rect content = Around(item.firstPiece, item.endPiece, origin);
+    const layout::Edges around{edges.border.left + edges.padding.left,
+                               edges.border.right + edges.padding.right, edges.border.top + edges.padding.top,
+                               edges.border.bottom + edges.padding.bottom};
+    node.box = {content.x - around.left, content.y - around.top, 0,
+                content.width + around.left + around.right, content.height + around.top + around.bottom};
+    NoteBoxChange(*item.handle, old, pass);
+}
+
+void InlineFlow::Place(LayoutPass& pass, LayoutHandle& paragraph, Point origin, float width) {
+    AlignLines(paragraph.node().style.text->textAlign, width);
+    for (const Item& item : items_) {
+        switch (item.kind) {
+            case Kind::Text:
+                PlaceText(pass, item, origin);
+                break;
+            case Kind::Box:
+                PlaceBox(pass, item, origin);
+                break;
+            case Kind::Inline:
+                PlaceInline(pass, item, origin);
+                break;
+        }
+    }
+    // Out of the flow, at the content's corner and moved by left and top alone.
+    for (LayoutHandle* handle : outOfFlow_) {
+        LayoutNode& node = handle->node();
+        YGNodeCalculateLayout(node.flex, YGUndefined, YGUndefined, YGDirectionLTR);
+        const auto inset = [&](YGEdge edge) {
+            const YGValue value = YGNodeStyleGetPosition(node.flex, edge);
+            return value.unit == YGUnitPoint ? Finite(value.value) : 0.0f;
+        };
+        layout::FlexReadRoot root{handle, nullptr, {}, pass.everything};
+        root.origin = {origin.x + inset(YGEdgeLeft) - Finite(YGNodeLayoutGetLeft(node.flex)),
+                       origin.y + inset(YGEdgeTop) - Finite(YGNodeLayoutGetTop(node.flex))};
+        ReadYogaResults(root, pass);
+    }
+}
+
+}  // namespace qorvex::dsp

@@ -1,0 +1,151 @@
+// <p qor-inline>: text and inline boxes share lines, in both engines, and follow what changes below.
+#include "display/display_paragraph.h"
+
+#include <fresco/rendering_library.h>
+
+#include "display/display_text.h"
+#include "layout/fonts/fallback_font_data.h"
+#include "layout/fonts/memory_stream.h"
+#include "layout/page_fixture.h"
+
+namespace qorvex::test {
+namespace {
+
+using dsp::DisplayParagraph;
+using dsp::DisplayText;
+using layout::LayoutHandle;
+
+class ParagraphTest : public LayoutTest {
+  protected:
+    ParagraphTest() : fonts(fresco::CreateNullRenderingLibrary({})) {
+        layout::MemoryStream stream(layout::kLargeFallbackFont, layout::kLargeFallbackFontSize);
+        font = fonts->GetFontService()->LoadFace(&stream, 0, fresco::SdfMode::Never);
+        page.tree.SetTextServices({fonts->GetFontService()});
+    }
+    ~ParagraphTest() override { fonts->Destroy(); }
+
+    LayoutHandle* Add(LayoutHandle* parent, dsp::DisplayElementPtr display, std::string_view style) {
+        css::LayoutStyleRefs refs = Page::Style(style);
+        refs.Mutable<css::TextLayoutStyle>().typefaces.push_back(font);
+        kept.push_back(page.tree.AddChild(*parent, parent->data().children.size(),
+                                          {refs, std::move(display), nullptr, {}, false}));
+        return kept.back().get();
+    }
+    LayoutHandle* Paragraph(std::string_view style) {
+        return Add(page.body, MakeRef<DisplayParagraph>(), style);
+    }
+    LayoutHandle* Text(LayoutHandle* parent, std::string_view text, std::string_view style = "") {
+        auto display = MakeRef<DisplayText>();
+        display->SetText(text);
+        return Add(parent, display, style);
+    }
+    LayoutHandle* Inline(LayoutHandle* parent, std::string_view style = "") {
+        return Add(parent, MakeRef<dsp::Box>(), "display:inline;" + std::string(style));
+    }
+    static const layout::LayoutResult& Box(const LayoutHandle* handle) { return handle->data().result; }
+    static float Right(const LayoutHandle* handle) { return Box(handle).left + Box(handle).width; }
+
+    // Before the page, whose texts ask for its fonts.
+    fresco::IRenderingLibrary* fonts;
+    fresco::FontId font;
+    Page page;
+    std::vector<layout::HandlePtr> kept;
+};
+
+TEST_F(ParagraphTest, TextAndInlineBoxesShareALine) {
+    LayoutHandle* p = Paragraph("padding-left:10px;padding-top:4px;width:600px");
+    LayoutHandle* first = Text(p, "some text ");
+    LayoutHandle* chip = Inline(p,
+                                "padding-left:5px;padding-right:5px;border-left-width:2px;"
+                                "border-left-style:solid");
+    LayoutHandle* inside = Text(chip, "inside");
+    LayoutHandle* last = Text(p, " and behind");
+    page.Settle();
+    EXPECT_FLOAT_EQ(Box(first).left, 10);
+    EXPECT_FLOAT_EQ(Box(first).top, 4);
+    EXPECT_NEAR(Box(chip).left, Right(first), 0.01f);
+    EXPECT_NEAR(Box(inside).left, Box(chip).left + 7, 0.01f);
+    EXPECT_NEAR(Right(chip), Right(inside) + 5, 0.01f);
+    EXPECT_NEAR(Box(last).left, Right(chip), 0.01f);
+    EXPECT_FLOAT_EQ(Box(first).top, Box(last).top);
+    EXPECT_FLOAT_EQ(Box(p).height, std::ceil(Box(first).height) + 4);
+}
+
+TEST_F(ParagraphTest, LinesBreakAcrossElementsAndStandOnOneBaseline) {
+    LayoutHandle* p = Paragraph("width:120px");
+    LayoutHandle* small = Text(p, "aaa bbb ");
+    LayoutHandle* span = Inline(p);
+    LayoutHandle* large = Text(span, "cccccccc ddd", "font-size:40px");
+    page.Settle();
+    // The large text does not fit behind the small one.
+    EXPECT_FLOAT_EQ(Box(large).left, Box(p).left);
+    EXPECT_GE(Box(large).top, Box(small).top + Box(small).height - 0.01f);
+    const float narrow = Box(p).height;
+    page.Change(p, "width:500px");
+    page.Settle();
+    EXPECT_LT(Box(p).height, narrow);
+    EXPECT_NEAR(Box(large).left, Right(small), 0.01f);
+    // One baseline: the small text hangs lower than the top of the line.
+    EXPECT_GT(Box(small).top, Box(large).top);
+}
+
+TEST_F(ParagraphTest, BlocksStandAsPiecesAndAlignmentMovesLines) {
+    LayoutHandle* p = Paragraph("width:400px;text-align:right");
+    Text(p, "text");
+    LayoutHandle* box = Add(p, MakeRef<dsp::Box>(), "display:block;width:50px;height:60px;margin-left:6px");
+    LayoutHandle* child = Add(box, MakeRef<dsp::Box>(), "width:10px;height:10px;margin-top:3px");
+    page.Settle();
+    EXPECT_NEAR(Right(box), Box(p).left + 400, 0.01f);
+    EXPECT_FLOAT_EQ(Box(box).height, 60);
+    EXPECT_FLOAT_EQ(Box(child).left, Box(box).left);
+    EXPECT_FLOAT_EQ(Box(child).top, Box(box).top + 3);
+    page.Change(p, "margin-top:100px");
+    page.Settle();
+    EXPECT_FLOAT_EQ(Box(child).top, Box(box).top + 3);
+    EXPECT_GE(Box(box).top, 100);
+}
+
+TEST_F(ParagraphTest, AChangeBelowIsSeenAndCostsNothingElsewhere) {
+    LayoutHandle* p = Paragraph("");
+    LayoutHandle* span = Inline(p);
+    LayoutHandle* text = Text(span, "short");
+    LayoutHandle* other = Paragraph("");
+    Text(other, "other");
+    page.Settle();
+    const float before = Box(text).width;
+    static_cast<DisplayText&>(*text->node().display).SetText("very much longer");
+    page.tree.MarkChanged(*text);
+    page.Settle();
+    EXPECT_GT(Box(text).width, before);
+    EXPECT_GT(Box(span).width, before);
+    EXPECT_LE(page.Counters().measured, 3u);
+    page.Settle();
+    EXPECT_EQ(page.Counters().measured, 0u);
+}
+
+TEST_F(ParagraphTest, FitFillsTheBox) {
+    LayoutHandle* p = Paragraph("width:300px;height:100px;font-fit-mode:fit");
+    LayoutHandle* text = Text(p, "some words to fit");
+    page.Settle();
+    EXPECT_GT(Box(text).height, 24);
+    EXPECT_LE(Box(text).height, 100);
+    EXPECT_LE(Box(text).width, 300);
+}
+
+TEST_F(ParagraphTest, SimplePagesPlaceParagraphsToo) {
+    page.Change(page.body, "display:simple");
+    LayoutHandle* p = Paragraph("position:absolute;left:30px;top:20px");
+    LayoutHandle* first = Text(p, "one ");
+    LayoutHandle* span = Inline(p);
+    LayoutHandle* second = Text(span, "two");
+    page.Settle();
+    EXPECT_FLOAT_EQ(Box(first).left, 30);
+    EXPECT_NEAR(Box(second).left, Right(first), 0.01f);
+    static_cast<DisplayText&>(*first->node().display).SetText("longer ");
+    page.tree.MarkChanged(*first);
+    page.Settle();
+    EXPECT_NEAR(Box(second).left, Right(first), 0.01f);
+}
+
+}  // namespace
+}  // namespace qorvex::test

@@ -1,0 +1,285 @@
+// Kinds of fonts: packed, coloured, variable, of pictures, and broken ones. Files are made here from the
+// bytes of an installed font, so that no binary stands in the tree.
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <random>
+
+#include "canvas.h"
+
+namespace fresco::test {
+namespace {
+
+constexpr char kSans[] = "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf";
+
+using Bytes = std::vector<uint8_t>;
+
+uint32_t Read32(const Bytes& bytes, size_t at) {
+    return uint32_t(bytes[at]) << 24 | uint32_t(bytes[at + 1]) << 16 | uint32_t(bytes[at + 2]) << 8 |
+           bytes[at + 3];
+}
+void Put16(Bytes& out, uint32_t value) {
+    out.push_back(uint8_t(value >> 8)), out.push_back(uint8_t(value));
+}
+void Put32(Bytes& out, uint32_t value) {
+    Put16(out, value >> 16), Put16(out, value & 0xFFFF);
+}
+uint32_t Tag(const char* name) {
+    return uint32_t(name[0]) << 24 | uint32_t(name[1]) << 16 | uint32_t(name[2]) << 8 | uint32_t(name[3]);
+}
+
+struct Table {
+    uint32_t tag;
+    Bytes bytes;
+};
+
+std::vector<Table> TablesOf(const Bytes& font) {
+    std::vector<Table> tables;
+    const size_t count = size_t(font[4]) << 8 | font[5];
+    for (size_t i = 0; i < count; ++i) {
+        const size_t entry = 12 + i * 16;
+        const size_t offset = Read32(font, entry + 8), length = Read32(font, entry + 12);
+        tables.push_back({Read32(font, entry), Bytes(font.begin() + ptrdiff_t(offset),
+                                                     font.begin() + ptrdiff_t(offset + length))});
+    }
+    return tables;
+}
+
+// The same tables as a plain font, or uncompressed as WOFF.
+Bytes Build(std::vector<Table> tables, bool woff) {
+    std::sort(tables.begin(), tables.end(), [](const Table& a, const Table& b) { return a.tag < b.tag; });
+    const uint32_t count = uint32_t(tables.size());
+    const size_t entrySize = woff ? 20 : 16, headerSize = woff ? 44 : 12;
+    size_t offset = headerSize + entrySize * count;
+    Bytes directory, body;
+    uint32_t plainSize = 12 + 16 * count;
+    for (const Table& table : tables) {
+        const uint32_t length = uint32_t(table.bytes.size());
+        Put32(directory, table.tag);
+        if (!woff) Put32(directory, 0);
+        Put32(directory, uint32_t(offset + body.size()));
+        Put32(directory, length);
+        if (woff) Put32(directory, length), Put32(directory, 0);
+        body.insert(body.end(), table.bytes.begin(), table.bytes.end());
+        while (body.size() % 4)
+            body.push_back(0);
+        plainSize += (length + 3) & ~3u;
+    }
+    Bytes out;
+    if (woff) {
+        for (const uint32_t word : {Tag("wOFF"), 0x00010000u, uint32_t(offset + body.size())})
+            Put32(out, word);
+        Put16(out, count), Put16(out, 0), Put32(out, plainSize);
+        out.resize(headerSize, 0);
+    } else {
+        Put32(out, 0x00010000), Put16(out, count);
+        out.resize(headerSize, 0);
+    }
+    out.insert(out.end(), directory.begin(), directory.end());
+    out.insert(out.end(), body.begin(), body.end());
+    return out;
+}
+
+uint32_t GlyphOf(const IFont& font, uint32_t code) {
+    uint32_t glyph = 0;
+    font.GetGlyphIndices(&code, 1, &glyph);
+    return glyph;
+}
+
+// COLR of one glyph: its layers are the glyphs given, in palette colours red and blue.
+void AddColor(std::vector<Table>& tables, uint32_t base, uint32_t red, uint32_t blue) {
+    Table colr{Tag("COLR"), {}}, cpal{Tag("CPAL"), {}};
+    Put16(colr.bytes, 0), Put16(colr.bytes, 1), Put32(colr.bytes, 14), Put32(colr.bytes, 20),
+        Put16(colr.bytes, 2);
+    for (const uint32_t value : {base, 0u, 2u, red, 0u, blue, 1u})
+        Put16(colr.bytes, value);
+    Put16(cpal.bytes, 0), Put16(cpal.bytes, 2), Put16(cpal.bytes, 1), Put16(cpal.bytes, 2);
+    Put32(cpal.bytes, 14), Put16(cpal.bytes, 0);
+    for (const uint32_t bgra : {0x0000FFFFu, 0xFF0000FFu})
+        Put32(cpal.bytes, bgra);
+    tables.push_back(colr);
+    tables.push_back(cpal);
+}
+
+FontId Load(IFontService& service, const Bytes& bytes, SdfMode sdf = SdfMode::Never,
+            uint32_t wanted = kAnyStyle) {
+    MemoryReader reader(bytes);
+    return service.LoadFace(&reader, 0, sdf, wanted);
+}
+
+void DrawText(Canvas& canvas, FontId font, const char* text, float size, float y,
+              Color color = {0, 0, 0, 1}) {
+    CommandBuffer* b = Library::CreateBuffer(0, 0);
+    TextPaint paint;
+    paint.font = font, paint.size = size, paint.x = 4, paint.y = y;
+    paint.paint.color = color;
+    b->FillString(text, std::strlen(text), paint);
+    canvas.Draw(b);
+}
+
+long Ink(const Canvas& canvas) {
+    long ink = 0;
+    for (int y = 0; y < canvas.height; ++y)
+        for (int x = 0; x < canvas.width; ++x)
+            ink += canvas.At(x, y).a;
+    return ink;
+}
+
+class FontKinds : public testing::Test {
+  protected:
+    void SetUp() override {
+        sans = ReadFile(kSans);
+        if (sans.empty()) GTEST_SKIP() << "no DejaVu on this machine";
+        service = canvas.library->GetFontService();
+    }
+    Bytes sans;
+    Canvas canvas{64, 64};
+    IFontService* service = nullptr;
+};
+
+TEST_F(FontKinds, PackedFontsMeasureAsPlainOnes) {
+    const FontId plain = Load(*service, sans);
+    const FontId packed = Load(*service, Build(TablesOf(sans), true));
+    ASSERT_NE(packed, kNoId);
+    const IFont& a = *service->GetFont(plain);
+    const IFont& b = *service->GetFont(packed);
+    EXPECT_EQ(GlyphOf(a, 'g'), GlyphOf(b, 'g'));
+    EXPECT_EQ(GlyphOf(a, 0x627), GlyphOf(b, 0x627));
+    EXPECT_FLOAT_EQ(a.GetMetrics(20).ascent, b.GetMetrics(20).ascent);
+    // A header that promises a font of gigabytes is not believed.
+    Bytes liar = Build(TablesOf(sans), true);
+    liar[16] = 0x7F;
+    Load(*service, liar);
+}
+
+TEST_F(FontKinds, LayersOfColourArePictures) {
+    const FontId plain = Load(*service, sans);
+    const IFont& font = *service->GetFont(plain);
+    std::vector<Table> tables = TablesOf(sans);
+    AddColor(tables, GlyphOf(font, 'A'), GlyphOf(font, 0x2588), GlyphOf(font, '.'));
+    const FontId colored = Load(*service, Build(tables, false));
+    ASSERT_NE(colored, kNoId);
+    DrawText(canvas, colored, "A", 40, 44);
+    const Pixel pixel = canvas.At(12, 20);
+    EXPECT_GT(pixel.r, 200);
+    EXPECT_LT(pixel.b, 40);
+    // Other glyphs keep the colour of the text.
+    DrawText(canvas, colored, "B", 40, 44, {0, 1, 0, 1});
+    EXPECT_GT(canvas.At(10, 30).g, 200);
+}
+
+TEST_F(FontKinds, FieldsCoverWhatOutlinesCover) {
+    for (const float size : {12.0f, 18.0f, 27.0f, 40.0f, 60.0f}) {
+        Canvas outline(64, 64), field(64, 64);
+        const FontId a = Load(*outline.library->GetFontService(), sans);
+        const FontId b = Load(*field.library->GetFontService(), sans, SdfMode::Always);
+        DrawText(outline, a, "Rg", size, 48);
+        DrawText(field, b, "Rg", size, 48);
+        const long expected = Ink(outline);
+        EXPECT_GT(expected, 1000);
+        EXPECT_NEAR(double(Ink(field)), double(expected), double(expected) * 0.08) << size;
+    }
+}
+
+TEST_F(FontKinds, PicturesMakeAFont) {
+    // Two glyphs in a page of 4 by 2 pixels: white and red squares.
+    const uint32_t page[8] = {~0u, ~0u, 0xFF0000FF, 0xFF0000FF, ~0u, ~0u, 0xFF0000FF, 0xFF0000FF};
+    const BitmapFontImage image{page, 4, 2, 16};
+    BitmapFontDescription description{"Tiles", 0, &image, 1};
+    const std::string table =
+        "info face=\"Tiles\" size=2\ncommon lineHeight=3 base=2 pages=1\n"
+        "char id=65 x=0 y=0 width=2 height=2 xoffset=0 yoffset=0 xadvance=3 page=0\r\n"
+        "char id=66 x=2 y=0 width=2 height=2 xoffset=0 yoffset=0 xadvance=2 page=0\n"
+        "char id=67 x=-9 y=900000 width=99999 height=1 xadvance=-4 page=77\n"
+        "kerning first=65 second=66 amount=-1\nnonsense\nchar id=\n";
+    MemoryReader reader(Bytes(table.begin(), table.end()));
+    const FontId id = service->RegisterBitmapFont(&reader, description);
+    ASSERT_NE(id, kNoId);
+    EXPECT_EQ(service->FindFont("tiles", 0), id);
+    const IFont& font = *service->GetFont(id);
+    uint32_t glyphs[] = {GlyphOf(font, 'A'), GlyphOf(font, 'Z')};
+    EXPECT_NE(glyphs[0], 0u);
+    EXPECT_EQ(glyphs[1], 0u);
+    float advances[2];
+    EXPECT_TRUE(font.GetAdvances(glyphs, 2, 20, advances));
+    EXPECT_FLOAT_EQ(advances[0], 30);
+    EXPECT_FLOAT_EQ(font.GetMetrics(20).ascent, -20);
+    // White pictures take the colour of the text, black text hides nothing but colours.
+    DrawText(canvas, id, "AB", 20, 30, {0, 1, 0, 1});
+    EXPECT_EQ(canvas.At(14, 20), (Pixel{0, 255, 0, 255}));
+    EXPECT_EQ(canvas.At(46, 20), (Pixel{0, 0, 0, 255}));
+    DrawText(canvas, id, "C", 20, 60);
+    for (const char* bad : {"", "char", "common lineHeight=nan\nchar id=99999999999"}) {
+        MemoryReader empty(Bytes(bad, bad + std::strlen(bad)));
+        EXPECT_EQ(service->RegisterBitmapFont(&empty, description), kNoId);
+    }
+    description.imageCount = 0;
+    EXPECT_EQ(service->RegisterBitmapFont(&reader, description), kNoId);
+}
+
+TEST_F(FontKinds, BrokenFilesAnswerOrAreRefused) {
+    std::mt19937 random(7);
+    uint32_t text[] = {'a', 'f', 'i', 0x627, 0x644, 0x301, 0x10FFFF};
+    for (int round = 0; round < 60; ++round) {
+        Bytes bytes = sans;
+        if (round % 3 == 0) bytes.resize(random() % bytes.size());
+        for (int i = 0; i < 40 && !bytes.empty(); ++i)
+            bytes[random() % std::min<size_t>(bytes.size(), round % 2 ? 4096 : bytes.size())] =
+                uint8_t(random());
+        const FontId id = Load(*service, bytes);
+        const IFont* font = service->GetFont(id);
+        if (!font) continue;
+        struct Sink : IShapeSink {
+            void OnGlyphs(const ShapedGlyph* glyphs, size_t count) override {
+                for (size_t i = 0; i < count; ++i)
+                    EXPECT_TRUE(std::isfinite(glyphs[i].advance) && glyphs[i].cluster < 7);
+            }
+        } sink;
+        ShapeRequest request;
+        request.codePoints = text, request.count = 7;
+        font->Shape(request, sink);
+        font->PreloadGlyphs(text, 7);
+        EXPECT_TRUE(std::isfinite(font->GetMetrics(20).ascent));
+        DrawText(canvas, id, "afi", 20, 30);
+    }
+}
+
+TEST_F(FontKinds, ShapingRemembersByTextAndContext) {
+    const IFont& font = *service->GetFont(Load(*service, sans));
+    struct Sink : IShapeSink {
+        void OnGlyphs(const ShapedGlyph* list, size_t count) override { glyphs.assign(list, list + count); }
+        std::vector<ShapedGlyph> glyphs;
+    };
+    const auto shape = [&](const std::vector<uint32_t>& text, size_t first, size_t count, float size) {
+        Sink sink;
+        ShapeRequest request;
+        request.codePoints = text.data() + first, request.count = count, request.size = size;
+        request.direction = TextDirection::RightToLeft;
+        request.context = text.data(), request.contextCount = text.size(), request.contextOffset = first;
+        EXPECT_TRUE(font.Shape(request, sink));
+        return sink.glyphs;
+    };
+    // Beh alone, and joined to a neighbour that is not part of the run.
+    const std::vector<uint32_t> joined = {0x628, 0x628, 0x628};
+    const uint32_t alone = shape({0x628}, 0, 1, 20)[0].index;
+    const uint32_t middle = shape(joined, 1, 1, 20)[0].index;
+    EXPECT_NE(alone, middle);
+    EXPECT_EQ(shape({0x628}, 0, 1, 20)[0].index, alone);
+    EXPECT_EQ(shape(joined, 1, 1, 20)[0].index, middle);
+    // One result serves every size.
+    EXPECT_FLOAT_EQ(shape(joined, 0, 3, 40)[0].advance, 2 * shape(joined, 0, 3, 20)[0].advance);
+    // More runs than are kept: the first ones are shaped again and are the same.
+    FontServiceConfiguration configuration;
+    configuration.keptGlyphs = 64;
+    service->Configure(&configuration);
+    for (uint32_t i = 0; i < 500; ++i)
+        shape({0x628, 'a' + i % 26, '0' + i / 26}, 0, 3, 20);
+    EXPECT_EQ(shape(joined, 1, 1, 20)[0].index, middle);
+    configuration.structSize = 4;
+    service->Configure(&configuration);
+    EXPECT_NE(canvas.log.lines.back().find("another version"), std::string::npos);
+    service->Configure(nullptr);
+}
+
+}  // namespace
+}  // namespace fresco::test
