@@ -15,4 +15,13 @@ void DisplayHTML::Paint(PaintContext& context, bool, const layout::LayoutNode& n
     buffer.FillRect({0, 0, 0, context.viewSize.width, context.viewSize.height}, SolidPaint(ToFresco(color)));
 }
 
+bool FillsCanvas(const layout::LayoutNode& root) {
+    // A root of another kind than DisplayHTML paints a box or measures.
+    if (!root.display || root.display->Has(IDisplayElement::kPaintsBox) ||
+        root.display->Has(IDisplayElement::kMeasures))
+        return false;
+    const css::VisualStyle& visual = *root.style.visual;
+    return visual.visibility == css::Visibility::Visible && visual.backgroundColor.alpha >= 1;
+}
+
 }  // namespace qorvex::dsp

@@ -13,6 +13,9 @@ class DisplayHTML final : public IDisplayElement {
                fresco::CommandBuffer& buffer) override;
 };
 
+// Whether the root node paints every pixel of the view, with no help from transforms and effects around it.
+bool FillsCanvas(const layout::LayoutNode& root);
+
 class DisplayBody final : public Box {};
 
 }  // namespace qorvex::dsp

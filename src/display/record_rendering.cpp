@@ -1,7 +1,11 @@
 #include "display/record_rendering.h"
 
 #include "css/values/color.h"
+#include "css/values/style_groups.h"
 #include "display/dirty_region.h"
+#include "display/layer_effects.h"
+#include "display/page_elements.h"
+#include "display/paint_order.h"
 #include "display/record_node.h"
 
 #include <fresco/library.h>
@@ -51,9 +55,14 @@ void SetScissors(std::span<const Rect> rects, bool scaled, CommandBuffer& buffer
                                         {r.x, layout::Bottom(r), 0}};
         buffer.ClipQuad(quad, mode);
     }
-    // The target still shows the last frame there.
-    for (const Rect& rect : rects)
-        buffer.ClearRect(rect, 0);
+}
+
+// Whether the root's background hides what the target shows of the last frame. It begins and ends on whole
+// pixels in a view that is not scaled only.
+bool HidesLastFrame(const layout::LayoutNode& root, std::span<const Rect> areas, bool scaled) {
+    return !scaled && FillsCanvas(root) && !root.local && !NeedsLayer(root) &&
+           root.style.visual->clipPath.IsNone() && TouchesAny(areas, root.visualAabb) &&
+           TouchesAny(areas, root.paintBounds);
 }
 
 // Older lists in other colours, the newest on top.
@@ -125,6 +134,10 @@ class FrameRecorder {
         }
         const std::span<const Rect> areas(record_.dirtyRects.data(), record_.dirtyRects.size());
         SetScissors(areas, scaled, *buffer);
+        if (pass_.root == nullptr || !HidesLastFrame(pass_.root->node(), areas, scaled)) {
+            for (const Rect& area : areas)
+                buffer->ClearRect(area, 0);
+        }
         if (pass_.root != nullptr) {
             PaintContext context = MakeContext();
             RecordNode(pass_.root->node(), context, areas, buffer);

@@ -56,8 +56,8 @@ struct ClassDescription {
     JSObjectFinalizeCallback finalise = nullptr;
 };
 
-// Fills the process-wide table: all 95 classes, those without a description with nothing but their name. The
-// descriptions must live until ReleaseScriptClasses. Logs "Initializing scripting...".
+// Takes the descriptions, which must live until ReleaseScriptClasses, and fills the process-wide table with
+// the classes that have property rules. Logs "Initializing scripting...".
 void CreateScriptClasses(std::span<const ClassDescription* const> descriptions);
 // Logs "Uninitializing scripting...".
 void ReleaseScriptClasses();

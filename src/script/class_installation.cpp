@@ -24,13 +24,20 @@ constexpr std::string_view kBuilders = R"('use strict'; {
     const instanceOf = Function.prototype[hasInstance];
     const kind = (writable, enumerable, configurable) =>
         ({ __proto__: null, value: undefined, writable, enumerable, configurable });
-    const accessor = { __proto__: null, get: undefined, set: undefined, enumerable: true, configurable: true };
+    const access = enumerable =>
+        ({ __proto__: null, get: undefined, set: undefined, enumerable, configurable: true });
+    const accessor = access(true), hiddenAccessor = access(false);
     const method = kind(true, true, true), constant = kind(false, true, false), fixed = kind(false, false, false);
     const hidden = kind(true, false, true), label = kind(false, false, true);
     function define(target, key, descriptor, value) {
         descriptor.value = value;
         defineProperty(target, key, descriptor);
         descriptor.value = undefined;
+    }
+    function defineHidden(target, key, get, set) {
+        hiddenAccessor.get = get;
+        hiddenAccessor.set = set;
+        defineProperty(target, key, hiddenAccessor);
     }
     function constants(target, values, i) {
         for (; i < values.length; i += 2) define(target, values[i], constant, values[i + 1]);
@@ -41,25 +48,29 @@ constexpr std::string_view kBuilders = R"('use strict'; {
             build = make;
             for (let i = 0; i < names.length; i += 2) {
                 const name = names[i], index = names[i + 1];
-                defineProperty(global, name, { __proto__: null, enumerable: false, configurable: true,
-                    get() {
-                        const made = build(index);
-                        define(global, name, hidden, made);
-                        return made;
-                    },
-                    set(value) { define(global, name, hidden, value); } });
+                defineHidden(global, name, () => {
+                    const made = build(index);
+                    define(global, name, hidden, made);
+                    return made;
+                }, value => define(global, name, hidden, value));
             }
         },
-        function prototypeOf(parent) { return create(parent || root); },
-        // Name, getter and setter of each attribute; name and function of each method; name and value of constants.
-        function members(target, attributes, methods, ...values) {
+        // Its constructor costs more than the rest of it, and a page asks for few.
+        function prototypeOf(parent, name, index) {
+            const result = create(parent || root);
+            define(result, toStringTag, label, name);
+            defineHidden(result, 'constructor', () => build(index),
+                function(value) { define(this, 'constructor', this === result ? hidden : method, value); });
+            return result;
+        },
+        // Name, getter and setter of each attribute; name and value of constants.
+        function members(target, attributes, ...values) {
             let i = 0;
             for (; attributes > 0; --attributes, i += 3) {
                 accessor.get = values[i + 1];
                 accessor.set = values[i + 2];
                 defineProperty(target, values[i], accessor);
             }
-            for (; methods > 0; --methods, i += 2) define(target, values[i], method, values[i + 1]);
             constants(target, values, i);
         },
         function constructorOf(name, prototype, parent, construct, answersForGlobal, ...values) {
@@ -67,7 +78,6 @@ constexpr std::string_view kBuilders = R"('use strict'; {
             define(result, 'prototype', fixed, prototype);
             define(result, 'name', fixed, name);
             define(prototype, 'constructor', hidden, result);
-            define(prototype, toStringTag, label, name);
             if (parent) setPrototypeOf(result, parent);
             if (answersForGlobal) {
                 define(result, hasInstance, fixed,
@@ -160,26 +170,29 @@ class Installer {
         if (parent != ScriptClass::None && !parent_prototype) return nullptr;
         Arguments arguments(context_);
         arguments.Add(parent_prototype ? parent_prototype : JSValueMakeNull(context_));
+        arguments.Add(GetScriptClassRow(script_class).name);
+        arguments.Add(static_cast<double>(index));
         const JSObjectRef prototype = AsObject(context_, Call(ClassBuilder::PrototypeOf, arguments));
         if (!prototype) return nullptr;
         const ClassDescription* description = GetClassDescription(script_class);
         // The window's own stand on the global object.
         const bool has_members = description && script_class != ScriptClass::Window;
         if (has_members && !DefineMembers(prototype, *description)) return nullptr;
-        const JSObjectRef constructor = MakeConstructor(script_class, description, prototype);
-        if (!constructor) return nullptr;
         Keep(kPrototypesAt + index, prototype);
-        Keep(kConstructorsAt + index, constructor);
         return page_.prototypes[index] = prototype;
     }
 
     JSObjectRef ConstructorOf(ScriptClass script_class) {
-        if (!PrototypeOf(script_class)) return nullptr;
-        return AsObject(
-            context_,
-            JSObjectGetPropertyAtIndex(
-                context_, page_.class_keeper,
-                static_cast<unsigned>(kConstructorsAt + static_cast<size_t>(script_class)), nullptr));
+        const JSObjectRef prototype = PrototypeOf(script_class);
+        if (!prototype) return nullptr;
+        const size_t at = kConstructorsAt + static_cast<size_t>(script_class);
+        const JSValueRef kept =
+            JSObjectGetPropertyAtIndex(context_, page_.class_keeper, static_cast<unsigned>(at), nullptr);
+        if (const JSObjectRef made = AsObject(context_, kept)) return made;
+        const ScriptEngineLock lock(context_);
+        const JSObjectRef constructor = MakeConstructor(script_class, prototype);
+        if (constructor) Keep(at, constructor);
+        return constructor;
     }
 
     [[nodiscard]] JSValueRef exception() const { return exception_; }
@@ -237,18 +250,28 @@ class Installer {
         return exception_ ? nullptr : result;
     }
 
+    // A plain assignment makes what the builder would, at half the cost.
+    bool DefineMethods(JSObjectRef target, std::span<const MethodDescription> methods) {
+        for (const MethodDescription& method : methods) {
+            JSStringRef name = JSStringCreateWithUTF8CString(method.name);
+            const JSObjectRef function = JSObjectMakeFunctionWithCallback(context_, name, method.callback);
+            JSObjectSetProperty(context_, target, name, function, kJSPropertyAttributeNone, &exception_);
+            JSStringRelease(name);
+            if (exception_) return false;
+        }
+        return true;
+    }
+
     bool DefineMembers(JSObjectRef target, const ClassDescription& description) {
+        if (!DefineMethods(target, description.methods)) return false;
         auto attribute = description.attributes.begin();
-        auto method = description.methods.begin();
         auto constant = description.constants.begin();
         // The largest classes take several calls.
-        while (attribute != description.attributes.end() || method != description.methods.end() ||
-               constant != description.constants.end()) {
+        while (attribute != description.attributes.end() || constant != description.constants.end()) {
             Arguments arguments(context_);
             arguments.Add(target);
             arguments.Add(0.0);
-            arguments.Add(0.0);
-            double attributes = 0, methods = 0;
+            double attributes = 0;
             for (; attribute != description.attributes.end() && !arguments.IsFull();
                  ++attribute, ++attributes) {
                 JSStringRef name = JSStringCreateWithUTF8CString(attribute->name);
@@ -257,25 +280,18 @@ class Installer {
                 arguments.Add(name, attribute->setter);
                 JSStringRelease(name);
             }
-            for (; method != description.methods.end() && !arguments.IsFull(); ++method, ++methods) {
-                JSStringRef name = JSStringCreateWithUTF8CString(method->name);
-                arguments.Add(JSValueMakeString(context_, name));
-                arguments.Add(name, method->callback);
-                JSStringRelease(name);
-            }
             for (; constant != description.constants.end() && !arguments.IsFull(); ++constant) {
                 arguments.Add(constant->name);
                 arguments.Add(constant->value);
             }
             arguments.Set(1, attributes);
-            arguments.Set(2, methods);
             if (!Call(ClassBuilder::Members, arguments)) return false;
         }
         return true;
     }
 
-    JSObjectRef MakeConstructor(ScriptClass script_class, const ClassDescription* description,
-                                JSObjectRef prototype) {
+    JSObjectRef MakeConstructor(ScriptClass script_class, JSObjectRef prototype) {
+        const ClassDescription* description = GetClassDescription(script_class);
         const ScriptClassRow& row = GetScriptClassRow(script_class);
         const JSObjectRef parent = ConstructorOf(row.parent);
         const bool constructs = description && description->construct;

@@ -6,7 +6,8 @@
 //
 // A class is made when a page first names it or meets an object of it: all 95 would cost 4 ms before the
 // first frame, and a page uses about a dozen. Until then the global name is an accessor, which puts the
-// constructor in its own place.
+// constructor in its own place; `constructor` of a prototype is one as well, as most pages use objects of a
+// class and never name it.
 //
 // The global object is a plain one and not of class Window: on a global of a native class every name that is
 // not the page's own variable costs a search through that class (`Math` 66 ns against 0.3, `document` 42

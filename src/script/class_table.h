@@ -196,7 +196,7 @@ inline constexpr AncestorTable kAncestors;
     return (internal::kAncestors.words[static_cast<size_t>(script_class)][b / 64] >> (b % 64)) & 1;
 }
 
-// One entry a class; null before library start and after library end.
+// One entry a class; null for those without property rules, before library start and after library end.
 class ScriptClassTable {
   public:
     [[nodiscard]] JSClassRef operator[](ScriptClass script_class) const {

@@ -63,6 +63,28 @@ TEST_F(RecordTest, ScissorsAreTheDirtyRectangles) {
     EXPECT_EQ(CountOf(scaled, "ClipQuad"), 1u);
 }
 
+// What the last frame left must not show through, and need not be cleared where the canvas hides it.
+TEST_F(RecordTest, ClearsOnlyWhatTheCanvasDoesNotHide) {
+    page.Settle();
+    const auto clears = [this](const char* root_style) {
+        const std::string plain =
+            "background-color: red; opacity: 1; visibility: visible; transform: none;"
+            "clip-path: none; mix-blend-mode: normal;";
+        page.Change(page.root, plain + root_style);
+        page.Frame();
+        page.dirty.Add(layout::MakeRect(0, 0, 1000, 500));
+        return CountOf(Records(*Record().buffers[0]), "ClearRect");
+    };
+    EXPECT_EQ(clears(""), 0u);
+    for (const char* style : {"background-color: transparent", "background-color: rgba(255, 0, 0, 0.9)",
+                              "opacity: 0.5", "visibility: hidden", "transform: scale(0.5)",
+                              "clip-path: circle(40px)", "mix-blend-mode: multiply"}) {
+        EXPECT_EQ(clears(style), 1u) << style;
+    }
+    scale = 1.5f;
+    EXPECT_EQ(clears(""), 1u);
+}
+
 TEST_F(RecordTest, LayersOpenOnlyWhereAsked) {
     LayoutHandle* box = page.Add(page.body, "width: 10px; height: 10px; background-color: red");
     page.Add(box, "width: 5px; height: 5px; background-color: blue");
