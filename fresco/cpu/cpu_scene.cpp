@@ -124,7 +124,7 @@ CaptureData CpuScene::SerializeBuffers(CommandBuffer* const* buffers, uint32_t c
         const FontFace* face = shared_.fonts.GetFace(id);
         // A bitmap font has no file to put in; its glyphs are missing in the replay.
         if (!face || face->GetData().bytes.empty()) continue;
-        const FileBytes& bytes = face->GetData().bytes;
+        const Vector<uint8_t>& bytes = face->GetData().bytes;
         writer.AddFont(id, face->GetFaceIndex(), uint32_t(face->GetSdfMode()), bytes.data(), bytes.size());
     }
     for (const ImageId id : uses.images) {

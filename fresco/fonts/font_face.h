@@ -20,26 +20,9 @@ inline bool IsValidFontSize(float size) {
     return size > 0 && size <= kMaxFontSize;
 }
 
-// Leaves what resize adds as it is: a file is read over all of it.
-template <class T>
-struct RawAllocator : StdAllocator<T> {
-    template <class U>
-    struct rebind {
-        using other = RawAllocator<U>;
-    };
-    RawAllocator() = default;
-    template <class U>
-    RawAllocator(const RawAllocator<U>&) {}  // NOLINT: the standard asks for an implicit conversion
-    template <class U>
-    void construct(U* place) {
-        ::new (static_cast<void*>(place)) U;
-    }
-};
-using FileBytes = std::vector<uint8_t, RawAllocator<uint8_t>>;
-
 // The bytes of a font file, shared by its faces. Empty for a font that came without a file.
 struct FontData {
-    FileBytes bytes;
+    Vector<uint8_t> bytes;
 };
 
 // In font units, y downward. Empty for blanks and for glyphs that are not there.

@@ -49,7 +49,7 @@ void* FtReallocate(FT_Memory memory, long, long newSize, void* block) {
     return moved;
 }
 
-bool ReadAll(IStreamReader* stream, FileBytes* bytes, size_t most = kMaxFontBytes) {
+bool ReadAll(IStreamReader* stream, Vector<uint8_t>* bytes, size_t most = kMaxFontBytes) {
     const size_t size = stream ? stream->GetSize() : 0;
     if (size == 0 || size > most) return false;
     bytes->resize(size);
@@ -104,7 +104,7 @@ void FontService::Configure(void* argument) {
 }
 
 FontId FontService::RegisterBitmapFont(IStreamReader* stream, const BitmapFontDescription& description) {
-    FileBytes table;
+    Vector<uint8_t> table;
     std::unique_ptr<BitmapFace, HeapDeleter<BitmapFace>> face(HeapNew<BitmapFace>());
     if (!face || !ReadAll(stream, &table, kMaxTableBytes)) return kNoId;
     const std::string_view text(reinterpret_cast<const char*>(table.data()), table.size());
@@ -116,7 +116,7 @@ FontId FontService::RegisterBitmapFont(IStreamReader* stream, const BitmapFontDe
 }
 
 uint32_t FontService::GetFaceCount(IStreamReader* stream) {
-    FileBytes bytes;
+    Vector<uint8_t> bytes;
     if (!ReadAll(stream, &bytes)) return 0;
     std::lock_guard lock(mutex_);
     FT_Face face = nullptr;
@@ -127,7 +127,7 @@ uint32_t FontService::GetFaceCount(IStreamReader* stream) {
 }
 
 // The faces of a collection come as one file each time; keep its bytes once.
-std::shared_ptr<FontData> FontService::ShareData(FileBytes bytes) {
+std::shared_ptr<FontData> FontService::ShareData(Vector<uint8_t> bytes) {
     for (const auto& [id, face] : faces_) {
         const FontData& data = face->GetData();
         if (data.bytes.size() == bytes.size() &&
@@ -176,7 +176,7 @@ void FontService::AddInstances(const std::shared_ptr<FontData>& data, uint32_t f
 }
 
 FontId FontService::LoadFace(IStreamReader* stream, uint32_t faceIndex, SdfMode sdf, uint32_t wantedFlags) {
-    FileBytes bytes;
+    Vector<uint8_t> bytes;
     if (!ReadAll(stream, &bytes)) return kNoId;
     std::lock_guard lock(mutex_);
     const FontId id = nextId_;
@@ -187,7 +187,7 @@ bool FontService::LoadFaceAs(FontId id, const void* data, size_t size, uint32_t 
     const auto* begin = static_cast<const uint8_t*>(data);
     std::lock_guard lock(mutex_);
     if (id == kNoId || id >= kNoId - 1 || faces_.count(id)) return false;
-    return AddFace(ShareData(FileBytes(begin, begin + size)), faceIndex, sdf, id, kAnyStyle);
+    return AddFace(ShareData(Vector<uint8_t>(begin, begin + size)), faceIndex, sdf, id, kAnyStyle);
 }
 
 FontId FontService::FindFont(const char* family, uint32_t flags) {
@@ -202,7 +202,7 @@ bool FontService::LoadSystemFonts() {
     const Vector<FontId> loaded = std::move(order_);
     order_.clear();
     const bool opened = system_.Open([this](IStreamReader* reader) {
-        FileBytes bytes;
+        Vector<uint8_t> bytes;
         if (!ReadAll(reader, &bytes)) return;
         const std::shared_ptr<FontData> data = ShareData(std::move(bytes));
         for (uint32_t face = 0; AddFace(data, face, SdfMode::WhenLarge, nextId_, kAnyStyle); ++face)

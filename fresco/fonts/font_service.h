@@ -34,7 +34,7 @@ class FontService final : public IFontService {
     FontFace* FindFace(FontId id);
     FontId FindLoaded(const char* family, uint32_t flags) const;
     bool LoadSystemFonts();
-    std::shared_ptr<FontData> ShareData(FileBytes bytes);
+    std::shared_ptr<FontData> ShareData(Vector<uint8_t> bytes);
     using ScalablePtr = std::unique_ptr<ScalableFace, HeapDeleter<ScalableFace>>;
     ScalablePtr MakeFace(std::shared_ptr<FontData> data, uint32_t faceIndex, SdfMode sdf, FontId id);
     template <class Face>
