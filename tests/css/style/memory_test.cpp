@@ -93,8 +93,8 @@ TEST_F(Memory, ATextOfTenCharacters) {
     const size_t with = BytesOf("<div class='row'>0123456789</div>", "simple", ".row { color: red }");
     const size_t without = BytesOf("<div class='row'></div>", "simple", ".row { color: red }");
     RecordProperty("bytes", static_cast<int>(with - without));
-    // 1,211: what shaped text keeps (its break iterator, published positions and font, lines of an inline flow)
-    // has added 80 bytes.
+    // 1,211: what shaped text keeps (its break iterator, published positions and font, lines of an inline
+    // flow) has added 80 bytes.
     EXPECT_LT(with - without, 1220u);
 }
 
