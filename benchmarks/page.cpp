@@ -26,9 +26,9 @@ void Page::Handler::OnResourceRequest(const IAsyncResourceRequest*, IAsyncResour
 }
 
 Page::Page(const PageSettings& settings)
-    : handler_(Markup(settings.elements)),
+    : handler_(settings.markup.empty() ? Markup(settings.elements) : settings.markup),
       target_(settings.width, settings.height),
-      elements_(settings.elements),
+      elements_(settings.markup.empty() ? settings.elements : 0),
       layout_elsewhere_(settings.layout_elsewhere) {
     Start(settings);
     view_->LoadURL("bench://page.html");
@@ -78,6 +78,7 @@ Page::~Page() {
 }
 
 bool Page::IsComplete() {
+    if (elements_ == 0) return listener_.loaded && log_.errors == 0;
     const std::string check =
         "if (document.getElementsByTagName('div').length !== " + std::to_string(elements_) +
         ") throw 'short'";

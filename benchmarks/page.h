@@ -1,4 +1,4 @@
-// A page that is really loaded, through the public interfaces: `elements` boxes, settled and painted.
+// A page that is really loaded, through the public interfaces: settled and painted.
 #pragma once
 
 #include <qorvex/qorvex.h>
@@ -13,7 +13,8 @@
 namespace bench {
 
 struct PageSettings {
-    int elements = 1;
+    int elements = 1;      // boxes
+    std::string markup{};  // instead of them, unless empty
     std::uint32_t width = 640;
     std::uint32_t height = 360;
     // Frames are laid out by whoever calls ExecuteWork for the view's family, not inside Advance.
@@ -27,11 +28,12 @@ class Page {
     Page(const Page&) = delete;
     Page& operator=(const Page&) = delete;
 
-    // The load has finished and every element is there.
+    // The load has finished, without an error, and every box is there.
     [[nodiscard]] bool IsComplete();
     // One turn of a game's loop on one thread.
     void Frame();
     void Advance() { view_->Advance(time_ += 16); }
+    void Run(const char* script) { view_->ExecuteScript(script); }
     void LayOut() {
         library_->ExecuteWork(qorvex::WorkType::Layout, qorvex::WorkExecutionMode::RunUntilEmpty,
                               view_->GetTaskFamilyId());
@@ -73,7 +75,7 @@ class Page {
     Handler handler_;
     Listener listener_;
     qorvex::host::SoftwareRenderTarget target_;
-    const int elements_;
+    const int elements_;  // 0: not counted
     const bool layout_elsewhere_;
     std::uint32_t frame_ = 0;
     double time_ = 0;

@@ -4,11 +4,9 @@
 
 #include <string>
 
-#include "benchmarks/loaded_page.h"
+#include "benchmarks/page.h"
 
 namespace {
-
-using qorvex::bench::LoadedPage;
 
 constexpr int kPanels = 10;
 constexpr int kRows = 10;
@@ -37,7 +35,8 @@ std::string Markup(int panels, int rows, int labels) {
 }
 
 void ChangeOne(benchmark::State& state, int panels, int rows, int labels) {
-    LoadedPage page(Markup(panels, rows, labels));
+    bench::Page page({.markup = Markup(panels, rows, labels)});
+    if (!page.IsComplete()) return state.SkipWithError("the page is not what was asked for");
     for (auto _ : state) {
         page.Run("last.data=String(10+n++%90)");
         page.Frame();
@@ -48,7 +47,8 @@ BENCHMARK_CAPTURE(ChangeOne, many, kPanels, kRows, kLabels)->Name("text_change")
 BENCHMARK_CAPTURE(ChangeOne, alone, 1, 1, 1)->Name("text_change_baseline");
 
 void Idle(benchmark::State& state, int panels, int rows, int labels) {
-    LoadedPage page(Markup(panels, rows, labels));
+    bench::Page page({.markup = Markup(panels, rows, labels)});
+    if (!page.IsComplete()) return state.SkipWithError("the page is not what was asked for");
     const std::uint64_t before = page.Allocations();
     for (auto _ : state)
         page.Frame();
