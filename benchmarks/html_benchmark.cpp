@@ -7,44 +7,14 @@
 
 #include "css/style/style_engine.h"
 #include "dom/document.h"
-#include "dom/document_host.h"
 #include "dom/html_elements.h"
 #include "dom/parsed_html.h"
-#include "dom/resource_loader.h"
 #include "script/make_handle.h"
+#include "tests/support/idle_page.h"
 
 namespace {
 
 using namespace qorvex;
-
-class Host final : public dom::IDocumentHost {
-  public:
-    StringPool& GetStringPool() override { return strings_; }
-    TaskFamilyHandle GetTaskFamily() override { return {}; }
-    uint32_t GetViewId() const override { return 0; }
-    dom::HostSize GetViewSize() const override { return {1280, 720}; }
-    bool AreComplexSelectorsEnabled() const override { return true; }
-    void RequestFrames(uint32_t) override {}
-    void OnDOMBuilt(dom::Document&) override {}
-    void OnFinishLoad(dom::Document&) override {}
-    void EvaluateScript(dom::Document&, std::string_view, std::string_view) override {}
-    void NavigateTo(const URL&) override {}
-
-  private:
-    StringPool strings_;
-};
-
-// The page asks for nothing.
-class Loader final : public dom::IDocumentLoader {
-  public:
-    uint32_t LoadResource(const URL&, dom::Element&, bool) override { return 0; }
-    uint32_t LoadAndParseStylesheet(const URL&, dom::Element&, bool) override { return 0; }
-    uint32_t ParseStylesheetText(std::string_view, dom::Element&) override { return 0; }
-    void RequestPrefetch(const URL&) override {}
-    void RequestStylesheetPrefetch(const URL&) override {}
-    bool HasPendingWork() const override { return false; }
-    void StopLoading() override {}
-};
 
 // What a game's screens are made of: nested boxes with classes, ids, data attributes and short texts.
 std::string Page() {
@@ -66,7 +36,7 @@ void HTMLToDOM(benchmark::State& state) {
     const std::string page = Page();
     css::CreateDefaultStyles();
     {
-        Host host;
+        test::IdleHost host;
         const auto rules = MakeRef<css::DefaultRules>(host.GetStringPool());
         size_t nodes = 0;
         for (auto _ : state) {
@@ -74,7 +44,7 @@ void HTMLToDOM(benchmark::State& state) {
             params.host = &host;
             params.url.Parse("file:///page.html");
             params.style_engine = MakeUnique<css::StyleEngine, MemoryTag::DOM>(host.GetStringPool(), rules);
-            params.loader = MakeUnique<Loader, MemoryTag::DOM>();
+            params.loader = MakeUnique<test::IdleLoader, MemoryTag::DOM>();
             qsl::RefPtr<dom::Document> document = script::MakeHandle<dom::HTMLDocument>(std::move(params));
             // The bytes are lent, as a resource's buffer is.
             if (!document->BuildRoot(dom::ParseHTML(page, [] {}))) std::abort();

@@ -2,26 +2,12 @@
 
 #include "core/memory/allocator.h"
 #include "css/parser/convert.h"
-#include "dom/document_host.h"
 #include "dom/parsed_html.h"
-#include "dom/resource_loader.h"
 #include "host/counting_allocator.h"
 #include "script/make_handle.h"
 
 namespace qorvex::bench {
 namespace {
-
-// Loads nothing: the page hands its sheet to the engine itself.
-class IdleLoader final : public dom::IDocumentLoader {
-  public:
-    uint32_t LoadResource(const URL&, dom::Element&, bool) override { return 0; }
-    uint32_t LoadAndParseStylesheet(const URL&, dom::Element&, bool) override { return 0; }
-    uint32_t ParseStylesheetText(std::string_view, dom::Element&) override { return 0; }
-    void RequestPrefetch(const URL&) override {}
-    void RequestStylesheetPrefetch(const URL&) override {}
-    bool HasPendingWork() const override { return false; }
-    void StopLoading() override {}
-};
 
 // Writes `text` with every "NAME" replaced by the panel's name and every "N" by its number.
 void AppendFor(int panel, std::string_view text, std::string& out) {
@@ -125,25 +111,9 @@ std::string PanelMarkup(int elements, int panels) {
     return body + "</section>";
 }
 
-class StylePage::Host final : public dom::IDocumentHost {
-  public:
-    StringPool& GetStringPool() override { return strings; }
-    TaskFamilyHandle GetTaskFamily() override { return {}; }
-    uint32_t GetViewId() const override { return 0; }
-    dom::HostSize GetViewSize() const override { return {1920, 1080}; }
-    bool AreComplexSelectorsEnabled() const override { return true; }
-    void RequestFrames(uint32_t) override {}
-    void OnDOMBuilt(dom::Document&) override {}
-    void OnFinishLoad(dom::Document&) override {}
-    void EvaluateScript(dom::Document&, std::string_view, std::string_view) override {}
-    void NavigateTo(const URL&) override {}
-
-    StringPool strings;
-};
-
 StylePage::StylePage(std::string_view body, std::string_view sheet) {
     css::CreateDefaultStyles();
-    host_ = std::make_unique<Host>();
+    host_ = std::make_unique<test::IdleHost>(dom::HostSize{1920, 1080});
     auto engine = MakeUnique<css::StyleEngine, MemoryTag::DOM>(host_->strings,
                                                                MakeRef<css::DefaultRules>(host_->strings));
     engine_ = engine.get();
@@ -151,7 +121,7 @@ StylePage::StylePage(std::string_view body, std::string_view sheet) {
     params.host = host_.get();
     params.url = URL("file:///page.html");
     params.style_engine = std::move(engine);
-    params.loader = MakeUnique<IdleLoader, MemoryTag::DOM>();
+    params.loader = MakeUnique<test::IdleLoader, MemoryTag::DOM>();
     document_ = script::MakeHandle<dom::HTMLDocument>(std::move(params));
     const std::string html = "<html><head></head><body>" + std::string(body) + "</body></html>";
     if (document_->BuildRoot(dom::ParseHTML(html))) document_->IterateDOMBuilding();

@@ -8,6 +8,7 @@
 
 #include "css/style/style_engine.h"
 #include "dom/document.h"
+#include "tests/support/idle_page.h"
 
 namespace qorvex::bench {
 
@@ -31,8 +32,7 @@ class StylePage {
     [[nodiscard]] size_t CountElements() const;
 
   private:
-    class Host;
-    std::unique_ptr<Host> host_;
+    std::unique_ptr<test::IdleHost> host_;
     css::StyleEngine* engine_ = nullptr;
     qsl::RefPtr<dom::Document> document_;
 };

@@ -3,32 +3,22 @@
 
 #include "core/memory/containers.h"
 #include "dom/document.h"
-#include "dom/document_host.h"
 #include "dom/element.h"
 #include "dom/resource_loader.h"
 #include "dom/style_engine.h"
+#include "tests/support/idle_page.h"
 
 namespace qorvex::fuzz {
 
 /// Stands in for the page's scripts: called with the text of each.
 using OnScript = void (*)(dom::Document& document, std::string_view source, void* user);
 
-class PageHost final : public dom::IDocumentHost {
+class PageHost final : public qorvex::test::IdleHost {
   public:
-    StringPool& GetStringPool() override { return strings; }
-    TaskFamilyHandle GetTaskFamily() override { return {}; }
-    uint32_t GetViewId() const override { return 0; }
-    dom::HostSize GetViewSize() const override { return {800, 600}; }
-    bool AreComplexSelectorsEnabled() const override { return true; }
-    void RequestFrames(uint32_t) override {}
-    void OnDOMBuilt(dom::Document&) override {}
-    void OnFinishLoad(dom::Document&) override {}
     void EvaluateScript(dom::Document& document, std::string_view source, std::string_view) override {
         if (on_script) on_script(document, source, user);
     }
-    void NavigateTo(const URL&) override {}
 
-    StringPool strings;
     OnScript on_script = nullptr;
     void* user = nullptr;
 };

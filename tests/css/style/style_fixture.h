@@ -8,45 +8,23 @@
 
 #include "css/style/style_engine.h"
 #include "dom/document.h"
-#include "dom/document_host.h"
-#include "dom/resource_loader.h"
+#include "support/idle_page.h"
 #include "support/scoped_library_state.h"
 
 namespace qorvex::css::test {
 
-class StyleHost final : public dom::IDocumentHost {
+class StyleHost final : public qorvex::test::IdleHost {
   public:
-    StringPool& GetStringPool() override { return strings; }
-    TaskFamilyHandle GetTaskFamily() override { return {}; }
-    uint32_t GetViewId() const override { return 0; }
-    dom::HostSize GetViewSize() const override { return {800, 600}; }
-    bool AreComplexSelectorsEnabled() const override { return true; }
     dom::Node* GetHoveredNode() const override { return hovered; }
     dom::Node* GetActiveNode() const override { return active; }
     layout::IFontResolver* GetFontResolver() override { return fonts; }
-    void RequestFrames(uint32_t) override {}
-    void OnDOMBuilt(dom::Document&) override {}
-    void OnFinishLoad(dom::Document&) override {}
-    void EvaluateScript(dom::Document&, std::string_view, std::string_view) override {}
-    void NavigateTo(const URL&) override {}
 
-    StringPool strings;
     dom::Node* hovered = nullptr;
     dom::Node* active = nullptr;
     layout::IFontResolver* fonts = nullptr;
 };
 
-// Loads nothing: tests hand their sheets to the engine themselves.
-class IdleLoader final : public dom::IDocumentLoader {
-  public:
-    uint32_t LoadResource(const URL&, dom::Element&, bool) override { return 0; }
-    uint32_t LoadAndParseStylesheet(const URL&, dom::Element&, bool) override { return 0; }
-    uint32_t ParseStylesheetText(std::string_view, dom::Element&) override { return 0; }
-    void RequestPrefetch(const URL&) override {}
-    void RequestStylesheetPrefetch(const URL&) override {}
-    bool HasPendingWork() const override { return false; }
-    void StopLoading() override {}
-};
+using qorvex::test::IdleLoader;  // tests hand their sheets to the engine themselves
 
 class StyleTest : public qorvex::test::QorvexTest {
   protected:
