@@ -6,14 +6,14 @@
 
 namespace qorvex::dsp {
 
-// One image of a background, border image or mask list. Filled by the image rooms; a slot without a resource
-// and without a gradient paints nothing.
+// One image of a background, border image or mask list, or the content of an image element. Filled at the
+// commit; a slot without a resource paints nothing.
 struct ImageSlot {
-    int32_t resource = -1;
-    uint32_t gradient = 0;  // 1-based index in the style's image list, 0 for none
+    int32_t resource = -1;  // the frame that shows, of an animated image
     layout::Size intrinsic;
-    layout::Edges slices;
-    uint32_t usedInFrame = 0;
+    layout::Edges slices;  // of a border image: where its nine pieces meet, in pixels of the image
+    // The part of the image to draw, in its pixels; empty for the whole.
+    layout::Rect source{};
 };
 
 using ImageSlots = SmallVector<ImageSlot, 1, MemoryTag::Rendering>;

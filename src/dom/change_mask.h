@@ -23,6 +23,7 @@ enum ChangeMask : uint32_t {
     kChangeTransition = 128,   // transition fields changed
     kChangeTransitionTarget = 256,  // the transition record has new end values
     kChangeTextTransform = 512,
+    kChangeImages = 1024,  // the images that the style names, or how a border image is cut
 };
 
 // Style solving runs no script, so the nodes named here cannot die while a run fills the lists; the lists

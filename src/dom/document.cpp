@@ -93,7 +93,8 @@ void Document::DropTree() {
     collections_.clear();
     deferred_scripts_.clear();
     for (NodeSet* set : {&style_dirty_nodes_, &selector_dirty_elements_, &layout_changes_,
-                         &transform_changes_, &visual_changes_, &restyle_changes_, &text_commits_})
+                         &transform_changes_, &visual_changes_, &restyle_changes_, &text_commits_, &image_changes_,
+                         &image_commits_})
         set->clear();
     run_lists_.Clear();
     for (const RefPtr<Node>& child : children_)
@@ -105,6 +106,8 @@ void Document::Unload() {
     if (unloaded_) return;
     unloaded_ = true;
     if (loader_) loader_->StopLoading();
+    if (IImageLoader* images = host_->GetImageLoader()) images->ForgetDocument(*this);
+    image_clock_.Clear();
     builder_.reset();
     build_state_ = BuildState::Built;
     deferred_scripts_.clear();

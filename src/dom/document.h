@@ -17,6 +17,7 @@
 #include "dom/element.h"
 #include "dom/event_listeners.h"
 #include "dom/font_usage.h"
+#include "dom/image_clock.h"
 #include "dom/observer_hooks.h"
 #include "layout/layout_tree.h"
 #include "layout/layout_update.h"
@@ -174,6 +175,17 @@ class Document : public Element {
     void QueueRestyle(Node& node) { restyle_changes_.insert(&node); }
     // The text's display element takes the new text at the next commit.
     void QueueTextCommit(Text& text);
+    // --- Images
+    // Null without a view, and once the page is gone.
+    IImageLoader* GetImageLoader() const;
+    ImageClock& GetImageClock() { return image_clock_; }
+    // The node's display element takes what its images are by now at the next commit, and a frame paints it.
+    void QueueImageChange(Node& node);
+    // The same without a frame of its own, for what is out of sight.
+    void QueueImageCommit(Node& node) { image_commits_.insert(&node); }
+    // Images that hold back "load".
+    void CountPendingImage(int change) { pending_images_ += change; }
+
     // Work that the next frame runs on the layout channel ahead of its layout.
     using LayoutTask = Function<void(TaskFamilyHandle), MemoryTag::DOM>;
     void ScheduleLayoutTask(LayoutTask task) { layout_tasks_.push_back(std::move(task)); }
@@ -233,7 +245,9 @@ class Document : public Element {
     void DropTree();
     void ReleaseIfOrphaned();
     void RunDeferredScripts();
+    bool HasPendingWork() const;
     void FireLoad();
+    void TakeStyleImages();
 
     // Elements with one id: the first in document order as far as it is known.
     struct IdEntry {
@@ -291,11 +305,16 @@ class Document : public Element {
     NodeSet visual_changes_;
     NodeSet restyle_changes_;
     NodeSet text_commits_;
+    NodeSet image_changes_;
+    NodeSet image_commits_;
     FontUsage font_usage_;
     Vector<NodeText, MemoryTag::DOM> removed_composition_ids_;
     Vector<LayoutTask, MemoryTag::DOM> layout_tasks_;
     uint32_t view_width_ = 0;
     uint32_t view_height_ = 0;
+
+    ImageClock image_clock_;
+    int pending_images_ = 0;
 
     EventListenerTable listeners_;
     NodeVector doomed_;

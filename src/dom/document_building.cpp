@@ -80,16 +80,20 @@ void Document::RunDeferredScripts() {
     }
 }
 
+bool Document::HasPendingWork() const {
+    return pending_images_ > 0 || loader_->HasPendingWork();
+}
+
 void Document::MaybeFinishLoad() {
     if (load_fired_ || finishing_load_ || unloaded_ || build_state_ != BuildState::Built) return;
-    if (loader_->HasPendingWork()) return;
+    if (HasPendingWork()) return;
     const RefPtr<Node> self(this);
     finishing_load_ = true;
     parsed_point_ = true;
     RunDeferredScripts();
     finishing_load_ = false;
     // What deferred scripts brought in belongs to the page too (HTML, "the end", step 8).
-    if (unloaded_ || loader_->HasPendingWork() || host_->HasOtherLoadsPending()) return;
+    if (unloaded_ || HasPendingWork() || host_->HasOtherLoadsPending()) return;
     FireLoad();
 }
 

@@ -27,6 +27,7 @@ class IFontResolver;
 namespace qorvex::dom {
 
 class Document;
+class IImageLoader;
 class Node;
 
 struct HostSize {
@@ -53,6 +54,9 @@ class IDocumentHost {
     virtual ILocalizationManager* GetLocalizationManager() { return nullptr; }
     virtual ITextTransformationManager* GetTextTransformationManager() { return nullptr; }
     virtual IInternationalizationManager* GetInternationalizationManager() { return nullptr; }
+
+    // Null where nothing is painted: images are then not asked for.
+    virtual IImageLoader* GetImageLoader() { return nullptr; }
 
     // What has to be painted anew because a node left the layout; null while nothing is painted.
     virtual dsp::DirtyRegion* GetDirtyRegion() { return nullptr; }

@@ -169,11 +169,26 @@ TaskPtr Document::TakeFontPreload(fresco::IFontService& service) {
     return font_usage_.TakeTask(service);
 }
 
+IImageLoader* Document::GetImageLoader() const {
+    return unloaded_ ? nullptr : host_->GetImageLoader();
+}
+
+void Document::QueueImageChange(Node& node) {
+    if (!node.IsInDocument()) return;
+    image_commits_.insert(&node);
+    visual_changes_.insert(&node);
+}
+
 void Document::CommitLayout(layout::LayoutUpdateData& update, dsp::DirtyRegion* dirty,
                             layout::DebugNames* names) {
     for (Node* node : text_commits_)
         static_cast<Text*>(node)->CommitDisplayedText();
     text_commits_.clear();
+    for (Node* node : image_commits_) {
+        node->CommitImages();
+        if (node->layout_node_ && node->Is(kInLayoutTree)) layout_tree_.MarkChanged(*node->layout_node_);
+    }
+    image_commits_.clear();
     if (body_) update.bodyDisplay = body_->GetStyle().layout->display;
     layout_tree_.Commit(update, dirty, names);
 }
@@ -207,7 +222,8 @@ void Document::NodeRemoved(Node& node) {
     DetachLayoutNode(node);
     node.layout_node_ = nullptr;
     for (NodeSet* set : {&style_dirty_nodes_, &selector_dirty_elements_, &layout_changes_,
-                         &transform_changes_, &visual_changes_, &restyle_changes_, &text_commits_})
+                         &transform_changes_, &visual_changes_, &restyle_changes_, &text_commits_, &image_changes_,
+                         &image_commits_})
         set->erase(&node);
     node.pendingStyleBits = 0;
     ForgetCollections(node);

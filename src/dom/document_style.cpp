@@ -25,6 +25,16 @@ void Document::MarkSelectorDirty(Element& element) {
 
 void Document::SolveStyles() {
     style_engine_->SolveStyles(*this);
+    TakeStyleImages();
+}
+
+// After the solve: the client's handler, which may be called here, must not find it half done.
+void Document::TakeStyleImages() {
+    while (!image_changes_.empty()) {
+        Node* node = *image_changes_.begin();
+        image_changes_.erase(node);
+        if (node->IsElement()) static_cast<Element*>(node)->TakeStyleImages();
+    }
 }
 
 void Document::NoteStyleChange(Node& node, uint32_t mask) {
@@ -43,6 +53,7 @@ void Document::NoteStyleChange(Node& node, uint32_t mask) {
     if (mask & kChangeAnimation) run_lists_.animation.push_back(&node);
     if (mask & kChangeTransition) run_lists_.transition.push_back(&node);
     if (mask & kChangeTransitionTarget) run_lists_.transitionTargets.push_back(&node);
+    if (mask & kChangeImages) image_changes_.insert(&node);
     if (mask & kChangeTextTransform) run_lists_.textTransform.push_back(&node);
 }
 

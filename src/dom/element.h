@@ -108,6 +108,13 @@ class Element : public Node {
         MarkPseudoDependentChain(kActiveFocusDependent | kActiveFocusDependentQueued);
     }
 
+    // --- Images of the style
+    void TakeStyleImages();
+    void ReleaseImages(int kind, int slot) override;
+    void OnImageLoaded(uint32_t id, const ImageInfoPtr& info, ImageState state) override;
+    void OnImageFrame(uint32_t id, uint32_t frame, bool on_screen) override;
+    void CommitImages() override;
+
     // --- Queries
     qsl::RefPtr<HTMLCollection> GetElementsByTagName(std::string_view name);
     qsl::RefPtr<HTMLCollection> GetElementsByClassName(std::string_view name);

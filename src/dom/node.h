@@ -21,6 +21,7 @@
 #include "css/values/layout_style_refs.h"
 #include "display/display_element.h"
 #include "dom/event_target.h"
+#include "dom/image_loading.h"
 #include "dom/node_flags.h"
 #include "dom/node_link.h"
 #include "dom/node_rare_data.h"
@@ -156,7 +157,14 @@ class Node : public EventTarget {
     float GetScrollHeight() const;
 
     // --- Images and localisation
-    virtual void ReleaseImages(int kind, int slot);
+    virtual void ReleaseImages(int, int) {}
+    // News of an image that this node uses.
+    virtual void OnImageLoaded(uint32_t, const ImageInfoPtr&, ImageState) {}
+    // (id, frame, on screen): an animated image that this node uses shows another frame; a repaint makes sense only when the node is on
+    // screen. Requests and releases no image.
+    virtual void OnImageFrame(uint32_t, uint32_t, bool) {}
+    // Layout is idle: what the node's display element draws becomes what the node's images are.
+    virtual void CommitImages() {}
     virtual bool HasLocalizedContent() const { return false; }
     virtual void ApplyLocalization() {}
 

@@ -103,6 +103,4 @@ void Node::OnSubtreeRemoved() {
     depth_ = -1;
 }
 
-void Node::ReleaseImages(int, int) {}
-
 }  // namespace qorvex::dom

@@ -3,6 +3,7 @@
 #include "dom/dom_string_map.h"
 #include "dom/dom_token_list.h"
 #include "dom/node_list.h"
+#include "dom/style_images.h"
 
 namespace qorvex::dom {
 

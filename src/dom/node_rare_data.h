@@ -12,6 +12,7 @@ namespace qorvex::dom {
 class DOMStringMap;
 class DOMTokenList;
 class NodeList;
+class StyleImages;
 
 struct AttributePair {
     Atom name;
@@ -25,6 +26,8 @@ struct NodeRareData {
     layout::ScrollPosition scroll;
     // Declarations of an element that come between the default sheet and the author's.
     UniquePtr<css::StyleDeclarationSet, MemoryTag::DOM> extra_style;
+    // Null while the style names no images.
+    UniquePtr<StyleImages, MemoryTag::DOM> style_images;
     qsl::RefPtr<NodeList> child_nodes;
     qsl::RefPtr<DOMStringMap> dataset_map;
     qsl::RefPtr<DOMTokenList> class_list;

@@ -127,6 +127,8 @@ class ElementSolver {
         mask_ |= entry->changeMask;
         const LayoutStyleRefs& other = entry->element->GetStyle();
         NoteCompositionChange(*other.visual);
+        // The other element may have had the same images before, and this one not.
+        if (!(style_.visual == other.visual)) mask_ |= dom::kChangeImages;
         const bool newFont = !(style_.text == other.text);
         Take(other.layout);
         Take(other.visual);

@@ -42,7 +42,17 @@ constexpr uint32_t MaskOf(ChangeClass change) {
 template <PropertyId id>
 constexpr uint32_t ChangeMaskOf() {
     const uint32_t mask = MaskOf(PropertyTraits<id>::kChange);
-    return id == PropertyId::TextTransform ? mask | dom::kChangeTextTransform : mask;
+    switch (id) {
+        case PropertyId::TextTransform:
+            return mask | dom::kChangeTextTransform;
+        case PropertyId::BackgroundImage:
+        case PropertyId::MaskImage:
+        case PropertyId::BorderImageSource:
+        case PropertyId::BorderImageSlice:
+            return mask | dom::kChangeImages;
+        default:
+            return mask;
+    }
 }
 
 }  // namespace
