@@ -155,16 +155,26 @@ void Resources::RetireOwner(uint32_t owner) {
     anyRetired_.store(true, std::memory_order_release);
 }
 
+void Resources::RetireImages(const ImageId* ids, uint32_t count) {
+    std::lock_guard<std::mutex> lock(retiredMutex_);
+    retiredImages_.insert(retiredImages_.end(), ids, ids + count);
+    anyRetired_.store(true, std::memory_order_release);
+}
+
 void Resources::DropRetired() {
     if (!anyRetired_.load(std::memory_order_acquire)) return;
     Vector<uint32_t> retired;
+    Vector<ImageId> images;
     {
         std::lock_guard<std::mutex> lock(retiredMutex_);
         retired.swap(retired_);
+        images.swap(retiredImages_);
         anyRetired_.store(false, std::memory_order_relaxed);
     }
     for (const uint32_t owner : retired)
         DestroySurfacesOf(owner);
+    for (const ImageId id : images)
+        DestroyImage(id);
 }
 
 void Resources::CreateSurface(const CreateSurfaceRecord& record, uint32_t owner) {

@@ -47,6 +47,8 @@ class Resources {
     void DestroySurfacesOf(uint32_t owner);
     // Any thread: the owner has gone, and its surfaces go with the next DropRetired.
     void RetireOwner(uint32_t owner);
+    // The same for images.
+    void RetireImages(const ImageId* ids, uint32_t count);
     void DropRetired();
     void Clear();
     // For replays: pixels as a capture stored them.
@@ -63,7 +65,8 @@ class Resources {
     std::atomic<uint32_t> nextOwner_{1};
     std::atomic<bool> anyRetired_{false};
     std::mutex retiredMutex_;
-    Vector<uint32_t> retired_;  // under retiredMutex_
+    Vector<uint32_t> retired_;       // under retiredMutex_
+    Vector<ImageId> retiredImages_;  // under retiredMutex_
 };
 
 }  // namespace fresco::cpu

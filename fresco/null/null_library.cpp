@@ -48,6 +48,7 @@ class NullLibrary final : public IRenderingLibrary {
     IFontService* GetFontService() override { return &fonts_; }
     IScene* CreateScene(const SceneParams&) override { return HeapNew<NullScene>(); }
     void SetPaintHelpers(IPaintHelpers*) override {}
+    void RetireImages(const ImageId*, uint32_t) override {}
     void Forward(uint64_t, uint64_t, uint64_t) override {}
     void Destroy() override {
         HeapDelete(this);

@@ -1,8 +1,9 @@
 // Caches of a system as the client manages them.
 #include "core/logging/log.h"
+#include "core/main_thread.h"
 #include "core/memory/thread_scope.h"
 #include "core/system_impl.h"
-#include "core/unavailable.h"
+#include "resources/image_cache_stats.h"
 
 namespace qorvex {
 
@@ -59,21 +60,24 @@ void SystemImpl::ClearStylesheetCache() {
     stylesheet_cache_.Clear();
 }
 
-// Images come with a later build, and with them what there is to count and to prune.
 SystemCacheStats* SystemImpl::CreateCacheStats() {
     ThreadScope scope;
-    LogUnavailable("System::CreateCacheStats");
-    return nullptr;
+    auto* stats = New<SystemCacheStatsImpl, MemoryTag::General>();
+    images_->FillStats(*stats);
+    return stats;
 }
 
 void SystemImpl::PruneOrphanedResources() {
     ThreadScope scope;
-    LogUnavailable("System::PruneOrphanedResources");
+    LogDebug("Force prunning all orphaned images.");
+    images_->PruneAllOrphans();
+    LogDebug("Force prunning all orphaned svgs.");
 }
 
-void SystemImpl::UserImagesChanged(const unsigned*, unsigned) {
+void SystemImpl::UserImagesChanged(const unsigned* ids, unsigned count) {
     ThreadScope scope;
-    LogUnavailable("System::UserImagesChanged");
+    if (!CheckMainThread("System::UserImagesChanged")) return;
+    images_->UserImagesChanged(ids, ids ? count : 0);
 }
 
 }  // namespace qorvex

@@ -39,6 +39,7 @@ SystemImpl::SystemImpl(LibraryImpl& library, const SystemSettings& settings, uin
                                           settings.ResourceRequestsOnWorkers)),
       html_cache_(family_, *resources_),
       stylesheet_cache_(family_, *resources_, strings_),
+      images_(MakeRef<CachedImagesManager>(family_, resources_, library.GetRendering(), settings.ImageCacheLimits)),
       font_loader_(*resources_),
       localization_(settings.LocalizationManager),
       text_transformation_(settings.TextTransformationManager),
@@ -99,6 +100,7 @@ View* SystemImpl::CreateView(const ViewSettings& settings) {
     services.resources = resources_.get();
     services.html_cache = &html_cache_;
     services.stylesheet_cache = &stylesheet_cache_;
+    services.images = images_.get();
     services.default_rules = default_rules_;
     services.fonts = fonts_.get();
     services.localization = localization_;
@@ -177,6 +179,7 @@ void SystemImpl::Destroy() {
     // answer: a late answer finds a closed family.
     html_cache_.Clear();
     stylesheet_cache_.AbandonLoads();
+    images_->Close();
     for (TaskChannels channel : kSystemChannels) {
         LogChannel("Closing task channel ", channel, family_.family);
         family_.system->CloseChannel(channel, family_.family);

@@ -10,6 +10,7 @@
 #include "core/tasks/task_system.h"
 #include "core/view_services.h"
 #include "layout/fonts/font_manager.h"
+#include "resources/cached_images_manager.h"
 #include "resources/font_loader.h"
 #include "resources/html_cache.h"
 #include "resources/resource_context.h"
@@ -75,6 +76,8 @@ class SystemImpl final : public System, public IViewLifetimeTracker {
     RefPtr<ResourceContext> resources_;
     HTMLCache html_cache_;
     StylesheetCache stylesheet_cache_;
+    // Renderers may outlive the system and still hold it.
+    RefPtr<CachedImagesManager> images_;
     FontLoader font_loader_;
     UniquePtr<layout::FontManager> fonts_;
     ILocalizationManager* localization_;

@@ -5,6 +5,7 @@
 #include "core/unavailable.h"
 #include "core/view_impl.h"
 #include "display/dump.h"
+#include "resources/cached_images_manager.h"
 
 namespace qorvex {
 
@@ -23,10 +24,9 @@ DebugDump* ViewImpl::DumpStackingContexts() {
     return New<DebugDumpImpl, MemoryTag::DebugDump>(dsp::DumpStackingContexts(*root));
 }
 
-ImagesList* ViewImpl::GetImagesList(unsigned) {
+ImagesList* ViewImpl::GetImagesList(unsigned flags) {
     APICall call(family_, api_depth_);
-    LogUnavailable("View::GetImagesList");
-    return nullptr;
+    return document_ ? services_.images->ListImages(*document_, flags) : nullptr;
 }
 
 void ViewImpl::BeginCaptureFrames(FrameCaptureCallback callback, void* user_data) {

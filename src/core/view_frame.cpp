@@ -10,6 +10,7 @@
 #include "core/main_thread.h"
 #include "core/view_impl.h"
 #include "layout/fonts/font_manager.h"
+#include "resources/cached_images_manager.h"
 #include "script/bindings/window.h"
 #include "script/engine_seam.h"
 
@@ -59,6 +60,7 @@ void ViewImpl::AdvanceDocument() {
         CompleteIdleFrame();
         return;
     }
+    document_->GetImageClock().Advance(time_);
     layout::LayoutWork work = SolveFrame();
     TaskPtr preload = MakePreloadTask();
     WaitForPendingFrame();
@@ -97,6 +99,7 @@ void ViewImpl::HandleRendererReset() {
     LogDebug("Rendering resources reset detected. Next valid frame id ", open_frame_id_);
     MarkWholeViewDirty();
     render_caches_.ForgetResources();
+    services_.images->ReloadAll();
     last_rendering_generation_ = generation;
 }
 
@@ -232,6 +235,7 @@ FrameDataPtr ViewImpl::MakeFrameData() {
     if (scene_) frame->scene_frame = scene_->NewFrame();
     frame->scene = scene_;
     frame->caches = &render_caches_;
+    frame->images = RefPtr<CachedImagesManager>(services_.images);
     frame->stats = &stats_;
     frame->layout_unblocked = &layout_unblocked_;
     frame->on_frame_complete = on_frame_complete_;

@@ -10,6 +10,7 @@
 #include "core/logging/log.h"
 #include "core/main_thread.h"
 #include "layout/fonts/font_manager.h"
+#include "resources/cached_images_manager.h"
 #include "resources/html_cache.h"
 
 namespace qorvex {
@@ -171,6 +172,10 @@ double ViewImpl::GetTime() const {
 
 layout::IFontResolver* ViewImpl::GetFontResolver() {
     return services_.fonts;
+}
+
+dom::IImageLoader* ViewImpl::GetImageLoader() {
+    return services_.images;
 }
 
 void ViewImpl::RequestFrames(uint32_t count) {

@@ -118,6 +118,7 @@ class ViewImpl final : public View,
         return services_.internationalization;
     }
     dsp::DirtyRegion* GetDirtyRegion() override { return &dirty_region_; }
+    dom::IImageLoader* GetImageLoader() override;
     void RequestFrames(uint32_t count) override;
     void OnDOMBuilt(dom::Document& document) override;
     void OnFinishLoad(dom::Document& document) override;
@@ -128,6 +129,7 @@ class ViewImpl final : public View,
     // --- ILoaderHost
     TaskFamilyHandle GetLoaderFamily() override { return family_; }
     bool IsRequestAllowed(const URL& url) override;
+    bool GiveUpRequest(uint32_t id, const dom::Document& document) override;
 
     // --- dom::IWindowHost
     // The value of the time callback, or the time of the last Advance.

@@ -5,6 +5,7 @@
 #include "core/logging/log.h"
 #include "core/view_impl.h"
 #include "css/style/style_engine.h"
+#include "resources/cached_images_manager.h"
 #include "resources/html_cache.h"
 #include "script/bindings/context_lifecycle.h"
 #include "script/evaluate.h"
@@ -75,6 +76,10 @@ void ViewImpl::FailLoad(const URL& url, const char* error) {
 bool ViewImpl::IsRequestAllowed(const URL& url) {
     return !intercept_all_requests_ || !listener_ ||
            listener_->OnResourceRequestIntercepted(url.GetText().c_str()) == InterceptRequestStatus::Allow;
+}
+
+bool ViewImpl::GiveUpRequest(uint32_t id, const dom::Document& document) {
+    return services_.images->GiveUpRequest(id, document);
 }
 
 void ViewImpl::OnHTMLContent(const URL& url, RefPtr<dom::ParsedHTML> html) {

@@ -12,6 +12,7 @@ class IRenderingLibrary;
 
 namespace qorvex {
 
+class CachedImagesManager;
 class HTMLCache;
 class ILocalizationManager;
 class IInternationalizationManager;
@@ -41,6 +42,7 @@ struct ViewServices {
     ResourceContext* resources = nullptr;
     HTMLCache* html_cache = nullptr;
     StylesheetCache* stylesheet_cache = nullptr;
+    CachedImagesManager* images = nullptr;
     css::DefaultRulesPtr default_rules;
     layout::FontManager* fonts = nullptr;
     ILocalizationManager* localization = nullptr;

@@ -41,13 +41,13 @@ void DrawImageLayer(const ImageSlot& slot, const ResolvedImageLayer& layer, cons
     tile.y += box.y;
     const auto image = static_cast<fresco::ImageId>(slot.resource);
     if (!layer.repeatX && !layer.repeatY) {
-        buffer.DrawImage(image, tile, {}, fresco::Paint());
+        buffer.DrawImage(image, tile, slot.source, fresco::Paint());
         return;
     }
     Rect area = box;
     if (!layer.repeatX) area.x = tile.x, area.width = tile.width;
     if (!layer.repeatY) area.y = tile.y, area.height = tile.height;
-    buffer.DrawImageTiled(image, area, {{}, tile, layer.spacingX, layer.spacingY}, fresco::Paint());
+    buffer.DrawImageTiled(image, area, {slot.source, tile, layer.spacingX, layer.spacingY}, fresco::Paint());
 }
 
 }  // namespace
@@ -106,8 +106,11 @@ bool PaintBorderImage(const LayoutNode& node, const BoxShape& shape, const Image
     // The nine pieces as columns and rows of the image and of the area.
     const float columns[4] = {area.x, area.x + w.left, layout::Right(area) - w.right, layout::Right(area)};
     const float rows[4] = {area.y, area.y + w.top, layout::Bottom(area) - w.bottom, layout::Bottom(area)};
-    const float sourceColumns[4] = {0, s.left, slot.intrinsic.width - s.right, slot.intrinsic.width};
-    const float sourceRows[4] = {0, s.top, slot.intrinsic.height - s.bottom, slot.intrinsic.height};
+    const float left = slot.source.x, top = slot.source.y;
+    const float sourceColumns[4] = {left, left + s.left, left + slot.intrinsic.width - s.right,
+                                    left + slot.intrinsic.width};
+    const float sourceRows[4] = {top, top + s.top, top + slot.intrinsic.height - s.bottom,
+                                 top + slot.intrinsic.height};
     const auto image = static_cast<fresco::ImageId>(slot.resource);
     for (int row = 0; row < 3; ++row) {
         for (int column = 0; column < 3; ++column) {

@@ -48,18 +48,19 @@ void ApplyMask(const LayoutNode& node, PaintContext& context, CommandBuffer& buf
         ApplyGradientMask(node, context, layer, box, buffer);
         return;
     }
-    const auto image = static_cast<fresco::ImageId>((*SlotsOf(node))[0].resource);
+    const ImageSlot& slot = (*SlotsOf(node))[0];
+    const auto image = static_cast<fresco::ImageId>(slot.resource);
     Rect tile = layer.tile;
     tile.x += box.x;
     tile.y += box.y;
     if (!layer.repeatX && !layer.repeatY) {
-        buffer.SetMaskImage(image, tile, {}, 0);
+        buffer.SetMaskImage(image, tile, slot.source, 0);
     } else {
         // Along an axis without repeat there is one row or column of tiles.
         Rect area = box;
         if (!layer.repeatX) area.x = tile.x, area.width = tile.width;
         if (!layer.repeatY) area.y = tile.y, area.height = tile.height;
-        buffer.SetMaskImageTiled(image, area, {{}, tile, layer.spacingX, layer.spacingY}, 0);
+        buffer.SetMaskImageTiled(image, area, {slot.source, tile, layer.spacingX, layer.spacingY}, 0);
     }
 }
 

@@ -105,9 +105,10 @@ void Document::DropTree() {
 void Document::Unload() {
     if (unloaded_) return;
     unloaded_ = true;
-    if (loader_) loader_->StopLoading();
+    // Images first: other documents may wait for the same ones.
     if (IImageLoader* images = host_->GetImageLoader()) images->ForgetDocument(*this);
     image_clock_.Clear();
+    if (loader_) loader_->StopLoading();
     builder_.reset();
     build_state_ = BuildState::Built;
     deferred_scripts_.clear();

@@ -177,12 +177,16 @@ TaskPtr DocumentLoader::Load(ResourceRequestDescription description, ResourceJob
 }
 
 void DocumentLoader::CompleteTrackedRequest(uint32_t id) {
+    if (aborted_ids_.erase(id)) return;
     if (!request_ids_.erase(id) && !stopped_)
         AssertFailure("Completed a resource request job which wasn't tracked.");
 }
 
 void DocumentLoader::Abort(uint32_t id) {
-    if (!request_ids_.contains(id))
+    // Nobody waits for an aborted request, whether it is ever answered or not.
+    if (request_ids_.erase(id))
+        aborted_ids_.insert(id);
+    else
         AssertFailure("Trying to abort a resource job that is not started or has completed.");
     context_.Abort(id);
 }
@@ -204,7 +208,7 @@ void DocumentLoader::StopLoading() {
     // Taken out first: the client may finish a request inside the call that aborts it.
     const auto ids = std::exchange(request_ids_, {});
     for (uint32_t id : ids)
-        context_.Abort(id);
+        if (host_.GiveUpRequest(id, *document_)) context_.Abort(id);
     prefetched_.clear();
     prefetched_stylesheets_.clear();
     // The page goes for good: elements that the building waited for must not hold it. Else the page may stay,

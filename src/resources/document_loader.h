@@ -22,6 +22,9 @@ class ILoaderHost {
     virtual TaskFamilyHandle GetLoaderFamily() = 0;
     // False: the client refuses the request.
     virtual bool IsRequestAllowed(const URL& url) = 0;
+    // The document gives this request up. False when another document waits for its answer too; the request
+    // then goes on.
+    virtual bool GiveUpRequest(uint32_t, const dom::Document&) { return true; }
 };
 
 class DocumentLoader final : public dom::IDocumentLoader {
@@ -37,6 +40,7 @@ class DocumentLoader final : public dom::IDocumentLoader {
     TaskPtr Load(ResourceRequestDescription description, ResourceJobCallback on_finished,
                  ResourceJobCallback on_progress, bool binary, uint32_t* id);
     void Abort(uint32_t id);
+    bool IsTracking(uint32_t id) const { return request_ids_.contains(id); }
 
     // --- dom::IDocumentLoader
     uint32_t LoadResource(const URL& url, dom::Element& element, bool deferred) override;
@@ -88,6 +92,8 @@ class DocumentLoader final : public dom::IDocumentLoader {
     // Sheets that this document loads itself, with the stylesheet ids that wait for each.
     HashMap<UrlKey, Vector<uint32_t, MemoryTag::Resources>, MemoryTag::Resources> loading_stylesheets_;
     HashSet<uint32_t, MemoryTag::Resources> request_ids_;
+    // The client was told to give up, and may still answer.
+    HashSet<uint32_t, MemoryTag::Resources> aborted_ids_;
     HashMap<UrlKey, Prefetch, MemoryTag::Resources> prefetched_;
     // Prefetches that turned out to be sheets while their bytes were still on the way.
     HashMap<uint32_t, UrlKey, MemoryTag::Resources> prefetched_stylesheets_;

@@ -12,7 +12,7 @@ struct BuildIdentifier {
     constexpr BuildIdentifier() {
 #define FRESCO_TEXT(name, tail, fields) #name #tail #fields ";"
 #define FRESCO_FIELD(type, field)
-        constexpr char shape[] = FRESCO_COMMANDS(FRESCO_TEXT, FRESCO_FIELD) "interfaces 2";
+        constexpr char shape[] = FRESCO_COMMANDS(FRESCO_TEXT, FRESCO_FIELD) "interfaces 3";
 #undef FRESCO_TEXT
 #undef FRESCO_FIELD
         for (uint64_t part = 0; part < 4; ++part) {

@@ -39,6 +39,8 @@ class IRenderingLibrary {
     // Who helps with the frames of all scenes from now on; null (as at the start): nobody. The object must
     // live until it is replaced. Render thread, or any before the first frame.
     virtual void SetPaintHelpers(IPaintHelpers* helpers) = 0;
+    // Names that nobody draws any more: the images go with the next work on the render thread. Any thread.
+    virtual void RetireImages(const ImageId* ids, uint32_t count) = 0;
     // Passed on from the engine's own forwarding operation.
     virtual void Forward(uint64_t first, uint64_t second, uint64_t third) = 0;
     // No scene may be left.

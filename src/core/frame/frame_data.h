@@ -15,6 +15,7 @@
 #include "layout/perform_layout.h"
 #include "qorvex/frame_capture.h"
 #include "qorvex/view_settings.h"
+#include "resources/cached_images_manager.h"
 
 namespace qorvex {
 
@@ -44,6 +45,7 @@ class FrameData : public AtomicRefCounted<FrameData, MemoryTag::LayoutData> {
     // Borrowed from the view, which waits for its frame before it goes.
     fresco::IScene* scene = nullptr;
     dsp::RenderCaches* caches = nullptr;
+    RefPtr<CachedImagesManager> images;
     FrameStatsRecorder* stats = nullptr;
     std::atomic<uint32_t>* layout_unblocked = nullptr;
 

@@ -22,7 +22,8 @@ double PaintedArea(const dsp::FrameRecord& record) {
     return area;
 }
 
-void ExecutePaint(HeldRecord& held, fresco::IScene& scene, FrameStatsRecorder& stats, uint32_t frame_id) {
+void ExecutePaint(HeldRecord& held, CachedImagesManager& images, fresco::IScene& scene, FrameStatsRecorder& stats,
+                  uint32_t frame_id) {
     StageTimer timer(stats, frame_id, &FrameStats::Paint);
     dsp::FrameRecord& record = held.record;
     if (record.Empty()) {
@@ -33,6 +34,7 @@ void ExecutePaint(HeldRecord& held, fresco::IScene& scene, FrameStatsRecorder& s
     if (!record.resourceBuffers.empty())
         scene.ExecuteFrontEnd(record.resourceBuffers.data(),
                               static_cast<uint32_t>(record.resourceBuffers.size()));
+    images.ProcessUploads(scene);
     LogTrace("Execute Paint");
     if (!record.buffers.empty())
         scene.ExecuteBackEnd(record.buffers.data(), static_cast<uint32_t>(record.buffers.size()));
@@ -43,7 +45,8 @@ void ExecutePaint(HeldRecord& held, fresco::IScene& scene, FrameStatsRecorder& s
 }
 
 TaskPtr MakeCaptureTask(const FrameData& frame, const SharedRecord& held) {
-    return MakeTask("CaptureFrame", [held, scene = frame.scene, callback = frame.capture_callback,
+    return MakeTask("CaptureFrame", [held, images = frame.images, scene = frame.scene,
+                                     callback = frame.capture_callback,
                                      user_data = frame.capture_user_data](TaskFamilyHandle family) {
         // The record's own resource buffers come first, so that the capture starts from what the frame starts
         // from.
@@ -52,6 +55,8 @@ TaskPtr MakeCaptureTask(const FrameData& frame, const SharedRecord& held) {
             buffers.push_back(buffer);
         for (auto* buffer : held->record.buffers)
             buffers.push_back(buffer);
+        // A capture holds the images that its frame draws.
+        images->ProcessUploads(*scene);
         const fresco::CaptureData data =
             scene->SerializeBuffers(buffers.data(), static_cast<uint32_t>(buffers.size()));
         if (!data.data) return;
@@ -86,8 +91,10 @@ void RecordFrame(FrameData& frame) {
         SharedRecord held = MakeRef<HeldRecord>(std::move(record));
         RenderFrame& target = *frame.render_frame;
         if (frame.capture_callback) target.Push(MakeCaptureTask(frame, held));
-        target.Push(MakeTask("Paint", [held, scene = frame.scene, stats = frame.stats, id = frame.frame_id](
-                                          TaskFamilyHandle) { ExecutePaint(*held, *scene, *stats, id); }));
+        target.Push(MakeTask("Paint", [held, images = frame.images, scene = frame.scene, stats = frame.stats,
+                                       id = frame.frame_id](TaskFamilyHandle) {
+            ExecutePaint(*held, *images, *scene, *stats, id);
+        }));
     }
     frame.render_frame->PushClose();
 }

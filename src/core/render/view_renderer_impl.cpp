@@ -7,6 +7,7 @@
 #include "core/memory/thread_scope.h"
 #include "core/render/renderer_registry.h"
 #include "core/view_impl.h"
+#include "resources/cached_images_manager.h"
 
 namespace qorvex {
 
@@ -29,11 +30,14 @@ ViewRendererImpl::ViewRendererImpl(ViewImpl& view, RendererRegistry& registry)
     : registry_(registry),
       link_(&view.GetRenderLink()),
       frame_queue_(link_->GetFrames()),
+      images_(view.GetServices().images),
       scene_(*link_->GetScene()),
       family_(view.GetTaskFamily()) {
     link_->CountRenderer(+1);
     registry_.Add(this);
 }
+
+ViewRendererImpl::~ViewRendererImpl() = default;
 
 PaintStatus ViewRendererImpl::Paint(unsigned frame_id, bool wait_for_completion) {
     ThreadScope scope;
@@ -51,6 +55,7 @@ PaintStatus ViewRendererImpl::Paint(unsigned frame_id, bool wait_for_completion)
     } else {
         status = DrawReadyTasks(*frame, family_, frame_id);
     }
+    images_->ReleasePendingGPUResources(scene_);
     if (status == PaintStatus::Complete || (wait_for_completion && status != PaintStatus::FrameMissing)) {
         LogTrace("Frame complete ", frame_id);
         frame_queue_.Remove(frame_id);
@@ -83,6 +88,7 @@ void ViewRendererImpl::FreeRenderingResources() {
     LogDebug("ViewRenderer::FreeRenderingResources called.");
     // From here on the view discards new frames until it has noticed.
     frame_queue_.CountReset();
+    images_->ForgetGPUResources();
     frame_queue_.DiscardAll();
     ReleaseTextures();
     scene_.FreeResources();

@@ -10,6 +10,7 @@
 
 namespace qorvex {
 
+class CachedImagesManager;
 class RendererRegistry;
 class ViewImpl;
 
@@ -17,7 +18,7 @@ class ViewRendererImpl final : public ViewRenderer {
   public:
     // The view has a scene.
     ViewRendererImpl(ViewImpl& view, RendererRegistry& registry);
-    ~ViewRendererImpl() override = default;
+    ~ViewRendererImpl() override;
 
     void Destroy() override;
     PaintStatus Paint(unsigned frame_id, bool wait_for_completion) override;
@@ -32,6 +33,7 @@ class ViewRendererImpl final : public ViewRenderer {
     RendererRegistry& registry_;
     RefPtr<RenderLink> link_;
     FrameQueue& frame_queue_;
+    RefPtr<CachedImagesManager> images_;
     fresco::IScene& scene_;
     TaskFamilyHandle family_;
     // Images that went while their frame was being drawn.

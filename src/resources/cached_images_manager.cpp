@@ -1,0 +1,243 @@
+// Who uses which image, and what becomes of those that nobody uses.
+#include "resources/cached_images_manager.h"
+
+#include <fresco/rendering_library.h>
+
+#include <cstdio>
+
+#include "core/logging/log.h"
+#include "dom/document.h"
+#include "dom/document_host.h"
+#include "resources/document_loader.h"
+
+#define IMAGE_LOG "CachedImagesManager: "
+
+namespace qorvex {
+
+using dom::ImageInfo;
+using dom::ImageState;
+
+namespace {
+
+uint64_t BytesOf(const ImageInfo& info) {
+    return static_cast<uint64_t>(info.description.width) * info.description.height * 4;
+}
+
+bool IsAbove(uint64_t bytes, size_t count, uint32_t max_bytes, uint32_t max_count) {
+    return bytes > max_bytes || count > max_count;
+}
+
+}  // namespace
+
+CachedImagesManager::CachedImagesManager(TaskFamilyHandle family, RefPtr<ResourceContext> context,
+                                         fresco::IRenderingLibrary& rendering, const CacheLimits& limits)
+    : family_(family),
+      context_(std::move(context)),
+      rendering_(rendering),
+      limits_(limits),
+      no_info_(MakeRef<ImageInfo>()) {}
+
+CachedImagesManager::~CachedImagesManager() = default;
+
+void CachedImagesManager::Close() {
+    qsl::MutexLock lock(mutex_);
+    const auto requests = std::exchange(pending_requests_, {});
+    const auto images = std::exchange(images_, {});
+    for (const auto& [id, image] : images)
+        uploads_.Free(*image.info);
+    for (const auto& [id, orphan] : orphans_)
+        uploads_.Free(*orphan.info);
+    orphans_.clear();
+    oldest_orphan_ = newest_orphan_ = kNone;
+    orphan_bytes_ = 0;
+    image_ids_by_url_.clear();
+    user_image_ids_.clear();
+    lock.Unlock();
+    // No renderer of this system may come by any more.
+    const auto names = uploads_.TakePendingFrees();
+    uploads_.Forget();
+    if (!names.empty()) rendering_.RetireImages(names.data(), names.size());
+    for (const PendingRequest& request : requests)
+        context_->Abort(request.request_id);
+}
+
+// --- Uses
+
+void CachedImagesManager::AddHolder(CachedImage& image, dom::Node& node) {
+    Holder& holder = image.holders[&node];
+    if (holder.uses++ > 0) return;
+    holder.node = script::WeakHandle<dom::Node>(&node);
+    holder.document = node.GetDocument();
+    holder.family = node.GetDocument()->GetHost().GetTaskFamily();
+    holder.serial = next_holder_++;
+}
+
+void CachedImagesManager::RegisterImage(const URL& url, dom::Node& node, uint32_t* id) {
+    qsl::MutexLock lock(mutex_);
+    UrlKey key = MakeUrlKey(url);
+    CachedImage* image = nullptr;
+    if (const uint32_t* known = image_ids_by_url_.get(key)) {
+        *id = *known;
+        image = images_.get(*known);
+        if (image) {
+            LogTrace(IMAGE_LOG "Will reuse image: ", url.GetText(), " with id ", *id);
+        } else {
+            image = &Resurrect(*known);
+            LogTrace(IMAGE_LOG "Resurrecting image: ", url.GetText(), " assigned id ", *id);
+        }
+        AddHolder(*image, node);
+        const dom::ImageInfoPtr info = image->info;
+        const ImageState state = image->state;
+        lock.Unlock();
+        return Replay(node, *id, info, state);
+    }
+    *id = next_image_id_++;
+    image_ids_by_url_.insert_or_assign(std::move(key), *id);
+    image = &images_[*id];
+    image->info = no_info_;
+    image->url = url;
+    AddHolder(*image, node);
+    LogTrace(IMAGE_LOG "Started image load: ", url.GetText(), " assigned id ", *id);
+    lock.Unlock();
+    StartLoad(*id, url, GetLoaderOf(*node.GetDocument()));
+}
+
+void CachedImagesManager::Replay(dom::Node& node, uint32_t id, const dom::ImageInfoPtr& info,
+                                 ImageState state) {
+    const auto tell = [&](ImageState reached) {
+        node.OnImageLoaded(id, reached < ImageState::Decoded ? no_info_ : info, reached);
+    };
+    tell(ImageState::Loading);
+    if (state == ImageState::LoadFailed) return tell(state);
+    if (state >= ImageState::Decoding) tell(ImageState::Decoding);
+    if (state == ImageState::DecodeFailed) return tell(state);
+    if (state >= ImageState::Decoded) tell(ImageState::Decoded);
+    if (state == ImageState::OnGPU) tell(state);
+}
+
+void CachedImagesManager::UnregisterImage(uint32_t id, const dom::Node& node) {
+    LogTrace(IMAGE_LOG "Relinquishing image ", id);
+    Holder gone;  // what it holds goes after the lock
+    qsl::MutexLock lock(mutex_);
+    CachedImage* image = images_.get(id);
+    if (!image) {
+        char text[64];
+        std::snprintf(text, sizeof text, "Relinquishing cached image that is not tracked! %u", id);
+        AssertFailure(text);
+        return;
+    }
+    Holder* holder = image->holders.get(&node);
+    if (!holder || --holder->uses > 0) return;
+    gone = image->holders.take(&node);
+    if (!image->holders.empty()) return;
+    const uint32_t request = Relinquish(id);
+    lock.Unlock();
+    if (request == kNone) return;
+    DocumentLoader& loader = GetLoaderOf(*node.GetDocument());
+    loader.IsTracking(request) ? loader.Abort(request) : context_->Abort(request);
+}
+
+uint32_t CachedImagesManager::Relinquish(uint32_t id) {
+    CachedImage image = images_.take(id);
+    uint32_t request = kNone;
+    pending_requests_.erase_if([&](const PendingRequest& pending) {
+        if (pending.image_id != id) return false;
+        request = pending.request_id;
+        return true;
+    });
+    if (image.user_image_id != 0) user_image_ids_.erase(image.user_image_id);
+    if (image.kind == ImageKind::User && image.info->HasResource()) {
+        LogTrace(IMAGE_LOG "User image ", id, " scheduled to be freed with GPU resource id ",
+                 image.info->resource);
+        uploads_.Free(*image.info);
+    }
+    if (image.kind != ImageKind::Cached || !Orphan(id, image)) image_ids_by_url_.erase(MakeUrlKey(image.url));
+    LogTrace(IMAGE_LOG "Image ", id, " relinquished.");
+    return request;
+}
+
+void CachedImagesManager::ForgetDocument(const dom::Document& document) {
+    Vector<uint32_t, MemoryTag::Resources> unused;
+    Vector<uint32_t, MemoryTag::Resources> requests;
+    Vector<Holder, MemoryTag::Resources> gone;
+    {
+        qsl::MutexLock lock(mutex_);
+        for (auto& [id, image] : images_) {
+            Vector<const dom::Node*, MemoryTag::Resources> nodes;
+            for (const auto& [node, holder] : image.holders)
+                if (holder.document == &document) nodes.push_back(node);
+            for (const dom::Node* node : nodes)
+                gone.push_back(image.holders.take(node));
+            if (!nodes.empty() && image.holders.empty()) unused.push_back(id);
+        }
+        for (uint32_t id : unused) {
+            const uint32_t request = Relinquish(id);
+            if (request != kNone) requests.push_back(request);
+        }
+    }
+    if (requests.empty()) return;
+    DocumentLoader& loader = GetLoaderOf(const_cast<dom::Document&>(document));
+    for (uint32_t request : requests)
+        loader.IsTracking(request) ? loader.Abort(request) : context_->Abort(request);
+}
+
+// --- Orphans
+
+CachedImagesManager::CachedImage& CachedImagesManager::Resurrect(uint32_t id) {
+    const OrphanedImage orphan = orphans_.take(id);
+    UnlinkOrphan(orphan);
+    orphan_bytes_ -= BytesOf(*orphan.info);
+    CachedImage& image = images_[id];
+    image.info = orphan.info;
+    image.state = ImageState::OnGPU;
+    image.kind = ImageKind::Cached;
+    image.url = orphan.url;
+    return image;
+}
+
+bool CachedImagesManager::Orphan(uint32_t id, CachedImage& image) {
+    if (uploads_.Cancel(id)) {
+        LogTrace(IMAGE_LOG "Cached image ", id, " upload to GPU canceled.");
+        return false;
+    }
+    if (image.state != ImageState::OnGPU || !image.info->HasResource()) {
+        LogDebug(IMAGE_LOG "Tried to orphan image that is not uploaded to GPU with Id: ", id);
+        return false;
+    }
+    LogTrace(IMAGE_LOG "Orphaning image ", id);
+    PruneOrphans(limits_);
+    orphan_bytes_ += BytesOf(*image.info);
+    orphans_.insert_or_assign(id, OrphanedImage{image.url, std::move(image.info), newest_orphan_, kNone});
+    if (newest_orphan_ == kNone)
+        oldest_orphan_ = id;
+    else
+        orphans_.get(newest_orphan_)->newer = id;
+    newest_orphan_ = id;
+    return true;
+}
+
+void CachedImagesManager::UnlinkOrphan(const OrphanedImage& orphan) {
+    (orphan.older == kNone ? oldest_orphan_ : orphans_.get(orphan.older)->newer) = orphan.newer;
+    (orphan.newer == kNone ? newest_orphan_ : orphans_.get(orphan.newer)->older) = orphan.older;
+}
+
+void CachedImagesManager::PruneOrphans(const CacheLimits& limits) {
+    if (!IsAbove(orphan_bytes_, orphans_.size(), limits.MaxBytes, limits.MaxCount)) return;
+    while (oldest_orphan_ != kNone &&
+           IsAbove(orphan_bytes_, orphans_.size(), limits.TargetBytes, limits.TargetCount)) {
+        const OrphanedImage orphan = orphans_.take(oldest_orphan_);
+        LogTrace(IMAGE_LOG "Pruned image ", orphan.url.GetText(), " from cache (GPU resource id is ",
+                 orphan.info->FirstResource());
+        UnlinkOrphan(orphan);
+        uploads_.Free(*orphan.info);
+        image_ids_by_url_.erase(MakeUrlKey(orphan.url));
+        orphan_bytes_ -= BytesOf(*orphan.info);
+    }
+}
+
+void CachedImagesManager::PruneAllOrphans() {
+    qsl::MutexLock lock(mutex_);
+    PruneOrphans(CacheLimits());
+}
+
+}  // namespace qorvex
