@@ -23,10 +23,6 @@ uint64_t BytesOf(const ImageInfo& info) {
     return static_cast<uint64_t>(info.description.width) * info.description.height * 4;
 }
 
-bool IsAbove(uint64_t bytes, size_t count, uint32_t max_bytes, uint32_t max_count) {
-    return bytes > max_bytes || count > max_count;
-}
-
 }  // namespace
 
 CachedImagesManager::CachedImagesManager(TaskFamilyHandle family, RefPtr<ResourceContext> context,
@@ -45,11 +41,9 @@ void CachedImagesManager::Close() {
     const auto images = std::exchange(images_, {});
     for (const auto& [id, image] : images)
         uploads_.Free(*image.info);
-    for (const auto& [id, orphan] : orphans_)
-        uploads_.Free(*orphan.info);
-    orphans_.clear();
-    oldest_orphan_ = newest_orphan_ = kNone;
-    orphan_bytes_ = 0;
+    for (const auto& [id, orphan] : orphans_.GetAll())
+        uploads_.Free(*orphan.payload);
+    orphans_.Clear();
     image_ids_by_url_.clear();
     user_image_ids_.clear();
     lock.Unlock();
@@ -184,11 +178,9 @@ void CachedImagesManager::ForgetDocument(const dom::Document& document) {
 // --- Orphans
 
 CachedImagesManager::CachedImage& CachedImagesManager::Resurrect(uint32_t id) {
-    const OrphanedImage orphan = orphans_.take(id);
-    UnlinkOrphan(orphan);
-    orphan_bytes_ -= BytesOf(*orphan.info);
+    const OrphanedImages::Orphan orphan = orphans_.Take(id);
     CachedImage& image = images_[id];
-    image.info = orphan.info;
+    image.info = orphan.payload;
     image.state = ImageState::OnGPU;
     image.kind = ImageKind::Cached;
     image.url = orphan.url;
@@ -206,32 +198,17 @@ bool CachedImagesManager::Orphan(uint32_t id, CachedImage& image) {
     }
     LogTrace(IMAGE_LOG "Orphaning image ", id);
     PruneOrphans(limits_);
-    orphan_bytes_ += BytesOf(*image.info);
-    orphans_.insert_or_assign(id, OrphanedImage{image.url, std::move(image.info), newest_orphan_, kNone});
-    if (newest_orphan_ == kNone)
-        oldest_orphan_ = id;
-    else
-        orphans_.get(newest_orphan_)->newer = id;
-    newest_orphan_ = id;
+    const uint64_t bytes = BytesOf(*image.info);
+    orphans_.Add(id, image.url, std::move(image.info), bytes);
     return true;
 }
 
-void CachedImagesManager::UnlinkOrphan(const OrphanedImage& orphan) {
-    (orphan.older == kNone ? oldest_orphan_ : orphans_.get(orphan.older)->newer) = orphan.newer;
-    (orphan.newer == kNone ? newest_orphan_ : orphans_.get(orphan.newer)->older) = orphan.older;
-}
-
 void CachedImagesManager::PruneOrphans(const CacheLimits& limits) {
-    if (!IsAbove(orphan_bytes_, orphans_.size(), limits.MaxBytes, limits.MaxCount)) return;
-    while (oldest_orphan_ != kNone &&
-           IsAbove(orphan_bytes_, orphans_.size(), limits.TargetBytes, limits.TargetCount)) {
-        const OrphanedImage orphan = orphans_.take(oldest_orphan_);
+    for (const OrphanedImages::Orphan& orphan : orphans_.TakeBeyond(limits)) {
         LogTrace(IMAGE_LOG "Pruned image ", orphan.url.GetText(), " from cache (GPU resource id is ",
-                 orphan.info->FirstResource());
-        UnlinkOrphan(orphan);
-        uploads_.Free(*orphan.info);
+                 orphan.payload->FirstResource());
+        uploads_.Free(*orphan.payload);
         image_ids_by_url_.erase(MakeUrlKey(orphan.url));
-        orphan_bytes_ -= BytesOf(*orphan.info);
     }
 }
 

@@ -13,6 +13,7 @@
 
 #include "dom/image_loading.h"
 #include "resources/image_uploads.h"
+#include "resources/orphan_table.h"
 #include "resources/resource_context.h"
 #include "resources/url_key.h"
 #include "script/scripting_handle_enabled.h"
@@ -81,13 +82,7 @@ class CachedImagesManager final : public dom::IImageLoader,
         uint32_t user_image_id = 0;
         URL url;
     };
-    struct OrphanedImage {
-        URL url;
-        dom::ImageInfoPtr info;
-        // Neighbours in the order of orphaning; kNone at the ends.
-        uint32_t older = kNone;
-        uint32_t newer = kNone;
-    };
+    using OrphanedImages = OrphanTable<dom::ImageInfoPtr>;
     static constexpr uint32_t kNone = 0xFFFFFFFF;
 
     // --- cached_images_manager.cpp: uses and orphans
@@ -99,7 +94,6 @@ class CachedImagesManager final : public dom::IImageLoader,
     // False when it is not kept.
     bool Orphan(uint32_t id, CachedImage& image) QSL_REQUIRES(mutex_);
     void PruneOrphans(const CacheLimits& limits) QSL_REQUIRES(mutex_);
-    void UnlinkOrphan(const OrphanedImage& orphan) QSL_REQUIRES(mutex_);
 
     // --- image_loading.cpp: from the request to the rendering library
     void StartLoad(uint32_t id, const URL& url, DocumentLoader& loader);
@@ -124,10 +118,7 @@ class CachedImagesManager final : public dom::IImageLoader,
     uint32_t next_holder_ QSL_GUARDED_BY(mutex_) = 0;
     HashMap<UrlKey, uint32_t, MemoryTag::Resources> image_ids_by_url_ QSL_GUARDED_BY(mutex_);
     HashMap<uint32_t, CachedImage, MemoryTag::Resources> images_ QSL_GUARDED_BY(mutex_);
-    HashMap<uint32_t, OrphanedImage, MemoryTag::Resources> orphans_ QSL_GUARDED_BY(mutex_);
-    uint32_t oldest_orphan_ QSL_GUARDED_BY(mutex_) = kNone;
-    uint32_t newest_orphan_ QSL_GUARDED_BY(mutex_) = kNone;
-    uint64_t orphan_bytes_ QSL_GUARDED_BY(mutex_) = 0;
+    OrphanedImages orphans_ QSL_GUARDED_BY(mutex_);
     // The client's id to the image's.
     HashMap<uint32_t, uint32_t, MemoryTag::Resources> user_image_ids_ QSL_GUARDED_BY(mutex_);
     // Request and image ids of what is in flight.

@@ -46,8 +46,9 @@ void CachedImagesManager::FillStats(SystemCacheStatsImpl& stats) {
         const fresco::Image& size = image.info->description;
         stats.AddLive(image.url.GetText(), size.width, size.height, uses);
     }
-    for (const auto& [id, orphan] : orphans_)
-        stats.AddOrphan(orphan.url.GetText(), orphan.info->description.width, orphan.info->description.height);
+    for (const auto& [id, orphan] : orphans_.GetAll())
+        stats.AddOrphan(orphan.url.GetText(), orphan.payload->description.width,
+                        orphan.payload->description.height);
     stats.Finish();
 }
 

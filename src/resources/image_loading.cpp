@@ -176,11 +176,9 @@ void CachedImagesManager::ReloadAll() {
     {
         qsl::MutexLock lock(mutex_);
         uploads_.Forget();
-        for (const auto& [id, orphan] : orphans_)
+        for (const auto& [id, orphan] : orphans_.GetAll())
             image_ids_by_url_.erase(MakeUrlKey(orphan.url));
-        orphans_.clear();
-        oldest_orphan_ = newest_orphan_ = kNone;
-        orphan_bytes_ = 0;
+        orphans_.Clear();
         // Entries keep their ids, so that nodes need not learn new ones, and what is on its way goes on: it has
         // nothing to lose yet.
         for (auto& [id, image] : images_) {

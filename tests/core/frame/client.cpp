@@ -15,9 +15,10 @@ Client::Client(Options given) : options(given) {
     library = qorvex::Library::Initialize(params);
 
     qorvex::SystemSettings system_settings;
-    system_settings.ResourceHandler = &files;
+    system_settings.ResourceHandler = options.wrap_handler ? options.wrap_handler(files) : &files;
     system_settings.ResourceRequestsOnWorkers = options.requests_on_workers;
     system_settings.EmbeddedFallbackFont = 2;
+    system_settings.ImageCacheLimits = options.image_limits;
     system = library->CreateSystem(system_settings);
 
     qorvex::ViewSettings view_settings;
@@ -79,6 +80,7 @@ void Client::ServeResources() {
 }
 
 void Client::Frame(double dt) {
+    if (options.on_frame) options.on_frame();
     ServeResources();
     time += dt;
     system->Advance(time);

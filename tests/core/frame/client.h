@@ -8,6 +8,7 @@
 #include <atomic>
 #include <cstdlib>
 #include <cstring>
+#include <functional>
 #include <map>
 #include <mutex>
 #include <string>
@@ -215,6 +216,12 @@ struct Options {
     unsigned severity = qorvex::Logging::Trace;
     bool pools = true;
     const char* switches = nullptr;
+    // Nothing is pruned that a test does not prune.
+    qorvex::CacheLimits image_limits{1000, 1u << 30, 1000, 1u << 30};
+    // Puts a handler of the test's own in front of the files.
+    std::function<qorvex::IAsyncResourceHandler*(Files&)> wrap_handler;
+    // Called before each frame.
+    std::function<void()> on_frame;
 };
 
 // One library, system, view and renderer; the test's thread is main and render thread.
