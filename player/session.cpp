@@ -26,6 +26,8 @@ constexpr const char* kDefaultFontFiles[] = {
     "/usr/share/fonts/truetype/dejavu/DejaVuSans-Bold.ttf",
 };
 constexpr std::int32_t kLargeFallbackFont = 2;
+// Images that the page has stopped showing: cleaned from 64 MB or 256 of them down to half.
+constexpr CacheLimits kImageCacheLimits = {256, 64u << 20, 128, 32u << 20};
 constexpr std::uint32_t kErrorSeverity = 4;
 
 void PrintConsoleLine(void*, const ConsoleMessage& message) {
@@ -123,6 +125,7 @@ bool Session::Start(std::string& error) {
     system_settings.ResourceHandler = resources_.get();
     if (unruly_) system_settings.ResourceHandler = unruly_.get();
     system_settings.EmbeddedFallbackFont = kLargeFallbackFont;
+    system_settings.ImageCacheLimits = kImageCacheLimits;
     if (options_.text_services) {
         system_settings.InternationalizationManager = &internationalization_;
         system_settings.TextTransformationManager = &text_transformation_;

@@ -109,7 +109,4 @@ inline constexpr size_t kMaxMediaRuleCopies = 256 * 1024;
 /// their number can grow with the square of the text.
 inline constexpr size_t kMaxKeyframeValues = 64 * 1024;
 
-/// Bytes of all decoded frames of one image, as much as the largest still image has.
-inline constexpr size_t kMaxDecodedImageBytes = size_t{256} << 20;
-
 }  // namespace qorvex::limits

@@ -1,6 +1,5 @@
 #include "resources/decoded_image.h"
 
-#include "core/limits.h"
 #include "core/logging/log.h"
 
 namespace qorvex {
@@ -21,9 +20,10 @@ DecodedImage DecodedImage::Decode(std::span<const uint8_t> file) {
         const uint32_t opaque = index == 0 ? fresco::kImageOpaque : image.description_.flags;
         image.description_ = {info.width, info.height, info.format, info.flags & opaque, frame.rowPitch, nullptr};
         bytes += frame.size;
-        if (bytes > limits::kMaxDecodedImageBytes) {
-            LogWarning("Refusing an animated image of more than ", limits::kMaxDecodedImageBytes, " bytes in its ",
-                       count, " frames");
+        // All frames together may be what one still image may be.
+        if (bytes > fresco::kMaxImageBytes) {
+            LogWarning("Refusing an animated image of more than ", fresco::kMaxImageBytes, " bytes in its ", count,
+                       " frames");
             return {};
         }
     }
