@@ -182,7 +182,9 @@ class Document : public Element {
     // The node's display element takes what its images are by now at the next commit, and a frame paints it.
     void QueueImageChange(Node& node);
     // The same without a frame of its own, for what is out of sight.
-    void QueueImageCommit(Node& node) { image_commits_.insert(&node); }
+    void QueueImageCommit(Node& node) {
+        if (node.IsInDocument()) image_commits_.insert(&node);
+    }
     // Images that hold back "load".
     void CountPendingImage(int change) { pending_images_ += change; }
 

@@ -28,13 +28,17 @@ void Document::SolveStyles() {
     TakeStyleImages();
 }
 
-// After the solve: the client's handler, which may be called here, must not find it half done.
+// After the solve: the client's handler, which may be called here, must not find it half done, and may do
+// whatever it likes to the tree.
 void Document::TakeStyleImages() {
-    while (!image_changes_.empty()) {
-        Node* node = *image_changes_.begin();
-        image_changes_.erase(node);
-        if (node->IsElement()) static_cast<Element*>(node)->TakeStyleImages();
-    }
+    if (image_changes_.empty()) return;
+    NodeVector changed;
+    changed.reserve(image_changes_.size());
+    for (Node* node : image_changes_)
+        changed.push_back(RefPtr<Node>(node));
+    image_changes_.clear();
+    for (const RefPtr<Node>& node : changed)
+        if (node->IsInDocument() && node->IsElement()) static_cast<Element&>(*node).TakeStyleImages();
 }
 
 void Document::NoteStyleChange(Node& node, uint32_t mask) {

@@ -82,8 +82,11 @@ void CachedImagesManager::RegisterImage(const URL& url, dom::Node& node, uint32_
         AddHolder(*image, node);
         const dom::ImageInfoPtr info = image->info;
         const ImageState state = image->state;
+        const bool again = std::exchange(image->given_up, false) && state == ImageState::Loading;
         lock.Unlock();
-        return Replay(node, *id, info, state);
+        Replay(node, *id, info, state);
+        if (again) StartLoad(*id, url, GetLoaderOf(*node.GetDocument()));
+        return;
     }
     *id = next_image_id_++;
     image_ids_by_url_.insert_or_assign(std::move(key), *id);

@@ -80,6 +80,8 @@ class CachedImagesManager final : public dom::IImageLoader,
         dom::ImageState state = dom::ImageState::Loading;
         ImageKind kind = ImageKind::Unknown;
         uint32_t user_image_id = 0;
+        // Its request was given up while somebody held it: the next who asks starts anew.
+        bool given_up = false;
         URL url;
     };
     using OrphanedImages = OrphanTable<dom::ImageInfoPtr>;

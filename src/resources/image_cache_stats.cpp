@@ -80,9 +80,10 @@ bool CachedImagesManager::GiveUpRequest(uint32_t request_id, const dom::Document
     qsl::MutexLock lock(mutex_);
     for (PendingRequest& pending : pending_requests_) {
         if (pending.request_id != request_id) continue;
-        const CachedImage* image = images_.get(pending.image_id);
+        CachedImage* image = images_.get(pending.image_id);
         for (const auto& [node, holder] : image->holders)
             if (holder.document != &document) return false;
+        image->given_up = true;
         pending_requests_.erase(&pending);
         return true;
     }
