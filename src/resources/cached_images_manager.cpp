@@ -57,15 +57,6 @@ void CachedImagesManager::Close() {
 
 // --- Uses
 
-void CachedImagesManager::AddHolder(CachedImage& image, dom::Node& node) {
-    Holder& holder = image.holders[&node];
-    if (holder.uses++ > 0) return;
-    holder.node = script::WeakHandle<dom::Node>(&node);
-    holder.document = node.GetDocument();
-    holder.family = node.GetDocument()->GetHost().GetTaskFamily();
-    holder.serial = next_holder_++;
-}
-
 void CachedImagesManager::RegisterImage(const URL& url, dom::Node& node, uint32_t* id) {
     qsl::MutexLock lock(mutex_);
     UrlKey key = MakeUrlKey(url);
@@ -79,7 +70,7 @@ void CachedImagesManager::RegisterImage(const URL& url, dom::Node& node, uint32_
             image = &Resurrect(*known);
             LogTrace(IMAGE_LOG "Resurrecting image: ", url.GetText(), " assigned id ", *id);
         }
-        AddHolder(*image, node);
+        image->holders.Add(node, next_holder_++);
         const dom::ImageInfoPtr info = image->info;
         const ImageState state = image->state;
         const bool again = std::exchange(image->given_up, false) && state == ImageState::Loading;
@@ -93,7 +84,7 @@ void CachedImagesManager::RegisterImage(const URL& url, dom::Node& node, uint32_
     image = &images_[*id];
     image->info = no_info_;
     image->url = url;
-    AddHolder(*image, node);
+    image->holders.Add(node, next_holder_++);
     LogTrace(IMAGE_LOG "Started image load: ", url.GetText(), " assigned id ", *id);
     lock.Unlock();
     StartLoad(*id, url, GetLoaderOf(*node.GetDocument()));
@@ -114,7 +105,6 @@ void CachedImagesManager::Replay(dom::Node& node, uint32_t id, const dom::ImageI
 
 void CachedImagesManager::UnregisterImage(uint32_t id, const dom::Node& node) {
     LogTrace(IMAGE_LOG "Relinquishing image ", id);
-    Holder gone;  // what it holds goes after the lock
     qsl::MutexLock lock(mutex_);
     CachedImage* image = images_.get(id);
     if (!image) {
@@ -123,10 +113,7 @@ void CachedImagesManager::UnregisterImage(uint32_t id, const dom::Node& node) {
         AssertFailure(text);
         return;
     }
-    Holder* holder = image->holders.get(&node);
-    if (!holder || --holder->uses > 0) return;
-    gone = image->holders.take(&node);
-    if (!image->holders.empty()) return;
+    if (!image->holders.Remove(node) || !image->holders.IsEmpty()) return;
     const uint32_t request = Relinquish(id);
     lock.Unlock();
     if (request == kNone) return;
@@ -156,17 +143,10 @@ uint32_t CachedImagesManager::Relinquish(uint32_t id) {
 void CachedImagesManager::ForgetDocument(const dom::Document& document) {
     Vector<uint32_t, MemoryTag::Resources> unused;
     Vector<uint32_t, MemoryTag::Resources> requests;
-    Vector<Holder, MemoryTag::Resources> gone;
     {
         qsl::MutexLock lock(mutex_);
-        for (auto& [id, image] : images_) {
-            Vector<const dom::Node*, MemoryTag::Resources> nodes;
-            for (const auto& [node, holder] : image.holders)
-                if (holder.document == &document) nodes.push_back(node);
-            for (const dom::Node* node : nodes)
-                gone.push_back(image.holders.take(node));
-            if (!nodes.empty() && image.holders.empty()) unused.push_back(id);
-        }
+        for (auto& [id, image] : images_)
+            if (image.holders.RemoveAllOf(document) && image.holders.IsEmpty()) unused.push_back(id);
         for (uint32_t id : unused) {
             const uint32_t request = Relinquish(id);
             if (request != kNone) requests.push_back(request);

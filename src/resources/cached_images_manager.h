@@ -13,10 +13,10 @@
 
 #include "dom/image_loading.h"
 #include "resources/image_uploads.h"
+#include "resources/node_holders.h"
 #include "resources/orphan_table.h"
 #include "resources/resource_context.h"
 #include "resources/url_key.h"
-#include "script/scripting_handle_enabled.h"
 
 namespace fresco {
 class IRenderingLibrary;
@@ -66,16 +66,8 @@ class CachedImagesManager final : public dom::IImageLoader,
     void ForgetGPUResources();
 
   private:
-    // One entry for each node that uses the image. The pointers are compared, never followed.
-    struct Holder {
-        script::WeakHandle<dom::Node> node;
-        const dom::Document* document = nullptr;
-        TaskFamilyHandle family;
-        uint32_t uses = 0;
-        uint32_t serial = 0;  // tells it from a later holder for the same node
-    };
     struct CachedImage {
-        HashMap<const dom::Node*, Holder, MemoryTag::Resources> holders;
+        NodeHolders holders;
         dom::ImageInfoPtr info;
         dom::ImageState state = dom::ImageState::Loading;
         ImageKind kind = ImageKind::Unknown;
@@ -88,7 +80,6 @@ class CachedImagesManager final : public dom::IImageLoader,
     static constexpr uint32_t kNone = 0xFFFFFFFF;
 
     // --- cached_images_manager.cpp: uses and orphans
-    void AddHolder(CachedImage& image, dom::Node& node) QSL_REQUIRES(mutex_);
     CachedImage& Resurrect(uint32_t id) QSL_REQUIRES(mutex_);
     void Replay(dom::Node& node, uint32_t id, const dom::ImageInfoPtr& info, dom::ImageState state);
     // The last holder has gone. Gives the request to abort, or kNone.

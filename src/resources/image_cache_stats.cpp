@@ -40,11 +40,8 @@ void ImagesListImpl::Add(std::string_view url) {
 void CachedImagesManager::FillStats(SystemCacheStatsImpl& stats) {
     qsl::MutexLock lock(mutex_);
     for (const auto& [id, image] : images_) {
-        uint32_t uses = 0;
-        for (const auto& [node, holder] : image.holders)
-            uses += holder.uses;
         const fresco::Image& size = image.info->description;
-        stats.AddLive(image.url.GetText(), size.width, size.height, uses);
+        stats.AddLive(image.url.GetText(), size.width, size.height, image.holders.CountUses());
     }
     for (const auto& [id, orphan] : orphans_.GetAll())
         stats.AddOrphan(orphan.url.GetText(), orphan.payload->description.width,
@@ -58,7 +55,7 @@ ImagesList* CachedImagesManager::ListImages(const dom::Document& document, unsig
     {
         qsl::MutexLock lock(mutex_);
         for (const auto& [id, image] : images_) {
-            for (const auto& [key, holder] : image.holders) {
+            for (const auto& [key, holder] : image.holders.GetAll()) {
                 const dom::Node* node = holder.document == &document ? holder.node.get() : nullptr;
                 if (!node) continue;
                 const bool hidden = node->GetStyle().layout->display == css::CSSDisplay::None;
@@ -81,8 +78,7 @@ bool CachedImagesManager::GiveUpRequest(uint32_t request_id, const dom::Document
     for (PendingRequest& pending : pending_requests_) {
         if (pending.request_id != request_id) continue;
         CachedImage* image = images_.get(pending.image_id);
-        for (const auto& [node, holder] : image->holders)
-            if (holder.document != &document) return false;
+        if (image->holders.HasOthersThan(document)) return false;
         image->given_up = true;
         pending_requests_.erase(&pending);
         return true;

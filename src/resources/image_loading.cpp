@@ -183,7 +183,7 @@ void CachedImagesManager::ReloadAll() {
         // nothing to lose yet.
         for (auto& [id, image] : images_) {
             if (image.state < ImageState::Decoded) continue;
-            for (const auto& [node, holder] : image.holders) {
+            for (const auto& [node, holder] : image.holders.GetAll()) {
                 if (!holder.node) continue;
                 image.state = ImageState::Loading;
                 image.kind = ImageKind::Unknown;
@@ -219,7 +219,7 @@ void CachedImagesManager::UpdateCachedImageState(uint32_t id, dom::ImageInfoPtr 
     if (state == ImageState::OnGPU)
         LogTrace(IMAGE_LOG, image->kind == ImageKind::User ? "User image " : "Cached image ", id,
                  " now on GPU with resource id ", info->FirstResource());
-    for (const auto& [key, holder] : image->holders) {
+    for (const auto& [key, holder] : image->holders.GetAll()) {
         RefPtr<CachedImagesManager> self(this);
         holder.family.Push(
             TaskChannels::Main,
@@ -231,12 +231,10 @@ void CachedImagesManager::UpdateCachedImageState(uint32_t id, dom::ImageInfoPtr 
     }
 }
 
-// A node may have let go of the image and asked for it again since; it was told of everything then.
 bool CachedImagesManager::IsHolder(uint32_t id, const dom::Node& node, uint32_t serial) {
     qsl::MutexLock lock(mutex_);
     const CachedImage* image = images_.get(id);
-    const Holder* holder = image ? image->holders.get(&node) : nullptr;
-    return holder && holder->serial == serial;
+    return image && image->holders.Holds(node, serial);
 }
 
 void CachedImagesManager::UserImagesChanged(const unsigned* ids, unsigned count) {
@@ -254,7 +252,7 @@ void CachedImagesManager::UserImagesChanged(const unsigned* ids, unsigned count)
             LogWarning("Trying to update image with ID ", ids[i], ". Skipped.");
             continue;
         }
-        for (const auto& [key, holder] : image->holders)
+        for (const auto& [key, holder] : image->holders.GetAll())
             nodes.push_back(holder.node);
     }
     for (const auto& weak : nodes) {
