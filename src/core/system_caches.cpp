@@ -72,6 +72,7 @@ void SystemImpl::PruneOrphanedResources() {
     LogDebug("Force prunning all orphaned images.");
     images_->PruneAllOrphans();
     LogDebug("Force prunning all orphaned svgs.");
+    svgs_->PruneAllOrphans();
 }
 
 void SystemImpl::UserImagesChanged(const unsigned* ids, unsigned count) {

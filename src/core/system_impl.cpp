@@ -40,6 +40,7 @@ SystemImpl::SystemImpl(LibraryImpl& library, const SystemSettings& settings, uin
       html_cache_(family_, *resources_),
       stylesheet_cache_(family_, *resources_, strings_),
       images_(MakeRef<CachedImagesManager>(family_, resources_, library.GetRendering(), settings.ImageCacheLimits)),
+      svgs_(MakeRef<CachedSVGManager>(family_, resources_, settings.SVGCacheLimits)),
       font_loader_(*resources_),
       localization_(settings.LocalizationManager),
       text_transformation_(settings.TextTransformationManager),
@@ -101,6 +102,7 @@ View* SystemImpl::CreateView(const ViewSettings& settings) {
     services.html_cache = &html_cache_;
     services.stylesheet_cache = &stylesheet_cache_;
     services.images = images_.get();
+    services.svgs = svgs_.get();
     services.default_rules = default_rules_;
     services.fonts = fonts_.get();
     services.localization = localization_;
@@ -180,6 +182,7 @@ void SystemImpl::Destroy() {
     html_cache_.Clear();
     stylesheet_cache_.AbandonLoads();
     images_->Close();
+    svgs_->Close();
     for (TaskChannels channel : kSystemChannels) {
         LogChannel("Closing task channel ", channel, family_.family);
         family_.system->CloseChannel(channel, family_.family);

@@ -11,6 +11,7 @@
 #include "core/view_services.h"
 #include "layout/fonts/font_manager.h"
 #include "resources/cached_images_manager.h"
+#include "resources/cached_svg_manager.h"
 #include "resources/font_loader.h"
 #include "resources/html_cache.h"
 #include "resources/resource_context.h"
@@ -78,6 +79,7 @@ class SystemImpl final : public System, public IViewLifetimeTracker {
     StylesheetCache stylesheet_cache_;
     // Renderers may outlive the system and still hold it.
     RefPtr<CachedImagesManager> images_;
+    RefPtr<CachedSVGManager> svgs_;
     FontLoader font_loader_;
     UniquePtr<layout::FontManager> fonts_;
     ILocalizationManager* localization_;

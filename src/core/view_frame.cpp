@@ -11,6 +11,7 @@
 #include "core/view_impl.h"
 #include "layout/fonts/font_manager.h"
 #include "resources/cached_images_manager.h"
+#include "resources/cached_svg_manager.h"
 #include "script/bindings/window.h"
 #include "script/engine_seam.h"
 
@@ -100,6 +101,7 @@ void ViewImpl::HandleRendererReset() {
     MarkWholeViewDirty();
     render_caches_.ForgetResources();
     services_.images->ReloadAll();
+    services_.svgs->ReloadAll();
     last_rendering_generation_ = generation;
 }
 

@@ -11,6 +11,7 @@
 #include "core/main_thread.h"
 #include "layout/fonts/font_manager.h"
 #include "resources/cached_images_manager.h"
+#include "resources/cached_svg_manager.h"
 #include "resources/html_cache.h"
 
 namespace qorvex {
@@ -176,6 +177,10 @@ layout::IFontResolver* ViewImpl::GetFontResolver() {
 
 dom::IImageLoader* ViewImpl::GetImageLoader() {
     return services_.images;
+}
+
+dom::ISVGLoader* ViewImpl::GetSVGLoader() {
+    return services_.svgs;
 }
 
 void ViewImpl::RequestFrames(uint32_t count) {

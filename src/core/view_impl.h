@@ -119,6 +119,7 @@ class ViewImpl final : public View,
     }
     dsp::DirtyRegion* GetDirtyRegion() override { return &dirty_region_; }
     dom::IImageLoader* GetImageLoader() override;
+    dom::ISVGLoader* GetSVGLoader() override;
     void RequestFrames(uint32_t count) override;
     void OnDOMBuilt(dom::Document& document) override;
     void OnFinishLoad(dom::Document& document) override;

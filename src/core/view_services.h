@@ -13,6 +13,7 @@ class IRenderingLibrary;
 namespace qorvex {
 
 class CachedImagesManager;
+class CachedSVGManager;
 class HTMLCache;
 class ILocalizationManager;
 class IInternationalizationManager;
@@ -43,6 +44,7 @@ struct ViewServices {
     HTMLCache* html_cache = nullptr;
     StylesheetCache* stylesheet_cache = nullptr;
     CachedImagesManager* images = nullptr;
+    CachedSVGManager* svgs = nullptr;
     css::DefaultRulesPtr default_rules;
     layout::FontManager* fonts = nullptr;
     ILocalizationManager* localization = nullptr;

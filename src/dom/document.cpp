@@ -107,6 +107,7 @@ void Document::Unload() {
     unloaded_ = true;
     // Images first: other documents may wait for the same ones.
     if (IImageLoader* images = host_->GetImageLoader()) images->ForgetDocument(*this);
+    if (ISVGLoader* svgs = host_->GetSVGLoader()) svgs->ForgetDocument(*this);
     image_clock_.Clear();
     if (loader_) loader_->StopLoading();
     builder_.reset();

@@ -178,6 +178,7 @@ class Document : public Element {
     // --- Images
     // Null without a view, and once the page is gone.
     IImageLoader* GetImageLoader() const;
+    ISVGLoader* GetSVGLoader() const;
     ImageClock& GetImageClock() { return image_clock_; }
     // The node's display element takes what its images are by now at the next commit, and a frame paints it.
     void QueueImageChange(Node& node);

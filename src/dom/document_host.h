@@ -28,6 +28,7 @@ namespace qorvex::dom {
 
 class Document;
 class IImageLoader;
+class ISVGLoader;
 class Node;
 
 struct HostSize {
@@ -57,6 +58,7 @@ class IDocumentHost {
 
     // Null where nothing is painted: images are then not asked for.
     virtual IImageLoader* GetImageLoader() { return nullptr; }
+    virtual ISVGLoader* GetSVGLoader() { return nullptr; }
 
     // What has to be painted anew because a node left the layout; null while nothing is painted.
     virtual dsp::DirtyRegion* GetDirtyRegion() { return nullptr; }

@@ -173,6 +173,10 @@ IImageLoader* Document::GetImageLoader() const {
     return unloaded_ ? nullptr : host_->GetImageLoader();
 }
 
+ISVGLoader* Document::GetSVGLoader() const {
+    return unloaded_ ? nullptr : host_->GetSVGLoader();
+}
+
 void Document::QueueImageChange(Node& node) {
     if (!node.IsInDocument()) return;
     image_commits_.insert(&node);

@@ -112,6 +112,7 @@ class Element : public Node {
     void TakeStyleImages();
     void ReleaseImages(int kind, int slot) override;
     void OnImageLoaded(uint32_t id, const ImageInfoPtr& info, ImageState state) override;
+    void OnSVGLoaded(uint32_t id, const SVGImagePtr& svg) override;
     void OnImageFrame(uint32_t id, uint32_t frame, bool on_screen) override;
     void CommitImages() override;
 

@@ -42,6 +42,12 @@ void Element::OnImageLoaded(uint32_t id, const ImageInfoPtr& info, ImageState st
         GetDocument()->QueueImageChange(*this);
 }
 
+void Element::OnSVGLoaded(uint32_t id, const SVGImagePtr& svg) {
+    if (!svg) LogWarning("Received SVG load notification for null resource!");
+    StyleImages* images = ImagesOf(*this);
+    if (images && images->UpdateSVG(id, svg)) GetDocument()->QueueImageChange(*this);
+}
+
 void Element::OnImageFrame(uint32_t id, uint32_t frame, bool on_screen) {
     StyleImages* images = ImagesOf(*this);
     if (!images || !images->ShowFrame(id, frame)) return;

@@ -70,4 +70,24 @@ class IImageLoader {
     virtual void ForgetDocument(const Document& document) = 0;
 };
 
+// A parsed vector image; what it is made of is known where it is drawn. Never changed once it is given out.
+class SVGImage : public AtomicRefCounted<SVGImage, MemoryTag::Resources> {
+  public:
+    virtual ~SVGImage() = default;
+    // Of the parsed data, for the cache's limits.
+    virtual uint64_t GetBytes() const = 0;
+};
+
+using SVGImagePtr = RefPtr<const SVGImage>;
+
+// The same for vector images. The one answer comes by Node::OnSVGLoaded, with null for a failure; inside
+// RegisterSVG when it is known already.
+class ISVGLoader {
+  public:
+    virtual ~ISVGLoader() = default;
+    virtual void RegisterSVG(const URL& url, Node& node, uint32_t* id) = 0;
+    virtual void UnregisterSVG(uint32_t id, const Node& node) = 0;
+    virtual void ForgetDocument(const Document& document) = 0;
+};
+
 }  // namespace qorvex::dom

@@ -2,9 +2,21 @@
 
 #include <utility>
 
+#include "dom/ascii.h"
 #include "dom/document.h"
 
 namespace qorvex::dom {
+
+namespace {
+
+bool HasSVGPath(const URL& url) {
+    constexpr std::string_view kEnding = ".svg";
+    const String path = url.GetPath();
+    return path.size() >= kEnding.size() &&
+           EqualsIgnoringAsciiCase(path.view().substr(path.size() - kEnding.size()), kEnding);
+}
+
+}  // namespace
 
 ImageUse::ImageUse(ImageUse&& other) noexcept {
     *this = std::move(other);
@@ -19,37 +31,48 @@ ImageUse& ImageUse::operator=(ImageUse&& other) noexcept {
     state_ = std::exchange(other.state_, ImageState::None);
     pending_ = std::exchange(other.pending_, false);
     url_ = std::exchange(other.url_, URL());
+    is_svg_ = std::exchange(other.is_svg_, false);
     info_ = std::exchange(other.info_, nullptr);
+    svg_ = std::exchange(other.svg_, nullptr);
     return *this;
 }
 
 void ImageUse::Request(Node& node, const URL& url) {
     Release();
     Document& document = *node.GetDocument();
-    IImageLoader* loader = document.GetImageLoader();
-    if (!loader || url.IsEmpty()) return;
+    IImageLoader* images = document.GetImageLoader();
+    ISVGLoader* svgs = document.GetSVGLoader();
+    const bool is_svg = HasSVGPath(url);
+    if (url.IsEmpty() || (is_svg ? !svgs : !images)) return;
     node_ = &node;
     url_ = url;
     state_ = ImageState::Loading;
     CountAsPending(true);
-    loader->RegisterImage(url, node, &id_);
+    is_svg_ = is_svg;
+    is_svg ? svgs->RegisterSVG(url, node, &id_) : images->RegisterImage(url, node, &id_);
 }
 
 void ImageUse::Release() {
     if (!node_) return;
     Document& document = *node_->GetDocument();
-    if (IImageLoader* loader = document.GetImageLoader()) loader->UnregisterImage(id_, *node_);
+    if (is_svg_) {
+        if (ISVGLoader* loader = document.GetSVGLoader()) loader->UnregisterSVG(id_, *node_);
+    } else if (IImageLoader* loader = document.GetImageLoader()) {
+        loader->UnregisterImage(id_, *node_);
+    }
     if (info_ && info_->IsAnimated()) document.GetImageClock().Remove(id_, *node_);
     CountAsPending(false);
     node_ = nullptr;
     id_ = frame_ = 0;
     state_ = ImageState::None;
     url_ = URL();
+    is_svg_ = false;
     info_ = nullptr;
+    svg_ = nullptr;
 }
 
 bool ImageUse::Update(uint32_t id, const ImageInfoPtr& info, ImageState state) {
-    if (!node_ || id != id_) return false;
+    if (!node_ || is_svg_ || id != id_) return false;
     state_ = state;
     CountAsPending(state < ImageState::Decoded);
     if (state != ImageState::Decoded && state != ImageState::OnGPU) return true;
@@ -61,8 +84,16 @@ bool ImageUse::Update(uint32_t id, const ImageInfoPtr& info, ImageState state) {
     return true;
 }
 
+bool ImageUse::UpdateSVG(uint32_t id, const SVGImagePtr& svg) {
+    if (!node_ || !is_svg_ || id != id_) return false;
+    state_ = svg ? ImageState::OnGPU : ImageState::LoadFailed;
+    svg_ = svg;
+    CountAsPending(false);
+    return true;
+}
+
 bool ImageUse::ShowFrame(uint32_t id, uint32_t frame) {
-    if (!node_ || id != id_ || !info_ || frame >= info_->frames.size()) return false;
+    if (!node_ || is_svg_ || id != id_ || !info_ || frame >= info_->frames.size()) return false;
     frame_ = frame;
     return true;
 }

@@ -24,10 +24,15 @@ class ImageUse {
 
     // For Node::OnImageLoaded: takes the news over when they are about this image. False: it is another one.
     bool Update(uint32_t id, const ImageInfoPtr& info, ImageState state);
+    // The same for Node::OnSVGLoaded. A vector image goes from Loading to OnGPU or to a failure.
+    bool UpdateSVG(uint32_t id, const SVGImagePtr& svg);
     // The frame of an animated image that shows from now on (Node::OnImageFrame). True when it is this image.
     bool ShowFrame(uint32_t id, uint32_t frame);
 
     bool IsRequested() const { return node_ != nullptr; }
+    // By the ending of its path: a file of the other kind fails.
+    bool IsSVG() const { return is_svg_; }
+    const SVGImagePtr& GetSVG() const { return svg_; }
     uint32_t GetId() const { return id_; }
     const URL& GetURL() const { return url_; }
     ImageState GetState() const { return state_; }
@@ -48,8 +53,10 @@ class ImageUse {
     uint32_t frame_ = 0;
     ImageState state_ = ImageState::None;
     bool pending_ = false;
+    bool is_svg_ = false;
     URL url_;
     ImageInfoPtr info_;
+    SVGImagePtr svg_;
 };
 
 }  // namespace qorvex::dom

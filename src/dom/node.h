@@ -160,6 +160,7 @@ class Node : public EventTarget {
     virtual void ReleaseImages(int, int) {}
     // News of an image that this node uses.
     virtual void OnImageLoaded(uint32_t, const ImageInfoPtr&, ImageState) {}
+    virtual void OnSVGLoaded(uint32_t, const SVGImagePtr&) {}
     // (id, frame, on screen): an animated image that this node uses shows another frame; a repaint makes sense only when the node is on
     // screen. Requests and releases no image.
     virtual void OnImageFrame(uint32_t, uint32_t, bool) {}

@@ -79,6 +79,10 @@ bool StyleImages::Update(uint32_t id, const ImageInfoPtr& info, ImageState state
     return Any([&](ImageUse& use) { return use.Update(id, info, state); });
 }
 
+bool StyleImages::UpdateSVG(uint32_t id, const SVGImagePtr& svg) {
+    return Any([&](ImageUse& use) { return use.UpdateSVG(id, svg); });
+}
+
 bool StyleImages::ShowFrame(uint32_t id, uint32_t frame) {
     return Any([&](ImageUse& use) { return use.ShowFrame(id, frame); });
 }

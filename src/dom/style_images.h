@@ -29,6 +29,7 @@ class StyleImages {
 
     // True when it is one of these.
     bool Update(uint32_t id, const ImageInfoPtr& info, ImageState state);
+    bool UpdateSVG(uint32_t id, const SVGImagePtr& svg);
     bool ShowFrame(uint32_t id, uint32_t frame);
 
     void Commit(dsp::Box& box, const css::VisualStyle& style) const;

@@ -117,8 +117,7 @@ void CachedImagesManager::UnregisterImage(uint32_t id, const dom::Node& node) {
     const uint32_t request = Relinquish(id);
     lock.Unlock();
     if (request == kNone) return;
-    DocumentLoader& loader = GetLoaderOf(*node.GetDocument());
-    loader.IsTracking(request) ? loader.Abort(request) : context_->Abort(request);
+    GetLoaderOf(*node.GetDocument()).AbortShared(request);
 }
 
 uint32_t CachedImagesManager::Relinquish(uint32_t id) {
@@ -152,10 +151,8 @@ void CachedImagesManager::ForgetDocument(const dom::Document& document) {
             if (request != kNone) requests.push_back(request);
         }
     }
-    if (requests.empty()) return;
-    DocumentLoader& loader = GetLoaderOf(const_cast<dom::Document&>(document));
     for (uint32_t request : requests)
-        loader.IsTracking(request) ? loader.Abort(request) : context_->Abort(request);
+        GetLoaderOf(const_cast<dom::Document&>(document)).AbortShared(request);
 }
 
 // --- Orphans

@@ -40,7 +40,8 @@ class DocumentLoader final : public dom::IDocumentLoader {
     TaskPtr Load(ResourceRequestDescription description, ResourceJobCallback on_finished,
                  ResourceJobCallback on_progress, bool binary, uint32_t* id);
     void Abort(uint32_t id);
-    bool IsTracking(uint32_t id) const { return request_ids_.contains(id); }
+    // The same for a request that another document may have made.
+    void AbortShared(uint32_t id) { request_ids_.contains(id) ? Abort(id) : context_.Abort(id); }
 
     // --- dom::IDocumentLoader
     uint32_t LoadResource(const URL& url, dom::Element& element, bool deferred) override;

@@ -158,6 +158,20 @@ TEST_F(ImageTest, BadAnswersFailAndThePageGoesOn) {
     EXPECT_EQ(Pixel(5, 5), kSeenGreen);
 }
 
+// Until vector images can be parsed they fail, and say so once.
+TEST_F(ImageTest, VectorImagesFailInOneWay) {
+    Start();
+    client_->files.Put("coui://page/a.svg", "<svg/>");
+    client_->Load(Page("div { background-image: url(a.SVG), url(red.png); mask-image: url(b.svg?x); }",
+                       "<div id=a></div><div></div>"));
+    EXPECT_EQ(log().Count("SVG images are not available in this build"), 1u);
+    EXPECT_EQ(log().Count(" load FAILED"), 2u);
+    EXPECT_EQ(log().Count("Will reuse SVG: "), 2u);
+    Run("document.getElementById('a').remove()");
+    Frames(2);
+    EXPECT_TRUE(log().Lines(Logging::Error).empty());
+}
+
 // The last user goes in each state of the image.
 TEST_F(ImageTest, TheLastUserGoesWhileTheRequestIsInFlight) {
     Load("", "<div id=a></div>");
