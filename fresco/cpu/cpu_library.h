@@ -15,7 +15,9 @@ class CpuLibrary final : public IRenderingLibrary {
     IFontService* GetFontService() override { return &shared_.fonts; }
     IScene* CreateScene(const SceneParams& params) override;
     void SetPaintHelpers(IPaintHelpers* helpers) override { shared_.helpers = helpers; }
-    void RetireImages(const ImageId* ids, uint32_t count) override { shared_.resources.RetireImages(ids, count); }
+    void RetireImages(const ImageId* ids, uint32_t count) override {
+        shared_.resources.RetireImages(ids, count);
+    }
     void Forward(uint64_t first, uint64_t second, uint64_t third) override;
     void Destroy() override;
 

@@ -92,9 +92,9 @@ void Document::DropTree() {
     ids_.clear();
     collections_.clear();
     deferred_scripts_.clear();
-    for (NodeSet* set : {&style_dirty_nodes_, &selector_dirty_elements_, &layout_changes_,
-                         &transform_changes_, &visual_changes_, &restyle_changes_, &text_commits_, &image_changes_,
-                         &image_commits_})
+    for (NodeSet* set :
+         {&style_dirty_nodes_, &selector_dirty_elements_, &layout_changes_, &transform_changes_,
+          &visual_changes_, &restyle_changes_, &text_commits_, &image_changes_, &image_commits_})
         set->clear();
     run_lists_.Clear();
     for (const RefPtr<Node>& child : children_)

@@ -225,9 +225,9 @@ void Document::NodeRemoved(Node& node) {
     // Taking out the top of a subtree takes out the whole of it; those below have nothing left to unlink.
     DetachLayoutNode(node);
     node.layout_node_ = nullptr;
-    for (NodeSet* set : {&style_dirty_nodes_, &selector_dirty_elements_, &layout_changes_,
-                         &transform_changes_, &visual_changes_, &restyle_changes_, &text_commits_, &image_changes_,
-                         &image_commits_})
+    for (NodeSet* set :
+         {&style_dirty_nodes_, &selector_dirty_elements_, &layout_changes_, &transform_changes_,
+          &visual_changes_, &restyle_changes_, &text_commits_, &image_changes_, &image_commits_})
         set->erase(&node);
     node.pendingStyleBits = 0;
     ForgetCollections(node);

@@ -101,7 +101,8 @@ bool ImageUse::ShowFrame(uint32_t id, uint32_t frame) {
 dsp::ImageSlot ImageUse::MakeSlot() const {
     dsp::ImageSlot slot;
     if (!info_ || HasFailed()) return slot;
-    slot.resource = static_cast<int32_t>(info_->IsAnimated() ? info_->frames[frame_].resource : info_->resource);
+    slot.resource =
+        static_cast<int32_t>(info_->IsAnimated() ? info_->frames[frame_].resource : info_->resource);
     slot.intrinsic = info_->NaturalSize();
     slot.source = info_->content;
     return slot;

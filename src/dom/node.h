@@ -161,8 +161,8 @@ class Node : public EventTarget {
     // News of an image that this node uses.
     virtual void OnImageLoaded(uint32_t, const ImageInfoPtr&, ImageState) {}
     virtual void OnSVGLoaded(uint32_t, const SVGImagePtr&) {}
-    // (id, frame, on screen): an animated image that this node uses shows another frame; a repaint makes sense only when the node is on
-    // screen. Requests and releases no image.
+    // (id, frame, on screen): an animated image that this node uses shows another frame; a repaint makes
+    // sense only when the node is on screen. Requests and releases no image.
     virtual void OnImageFrame(uint32_t, uint32_t, bool) {}
     // Layout is idle: what the node's display element draws becomes what the node's images are.
     virtual void CommitImages() {}

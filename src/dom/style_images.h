@@ -21,8 +21,8 @@ class StyleImages {
 
     static bool AreNamedBy(const css::VisualStyle& style);
 
-    // Asks for what the style names anew and lets go of what it no longer names; an image that stays in use is
-    // not asked for again.
+    // Asks for what the style names anew and lets go of what it no longer names; an image that stays in use
+    // is not asked for again.
     void Take(Element& element);
     // A `slot` of -1 stands for the whole group.
     void Release(Group group, int slot);

@@ -4,7 +4,8 @@
 //
 // Threads: nodes register, unregister and are told on the main thread; answers come on any thread; decoding
 // runs on resource threads; uploads on the render thread. A node is held weakly and told by a task of its
-// view. Lock order: `mutex_`, then those of ImageUploads. Neither a node nor the client is called with a lock held.
+// view. Lock order: `mutex_`, then those of ImageUploads. Neither a node nor the client is called with a lock
+// held.
 #pragma once
 
 #include <qorvex/cache_stats.h>

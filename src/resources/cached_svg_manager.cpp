@@ -58,10 +58,11 @@ void CachedSVGManager::StartLoad(uint32_t id, const URL& url, dom::Document& doc
                 entry->answered = true;
             }
         }
-        self->family_.Push(TaskChannels::Resources,
-                           MakeTask("BuildSVGTask", [self, id, held = ResourceJobPtr(&job)](TaskFamilyHandle) {
-                               self->Build(id, held->Succeeded() ? held->GetData() : std::span<const uint8_t>());
-                           }));
+        self->family_.Push(
+            TaskChannels::Resources,
+            MakeTask("BuildSVGTask", [self, id, held = ResourceJobPtr(&job)](TaskFamilyHandle) {
+                self->Build(id, held->Succeeded() ? held->GetData() : std::span<const uint8_t>());
+            }));
     };
     uint32_t request = 0;
     TaskPtr task = GetLoaderOf(document).Load(DescribeGet(url), std::move(on_finished), {}, false, &request);
@@ -88,13 +89,12 @@ void CachedSVGManager::Finish(uint32_t id, SVGImagePtr svg) {
     entry->state = svg ? State::Loaded : State::Failed;
     for (const auto& [key, holder] : entry->holders.GetAll()) {
         RefPtr<CachedSVGManager> self(this);
-        holder.family.Push(
-            TaskChannels::Main,
-            MakeTask("UpdateCachedSVGState",
-                     [self, node = holder.node, serial = holder.serial, id, svg](TaskFamilyHandle) {
-                         dom::Node* alive = node.get();
-                         if (alive && self->IsHolder(id, *alive, serial)) alive->OnSVGLoaded(id, svg);
-                     }));
+        holder.family.Push(TaskChannels::Main,
+                           MakeTask("UpdateCachedSVGState", [self, node = holder.node, serial = holder.serial,
+                                                             id, svg](TaskFamilyHandle) {
+                               dom::Node* alive = node.get();
+                               if (alive && self->IsHolder(id, *alive, serial)) alive->OnSVGLoaded(id, svg);
+                           }));
     }
 }
 

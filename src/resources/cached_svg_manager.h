@@ -1,6 +1,6 @@
-// The twin of CachedImagesManager for vector images: one parsed SVG for all nodes of a system that show it. An
-// orphan is only kept in memory; there is nothing to upload and nothing to lose with the rendering resources
-// but what nodes made of it.
+// The twin of CachedImagesManager for vector images: one parsed SVG for all nodes of a system that show it.
+// An orphan is only kept in memory; there is nothing to upload and nothing to lose with the rendering
+// resources but what nodes made of it.
 //
 // In this build no SVG can be parsed: every load fails, and the first one says so in the log.
 //

@@ -18,12 +18,13 @@ DecodedImage DecodedImage::Decode(std::span<const uint8_t> file) {
         if (!frame.pixels) break;
         image.frames_.push_back({frame.pixels, delay});
         const uint32_t opaque = index == 0 ? fresco::kImageOpaque : image.description_.flags;
-        image.description_ = {info.width, info.height, info.format, info.flags & opaque, frame.rowPitch, nullptr};
+        image.description_ = {info.width,          info.height,    info.format,
+                              info.flags & opaque, frame.rowPitch, nullptr};
         bytes += frame.size;
         // All frames together may be what one still image may be.
         if (bytes > fresco::kMaxImageBytes) {
-            LogWarning("Refusing an animated image of more than ", fresco::kMaxImageBytes, " bytes in its ", count,
-                       " frames");
+            LogWarning("Refusing an animated image of more than ", fresco::kMaxImageBytes, " bytes in its ",
+                       count, " frames");
             return {};
         }
     }

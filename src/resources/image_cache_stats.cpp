@@ -7,7 +7,8 @@
 
 namespace qorvex {
 
-void SystemCacheStatsImpl::Images::Add(std::string_view url, uint32_t width, uint32_t height, uint32_t holders) {
+void SystemCacheStatsImpl::Images::Add(std::string_view url, uint32_t width, uint32_t height,
+                                       uint32_t holders) {
     urls.emplace_back(url);
     entries.push_back({nullptr, width, height, holders});
     bytes += static_cast<uint64_t>(width) * height * 4;
@@ -29,8 +30,8 @@ void SystemCacheStatsImpl::AddOrphan(std::string_view url, uint32_t width, uint3
 void SystemCacheStatsImpl::Finish() {
     live_.Finish();
     orphaned_.Finish();
-    data_ = {live_.entries.size(),   orphaned_.entries.size(), live_.bytes,
-             orphaned_.bytes,        live_.entries.data(),     orphaned_.entries.data()};
+    data_ = {live_.entries.size(), orphaned_.entries.size(), live_.bytes,
+             orphaned_.bytes,      live_.entries.data(),     orphaned_.entries.data()};
 }
 
 void ImagesListImpl::Add(std::string_view url) {

@@ -19,7 +19,6 @@ class SystemCacheStatsImpl final : public SystemCacheStats {
     void Finish();
 
   private:
-
     struct Images {
         Vector<SystemCacheImageStats> entries;
         Vector<String> urls;

@@ -51,7 +51,8 @@ void CachedImagesManager::StartLoad(uint32_t id, const URL& url, DocumentLoader&
     uint32_t request = 0;
     RefPtr<CachedImagesManager> self(this);
     TaskPtr task = loader.Load(
-        DescribeGet(url), [self, id](ResourceRequestJob& job) { self->OnResponse(id, job); }, {}, true, &request);
+        DescribeGet(url), [self, id](ResourceRequestJob& job) { self->OnResponse(id, job); }, {}, true,
+        &request);
     {
         qsl::MutexLock lock(mutex_);
         // The answer may have come already.
@@ -179,8 +180,8 @@ void CachedImagesManager::ReloadAll() {
         for (const auto& [id, orphan] : orphans_.GetAll())
             image_ids_by_url_.erase(MakeUrlKey(orphan.url));
         orphans_.Clear();
-        // Entries keep their ids, so that nodes need not learn new ones, and what is on its way goes on: it has
-        // nothing to lose yet.
+        // Entries keep their ids, so that nodes need not learn new ones, and what is on its way goes on: it
+        // has nothing to lose yet.
         for (auto& [id, image] : images_) {
             if (image.state < ImageState::Decoded) continue;
             for (const auto& [node, holder] : image.holders.GetAll()) {
@@ -207,10 +208,11 @@ void CachedImagesManager::UpdateCachedImageState(uint32_t id, dom::ImageInfoPtr 
     const bool outdated = image && state == ImageState::OnGPU && image->info != info;
     if (!image || outdated) {
         if (state != ImageState::OnGPU) return;
-        LogTrace(IMAGE_LOG "Image ", id,
-                 " has just been uploaded to the GPU, but it is no longer alive. Scheduling to be freed with GPU "
-                 "resource id ",
-                 info->FirstResource());
+        LogTrace(
+            IMAGE_LOG "Image ", id,
+            " has just been uploaded to the GPU, but it is no longer alive. Scheduling to be freed with GPU "
+            "resource id ",
+            info->FirstResource());
         uploads_.Free(*info);
         return;
     }
@@ -221,13 +223,13 @@ void CachedImagesManager::UpdateCachedImageState(uint32_t id, dom::ImageInfoPtr 
                  " now on GPU with resource id ", info->FirstResource());
     for (const auto& [key, holder] : image->holders.GetAll()) {
         RefPtr<CachedImagesManager> self(this);
-        holder.family.Push(
-            TaskChannels::Main,
-            MakeTask("UpdateCachedImageState",
-                     [self, node = holder.node, serial = holder.serial, id, info, state](TaskFamilyHandle) {
-                         dom::Node* alive = node.get();
-                         if (alive && self->IsHolder(id, *alive, serial)) alive->OnImageLoaded(id, info, state);
-                     }));
+        holder.family.Push(TaskChannels::Main, MakeTask("UpdateCachedImageState",
+                                                        [self, node = holder.node, serial = holder.serial, id,
+                                                         info, state](TaskFamilyHandle) {
+                                                            dom::Node* alive = node.get();
+                                                            if (alive && self->IsHolder(id, *alive, serial))
+                                                                alive->OnImageLoaded(id, info, state);
+                                                        }));
     }
 }
 

@@ -65,7 +65,8 @@ ImageUploads::Uploaded ImageUploads::Process(fresco::IScene& scene) {
     Uploaded uploaded;
     for (const PendingImageUpload& upload : submitted.uploads) {
         RecordUpload(*submitted.buffer, upload);
-        if (upload.image_id != PendingImageUpload::kNoImageId) uploaded.push_back({upload.image_id, upload.info});
+        if (upload.image_id != PendingImageUpload::kNoImageId)
+            uploaded.push_back({upload.image_id, upload.info});
     }
     {
         qsl::MutexLock lock(upload_mutex_);

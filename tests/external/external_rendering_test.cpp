@@ -45,7 +45,9 @@ class ClientLibrary final : public fresco::IRenderingLibrary {
         return scene = inner_.CreateScene(params);
     }
     void SetPaintHelpers(fresco::IPaintHelpers* helpers) override { inner_.SetPaintHelpers(helpers); }
-    void RetireImages(const fresco::ImageId* ids, uint32_t count) override { inner_.RetireImages(ids, count); }
+    void RetireImages(const fresco::ImageId* ids, uint32_t count) override {
+        inner_.RetireImages(ids, count);
+    }
     void Forward(uint64_t first, uint64_t second, uint64_t third) override {
         forwarded = first * 100 + second * 10 + third;
     }

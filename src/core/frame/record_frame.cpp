@@ -22,8 +22,8 @@ double PaintedArea(const dsp::FrameRecord& record) {
     return area;
 }
 
-void ExecutePaint(HeldRecord& held, CachedImagesManager& images, fresco::IScene& scene, FrameStatsRecorder& stats,
-                  uint32_t frame_id) {
+void ExecutePaint(HeldRecord& held, CachedImagesManager& images, fresco::IScene& scene,
+                  FrameStatsRecorder& stats, uint32_t frame_id) {
     StageTimer timer(stats, frame_id, &FrameStats::Paint);
     dsp::FrameRecord& record = held.record;
     if (record.Empty()) {
@@ -45,28 +45,28 @@ void ExecutePaint(HeldRecord& held, CachedImagesManager& images, fresco::IScene&
 }
 
 TaskPtr MakeCaptureTask(const FrameData& frame, const SharedRecord& held) {
-    return MakeTask("CaptureFrame", [held, images = frame.images, scene = frame.scene,
-                                     callback = frame.capture_callback,
-                                     user_data = frame.capture_user_data](TaskFamilyHandle family) {
-        // The record's own resource buffers come first, so that the capture starts from what the frame starts
-        // from.
-        Vector<fresco::CommandBuffer*, MemoryTag::Rendering> buffers;
-        for (auto* buffer : held->record.resourceBuffers)
-            buffers.push_back(buffer);
-        for (auto* buffer : held->record.buffers)
-            buffers.push_back(buffer);
-        // A capture holds the images that its frame draws.
-        images->ProcessUploads(*scene);
-        const fresco::CaptureData data =
-            scene->SerializeBuffers(buffers.data(), static_cast<uint32_t>(buffers.size()));
-        if (!data.data) return;
-        auto capture = MakeRef<FrameCaptureImpl>(data.data, data.size);
-        scene->FreeCapture(data);
-        family.Push(TaskChannels::Main,
-                    MakeTask("CaptureFrameCallback", [capture, callback, user_data](TaskFamilyHandle) {
-                        callback(user_data, *capture);
-                    }));
-    });
+    return MakeTask(
+        "CaptureFrame", [held, images = frame.images, scene = frame.scene, callback = frame.capture_callback,
+                         user_data = frame.capture_user_data](TaskFamilyHandle family) {
+            // The record's own resource buffers come first, so that the capture starts from what the frame
+            // starts from.
+            Vector<fresco::CommandBuffer*, MemoryTag::Rendering> buffers;
+            for (auto* buffer : held->record.resourceBuffers)
+                buffers.push_back(buffer);
+            for (auto* buffer : held->record.buffers)
+                buffers.push_back(buffer);
+            // A capture holds the images that its frame draws.
+            images->ProcessUploads(*scene);
+            const fresco::CaptureData data =
+                scene->SerializeBuffers(buffers.data(), static_cast<uint32_t>(buffers.size()));
+            if (!data.data) return;
+            auto capture = MakeRef<FrameCaptureImpl>(data.data, data.size);
+            scene->FreeCapture(data);
+            family.Push(TaskChannels::Main,
+                        MakeTask("CaptureFrameCallback", [capture, callback, user_data](TaskFamilyHandle) {
+                            callback(user_data, *capture);
+                        }));
+        });
 }
 
 }  // namespace

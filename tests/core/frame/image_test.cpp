@@ -9,8 +9,8 @@
 #include <set>
 
 #include "core/frame/client.h"
-#include "support/image_files.h"
 #include "host/unruly_resource_handler.h"
+#include "support/image_files.h"
 
 namespace qorvex {
 namespace {
@@ -65,12 +65,15 @@ class ImageTest : public testing::Test {
 };
 
 TEST_F(ImageTest, StyleImagesAreAskedForOnceAndPainted) {
-    Load("#a { background: url(red.png) no-repeat 2px 3px; }"
-         "#b { left: 30px; background-image: url(red.png), url(green.png); background-repeat: no-repeat, repeat; }"
-         "#c { top: 24px; border: 4px solid black; border-image: url(blue.png) 1 fill; }"
-         "#d { left: 30px; top: 24px; background-color: red; mask-image: url(red.png); mask-repeat: no-repeat; }"
-         "#e { display: none; background-image: url(hidden.png); }",
-         "<div id=a></div><div id=b></div><div id=c></div><div id=d></div><div id=e></div>");
+    Load(
+        "#a { background: url(red.png) no-repeat 2px 3px; }"
+        "#b { left: 30px; background-image: url(red.png), url(green.png); background-repeat: no-repeat, "
+        "repeat; }"
+        "#c { top: 24px; border: 4px solid black; border-image: url(blue.png) 1 fill; }"
+        "#d { left: 30px; top: 24px; background-color: red; mask-image: url(red.png); mask-repeat: "
+        "no-repeat; }"
+        "#e { display: none; background-image: url(hidden.png); }",
+        "<div id=a></div><div id=b></div><div id=c></div><div id=d></div><div id=e></div>");
     EXPECT_EQ(Pixel(1, 2), kSeenWhite);
     EXPECT_EQ(Pixel(2, 3), kSeenRed);
     EXPECT_EQ(Pixel(11, 12), kSeenRed);
@@ -97,9 +100,10 @@ TEST_F(ImageTest, StyleImagesAreAskedForOnceAndPainted) {
 }
 
 TEST_F(ImageTest, TheListNamesWhatThePageShows) {
-    Load("#a { background-image: url(red.png); } #b { display: none; background-image: url(green.png); }"
-         ".unused { background-image: url(blue.png); }",
-         "<div id=a></div><div id=b></div>");
+    Load(
+        "#a { background-image: url(red.png); } #b { display: none; background-image: url(green.png); }"
+        ".unused { background-image: url(blue.png); }",
+        "<div id=a></div><div id=b></div>");
     const auto list = [&](unsigned flags) {
         ImagesList* images = client_->view->GetImagesList(flags);
         std::set<std::string> urls;
@@ -136,7 +140,8 @@ TEST_F(ImageTest, BadAnswersFailAndThePageGoesOn) {
     std::string body;
     int top = 0;
     for (const char* file : {"cut.png", "huge.png", "noise.png", "empty.png", "missing.png"})
-        body += "<div style='top:" + std::to_string(top++) + "px; background-image: url(" + file + ")'></div>";
+        body +=
+            "<div style='top:" + std::to_string(top++) + "px; background-image: url(" + file + ")'></div>";
     body += "<div style='left: 30px; background: green; mask-image: url(missing.png)'></div>";
     client_->Load(Page("", body));
     EXPECT_EQ(log().Count("CachedImagesManager: Decode error for image "), 3u);
@@ -263,7 +268,8 @@ TEST_F(ImageTest, ARequestThatAnotherViewWaitsForGoesOn) {
     ViewSettings settings;
     settings.Width = settings.Height = 32;
     View* other = client_->system->CreateView(settings);
-    client_->files.Put("coui://page/other.html", Page("", "<div style='background-image: url(red.png)'></div>"));
+    client_->files.Put("coui://page/other.html",
+                       Page("", "<div style='background-image: url(red.png)'></div>"));
     other->LoadURL("coui://page/other.html");
     for (int i = 0; i < 4; ++i) {
         other->Advance(client_->time);
@@ -302,7 +308,8 @@ TEST_F(ImageTest, AnimationsFollowTheClockAndCostNothingOutOfSight) {
     EXPECT_NEAR(find(kSeenBlue), 20, 2);
     EXPECT_NEAR(find(kSeenGreen), 300, 2);
 
-    auto* stats_of_frames = static_cast<IFrameStats*>(client_->library->GetFeatureInterface(kFrameStatsFeature));
+    auto* stats_of_frames =
+        static_cast<IFrameStats*>(client_->library->GetFeatureInterface(kFrameStatsFeature));
     stats_of_frames->SetEnabled(client_->view, true);
     const auto painted = [&] {
         uint64_t pixels = 0;
@@ -316,7 +323,9 @@ TEST_F(ImageTest, AnimationsFollowTheClockAndCostNothingOutOfSight) {
     };
     EXPECT_GT(painted(), 0u);
     for (const char* style : {"left = '200px'", "display = 'none'", "visibility = 'hidden'"}) {
-        Run(std::string("document.getElementById('a').style.cssText = ''; document.getElementById('a').style.") + style);
+        Run(std::string(
+                "document.getElementById('a').style.cssText = ''; document.getElementById('a').style.") +
+            style);
         Frames(4);
         EXPECT_EQ(painted(), 0u) << style;
     }
@@ -341,7 +350,8 @@ class UserImages final : public IAsyncResourceHandler {
             pixels_[i] = i % 8 < 4 && i / 8 < 4 ? color : 0xFF000000;
     }
     void OnResourceRequest(const IAsyncResourceRequest* request, IAsyncResourceResponse* response) override {
-        if (!std::string_view(request->GetURL()).ends_with("own")) return files_.OnResourceRequest(request, response);
+        if (!std::string_view(request->GetURL()).ends_with("own"))
+            return files_.OnResourceRequest(request, response);
         response->RecieveUserImage(data_);
         response->Finish(IAsyncResourceResponse::Status::Success);
     }
@@ -371,8 +381,8 @@ TEST_F(ImageTest, ClientsOwnImagesShowTheirContents) {
     client_->system->UserImagesChanged(ids, 3);
     Frames(1);
     EXPECT_EQ(Pixel(5, 5), kSeenBlue);
-    EXPECT_TRUE(log().Contains(
-        "Trying to update image with ID - 0 (index in provided list 0 out of 3). Skipped."));
+    EXPECT_TRUE(
+        log().Contains("Trying to update image with ID - 0 (index in provided list 0 out of 3). Skipped."));
     EXPECT_TRUE(log().Contains("Trying to update image with ID 8. Skipped."));
     Run("document.getElementById('a').remove()");
     Frames(1);
@@ -427,7 +437,8 @@ TEST_P(UnrulyImages, EndRight) {
         Run("{ const d = document.createElement('div'); d.style.backgroundImage = 'url(" + file +
             ")'; document.body.appendChild(d);"
             "  const all = document.body.children; if (all.length > 6) all[2].remove();"
-            "  all[all.length - 2].style.maskImage = 'url(" + file + ")'; }");
+            "  all[all.length - 2].style.maskImage = 'url(" +
+            file + ")'; }");
         client_->Frame();
         if (step == 60) client_->renderer->FreeRenderingResources();
     }
