@@ -271,10 +271,9 @@ TEST_F(ImageTest, ARequestThatAnotherViewWaitsForGoesOn) {
     client_->files.Put("coui://page/other.html",
                        Page("", "<div style='background-image: url(red.png)'></div>"));
     other->LoadURL("coui://page/other.html");
-    for (int i = 0; i < 4; ++i) {
+    for (int i = 0; i < 6; ++i) {
         other->Advance(client_->time);
         client_->ServeResources();
-        if (i == 2) client_->files.SetDeferred(true);
     }
     client_->files.SetDeferred(true);
     Run("document.getElementById('a').style.backgroundImage = 'url(green.png)';");
