@@ -1,6 +1,7 @@
 // Images from the handler to the screen: one request for all who show one, every bad answer, every moment at
 // which the last user can go, orphans, animations, the client's own images, lost rendering resources.
 #include <gtest/gtest.h>
+#include <qorvex/debug_interface.h>
 #include <qorvex/frame_stats.h>
 #include <qorvex/images_list.h>
 
@@ -430,7 +431,14 @@ TEST_P(UnrulyImages, EndRight) {
     for (int i = 0; i < 12; ++i)
         client_->files.Put("coui://page/" + std::to_string(i) + ".png",
                            Png(Plain(8 + static_cast<uint32_t>(i), 8, kBlue)));
-    client_->Load(Page("", "<div id=a></div><div id=b style='left: 30px'></div>"));
+    client_->files.Put("coui://page/index.html", Page("", "<div id=a></div><div id=b></div>"));
+    client_->view->LoadURL("coui://page/index.html");
+    auto* debug = static_cast<IDebugInterface*>(client_->library->GetFeatureInterface(kDebugFeature));
+    for (int i = 0; i < 2000 && !debug->IsLoaded(client_->view); ++i) {
+        client_->Frame();
+        std::this_thread::yield();
+    }
+    ASSERT_TRUE(debug->IsLoaded(client_->view));
     for (int step = 0; step < 120; ++step) {
         const std::string file = std::to_string(step * 7 % 12) + ".png";
         Run("{ const d = document.createElement('div'); d.style.backgroundImage = 'url(" + file +
