@@ -6,6 +6,8 @@
 #include <cstring>
 #include <string_view>
 
+#include "tests/support/image_files.h"
+
 namespace stress {
 namespace {
 
@@ -49,7 +51,9 @@ constexpr File kFiles[] = {
      "try { location.href = 'coui://stress/rich.html'; } catch (e) {} }, 40)</script></body></html>"},
     {"coui://stress/a.css",
      "@font-face{font-family:Web;src:url(coui://stress/web.ttf)}body{margin:0;background-color:#fff}"
-     ".b0{background-color:red;height:10px}.b1{width:50%;opacity:.5}.b2{transform:translate(4px,4px) "
+     ".b0{background:url(a.png),url(b.gif);height:10px}.b1{width:50%;opacity:.5;background-image:url(b.gif)}."
+     "b2{"
+     "border:3px solid;border-image:url(a.png) 3;mask-image:url(c.png)}.b2{transform:translate(4px,4px) "
      "rotate(5deg)}#app{position:absolute;padding:4px;font-family:Web,sans-serif;font-size:12px}"},
     {"coui://stress/b.css",
      ".card{display:flex;flex-direction:row;border:1px solid #000;border-radius:4px}.shadow{box-shadow:2px "
@@ -62,6 +66,16 @@ constexpr File kFiles[] = {
      "document.body.appendChild(s); }"},
     {"coui://stress/c.js", "null.missing();"},
 };
+
+// Pictures by their letter; any other is missing.
+std::string MakePicture(std::string_view url) {
+    constexpr std::string_view kAt = "coui://stress/";
+    if (!url.starts_with(kAt)) return {};
+    url.remove_prefix(kAt.size());
+    if (url == "a.png" || url == "c.png") return qorvex::test::Png(qorvex::test::Plain(12, 8, 0x80402010));
+    if (url == "b.gif") return qorvex::test::Gif(6, 6, {1, 3, 5});
+    return {};
+}
 
 const File* Find(std::string_view url) {
     const File* found =
@@ -125,13 +139,16 @@ const char* const kScripts[12] = {
 };
 
 void Site::OnResourceRequest(const qorvex::IAsyncResourceRequest* request, IAsyncResourceResponse* response) {
-    const File* file = Find(request->GetAbsoluteURL());
-    if (!file) {
+    const std::string_view url = request->GetAbsoluteURL();
+    const File* file = Find(url);
+    const std::string picture = file ? std::string() : MakePicture(url);
+    if (!file && picture.empty()) {
         response->SetStatus(404);
         response->Finish(IAsyncResourceResponse::Status::Failure);
         return;
     }
-    std::memcpy(response->GetSpace(file->text.size()), file->text.data(), file->text.size());
+    const std::string_view bytes = file ? file->text : std::string_view(picture);
+    std::memcpy(response->GetSpace(bytes.size()), bytes.data(), bytes.size());
     response->SetHeader("Content-Type", "text/plain");
     response->SetStatus(200);
     response->Finish(IAsyncResourceResponse::Status::Success);
