@@ -5,10 +5,10 @@
 // lock for them; FT_Face is not safe to share and is touched under `mutex_` alone, when a shape is asked for
 // the first time.
 #pragma once
-#include <array>
 #include <mutex>
 
 #include "fresco/fonts/font_face.h"
+#include "fresco/fonts/glyph_table.h"
 #include "fresco/fonts/shape_cache.h"
 
 struct FT_FaceRec_;
@@ -41,8 +41,6 @@ class ScalableFace final : public FontFace {
     const DistanceField* GetDistanceField(uint32_t glyph) const override;
 
   private:
-    // Code points below this are looked up in a table: Latin and what it borders on.
-    static constexpr uint32_t kTabledCodes = 0x300;
     static constexpr uint32_t kUnknownAdvance = 0xFFFF;
 
     template <class T>
@@ -60,9 +58,9 @@ class ScalableFace final : public FontFace {
     FT_FaceRec_* face_ = nullptr;
     hb_face_t* hbFace_ = nullptr;
     hb_font_t* hbFont_ = nullptr;
-    bool hasLayers_ = false;   // COLR
-    FontMetrics unitMetrics_;  // in font units
-    std::array<uint16_t, kTabledCodes> tabled_{};
+    bool hasLayers_ = false;  // COLR version 0
+    FontMetrics unitMetrics_;        // in font units
+    GlyphTable glyphs_;
     // In font units, filled as they are asked for: a font of all Chinese characters has 65,535.
     mutable Vector<std::atomic<uint16_t>> advances_;
     mutable ShapeCache shapes_;
