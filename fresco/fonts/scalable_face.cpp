@@ -45,6 +45,7 @@ int WeightCode(uint32_t flags) {
 }  // namespace
 
 ScalableFace::~ScalableFace() {
+    if (colr_) hb_blob_destroy(colr_);
     if (hbFont_) hb_font_destroy(hbFont_);
     if (hbFace_) hb_face_destroy(hbFace_);
     if (face_) FT_Done_Face(face_);
@@ -66,7 +67,8 @@ bool ScalableFace::Load(FT_LibraryRec_* library, std::shared_ptr<FontData> data,
     id_ = id;
     if (!MakeShaper()) return false;
     hasLayers_ = hb_ot_color_has_layers(hbFace_) != 0 && FT_IS_SCALABLE(face_);
-    hasColor_ = (FT_HAS_COLOR(face_) && face_->num_fixed_sizes > 0) || hasLayers_;
+    if (FT_IS_SCALABLE(face_)) ReadColorGraphs();
+    hasColor_ = (FT_HAS_COLOR(face_) && face_->num_fixed_sizes > 0) || hasLayers_ || graphs_.HasGraphs();
     ReadNames();
     ReadMetrics();
     return true;
@@ -97,6 +99,13 @@ bool ScalableFace::MakeShaper() {
     for (std::atomic<uint16_t>& advance : advances_)
         advance.store(kUnknownAdvance, std::memory_order_relaxed);
     return true;
+}
+
+void ScalableFace::ReadColorGraphs() {
+    colr_ = hb_face_reference_table(hbFace_, HB_TAG('C', 'O', 'L', 'R'));
+    unsigned size = 0;
+    const char* data = hb_blob_get_data(colr_, &size);
+    graphs_ = ColorTable(data, size);
 }
 
 void ScalableFace::ReadNames() {

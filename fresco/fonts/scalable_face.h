@@ -7,12 +7,14 @@
 #pragma once
 #include <mutex>
 
+#include "fresco/fonts/color_table.h"
 #include "fresco/fonts/font_face.h"
 #include "fresco/fonts/glyph_table.h"
 #include "fresco/fonts/shape_cache.h"
 
 struct FT_FaceRec_;
 struct FT_LibraryRec_;
+struct hb_blob_t;
 struct hb_face_t;
 
 namespace fresco {
@@ -47,11 +49,11 @@ class ScalableFace final : public FontFace {
     using ShapeMap = HashMap<uint32_t, std::unique_ptr<T, HeapDeleter<T>>>;
 
     bool MakeShaper();
+    void ReadColorGraphs();
     void ReadNames();
     void ReadMetrics();
     uint32_t StyleOfInstance(uint32_t instance) const;
     uint32_t Advance(uint32_t glyph) const;
-    void LoadOutline(uint32_t glyph, GlyphOutline& out) const;
     void LoadPicture(uint32_t glyph, ColorGlyph& out) const;
     void LoadDistances(uint32_t glyph, DistanceField& out) const;
 
@@ -59,6 +61,8 @@ class ScalableFace final : public FontFace {
     hb_face_t* hbFace_ = nullptr;
     hb_font_t* hbFont_ = nullptr;
     bool hasLayers_ = false;  // COLR version 0
+    hb_blob_t* colr_ = nullptr;
+    ColorTable graphs_{nullptr, 0};  // COLR version 1
     FontMetrics unitMetrics_;        // in font units
     GlyphTable glyphs_;
     // In font units, filled as they are asked for: a font of all Chinese characters has 65,535.
