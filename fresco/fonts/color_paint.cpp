@@ -8,7 +8,6 @@
 #include <cmath>
 
 #include <fresco/paint.h>
-#include "fresco/core/log.h"
 #include "fresco/cpu/blend_modes.h"
 #include "fresco/cpu/outline.h"
 #include "fresco/fonts/color_gradient.h"
@@ -28,7 +27,7 @@ constexpr int kMaxDepth = 32;
 // Composites that are open at once; each holds two pictures.
 constexpr int kMaxComposites = 8;
 // In pixels that are written. Emoji of a hundred layers stay below a tenth of it.
-constexpr int64_t kMaxWork = int64_t(1) << 26;
+constexpr int64_t kMaxWork = int64_t(1) << 25;
 constexpr int64_t kWorkOfPaint = 256;
 constexpr int64_t kWorkOfPoint = 16;
 constexpr int64_t kWorkOfGradientPixel = 8;
@@ -376,26 +375,22 @@ class GraphPainter {
 
 }  // namespace
 
-bool PaintColorGraph(const ColorTable& table, FT_FaceRec_* face, hb_face_t* colors, uint32_t glyph,
-                     uint32_t pixelsPerEm, ColorGlyph& out) {
-    if (face->units_per_EM == 0 || table.FindGlyph(glyph) == 0) return false;
+GraphResult PaintColorGraph(const ColorTable& table, FT_FaceRec_* face, hb_face_t* colors, uint32_t glyph,
+                            uint32_t pixelsPerEm, ColorGlyph& out) {
+    if (face->units_per_EM == 0 || table.FindGlyph(glyph) == 0) return GraphResult::Nothing;
     const double size = pixelsPerEm;
     GraphPainter painter(table, face, colors, size / face->units_per_EM);
     const int reach = int(pixelsPerEm) * kReach;
     const IRect bounds = painter.Measure(glyph, {-reach, -reach, reach, reach});
-    if (bounds.IsEmpty()) return false;
+    if (bounds.IsEmpty()) return painter.IsExhausted() ? GraphResult::TooMuch : GraphResult::Nothing;
     Vector<uint32_t> pixels;
     painter.Draw(glyph, bounds, pixels);
-    if (painter.IsExhausted()) {
-        FRESCO_WARN("The colours of glyph %u of the font %s are too much to paint: it shows as an outline",
-                    glyph, face->family_name ? face->family_name : "");
-        return false;
-    }
+    if (painter.IsExhausted()) return GraphResult::TooMuch;
     out.pixels = std::move(pixels);
     out.width = uint32_t(bounds.Width()), out.height = uint32_t(bounds.Height());
     out.left = float(bounds.x0 / size), out.top = float(bounds.y0 / size);
     out.emWidth = float(bounds.Width() / size), out.emHeight = float(bounds.Height() / size);
-    return true;
+    return GraphResult::Painted;
 }
 
 }  // namespace fresco

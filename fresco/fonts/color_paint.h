@@ -10,9 +10,15 @@ namespace fresco {
 
 class ColorTable;
 
-// False, with `out` untouched, when the glyph has no such graph, paints nothing, or costs more than any
-// honest one. Outlines come from one face, the palette from the other. Under the lock of the face.
-bool PaintColorGraph(const ColorTable& table, FT_FaceRec_* face, hb_face_t* colors, uint32_t glyph,
-                     uint32_t pixelsPerEm, ColorGlyph& out);
+enum class GraphResult {
+    Painted,
+    Nothing,  // no graph, or one that paints nothing
+    TooMuch,  // it costs more than any honest one
+};
+
+// `out` is filled when the glyph was painted. Outlines come from one face, the palette from the other. Under
+// the lock of the face.
+GraphResult PaintColorGraph(const ColorTable& table, FT_FaceRec_* face, hb_face_t* colors, uint32_t glyph,
+                            uint32_t pixelsPerEm, ColorGlyph& out);
 
 }  // namespace fresco

@@ -6,6 +6,7 @@
 
 #include <algorithm>
 
+#include "fresco/core/log.h"
 #include "fresco/fonts/color_paint.h"
 #include "fresco/fonts/glyph_outline.h"
 #include "fresco/fonts/scalable_face.h"
@@ -96,8 +97,20 @@ const DistanceField* ScalableFace::GetDistanceField(uint32_t glyph) const {
     return found.values.empty() ? nullptr : &found;
 }
 
+bool ScalableFace::LoadGraph(uint32_t glyph, ColorGlyph& out) const {
+    if (graphsRefused_) return false;
+    const GraphResult result = PaintColorGraph(graphs_, face_, hbFace_, glyph, kPictureSize, out);
+    if (result == GraphResult::TooMuch) {
+        // A font that tries once may do so with each of its glyphs.
+        graphsRefused_ = true;
+        FRESCO_WARN("A colour glyph of the font %s is too much to paint: its glyphs show as outlines",
+                    family_.c_str());
+    }
+    return result == GraphResult::Painted;
+}
+
 void ScalableFace::LoadPicture(uint32_t glyph, ColorGlyph& out) const {
-    if (graphs_.HasGraphs() && PaintColorGraph(graphs_, face_, hbFace_, glyph, kPictureSize, out)) return;
+    if (graphs_.HasGraphs() && LoadGraph(glyph, out)) return;
     FT_Int32 flags = FT_LOAD_COLOR;
     if (hasLayers_) {
         // FreeType draws the layers one over the other.

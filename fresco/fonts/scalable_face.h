@@ -54,6 +54,7 @@ class ScalableFace final : public FontFace {
     void ReadMetrics();
     uint32_t StyleOfInstance(uint32_t instance) const;
     uint32_t Advance(uint32_t glyph) const;
+    bool LoadGraph(uint32_t glyph, ColorGlyph& out) const;
     void LoadPicture(uint32_t glyph, ColorGlyph& out) const;
     void LoadDistances(uint32_t glyph, DistanceField& out) const;
 
@@ -70,6 +71,7 @@ class ScalableFace final : public FontFace {
     mutable ShapeCache shapes_;
 
     mutable std::mutex mutex_;
+    mutable bool graphsRefused_ = false;
     mutable ShapeMap<GlyphOutline> outlines_;
     mutable ShapeMap<ColorGlyph> pictures_;
     mutable ShapeMap<DistanceField> fields_;

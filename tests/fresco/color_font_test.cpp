@@ -219,6 +219,7 @@ TEST_F(ColorFont, NoGraphCostsMoreThanItsShare) {
     const std::vector<Bytes> bomb(16, Layers(16, 0));
     Show(Font(Layers(16, 0), bomb));
     EXPECT_GT(At(700, 560).g, 100);
+    EXPECT_NE(canvas.log.lines.back().find("too much to paint"), std::string::npos);
     // Deep, and nothing but composites.
     Bytes deep = Glyph(box, Solid(kRed));
     for (int i = 0; i < 10; ++i)
