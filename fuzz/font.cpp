@@ -1,14 +1,15 @@
-// Font files through the text path of the rendering library: open, measure, shape, draw plain and as a
-// distance field.
+// Font files through the whole text path: opened, measured, shaped and drawn by the rendering library alone,
+// then as the @font-face of a page whose texts are laid out, recorded and painted.
 #include <algorithm>
 #include <cmath>
 #include <cstring>
 
 #include <fresco/library.h>
-#include <fresco/stream_reader.h>
 
 #include "support/engine.h"
+#include "support/memory_file.h"
 #include "support/scene.h"
+#include "support/text_page.h"
 
 namespace qorvex::fuzz {
 namespace {
@@ -20,20 +21,21 @@ constexpr uint32_t kText[] = {'A',   'V',   'f',   'i',   0x301,  ' ',     0x5D0
 constexpr const char* kUtf8 = "AVfi e\u0301 \u0644\u0627 \u4E00 \U0001F600";
 constexpr uint32_t kMostFaces = 3;
 
-class FileInMemory final : public IStreamReader {
-  public:
-    FileInMemory(const uint8_t* data, size_t size) : data_(data), size_(size) {}
-    size_t GetSize() override { return size_; }
-    size_t Read(size_t offset, void* destination, size_t size) override {
-        size = offset < size_ ? std::min(size, size_ - offset) : 0;
-        if (size) std::memcpy(destination, data_ + offset, size);
-        return size;
-    }
-    void Close() override {}
-
-  private:
-    const uint8_t* data_;
-    size_t size_;
+struct Specimen {
+    const char* text;
+    const char* style;
+};
+// Several scripts, and each way to break, cut, align and fit lines.
+constexpr Specimen kSpecimens[] = {
+    {"AVfi 12 office, words that wrap", "text-align: justify; text-shadow: 1px 1px 2px red"},
+    {"\u0633\u0644\u0627\u0645 12 \u05E9\u05DC\u05D5\u05DD AV", "overflow-wrap: break-word"},
+    {"\u0915\u094D\u0937\u093F \u0E01\u0E33\u0E25\u0E31\u0E07", "text-align: center"},
+    {"\u6F22\u5B57\u304B\u306A \uD55C\uAD6D", "overflow-wrap: anywhere"},
+    {"\U0001F469\u200D\U0001F4BB\U0001F1E9\U0001F1EA\U0001F44D\U0001F3FD",
+     "font-size: 40px; qor-font-sdf: on"},
+    {"\u0301e\u0301\u0302 \u202E\u2067x\u2069", "white-space: pre-wrap"},
+    {"cut off where the box ends", "white-space: nowrap; text-overflow: ellipsis"},
+    {"fits", "font-fit-mode: shrink; white-space: nowrap; text-align: right; font-size: 90px"},
 };
 
 struct CheckShape final : IShapeSink {
@@ -65,7 +67,17 @@ void Measure(IFont& font, float size) {
     }
 }
 
-void Use(Scene& scene, FileInMemory& file, uint32_t face, SdfMode sdf) {
+void ShowPage(const uint8_t* data, size_t size) {
+    const Input input;
+    Scene scene;
+    TextPage page(scene, data, size);
+    for (const Specimen& specimen : kSpecimens)
+        page.AddText(specimen.text, specimen.style);
+    page.AddParagraph("AV \u0644\u0627 \u4E00");
+    page.Show();
+}
+
+void Use(Scene& scene, MemoryFile& file, uint32_t face, SdfMode sdf) {
     const FontId id = scene.library().GetFontService()->LoadFace(&file, face, sdf);
     IFont* font = id == kNoId ? nullptr : scene.library().GetFontService()->GetFont(id);
     if (!font) return;
@@ -89,10 +101,13 @@ void Use(Scene& scene, FileInMemory& file, uint32_t face, SdfMode sdf) {
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     using namespace qorvex::fuzz;
-    Scene scene;
-    FileInMemory file(data, size);
-    const uint32_t faces = std::min(scene.library().GetFontService()->GetFaceCount(&file), kMostFaces);
-    for (uint32_t face = 0; face <= faces; ++face)
-        Use(scene, file, face, face % 2 ? fresco::SdfMode::Always : fresco::SdfMode::Never);
+    {
+        Scene scene;
+        MemoryFile file(data, size);
+        const uint32_t faces = std::min(scene.library().GetFontService()->GetFaceCount(&file), kMostFaces);
+        for (uint32_t face = 0; face <= faces; ++face)
+            Use(scene, file, face, face % 2 ? fresco::SdfMode::Always : fresco::SdfMode::Never);
+    }
+    ShowPage(data, size);
     return 0;
 }

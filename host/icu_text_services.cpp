@@ -58,6 +58,35 @@ void ToUtf16(const char* utf8, unsigned length, BidiScratch& out) {
     out.offsets.push_back(length);
 }
 
+// Letters, their marks and punctuation of Hebrew and Arabic, all of which stand at level 1 where no letter or
+// digit of another direction is near.
+bool IsBackwardOrNeutral(unsigned code) {
+    if (code < 0x80) {
+        const unsigned letter = code | 0x20;
+        return code >= 0x20 && code != 0x7F && !(code >= '0' && code <= '9') &&
+               !(letter >= 'a' && letter <= 'z');
+    }
+    return (code >= 0x5D0 && code <= 0x5EA) || (code >= 0x61B && code <= 0x65F && code != 0x61C) ||
+           code == 0x60C || (code >= 0x66E && code <= 0x6D3);
+}
+
+// Whether the whole text is one backward run beyond doubt. Spares ICU what most text of these scripts is.
+bool IsPlainlyBackward(const char* utf8, unsigned length) {
+    bool letters = false;
+    for (unsigned i = 0; i < length; ++i) {
+        unsigned code = static_cast<unsigned char>(utf8[i]);
+        if (code >= 0x80) {
+            if (code < 0xC2 || code > 0xDF || ++i == length) return false;
+            const unsigned trail = static_cast<unsigned char>(utf8[i]);
+            if ((trail & 0xC0) != 0x80) return false;
+            code = (code & 0x1F) << 6 | (trail & 0x3F);
+            letters = letters || (code >= 0x5D0 && code <= 0x5EA) || (code >= 0x620 && code <= 0x64A);
+        }
+        if (!IsBackwardOrNeutral(code)) return false;
+    }
+    return letters;
+}
+
 }  // namespace
 
 // Prototypes of break iterators, which are copied since making one reads its rules anew.
@@ -180,6 +209,7 @@ TextDirection IcuInternationalization::ComputeBaseDirection(const char* utf8, un
 void IcuInternationalization::ComputeTextDirection(const char* utf8, unsigned length,
                                                    i18n::TextDirectionResult* result) {
     if (length == 0) return;
+    if (IsPlainlyBackward(utf8, length)) return result->AddRun(0, length, 1);
     std::unique_ptr<BidiScratch> scratch = shared_->TakeScratch();
     ToUtf16(utf8, length, *scratch);
     UErrorCode fault = U_ZERO_ERROR;

@@ -1,6 +1,5 @@
 #include "fresco/commands/capture.h"
 
-#include <fresco/font.h>
 #include "fresco/commands/validate.h"
 
 namespace fresco {
@@ -39,6 +38,22 @@ void CaptureWriter::AddTarget(uint32_t width, uint32_t height, const uint8_t* ro
 void CaptureWriter::AddFont(FontId id, uint32_t faceIndex, uint32_t sdf, const void* data, size_t size) {
     const size_t start = BeginChunk(ChunkType::Font, id, faceIndex, sdf, 0);
     Append(data, size);
+    EndChunk(start);
+}
+
+void CaptureWriter::AddPictureFont(FontId id, std::string_view table, const BitmapFontDescription& font) {
+    const size_t start =
+        BeginChunk(ChunkType::Pictures, id, font.flags, font.imageCount, uint32_t(table.size()));
+    Append(table.data(), table.size());
+    data_.resize((data_.size() + 3) & ~size_t(3));
+    for (uint32_t i = 0; i < font.imageCount; ++i) {
+        const BitmapFontImage& page = font.images[i];
+        Append(&page.width, sizeof(page.width));
+        Append(&page.height, sizeof(page.height));
+        for (uint32_t y = 0; y < page.height; ++y)
+            Append(static_cast<const uint8_t*>(page.pixels) + size_t(y) * page.rowPitch,
+                   size_t(page.width) * 4);
+    }
     EndChunk(start);
 }
 
@@ -111,6 +126,25 @@ const Vector<uint8_t>& CaptureWriter::Finish() {
     return data_;
 }
 
+bool CapturedPictureFont::Read(const CaptureChunk& chunk) {
+    const uint64_t tableSize = (uint64_t(chunk.fields[3]) + 3) & ~uint64_t(3);
+    if (tableSize > chunk.size) return false;
+    table = {reinterpret_cast<const char*>(chunk.data), chunk.fields[3]};
+    size_t at = size_t(tableSize);
+    for (uint32_t i = 0; i < chunk.fields[2]; ++i) {
+        uint32_t side[2];
+        if (chunk.size - at < sizeof(side)) return false;
+        std::memcpy(side, chunk.data + at, sizeof(side));
+        at += sizeof(side);
+        if (side[0] > kMaxImageSide || side[1] > kMaxImageSide) return false;
+        const uint64_t bytes = uint64_t(side[0]) * side[1] * 4;
+        if (bytes > chunk.size - at) return false;
+        pages.push_back({chunk.data + at, side[0], side[1], side[0] * 4});
+        at += size_t(bytes);
+    }
+    return true;
+}
+
 bool CapturedStream::Read(const CaptureChunk& chunk, const char** error) {
     target_ = chunk.fields[0];
     stream_ = chunk.data;
@@ -160,6 +194,8 @@ const char* CheckChunk(const CaptureChunk& chunk) {
         case ChunkType::Font:
             return chunk.size > 0 && chunk.fields[2] <= uint32_t(SdfMode::Never) ? nullptr
                                                                                  : "an invalid font";
+        case ChunkType::Pictures:
+            return CapturedPictureFont().Read(chunk) ? nullptr : "an invalid font";
         case ChunkType::Buffer: {
             CapturedStream stream;
             const char* error = nullptr;

@@ -4,13 +4,16 @@
 // and zeros up to the next 8 bytes:
 //   Target   width, height                             rows of the render target before the frame
 //   Font     id, face index, SDF mode                  the font file
-//   Image    id, width, height, PixelFormat            rows without gaps, RGBA8 premultiplied or A8
-//   Surface  id, width, height                         rows
-//   Buffer   target surface, stream size, blob count   the stream, then each blob: uint32 size, bytes, padded
-//   to 4
+//   Pictures id, flag word, page count, table size     the glyph table, padded to 4, then each page: uint32
+//   width, height, rows (a font of pictures) Image    id, width, height, PixelFormat            rows without
+//   gaps, RGBA8 premultiplied or A8 Surface  id, width, height                         rows Buffer   target
+//   surface, stream size, blob count   the stream, then each blob: uint32 size, bytes, padded to 4
 // Buffers run in the order in which they stand. A reader trusts nothing: ReadCapture checks each number
 // before it uses it, and each stream with ValidateStream.
 #pragma once
+#include <string_view>
+
+#include <fresco/font.h>
 #include "fresco/backend/backend.h"
 #include "fresco/core/heap.h"
 
@@ -26,7 +29,7 @@ struct CaptureHeader {
     uint32_t chunkCount = 0;
 };
 
-enum class ChunkType : uint32_t { Target = 1, Font, Image, Surface, Buffer };
+enum class ChunkType : uint32_t { Target = 1, Font, Image, Surface, Buffer, Pictures };
 
 struct ChunkHeader {
     uint32_t type = 0;
@@ -40,6 +43,7 @@ class CaptureWriter {
     CaptureWriter();
     void AddTarget(uint32_t width, uint32_t height, const uint8_t* rows, size_t pitch);
     void AddFont(FontId id, uint32_t faceIndex, uint32_t sdf, const void* data, size_t size);
+    void AddPictureFont(FontId id, std::string_view table, const BitmapFontDescription& font);
     void AddImage(ImageId id, uint32_t width, uint32_t height, uint32_t format, const void* pixels);
     void AddSurface(SurfaceId id, uint32_t width, uint32_t height, const void* pixels);
     void AddBuffer(const StreamSource& stream);
@@ -60,6 +64,14 @@ struct CaptureChunk {
     uint32_t fields[4];
     const uint8_t* data;
     size_t size;
+};
+
+// A chunk of a font of pictures: its glyph table and its pages, which point into the file.
+struct CapturedPictureFont {
+    std::string_view table;
+    Vector<BitmapFontImage> pages;
+    // False when it is cut short.
+    bool Read(const CaptureChunk& chunk);
 };
 
 // A buffer chunk as a stream.

@@ -122,9 +122,14 @@ CaptureData CpuScene::SerializeBuffers(CommandBuffer* const* buffers, uint32_t c
     }
     for (const FontId id : uses.fonts) {
         const FontFace* face = shared_.fonts.GetFace(id);
-        // A bitmap font has no file to put in; its glyphs are missing in the replay.
-        if (!face || face->GetData().bytes.empty()) continue;
+        if (!face) continue;
         const Vector<uint8_t>& bytes = face->GetData().bytes;
+        const Vector<BitmapFontImage> pages = face->GetPages();
+        if (!pages.empty()) {
+            const std::string_view table(reinterpret_cast<const char*>(bytes.data()), bytes.size());
+            writer.AddPictureFont(id, table, {"", face->GetFlags(), pages.data(), uint32_t(pages.size())});
+            continue;
+        }
         writer.AddFont(id, face->GetFaceIndex(), uint32_t(face->GetSdfMode()), bytes.data(), bytes.size());
     }
     for (const ImageId id : uses.images) {

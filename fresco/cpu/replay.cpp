@@ -25,6 +25,13 @@ bool Restore(const CaptureChunk& chunk, SharedState& state, PixelBuffer* picture
         case ChunkType::Font:
             *error = "a font does not load";
             return state.fonts.LoadFaceAs(f[0], chunk.data, chunk.size, f[1], SdfMode(f[2]));
+        case ChunkType::Pictures: {
+            *error = "a font does not load";
+            CapturedPictureFont font;
+            const bool sound = font.Read(chunk);
+            return sound && state.fonts.RegisterBitmapFontAs(
+                                f[0], font.table, {"", f[1], font.pages.data(), uint32_t(font.pages.size())});
+        }
         case ChunkType::Image:
             *error = "an image does not load";
             return state.resources.RestoreImage(f[0], f[3], f[1], f[2], chunk.data);

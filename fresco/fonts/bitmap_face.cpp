@@ -47,6 +47,8 @@ bool StartsWith(std::string_view line, std::string_view word) {
 
 bool BitmapFace::Load(std::string_view table, const BitmapFontDescription& description, FontId id) {
     data_ = std::allocate_shared<FontData>(StdAllocator<FontData>());
+    // Captures write it out again.
+    data_->bytes.assign(table.begin(), table.end());
     id_ = id;
     family_ = description.family ? description.family : "";
     flags_ = description.flags;
@@ -93,6 +95,13 @@ bool BitmapFace::TakePages(const BitmapFontDescription& description) {
         pages_.push_back(std::move(page));
     }
     return !pages_.empty();
+}
+
+Vector<BitmapFontImage> BitmapFace::GetPages() const {
+    Vector<BitmapFontImage> pages;
+    for (const Page& page : pages_)
+        pages.push_back({page.pixels.data(), page.width, page.height, page.width * 4});
+    return pages;
 }
 
 void BitmapFace::ReadLine(std::string_view line) {

@@ -19,6 +19,7 @@ class BitmapFace final : public FontFace {
     bool Shape(const ShapeRequest& request, IShapeSink& sink) const override;
     void PreloadGlyphs(const uint32_t* codePoints, size_t count) const override;
 
+    Vector<BitmapFontImage> GetPages() const override;
     const GlyphOutline& GetOutline(uint32_t) const override { return blank_; }
     const ColorGlyph* GetColorGlyph(uint32_t glyph) const override;
     const DistanceField* GetDistanceField(uint32_t) const override { return nullptr; }

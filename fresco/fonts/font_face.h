@@ -20,7 +20,7 @@ inline bool IsValidFontSize(float size) {
     return size > 0 && size <= kMaxFontSize;
 }
 
-// The bytes of a font file, shared by its faces. Empty for a font that came without a file.
+// The bytes of a font file, shared by its faces, or the glyph table of a font of pictures.
 struct FontData {
     Vector<uint8_t> bytes;
 };
@@ -67,6 +67,8 @@ class FontFace : public IFont {
     uint32_t GetFaceIndex() const { return faceIndex_; }
     const FontData& GetData() const { return *data_; }
     std::shared_ptr<FontData> ShareData() const { return data_; }
+    // Of a font of pictures, valid as long as the face; none otherwise.
+    virtual Vector<BitmapFontImage> GetPages() const { return {}; }
     // Whether a glyph may be a picture at all.
     bool HasColorGlyphs() const { return hasColor_; }
     // What these return stays valid as long as the face.

@@ -6,6 +6,9 @@
 
 #include <hb.h>
 
+#include <algorithm>
+#include <cstring>
+
 #include "fresco/core/log.h"
 #include "fresco/fonts/bitmap_face.h"
 
@@ -18,6 +21,8 @@ constexpr size_t kMaxFontBytes = size_t(128) << 20;
 constexpr size_t kMaxTableBytes = size_t(16) << 20;
 // Instances of a variable font that names find; usual ones have 9 weights, upright and slanted.
 constexpr uint32_t kMaxInstances = 64;
+// Faces of a collection; those of all East Asian scripts and weights are fewer.
+constexpr FT_Long kMaxFaces = 256;
 constexpr size_t kFontAlignment = 16;
 
 // FreeType's own memory, from the client. Blocks carry their size in front for Realloc.
@@ -105,14 +110,18 @@ void FontService::Configure(void* argument) {
 
 FontId FontService::RegisterBitmapFont(IStreamReader* stream, const BitmapFontDescription& description) {
     Vector<uint8_t> table;
-    std::unique_ptr<BitmapFace, HeapDeleter<BitmapFace>> face(HeapNew<BitmapFace>());
-    if (!face || !ReadAll(stream, &table, kMaxTableBytes)) return kNoId;
+    if (!ReadAll(stream, &table, kMaxTableBytes)) return kNoId;
     const std::string_view text(reinterpret_cast<const char*>(table.data()), table.size());
     std::lock_guard lock(mutex_);
     const FontId id = nextId_;
-    if (!face->Load(text, description, id)) return kNoId;
+    return AddBitmapFace(id, text, description) ? id : kNoId;
+}
+
+bool FontService::AddBitmapFace(FontId id, std::string_view table, const BitmapFontDescription& description) {
+    std::unique_ptr<BitmapFace, HeapDeleter<BitmapFace>> face(HeapNew<BitmapFace>());
+    if (!face || !face->Load(table, description, id)) return false;
     Keep(std::move(face));
-    return id;
+    return true;
 }
 
 uint32_t FontService::GetFaceCount(IStreamReader* stream) {
@@ -123,7 +132,7 @@ uint32_t FontService::GetFaceCount(IStreamReader* stream) {
     if (!library_ || FT_New_Memory_Face(library_, bytes.data(), FT_Long(bytes.size()), -1, &face)) return 0;
     const FT_Long count = face->num_faces;
     FT_Done_Face(face);
-    return uint32_t(std::clamp<FT_Long>(count, 0, 0xFFFF));
+    return uint32_t(std::clamp<FT_Long>(count, 0, kMaxFaces));
 }
 
 // The faces of a collection come as one file each time; keep its bytes once.
@@ -186,8 +195,14 @@ FontId FontService::LoadFace(IStreamReader* stream, uint32_t faceIndex, SdfMode 
 bool FontService::LoadFaceAs(FontId id, const void* data, size_t size, uint32_t faceIndex, SdfMode sdf) {
     const auto* begin = static_cast<const uint8_t*>(data);
     std::lock_guard lock(mutex_);
-    if (id == kNoId || id >= kNoId - 1 || faces_.count(id)) return false;
+    if (!IsFree(id)) return false;
     return AddFace(ShareData(Vector<uint8_t>(begin, begin + size)), faceIndex, sdf, id, kAnyStyle);
+}
+
+bool FontService::RegisterBitmapFontAs(FontId id, std::string_view table,
+                                       const BitmapFontDescription& description) {
+    std::lock_guard lock(mutex_);
+    return IsFree(id) && AddBitmapFace(id, table, description);
 }
 
 FontId FontService::FindFont(const char* family, uint32_t flags) {

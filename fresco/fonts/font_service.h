@@ -2,6 +2,7 @@
 // themselves never move and never go before the service.
 #pragma once
 #include <shared_mutex>
+#include <string_view>
 
 #include "fresco/fonts/scalable_face.h"
 #include "fresco/fonts/system_fonts.h"
@@ -29,9 +30,13 @@ class FontService final : public IFontService {
     const FontFace* GetFace(FontId id) const { return const_cast<FontService*>(this)->FindFace(id); }
     // For replays: a face under the id that it had when it was captured.
     bool LoadFaceAs(FontId id, const void* data, size_t size, uint32_t faceIndex, SdfMode sdf);
+    bool RegisterBitmapFontAs(FontId id, std::string_view table, const BitmapFontDescription& description);
 
   private:
     FontFace* FindFace(FontId id);
+    // For an id that a capture names.
+    bool IsFree(FontId id) const { return id != kNoId && id < kNoId - 1 && !faces_.count(id); }
+    bool AddBitmapFace(FontId id, std::string_view table, const BitmapFontDescription& description);
     FontId FindLoaded(const char* family, uint32_t flags) const;
     bool LoadSystemFonts();
     std::shared_ptr<FontData> ShareData(Vector<uint8_t> bytes);

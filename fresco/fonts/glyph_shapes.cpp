@@ -6,6 +6,9 @@
 
 #include <algorithm>
 
+#include "fresco/core/log.h"
+#include "fresco/fonts/color_paint.h"
+#include "fresco/fonts/glyph_outline.h"
 #include "fresco/fonts/scalable_face.h"
 
 namespace fresco {
@@ -56,9 +59,28 @@ auto& Cached(Map& map, uint32_t glyph, Load&& load) {
 
 }  // namespace
 
+void ReadOutline(FT_FaceRec_* face, uint32_t glyph, GlyphOutline& out) {
+    if (!FT_IS_SCALABLE(face)) return;
+    if (FT_Load_Glyph(face, glyph, FT_LOAD_NO_SCALE | FT_LOAD_NO_BITMAP)) return;
+    if (face->glyph->format != FT_GLYPH_FORMAT_OUTLINE) return;
+    const FT_Outline_Funcs functions = {
+        OutlineSink::Move, OutlineSink::Line, OutlineSink::Conic, OutlineSink::Cubic, 0, 0};
+    OutlineSink outlineSink{&out};
+    FT_Outline_Decompose(&face->glyph->outline, &functions, &outlineSink);
+    if (outlineSink.open) out.path.Close();
+    const Vector<Point>& points = out.path.points;
+    if (points.empty()) return;
+    out.left = out.right = points[0].x;
+    out.top = out.bottom = points[0].y;
+    for (const Point& p : points) {
+        out.left = std::min(out.left, p.x), out.right = std::max(out.right, p.x);
+        out.top = std::min(out.top, p.y), out.bottom = std::max(out.bottom, p.y);
+    }
+}
+
 const GlyphOutline& ScalableFace::GetOutline(uint32_t glyph) const {
     std::lock_guard lock(mutex_);
-    return Cached(outlines_, glyph, [&](GlyphOutline& out) { LoadOutline(glyph, out); });
+    return Cached(outlines_, glyph, [&](GlyphOutline& out) { ReadOutline(face_, glyph, out); });
 }
 
 const ColorGlyph* ScalableFace::GetColorGlyph(uint32_t glyph) const {
@@ -75,33 +97,27 @@ const DistanceField* ScalableFace::GetDistanceField(uint32_t glyph) const {
     return found.values.empty() ? nullptr : &found;
 }
 
-void ScalableFace::LoadOutline(uint32_t glyph, GlyphOutline& out) const {
-    if (!FT_IS_SCALABLE(face_)) return;
-    if (FT_Load_Glyph(face_, glyph, FT_LOAD_NO_SCALE | FT_LOAD_NO_BITMAP)) return;
-    if (face_->glyph->format != FT_GLYPH_FORMAT_OUTLINE) return;
-    const FT_Outline_Funcs functions = {
-        OutlineSink::Move, OutlineSink::Line, OutlineSink::Conic, OutlineSink::Cubic, 0, 0};
-    OutlineSink outlineSink{&out};
-    FT_Outline_Decompose(&face_->glyph->outline, &functions, &outlineSink);
-    if (outlineSink.open) out.path.Close();
-    const Vector<Point>& points = out.path.points;
-    if (points.empty()) return;
-    out.left = out.right = points[0].x;
-    out.top = out.bottom = points[0].y;
-    for (const Point& p : points) {
-        out.left = std::min(out.left, p.x), out.right = std::max(out.right, p.x);
-        out.top = std::min(out.top, p.y), out.bottom = std::max(out.bottom, p.y);
+bool ScalableFace::LoadGraph(uint32_t glyph, ColorGlyph& out) const {
+    if (graphsRefused_) return false;
+    const GraphResult result = PaintColorGraph(graphs_, face_, hbFace_, glyph, kPictureSize, out);
+    if (result == GraphResult::TooMuch) {
+        // A font that tries once may do so with each of its glyphs.
+        graphsRefused_ = true;
+        FRESCO_WARN("A colour glyph of the font %s is too much to paint: its glyphs show as outlines",
+                    family_.c_str());
     }
+    return result == GraphResult::Painted;
 }
 
 void ScalableFace::LoadPicture(uint32_t glyph, ColorGlyph& out) const {
+    if (graphs_.HasGraphs() && LoadGraph(glyph, out)) return;
     FT_Int32 flags = FT_LOAD_COLOR;
     if (hasLayers_) {
         // FreeType draws the layers one over the other.
         if (hb_ot_color_glyph_get_layers(hbFace_, glyph, 0, nullptr, nullptr) == 0) return;
         if (FT_Set_Pixel_Sizes(face_, 0, kPictureSize)) return;
         flags |= FT_LOAD_RENDER | FT_LOAD_NO_HINTING;
-    } else if (FT_Select_Size(face_, face_->num_fixed_sizes - 1)) {
+    } else if (face_->num_fixed_sizes == 0 || FT_Select_Size(face_, face_->num_fixed_sizes - 1)) {
         return;
     }
     if (FT_Load_Glyph(face_, glyph, flags) || face_->glyph->format != FT_GLYPH_FORMAT_BITMAP) return;

@@ -45,6 +45,7 @@ int WeightCode(uint32_t flags) {
 }  // namespace
 
 ScalableFace::~ScalableFace() {
+    if (colr_) hb_blob_destroy(colr_);
     if (hbFont_) hb_font_destroy(hbFont_);
     if (hbFace_) hb_face_destroy(hbFace_);
     if (face_) FT_Done_Face(face_);
@@ -66,7 +67,8 @@ bool ScalableFace::Load(FT_LibraryRec_* library, std::shared_ptr<FontData> data,
     id_ = id;
     if (!MakeShaper()) return false;
     hasLayers_ = hb_ot_color_has_layers(hbFace_) != 0 && FT_IS_SCALABLE(face_);
-    hasColor_ = (FT_HAS_COLOR(face_) && face_->num_fixed_sizes > 0) || hasLayers_;
+    if (FT_IS_SCALABLE(face_)) ReadColorGraphs();
+    hasColor_ = (FT_HAS_COLOR(face_) && face_->num_fixed_sizes > 0) || hasLayers_ || graphs_.HasGraphs();
     ReadNames();
     ReadMetrics();
     return true;
@@ -96,12 +98,14 @@ bool ScalableFace::MakeShaper() {
     advances_ = Vector<std::atomic<uint16_t>>(count);
     for (std::atomic<uint16_t>& advance : advances_)
         advance.store(kUnknownAdvance, std::memory_order_relaxed);
-    for (uint32_t code = 0; code < kTabledCodes; ++code) {
-        hb_codepoint_t glyph = 0;
-        if (hb_font_get_nominal_glyph(hbFont_, code, &glyph) && glyph <= 0xFFFF)
-            tabled_[code] = uint16_t(glyph);
-    }
     return true;
+}
+
+void ScalableFace::ReadColorGraphs() {
+    colr_ = hb_face_reference_table(hbFace_, HB_TAG('C', 'O', 'L', 'R'));
+    unsigned size = 0;
+    const char* data = hb_blob_get_data(colr_, &size);
+    graphs_ = ColorTable(data, size);
 }
 
 void ScalableFace::ReadNames() {
@@ -178,14 +182,8 @@ uint32_t ScalableFace::FindInstance(uint32_t flags) const {
 }
 
 void ScalableFace::GetGlyphIndices(const uint32_t* codePoints, size_t count, uint32_t* glyphs) const {
-    for (size_t i = 0; i < count; ++i) {
-        if (codePoints[i] < kTabledCodes) {
-            glyphs[i] = tabled_[codePoints[i]];
-            continue;
-        }
-        hb_codepoint_t glyph = 0;
-        glyphs[i] = hb_font_get_nominal_glyph(hbFont_, codePoints[i], &glyph) ? glyph : 0;
-    }
+    for (size_t i = 0; i < count; ++i)
+        glyphs[i] = glyphs_.Get(hbFont_, codePoints[i]);
 }
 
 FontMetrics ScalableFace::GetMetrics(float size) const {
@@ -228,7 +226,7 @@ bool ScalableFace::Shape(const ShapeRequest& request, IShapeSink& sink) const {
         return false;
     }
     const ShapedRunPtr run = shapes_.Get(hbFont_, request);
-    const size_t count = run->glyphs.size();
+    const size_t count = run->Count();
     if (count == 0) return false;
     constexpr size_t kOnStack = 256;
     ShapedGlyph local[kOnStack];
@@ -239,8 +237,9 @@ bool ScalableFace::Shape(const ShapeRequest& request, IShapeSink& sink) const {
         glyphs = large.data();
     }
     const float scale = request.size / unitsPerEm_;
+    const UnitGlyph* units = run->Glyphs();
     for (size_t i = 0; i < count; ++i) {
-        const UnitGlyph& unit = run->glyphs[i];
+        const UnitGlyph& unit = units[i];
         glyphs[i] = {unit.index, unit.cluster, float(unit.advance) * scale, float(unit.x) * scale,
                      float(unit.y) * scale};
     }

@@ -5,14 +5,16 @@
 // lock for them; FT_Face is not safe to share and is touched under `mutex_` alone, when a shape is asked for
 // the first time.
 #pragma once
-#include <array>
 #include <mutex>
 
+#include "fresco/fonts/color_table.h"
 #include "fresco/fonts/font_face.h"
+#include "fresco/fonts/glyph_table.h"
 #include "fresco/fonts/shape_cache.h"
 
 struct FT_FaceRec_;
 struct FT_LibraryRec_;
+struct hb_blob_t;
 struct hb_face_t;
 
 namespace fresco {
@@ -41,33 +43,35 @@ class ScalableFace final : public FontFace {
     const DistanceField* GetDistanceField(uint32_t glyph) const override;
 
   private:
-    // Code points below this are looked up in a table: Latin and what it borders on.
-    static constexpr uint32_t kTabledCodes = 0x300;
     static constexpr uint32_t kUnknownAdvance = 0xFFFF;
 
     template <class T>
     using ShapeMap = HashMap<uint32_t, std::unique_ptr<T, HeapDeleter<T>>>;
 
     bool MakeShaper();
+    void ReadColorGraphs();
     void ReadNames();
     void ReadMetrics();
     uint32_t StyleOfInstance(uint32_t instance) const;
     uint32_t Advance(uint32_t glyph) const;
-    void LoadOutline(uint32_t glyph, GlyphOutline& out) const;
+    bool LoadGraph(uint32_t glyph, ColorGlyph& out) const;
     void LoadPicture(uint32_t glyph, ColorGlyph& out) const;
     void LoadDistances(uint32_t glyph, DistanceField& out) const;
 
     FT_FaceRec_* face_ = nullptr;
     hb_face_t* hbFace_ = nullptr;
     hb_font_t* hbFont_ = nullptr;
-    bool hasLayers_ = false;   // COLR
-    FontMetrics unitMetrics_;  // in font units
-    std::array<uint16_t, kTabledCodes> tabled_{};
+    bool hasLayers_ = false;  // COLR version 0
+    hb_blob_t* colr_ = nullptr;
+    ColorTable graphs_{nullptr, 0};  // COLR version 1
+    FontMetrics unitMetrics_;        // in font units
+    GlyphTable glyphs_;
     // In font units, filled as they are asked for: a font of all Chinese characters has 65,535.
     mutable Vector<std::atomic<uint16_t>> advances_;
     mutable ShapeCache shapes_;
 
     mutable std::mutex mutex_;
+    mutable bool graphsRefused_ = false;
     mutable ShapeMap<GlyphOutline> outlines_;
     mutable ShapeMap<ColorGlyph> pictures_;
     mutable ShapeMap<DistanceField> fields_;

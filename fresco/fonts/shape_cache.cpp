@@ -12,8 +12,8 @@ namespace {
 constexpr size_t kContext = 5;
 constexpr size_t kKeyHead = 5;
 constexpr size_t kMaxKey = kKeyHead + ShapeCache::kMaxCachedRun + 2 * kContext;
-// Buffers that wait for the next run; one for each thread that shapes at once.
-constexpr size_t kKeptBuffers = 4;
+// Scratch memory that waits for the next run; one for each thread that shapes at once.
+constexpr size_t kKeptScratch = 4;
 
 // The run and what surrounds it, as HarfBuzz wants them.
 struct Text {
@@ -53,8 +53,14 @@ size_t MakeKey(const ShapeRequest& request, hb_language_t language, uint32_t* ke
 
 uint64_t HashOf(const uint32_t* key, size_t length) {
     uint64_t hash = 0x9E3779B97F4A7C15ull;
-    for (size_t i = 0; i < length; ++i)
-        hash = (hash ^ key[i]) * 0xD6E8FEB86659FD93ull, hash ^= hash >> 32;
+    const auto mix = [&hash](uint64_t part) {
+        hash = (hash ^ part) * 0xD6E8FEB86659FD93ull;
+        hash ^= hash >> 32;
+    };
+    size_t i = 0;
+    for (; i + 1 < length; i += 2)
+        mix(uint64_t(key[i]) << 32 | key[i + 1]);
+    if (i < length) mix(key[i]);
     return hash;
 }
 
@@ -74,12 +80,44 @@ bool HasOwnScript(hb_script_t script) {
     return script != HB_SCRIPT_COMMON && script != HB_SCRIPT_INHERITED && script != HB_SCRIPT_UNKNOWN;
 }
 
+// Ranges that most text is made of: their letters need not be looked up one by one.
+struct ScriptRange {
+    uint32_t first, last;
+    hb_script_t script;
+};
+constexpr ScriptRange kScriptRanges[] = {
+    {0x41, 0x5A, HB_SCRIPT_LATIN},      {0x61, 0x7A, HB_SCRIPT_LATIN},
+    {0x400, 0x481, HB_SCRIPT_CYRILLIC}, {0x5D0, 0x5EA, HB_SCRIPT_HEBREW},
+    {0x620, 0x64A, HB_SCRIPT_ARABIC},   {0x904, 0x939, HB_SCRIPT_DEVANAGARI},
+    {0xE01, 0xE3A, HB_SCRIPT_THAI},     {0x3041, 0x3096, HB_SCRIPT_HIRAGANA},
+    {0x4E00, 0x9FFF, HB_SCRIPT_HAN},    {0xAC00, 0xD7A3, HB_SCRIPT_HANGUL},
+};
+
+// Asked for one character after the other, remembers the range of the last one.
+class ScriptFinder {
+  public:
+    hb_script_t Of(uint32_t code) {
+        // The tatweel stretches letters of several scripts.
+        if (code < 0x41 || code == 0x640) return HB_SCRIPT_COMMON;
+        if (code - range_->first <= range_->last - range_->first) return range_->script;
+        for (const ScriptRange& range : kScriptRanges) {
+            if (code < range.first || code > range.last) continue;
+            range_ = &range;
+            return range.script;
+        }
+        return hb_unicode_script(hb_unicode_funcs_get_default(), code);
+    }
+
+  private:
+    const ScriptRange* range_ = kScriptRanges;
+};
+
 // The end of the item that starts at `first`: characters without a script of their own join what is before.
 size_t ScriptItemEnd(const uint32_t* codes, size_t first, size_t end, hb_script_t* script) {
-    hb_unicode_funcs_t* unicode = hb_unicode_funcs_get_default();
+    ScriptFinder finder;
     *script = HB_SCRIPT_INVALID;
     for (size_t i = first; i < end; ++i) {
-        const hb_script_t own = hb_unicode_script(unicode, codes[i]);
+        const hb_script_t own = finder.Of(codes[i]);
         if (!HasOwnScript(own)) continue;
         if (*script == HB_SCRIPT_INVALID)
             *script = own;
@@ -112,85 +150,101 @@ void ShapeItem(hb_font_t* font, const Text& text, size_t first, size_t end, hb_s
 
 }  // namespace
 
-ShapeCache::~ShapeCache() {
-    for (hb_buffer_t* buffer : buffers_)
-        hb_buffer_destroy(buffer);
+ShapedRun* ShapedRun::Create(const uint32_t* key, size_t keyLength, const UnitGlyph* glyphs, size_t count) {
+    const size_t size = sizeof(ShapedRun) + keyLength * sizeof(uint32_t) + count * sizeof(UnitGlyph);
+    void* block = HeapAllocate(size, alignof(ShapedRun));
+    if (!block) HeapExhausted(size);
+    auto* run = new (block) ShapedRun(keyLength, count);
+    if (keyLength) std::memcpy(run->Words(), key, keyLength * sizeof(uint32_t));
+    if (count) std::memcpy(run->Words() + keyLength, glyphs, count * sizeof(UnitGlyph));
+    return run;
 }
 
-hb_buffer_t* ShapeCache::TakeBuffer() {
+void ShapedRun::Release() const {
+    if (references_.fetch_sub(1, std::memory_order_acq_rel) == 1)
+        HeapFree(const_cast<ShapedRun*>(this), alignof(ShapedRun));
+}
+
+struct ShapeCache::Scratch {
+    struct Item {
+        size_t first, end;
+        hb_script_t script;
+    };
+    Scratch() = default;
+    ~Scratch() { hb_buffer_destroy(buffer); }
+    Scratch(const Scratch&) = delete;
+    Scratch& operator=(const Scratch&) = delete;
+
+    hb_buffer_t* buffer = hb_buffer_create();
+    Vector<Item> items;
+    Vector<UnitGlyph> glyphs;
+};
+
+ShapeCache::ShapeCache(const ShapeSettings& settings) : settings_(settings) {}
+ShapeCache::~ShapeCache() = default;
+
+ShapeCache::ScratchPtr ShapeCache::TakeScratch() {
     {
         std::lock_guard lock(mutex_);
-        if (!buffers_.empty()) {
-            hb_buffer_t* buffer = buffers_.back();
-            buffers_.pop_back();
-            return buffer;
+        if (!scratch_.empty()) {
+            ScratchPtr taken = std::move(scratch_.back());
+            scratch_.pop_back();
+            return taken;
         }
     }
-    return hb_buffer_create();
+    ScratchPtr made(HeapNew<Scratch>());
+    if (!made) HeapExhausted(sizeof(Scratch));
+    return made;
 }
 
-void ShapeCache::ReturnBuffer(hb_buffer_t* buffer) {
+void ShapeCache::ReturnScratch(ScratchPtr scratch) {
     // One large text must not hold its memory for ever.
-    constexpr unsigned kLargeBuffer = 16 * 1024;
-    const bool keep = hb_buffer_get_length(buffer) <= kLargeBuffer;
-    {
-        std::lock_guard lock(mutex_);
-        if (keep && buffers_.size() < kKeptBuffers) {
-            buffers_.push_back(buffer);
-            return;
-        }
-    }
-    hb_buffer_destroy(buffer);
+    constexpr size_t kLargeText = 16 * 1024;
+    if (scratch->glyphs.capacity() > kLargeText) return;
+    scratch->glyphs.clear();
+    std::lock_guard lock(mutex_);
+    if (scratch_.size() < kKeptScratch) scratch_.push_back(std::move(scratch));
 }
 
-void ShapeCache::Shape(hb_font_t* font, const ShapeRequest& request, Vector<UnitGlyph>* out) {
+void ShapeCache::Shape(hb_font_t* font, const ShapeRequest& request, Scratch& scratch) const {
     const Text text(request);
     const bool backward = request.direction == TextDirection::RightToLeft;
     const hb_direction_t direction = backward ? HB_DIRECTION_RTL : HB_DIRECTION_LTR;
     const hb_language_t language = LanguageOf(request, settings_);
-    hb_buffer_t* buffer = TakeBuffer();
     const size_t end = text.offset + text.count;
-    if (request.script) {
-        ShapeItem(font, text, text.offset, end, hb_script_from_iso15924_tag(request.script), direction,
-                  language, buffer, out);
-    } else {
-        struct Item {
-            size_t first, end;
-            hb_script_t script;
-        };
-        Vector<Item> items;
-        for (size_t first = text.offset; first < end; first = items.back().end) {
-            hb_script_t script = HB_SCRIPT_INVALID;
-            const size_t itemEnd = ScriptItemEnd(text.codes, first, end, &script);
-            items.push_back({first, itemEnd, script});
-        }
-        // In visual order, which for a backward run begins with its last item.
-        if (backward) std::reverse(items.begin(), items.end());
-        for (const Item& item : items)
-            ShapeItem(font, text, item.first, item.end, item.script, direction, language, buffer, out);
+    const auto shape = [&](size_t first, size_t last, hb_script_t script) {
+        ShapeItem(font, text, first, last, script, direction, language, scratch.buffer, &scratch.glyphs);
+    };
+    if (request.script) return shape(text.offset, end, hb_script_from_iso15924_tag(request.script));
+    Vector<Scratch::Item>& items = scratch.items;
+    items.clear();
+    for (size_t first = text.offset; first < end; first = items.back().end) {
+        hb_script_t script = HB_SCRIPT_INVALID;
+        const size_t itemEnd = ScriptItemEnd(text.codes, first, end, &script);
+        items.push_back({first, itemEnd, script});
     }
-    ReturnBuffer(buffer);
+    // In visual order, which for a backward run begins with its last item.
+    if (backward) std::reverse(items.begin(), items.end());
+    for (const Scratch::Item& item : items)
+        shape(item.first, item.end, item.script);
 }
 
 ShapedRunPtr ShapeCache::Find(uint64_t hash, const uint32_t* key, size_t length) {
-    const auto holds = [&](const ShapedRun& run) {
-        return run.key.size() == length && std::memcmp(run.key.data(), key, length * sizeof(uint32_t)) == 0;
-    };
     std::lock_guard lock(mutex_);
     if (const auto found = young_.find(hash); found != young_.end())
-        return holds(*found->second) ? found->second : nullptr;
+        return found->second->HasKey(key, length) ? found->second : ShapedRunPtr();
     const auto found = old_.find(hash);
-    if (found == old_.end() || !holds(*found->second)) return nullptr;
+    if (found == old_.end() || !found->second->HasKey(key, length)) return {};
     ShapedRunPtr run = std::move(found->second);
     old_.erase(found);
-    youngGlyphs_ += run->glyphs.size();
+    youngGlyphs_ += run->Count();
     young_[hash] = run;
     return run;
 }
 
 void ShapeCache::Insert(uint64_t hash, ShapedRunPtr run) {
     std::lock_guard lock(mutex_);
-    youngGlyphs_ += run->glyphs.size();
+    youngGlyphs_ += run->Count();
     young_[hash] = std::move(run);
     if (youngGlyphs_ <= settings_.keptGlyphs.load(std::memory_order_relaxed) / 2) return;
     old_ = std::move(young_);
@@ -206,12 +260,12 @@ ShapedRunPtr ShapeCache::Get(hb_font_t* font, const ShapeRequest& request) {
     if (cached) {
         if (ShapedRunPtr found = Find(hash, key, length)) return found;
     }
-    auto run = std::allocate_shared<ShapedRun>(StdAllocator<ShapedRun>());
-    Shape(font, request, &run->glyphs);
-    if (cached) {
-        run->key.assign(key, key + length);
-        Insert(hash, run);
-    }
+    ScratchPtr scratch = TakeScratch();
+    Shape(font, request, *scratch);
+    const Vector<UnitGlyph>& glyphs = scratch->glyphs;
+    ShapedRunPtr run(ShapedRun::Create(key, length, glyphs.data(), glyphs.size()));
+    ReturnScratch(std::move(scratch));
+    if (cached) Insert(hash, run);
     return run;
 }
 

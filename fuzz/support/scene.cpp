@@ -43,4 +43,10 @@ void Scene::Draw(fresco::CommandBuffer* buffer) {
     buffer->Release();
 }
 
+void Scene::Draw(std::span<fresco::CommandBuffer* const> resources,
+                 std::span<fresco::CommandBuffer* const> drawing) {
+    scene_->ExecuteFrontEnd(resources.data(), static_cast<uint32_t>(resources.size()));
+    scene_->ExecuteBackEnd(drawing.data(), static_cast<uint32_t>(drawing.size()));
+}
+
 }  // namespace qorvex::fuzz

@@ -6,6 +6,7 @@
 
 #include <array>
 #include <cstdint>
+#include <span>
 
 namespace qorvex::fuzz {
 
@@ -31,6 +32,9 @@ class Scene {
     fresco::IRenderingLibrary& library() { return *library_; }
     /// Runs the buffer on the surface and releases it.
     void Draw(fresco::CommandBuffer* buffer);
+    /// Runs a frame's buffers, those of its resources first; they stay the caller's.
+    void Draw(std::span<fresco::CommandBuffer* const> resources,
+              std::span<fresco::CommandBuffer* const> drawing);
 
   private:
     static constexpr uint32_t kSide = 64;

@@ -6,6 +6,9 @@ void IDisplayElement::Measure(layout::LayoutHandle&, float, float, MeasureMode, 
                               layout::Size& out) {
     out = {};
 }
+bool IDisplayElement::KeepsSize(layout::LayoutHandle&) {
+    return false;
+}
 void IDisplayElement::OffsetLine(uint32_t, float, uint8_t) {}
 void IDisplayElement::GrowLastLine(float) {}
 uint32_t IDisplayElement::TextLength() const {

@@ -51,6 +51,8 @@ class IDisplayElement : public AtomicRefCounted<IDisplayElement, MemoryTag::Rend
     // NaN stands for an available size that is not known.
     virtual void Measure(layout::LayoutHandle& handle, float availableWidth, float availableHeight,
                          MeasureMode widthMode, MeasureMode heightMode, layout::Size& out);
+    // Whether everything that Measure answered since the last false is still so, though the content changed.
+    virtual bool KeepsSize(layout::LayoutHandle& handle);
     // Moves one text line; used by the inline flow of a paragraph.
     virtual void OffsetLine(uint32_t lineIndex, float offset, uint8_t alignment);
     virtual void GrowLastLine(float amount);

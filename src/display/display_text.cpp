@@ -83,16 +83,43 @@ void DisplayText::Measure(layout::LayoutHandle& handle, float availableWidth, fl
                           MeasureMode widthMode, MeasureMode heightMode, layout::Size& out) {
     if (widthMode == MeasureMode::Undefined) availableWidth = NAN;
     if (heightMode == MeasureMode::Undefined) availableHeight = NAN;
+    out = MeasureFor(handle, availableWidth, availableHeight);
+    Remember({availableWidth, availableHeight, out});
+}
+
+layout::Size DisplayText::MeasureFor(layout::LayoutHandle& handle, float availableWidth,
+                                     float availableHeight) {
     placed_.clear();
-    out = {};
     const css::TextLayoutStyle* group = handle.node().style.text.get();
-    if (group == nullptr) return;
+    if (group == nullptr) return {};
     const layout::TextServices& services = handle.store().text;
     Parameters wanted{layout::MakeTextStyle(*group), availableWidth, availableHeight};
     wanted.style.complexText = services.complexText;
-    if (!EnsureLayout(handle.node(), services, wanted)) return;
-    out.width = std::ceil(info_.width);
-    out.height = std::ceil(info_.height);
+    if (!EnsureLayout(handle.node(), services, wanted)) return {};
+    return {std::ceil(info_.width), std::ceil(info_.height)};
+}
+
+void DisplayText::Remember(const Answer& answer) {
+    for (Answer& known : answers_) {
+        if (!SameExtent(known.width, answer.width) || !SameExtent(known.height, answer.height)) continue;
+        known = answer;
+        return;
+    }
+    tooManyAnswers_ = tooManyAnswers_ || answers_.size() == kMostAnswers;
+    if (!tooManyAnswers_) answers_.push_back(answer);
+}
+
+bool DisplayText::KeepsSize(layout::LayoutHandle& handle) {
+    bool keeps = !tooManyAnswers_ && !answers_.empty();
+    for (size_t i = 0; keeps && i < answers_.size(); ++i) {
+        const layout::Size size = MeasureFor(handle, answers_[i].width, answers_[i].height);
+        keeps = size.width == answers_[i].size.width && size.height == answers_[i].size.height;
+    }
+    if (!keeps) {
+        answers_.clear();
+        tooManyAnswers_ = false;
+    }
+    return keeps;
 }
 
 const layout::TextInfo* DisplayText::LayoutInline(layout::LayoutHandle& handle,

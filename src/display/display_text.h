@@ -43,6 +43,7 @@ class DisplayText final : public IDisplayElement {
                fresco::CommandBuffer& buffer) override;
     void Measure(layout::LayoutHandle& handle, float availableWidth, float availableHeight,
                  MeasureMode widthMode, MeasureMode heightMode, layout::Size& out) override;
+    bool KeepsSize(layout::LayoutHandle& handle) override;
     void OffsetLine(uint32_t lineIndex, float offset, uint8_t alignment) override;
     void GrowLastLine(float amount) override;
     uint32_t TextLength() const override;
@@ -59,6 +60,12 @@ class DisplayText final : public IDisplayElement {
         float height = 0;
         float firstLineOffset = 0;
     };
+    // One question of the layout and its answer. The available size is NaN where it is not known.
+    struct Answer {
+        float width;
+        float height;
+        layout::Size size;
+    };
     struct DestroyIterator {
         void operator()(i18n::IBreakIterator* iterator) const;
     };
@@ -68,6 +75,8 @@ class DisplayText final : public IDisplayElement {
     bool EnsureLayout(const layout::LayoutNode& node, const layout::TextServices& services,
                       const Parameters& wanted);
     [[nodiscard]] bool Holds(const Parameters& wanted) const;
+    layout::Size MeasureFor(layout::LayoutHandle& handle, float availableWidth, float availableHeight);
+    void Remember(const Answer& answer);
     void Publish(PaintContext& context);
     void PaintShadows(PaintContext& context, const layout::LayoutNode& node, layout::Point corner,
                       fresco::CommandBuffer& buffer) const;
@@ -78,6 +87,10 @@ class DisplayText final : public IDisplayElement {
     Parameters laid_;  // of info_
     bool laidOut_ = false;
     bool unpublished_ = false;
+    // Of the layout's cached sizes; more of them than are kept here are too many to compare.
+    static constexpr size_t kMostAnswers = 4;
+    SmallVector<Answer, 2, MemoryTag::LayoutData> answers_;
+    bool tooManyAnswers_ = false;
     // Lines of an inline flow; empty elsewhere.
     Vector<layout::LinePlacement, MemoryTag::LayoutData> placed_;
     layout::NodeLinkPtr link_;

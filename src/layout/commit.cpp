@@ -54,7 +54,12 @@ void CopyToLayoutSide(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
     node.visualChanged = node.visualChanged || data.changed || Written(data.style, css::StyleGroup::Layout) ||
                          Written(data.style, css::StyleGroup::Transform);
     // Text, its font or its element changed: the cached size may be wrong.
-    if (data.changed && node.flex && YGNodeHasMeasureFunc(node.flex)) YGNodeMarkDirty(node.flex);
+    if (data.changed && node.flex && YGNodeHasMeasureFunc(node.flex)) {
+        if (dirty == nullptr)
+            node.contentChanged = true;
+        else
+            YGNodeMarkDirty(node.flex);
+    }
     data.changed = false;
     data.style.written.fill(0);
     if (!SameChildren(node.children, data.children)) {

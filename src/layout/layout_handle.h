@@ -171,6 +171,8 @@ struct LayoutNode {
     bool visualChanged = false;
     bool rectChanged = false;
     bool boxMetricsChanged = false;
+    // What the element measures changed, and the next layout asks whether its size did.
+    bool contentChanged = false;
 
     // Sticky and conservative: there is an absolute or fixed box below, whose containing block may lie above
     // this node. When it is set here, it is set on all ancestors.

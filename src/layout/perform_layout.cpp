@@ -15,6 +15,8 @@
 
 #include <yoga/Yoga.h>
 
+#include <utility>
+
 namespace qorvex::layout {
 
 namespace {
@@ -50,6 +52,22 @@ void SyncAllStyles(LayoutPass& pass, FlexStyleContext& context) {
     }
 }
 
+// A changed element may still have the size that it had: a counter whose digits are all as wide. When nothing
+// else has changed no box of the page moves, and Yoga, which walks the whole page each time, is not asked.
+// True then.
+bool KeepChangedContent(LayoutPass& pass, bool mayKeep) {
+    bool all = mayKeep && !pass.update.changed.Empty();
+    pass.update.changed.ForEach([&](LayoutHandle& handle) {
+        LayoutNode& node = handle.node();
+        const bool content = std::exchange(node.contentChanged, false) && node.flex != nullptr &&
+                             YGNodeHasMeasureFunc(node.flex);
+        const bool keeps = content && mayKeep && node.display && node.display->KeepsSize(handle);
+        if (content && !keeps) YGNodeMarkDirty(node.flex);
+        all = all && keeps;
+    });
+    return all && !YGNodeIsDirty(pass.root->node().flex);
+}
+
 void PerformFlexLayout(LayoutPass& pass, const css::LengthContext& lengths) {
     FlexStyleContext context{lengths, pass.disableFlexBasisUnits, pass.root};
     const bool stylesMissing = std::exchange(pass.root->store().flexStylesMissing, false);
@@ -62,6 +80,7 @@ void PerformFlexLayout(LayoutPass& pass, const css::LengthContext& lengths) {
             dsp::InvalidateParagraphs(handle);
         });
     }
+    if (KeepChangedContent(pass, !pass.everything)) return;
     YGNodeCalculateLayout(pass.root->node().flex, static_cast<float>(pass.viewWidth),
                           static_cast<float>(pass.viewHeight), YGDirectionLTR);
     pass.update.counters.measured += TakeMeasureCount();
@@ -84,10 +103,12 @@ void PerformLayout(LayoutPass& pass) {
     if (TakeMetrics(pass, simple ? Engine::Simple : Engine::Flex)) pass.everything = true;
     if (simple) {
         if (std::exchange(pass.root->store().flexStylesMissing, false)) pass.everything = true;
+        (void)KeepChangedContent(pass, false);
         PerformSimpleLayout(pass, lengths, pass.everything);
     } else if (pass.algorithm != FlexAlgorithm::Internal) {
         PerformFlexLayout(pass, lengths);
     } else {
+        (void)KeepChangedContent(pass, false);
         // The styles of this frame were not written; the next run of Yoga has to catch up.
         pass.root->store().engine = Engine::None;
     }

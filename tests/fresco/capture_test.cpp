@@ -13,8 +13,8 @@ namespace {
 
 constexpr char kSans[] = "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf";
 
-// A frame that needs everything a capture carries: old content, a font, an image, a surface, uploads of its
-// own.
+// A frame that needs everything a capture carries: old content, a font, a font of pictures, an image, a
+// surface, uploads of its own.
 struct Frame {
     Canvas canvas{96, 64};
     ImageId image = Library::GetImageName(), late = Library::GetImageName();
@@ -54,6 +54,8 @@ struct Frame {
         TextPaint text;
         text.font = font, text.size = 13, text.x = 10, text.y = 50, text.paint = Solid(0, 0, 0);
         b->FillString("replay \xC3\xA9", 9, text);
+        text.font = LoadPictureFont(), text.y = 30, text.paint = Solid(1, 1, 0.5f);
+        b->FillString("AB", 2, text);
         const GradientStop stops[] = {{0, {1, 0, 0, 1}}, {1, {0, 0, 1, 1}}};
         b->FillRadialGradient({70, 40, 0, 20, 20}, Paint{}, stops, 2, {{0.5f, 0.5f}, {0.5f, 0.5f}});
         Path* path = Path::Create();
@@ -66,6 +68,15 @@ struct Frame {
     ~Frame() {
         for (CommandBuffer* b : buffers)
             b->Release();
+    }
+    FontId LoadPictureFont() {
+        const BitmapFontImage page{pixels, 2, 2, 8};
+        const std::string table =
+            "info size=2\ncommon lineHeight=2 base=2\n"
+            "char id=65 x=0 y=0 width=1 height=2 xadvance=2\nchar id=66 x=1 y=0 width=1 height=1 "
+            "xadvance=1\n";
+        MemoryReader reader(std::vector<uint8_t>(table.begin(), table.end()));
+        return canvas.library->GetFontService()->RegisterBitmapFont(&reader, {"Tiles", 0, &page, 1});
     }
     std::vector<uint64_t> Capture(size_t* size) {
         const CaptureData data = canvas.scene->SerializeBuffers(buffers, 2);

@@ -1,5 +1,4 @@
-// Fonts: what they measure, and that threads may share them.
-#include <thread>
+// Fonts: what they measure.
 
 #include <gtest/gtest.h>
 #include "canvas.h"
@@ -64,36 +63,6 @@ TEST(Font, RefusesWhatIsNoFont) {
     MemoryReader whole(bytes);
     EXPECT_EQ(service->LoadFace(&whole, 9, SdfMode::Never), kNoId);
     if (!bytes.empty()) EXPECT_EQ(service->GetFaceCount(&whole), 1u);
-}
-
-TEST(Font, ThreadsShareAFace) {
-    Canvas canvas;
-    const FontId id = canvas.LoadFont(kSans);
-    if (id == kNoId) GTEST_SKIP() << "no DejaVu on this machine";
-    IFont* font = canvas.library->GetFontService()->GetFont(id);
-    std::vector<std::thread> threads;
-    std::atomic<int> shaped{0};
-    for (int t = 0; t < 4; ++t) {
-        threads.emplace_back([&, t] {
-            for (int i = 0; i < 50; ++i) {
-                Collect sink;
-                uint32_t text[] = {uint32_t('A' + i % 26), uint32_t('a' + t)};
-                ShapeRequest request;
-                request.codePoints = text, request.count = 2;
-                shaped += font->Shape(request, sink);
-                font->PreloadGlyphs(text, 2);
-                canvas.library->GetFontService()->FindFont("nothing", 0);
-            }
-        });
-    }
-    CommandBuffer* b = Library::CreateBuffer(0, 0);
-    TextPaint paint;
-    paint.font = id, paint.y = 20;
-    b->FillString("ABCabc", 6, paint);
-    canvas.Draw(b);
-    for (std::thread& thread : threads)
-        thread.join();
-    EXPECT_EQ(shaped, 200);
 }
 
 TEST(Font, TheNullLibraryMeasuresAndDrawsNothing) {

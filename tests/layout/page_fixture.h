@@ -3,8 +3,6 @@
 #pragma once
 
 #include "css/values/layout_style_refs.h"
-#include "css/values/property_traits.h"
-#include "css/values/value_text.h"
 #include "display/box.h"
 #include "display/dirty_region.h"
 #include "display/page_elements.h"
@@ -12,6 +10,7 @@
 #include "layout/layout_tree.h"
 #include "layout/perform_layout.h"
 #include "support/scoped_library_state.h"
+#include "support/style_text.h"
 
 #include <string>
 #include <vector>
@@ -53,40 +52,6 @@ class FakeNode final : public layout::INodeLink {
     bool inTree = false;
 };
 
-inline void ApplyDeclarations(css::LayoutStyleRefs& style, std::string_view text) {
-    while (!text.empty()) {
-        const size_t end = std::min(text.find(';'), text.size());
-        std::string_view declaration = text.substr(0, end);
-        text.remove_prefix(std::min(end + 1, text.size()));
-        while (!declaration.empty() && declaration.front() == ' ')
-            declaration.remove_prefix(1);
-        if (declaration.empty()) continue;
-        const size_t colon = declaration.find(':');
-        const css::PropertyId id = css::FindProperty(declaration.substr(0, colon));
-        std::string_view value = declaration.substr(colon + 1);
-        while (!value.empty() && value.front() == ' ')
-            value.remove_prefix(1);
-        css::CssVector<css::Declaration> parsed;
-        if (css::IsShorthand(id)) {
-            EXPECT_TRUE(css::ParseShorthand(id, value, 0, parsed)) << declaration;
-        } else {
-            css::Declaration single;
-            EXPECT_TRUE(css::ParseLonghand(id, value, single)) << declaration;
-            parsed.push_back(single);
-        }
-        for (const css::Declaration& one : parsed) {
-            auto store = [&]<css::PropertyId property>() {
-                using Traits = css::PropertyTraits<property>;
-                if (one.property() != property || !one.IsValue()) return;
-                style.Mutable<typename Traits::Group>().*Traits::kField = one.Get<property>();
-                if constexpr (property == css::PropertyId::FontSize)
-                    style.Mutable<css::TextLayoutStyle>().computedFontSize = one.Get<property>().value;
-            };
-            css::ForEachLonghand(store);
-        }
-    }
-}
-
 class Page {
   public:
     explicit Page(uint32_t width = 1000, uint32_t height = 500) : viewWidth(width), viewHeight(height) {
@@ -98,7 +63,7 @@ class Page {
 
     static css::LayoutStyleRefs Style(std::string_view text) {
         css::LayoutStyleRefs style = css::DefaultStyles();
-        ApplyDeclarations(style, text);
+        EXPECT_TRUE(ApplyDeclarations(style, text)) << text;
         return style;
     }
 
@@ -119,7 +84,7 @@ class Page {
         css::LayoutStyleRefs changed = css::DefaultStyles();
         static_cast<css::LaidOutStyle&>(changed) = handle->data().style;
         changed.written.fill(0);
-        ApplyDeclarations(changed, style);
+        EXPECT_TRUE(ApplyDeclarations(changed, style)) << style;
         tree.UpdateStyle(*handle, changed);
     }
 

@@ -40,14 +40,17 @@ void DecodeCharacters(std::string_view utf8, css::WhiteSpaceMode whiteSpace, Cha
     uint32_t* offsets = out.offsets.data();
     size_t count = 0;
     uint32_t highest = 0;
+    bool lineFeeds = false;
     for (size_t at = 0; at < utf8.size();) {
         const auto offset = static_cast<uint32_t>(at);
         uint32_t code = NextCode(utf8, at);
         // A line feed that belongs to a carriage return before it is one line end; a lone return is a blank.
         if (code == 0x0D) code = at < utf8.size() && utf8[at] == '\n' ? 0x20 : 0x0A;
-        if (collapse && code <= 0x85 && ClassOf(code) != CharacterClass::Other) {
-            if (count > 0 && codes[count - 1] == ' ') continue;
-            code = ' ';
+        if (code <= 0x85) {
+            const CharacterClass kind = ClassOf(code);
+            if (collapse && kind != CharacterClass::Other && count > 0 && codes[count - 1] == ' ') continue;
+            if (kind == CharacterClass::Space || (collapse && kind == CharacterClass::LineFeed)) code = ' ';
+            lineFeeds |= !collapse && kind == CharacterClass::LineFeed;
         }
         highest = std::max(highest, code);
         codes[count] = code;
@@ -56,6 +59,7 @@ void DecodeCharacters(std::string_view utf8, css::WhiteSpaceMode whiteSpace, Cha
     out.codes.resize(count);
     out.offsets.resize(count);
     out.highest = highest;
+    out.hasLineFeeds = lineFeeds;
     // The width of a space at the end is added to the line instead, so that it neither wraps nor draws.
     if (collapse && !out.codes.empty() && out.codes.back() == ' ') {
         out.codes.pop_back();

@@ -32,10 +32,11 @@ enum class CharacterClass : uint8_t {
 
 // In the thread's temporary memory.
 struct Characters {
-    TempVector<uint32_t> codes;
+    TempVector<uint32_t> codes;    // tabs and their like are blanks: they have no glyph of their own
     TempVector<uint32_t> offsets;  // where each code point starts in the UTF-8 text
     bool endedInSpace = false;     // a collapsed text lost one space at its end
-    uint32_t highest = 0;          // at least the largest code
+    bool hasLineFeeds = false;
+    uint32_t highest = 0;  // at least the largest code
 };
 
 // Bytes that are no UTF-8 become U+FFFD.

@@ -27,20 +27,13 @@ LineMetrics MetricsOf(const fresco::IFont& font, const TextStyle& style, bool ap
 // without.
 size_t MapSpan(const Characters& characters, const fresco::IFont& font, uint8_t index, size_t first,
                size_t end, GlyphMap& out) {
-    TempMark mark;
-    TempVector<uint32_t> codes(end - first);
-    TempVector<uint32_t> glyphs(end - first);
-    for (size_t i = first; i < end; ++i)
-        codes[i - first] = ShownCode(characters.codes[i]);
-    font.GetGlyphIndices(codes.data(), codes.size(), glyphs.data());
+    font.GetGlyphIndices(characters.codes.data() + first, end - first, out.glyphs.data() + first);
     size_t missing = 0;
     for (size_t i = first; i < end; ++i) {
-        if (glyphs[i - first] == 0) {
+        if (out.glyphs[i] == 0)
             ++missing;
-            continue;
-        }
-        out.glyphs[i] = glyphs[i - first];
-        out.fonts[i] = index;
+        else
+            out.fonts[i] = index;
     }
     return missing;
 }
@@ -71,6 +64,7 @@ void MeasureAdvances(const Characters& characters, const LoadedTypefaces& typefa
                                                        map.advances.data() + first);
         first = end;
     }
+    if (style.letterSpacing == 0 && !characters.hasLineFeeds) return;
     for (size_t i = 0; i < count; ++i) {
         const bool lineFeed = ClassOf(characters.codes[i]) == CharacterClass::LineFeed;
         map.advances[i] = lineFeed ? 0 : map.advances[i] + style.letterSpacing;
@@ -95,7 +89,7 @@ void MapFonts(const Characters& characters, const LoadedTypefaces& typefaces, Gl
     out.glyphs.resize(count, 0u);
     out.fonts.resize(count, kNoFont);
     out.advances.resize(count, 0.0f);
-    for (size_t i = 0; i < count; ++i) {
+    for (size_t i = 0; i < count && characters.hasLineFeeds; ++i) {
         if (ClassOf(characters.codes[i]) == CharacterClass::LineFeed) out.fonts[i] = 0;
     }
     size_t missing = count;
@@ -115,7 +109,9 @@ void MapFonts(const Characters& characters, const LoadedTypefaces& typefaces, Gl
         }
     }
     std::replace(out.fonts.begin(), out.fonts.end(), kNoFont, uint8_t{0});
-    JoinSpaces(characters, typefaces, out);
+    const auto other = [&](uint8_t font) { return font != out.fonts[0]; };
+    out.mixed = std::any_of(out.fonts.begin(), out.fonts.end(), other);
+    if (out.mixed) JoinSpaces(characters, typefaces, out);
 }
 
 void MapGlyphs(const Characters& characters, const LoadedTypefaces& typefaces, const TextStyle& style,

@@ -28,16 +28,12 @@ struct GlyphMap {
     TempVector<uint32_t> glyphs;
     TempVector<uint8_t> fonts;   // index into LoadedTypefaces
     TempVector<float> advances;  // letter spacing included
+    bool mixed = false;          // not all characters have the same font
 };
 
 // Empty when nothing is loaded.
 void LoadTypefaces(const TextStyle& style, fresco::IFontService& service, bool applyLineHeight,
                    LoadedTypefaces& out);
-
-// Tabs and their like have no glyph of their own: they show as blanks.
-[[nodiscard]] inline uint32_t ShownCode(uint32_t code) {
-    return ClassOf(code) == CharacterClass::Space ? 0x20 : code;
-}
 
 // Every character gets the first font that has it, else the box of the first font. Advances stay 0.
 void MapFonts(const Characters& characters, const LoadedTypefaces& typefaces, GlyphMap& out);

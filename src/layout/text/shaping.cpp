@@ -37,8 +37,6 @@ bool Covers(const fresco::IFont& font, const uint32_t* codes, size_t count) {
 // on a letter of another font stands beside it.
 void KeepUnitsTogether(const Characters& characters, const LoadedTypefaces& typefaces, GlyphMap& map) {
     const auto& codes = characters.codes;
-    const auto other = [&](uint8_t font) { return font != map.fonts[0]; };
-    if (std::none_of(map.fonts.begin(), map.fonts.end(), other)) return;
     for (size_t first = 0; first < codes.size();) {
         const size_t end = UnitEnd(codes, first);
         bool mixed = false;
@@ -90,16 +88,16 @@ class GlyphSink final : public fresco::IShapeSink {
     TempVector<fresco::ShapedGlyph>& out_;
 };
 
-void ShapeSpan(ShapedSpan& span, const TempVector<uint32_t>& shown, const LoadedTypefaces& typefaces,
+void ShapeSpan(ShapedSpan& span, const TempVector<uint32_t>& codes, const LoadedTypefaces& typefaces,
                const TextStyle& style, ShapedText& out) {
     fresco::ShapeRequest request;
-    request.codePoints = shown.data() + span.first;
+    request.codePoints = codes.data() + span.first;
     request.count = span.end - span.first;
     request.size = style.usedSize;
     request.direction =
         span.IsRightToLeft() ? fresco::TextDirection::RightToLeft : fresco::TextDirection::LeftToRight;
-    request.context = shown.data();
-    request.contextCount = shown.size();
+    request.context = codes.data();
+    request.contextCount = codes.size();
     request.contextOffset = span.first;
     GlyphSink sink(span.first, out.glyphs);
     span.firstGlyph = static_cast<uint32_t>(out.glyphs.size());
@@ -132,17 +130,14 @@ void ShapeText(std::string_view utf8, const Characters& characters, const Loaded
                const TextStyle& style, IInternationalizationManager* i18n, GlyphMap& map, ShapedText& out) {
     const size_t count = characters.codes.size();
     MapFonts(characters, typefaces, map);
-    KeepUnitsTogether(characters, typefaces, map);
+    if (map.mixed) KeepUnitsTogether(characters, typefaces, map);
     TempVector<uint8_t> levels;
     ResolveLevels(utf8, characters, i18n, levels);
     SplitSpans(characters, map, levels, out.spans);
-    TempVector<uint32_t> shown(count);
-    for (size_t i = 0; i < count; ++i)
-        shown[i] = ShownCode(characters.codes[i]);
     out.clusterStarts.resize(count, uint8_t{0});
     out.glyphs.reserve(count);
     for (ShapedSpan& span : out.spans)
-        ShapeSpan(span, shown, typefaces, style, out);
+        ShapeSpan(span, characters.codes, typefaces, style, out);
     TakeAdvances(style, map, out);
 }
 

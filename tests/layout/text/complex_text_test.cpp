@@ -194,7 +194,7 @@ TEST_F(ComplexTextTest, EllipsisStandsWhereReadingEnds) {
 }
 
 TEST_F(ComplexTextTest, HostileTextIsBounded) {
-    std::string marks, controls, scripts, mixed, lines;
+    std::string marks, controls, scripts, mixed, lines, word;
     for (int i = 0; i < 100000; ++i)
         marks += "\u0301";
     for (int i = 0; i < 200; ++i)
@@ -215,7 +215,10 @@ TEST_F(ComplexTextTest, HostileTextIsBounded) {
         mixed += "a אب ";
     for (int i = 0; i < 100000; ++i)
         lines += "ا\n";
-    for (const std::string& text : {marks, controls, scripts, mixed,
+    // A megabyte without a place to break.
+    for (int i = 0; i < 500000; ++i)
+        word += "ب";
+    for (const std::string& text : {marks, controls, scripts, mixed, word,
                                     std::string("\xED\xA0\x80\xED\xBF\xBF\u0301"), std::string("\u0301")}) {
         const TextInfo info = Lay(text, 200);
         EXPECT_TRUE(std::isfinite(info.width) && std::isfinite(info.height));
