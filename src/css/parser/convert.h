@@ -43,6 +43,9 @@ namespace qorvex::css {
 [[nodiscard]] bool MakeDeclarations(PropertyId property, std::string_view valueText, StringPool& strings,
                                     uint8_t flags, CssVector<Declaration>& out);
 
+// The kHasVar and kHasCalc bits of a value text; what stands in quotes or in a comment does not count.
+[[nodiscard]] uint8_t FindExpressionFlags(std::string_view valueText);
+
 // Makes relative image URLs of a value absolute; a base that is not valid leaves them as written. Conversion
 // does it for sheets and style attributes, who makes a declaration otherwise calls this.
 void ResolveImageUrls(Declaration& declaration, const URL& base);

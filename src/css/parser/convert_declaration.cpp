@@ -2,6 +2,7 @@
 
 #include "core/logging/log.h"
 #include "css/parser/convert.h"
+#include "css/parser/scanner.h"
 #include "css/values/text_reader.h"
 #include "css/values/value_text.h"
 
@@ -83,6 +84,25 @@ std::optional<Declaration> MakeDeclaration(PropertyId property, std::string_view
     CssVector<Declaration> made;
     if (!MakeDeclarations(property, valueText, strings, flags, made)) return std::nullopt;
     return made.take_back();
+}
+
+uint8_t FindExpressionFlags(std::string_view valueText) {
+    const auto mentions = [](std::string_view text, std::string_view opening) {
+        return text.find(opening) != std::string_view::npos;
+    };
+    if (!mentions(valueText, "var(") && !mentions(valueText, "calc(")) return 0;
+    const CssString text(valueText);  // the scanner wants a zero at the end
+    Scanner scanner(text.view());
+    Token token;
+    uint8_t flags = 0;
+    for (scanner.Next(token); token.kind != TokenKind::End; scanner.Next(token)) {
+        if (token.kind != TokenKind::Function && !token.Is('(')) continue;
+        // Written as text, "10px - var(--x)" is a dimension and a parenthesis: the bytes decide, not the token.
+        const std::string_view before(text.data(), token.begin + token.size - text.data());
+        if (before.ends_with("var(")) flags |= kHasVar;
+        if (before.ends_with("calc(")) flags |= kHasCalc;
+    }
+    return flags;
 }
 
 bool MakeDeclarations(PropertyId property, std::string_view valueText, StringPool& strings, uint8_t flags,

@@ -37,16 +37,12 @@ bool IncludesWord(std::string_view text, std::string_view word, bool ignoreCase)
     return (at == 0 || text[at - 1] == ' ') && (end == text.size() || text[end] == ' ');
 }
 
-// A whole word, or the start of a word up to a "-". Wider than Selectors Level 4, 6.1, where the attribute is
-// one word.
-bool StartsWordBeforeDash(std::string_view text, std::string_view part, bool ignoreCase) {
-    for (size_t at = Find(text, part, 0, ignoreCase); at != std::string_view::npos;
-         at = Find(text, part, at + 1, ignoreCase)) {
-        const size_t end = at + part.size();
-        const bool startsWord = at == 0 || text[at - 1] == ' ';
-        if (startsWord && (end == text.size() || text[end] == '-' || text[end] == ' ')) return true;
-    }
-    return false;
+// Looser than Selectors Level 4, 6.1: the part may begin anywhere. Only the first occurrence is examined.
+bool EndsBeforeDash(std::string_view text, std::string_view part, bool ignoreCase) {
+    const size_t at = Find(text, part, 0, ignoreCase);
+    if (at == std::string_view::npos) return false;
+    const size_t end = at + part.size();
+    return end == text.size() || text[end] == '-';
 }
 
 bool Compare(const SimpleSelector& simple, std::string_view text) {
@@ -59,8 +55,7 @@ bool Compare(const SimpleSelector& simple, std::string_view text) {
         case AttributeOperator::Includes:
             return !value.empty() && IncludesWord(text, value, simple.ignoreCase);
         case AttributeOperator::DashMatch:
-            return value.empty() ? text.empty() || text[0] == '-'
-                                 : StartsWordBeforeDash(text, value, simple.ignoreCase);
+            return EndsBeforeDash(text, value, simple.ignoreCase);
         // An empty value matches nothing (Selectors Level 4, 6.2).
         case AttributeOperator::Prefix:
             return !value.empty() && SameText(text.substr(0, value.size()), value, simple.ignoreCase);

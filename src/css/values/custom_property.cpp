@@ -24,13 +24,6 @@ bool ForEachReference(std::string_view text, Visitor&& visit) {
 
 }  // namespace
 
-uint8_t FindExpressionFlags(std::string_view valueText) {
-    uint8_t flags = 0;
-    if (valueText.find("var(") != std::string_view::npos) flags |= kHasVar;
-    if (valueText.find("calc(") != std::string_view::npos) flags |= kHasCalc;
-    return flags;
-}
-
 std::optional<CustomExpression> PrepareCustomExpression(std::string_view valueText, StringPool& strings) {
     if (valueText.size() <= kOpening.size()) {
         LogWarning("Expected a custom expression in declaration but declaration is too short!");
@@ -55,6 +48,7 @@ CustomPropertyPtr MakeCustomProperty(std::string_view valueText, uint8_t flags, 
     RefPtr<CustomProperty> made = MakeRef<CustomProperty>();
     made->text = valueText;
     made->flags = flags;
+    if (!(flags & kHasVar)) return made;  // a "var(" in quotes is text
     bool valid = ForEachReference(valueText, [&](size_t offset, size_t length, std::string_view name) {
         made->references.push_back(
             {static_cast<uint32_t>(offset), static_cast<uint32_t>(length), strings.Intern(name)});

@@ -65,7 +65,5 @@ struct SharedCustomProperties : SharedValue<SharedCustomProperties> {
                                                                       StringPool& strings);
 [[nodiscard]] CustomPropertyPtr MakeCustomProperty(std::string_view valueText, uint8_t flags,
                                                    StringPool& strings);
-// The kHasVar and kHasCalc bits of a value text.
-[[nodiscard]] uint8_t FindExpressionFlags(std::string_view valueText);
 
 }  // namespace qorvex::css

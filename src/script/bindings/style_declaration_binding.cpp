@@ -1,4 +1,5 @@
 // The script attributes of CSSStyleDeclaration, made from the property table.
+#include "css/parser/convert.h"
 #include "css/values/custom_property.h"
 #include "css/values/property_table.h"
 #include "css/values/style_declaration_set.h"
