@@ -28,10 +28,21 @@ Edges BleedInset(const BoxShape& shape) {
             inset(shape.border.bottom)};
 }
 
-void ClipToShape(const BoxShape& shape, CommandBuffer& buffer) {
+// Images reach a pixel below each side that hides them, and no further: more would bleed through its edges
+// where these are smoothed.
+Edges HiddenInset(const BoxShape& shape) {
+    auto inset = [&](uint32_t side, float width) {
+        return width > 1 && shape.colors[side].a >= 1 ? std::max(width - 1, 1.0f) : 0.0f;
+    };
+    return {inset(0, shape.border.left), inset(1, shape.border.right), inset(2, shape.border.top),
+            inset(3, shape.border.bottom)};
+}
+
+void ClipToShape(const BoxShape& shape, const Edges& inset, CommandBuffer& buffer) {
+    const Rect rect = layout::Inset(shape.box, inset);
     buffer.PushState(fresco::kStateClip);
-    shape.IsRounded() ? buffer.ClipRoundedRect(shape.box, shape.radii, fresco::kClipIntersect)
-                      : buffer.ClipRect(shape.box, fresco::kClipIntersect);
+    shape.IsRounded() ? buffer.ClipRoundedRect(rect, InsetRadii(shape.radii, inset), fresco::kClipIntersect)
+                      : buffer.ClipRect(rect, fresco::kClipIntersect);
 }
 
 void DrawImageLayer(const ImageSlot& slot, const ResolvedImageLayer& layer, const Rect& box,
@@ -81,7 +92,7 @@ void PaintBackgroundImages(PaintContext& context, const LayoutNode& node, const 
         const css::ImageValue& image = visual.backgroundImage[i];
         const bool isImage = !image.IsGradient() && slots && i < slots->size() && (*slots)[i].resource >= 0;
         if (layout::IsEmpty(layers[i].tile) || (!image.gradient && !isImage)) continue;
-        if (!clipped) ClipToShape(shape, buffer);
+        if (!clipped) ClipToShape(shape, HasBorderImage(visual) ? Edges{} : HiddenInset(shape), buffer);
         clipped = true;
         if (image.gradient) {
             PaintGradientLayer(context, *image.gradient, layers[i], {shape.box.x, shape.box.y}, shape.box,

@@ -3,6 +3,7 @@
 #include "display/path_cache.h"
 
 #include <algorithm>
+#include <cmath>
 
 namespace qorvex::dsp {
 
@@ -20,36 +21,101 @@ bool Draws(const BoxShape& shape, uint32_t side) {
     return (shape.bits & (1u << side)) != 0;
 }
 
-// From an outer corner along the joint of its two sides: to the inner corner, and with a round corner on to
-// where the ring of the border leaves the joint, but not past the middle of the box.
-Point JointEnd(const BoxShape& shape, Point corner, Point radius, float toX, float toY) {
-    const float x = std::fabs(toX), y = std::fabs(toY);
-    float reach = 1;
-    if (x > 0) reach = std::max(reach, radius.x / x);
-    if (y > 0) reach = std::max(reach, radius.y / y);
-    if (x > 0) reach = std::min(reach, std::max(shape.box.width / 2 / x, 1.0f));
-    if (y > 0) reach = std::min(reach, std::max(shape.box.height / 2 / y, 1.0f));
-    return {corner.x + toX * reach, corner.y + toY * reach};
+bool IsVertical(uint32_t side) {
+    return side <= kRight;
 }
 
-// One side's share of the border: its outer edge and the joints with its neighbours.
-void SideQuad(const BoxShape& shape, uint32_t side, Point out[4]) {
-    const Rect& box = shape.box;
-    const Edges& b = shape.border;
-    const Point topLeft{box.x, box.y}, topRight{layout::Right(box), box.y};
-    const Point bottomLeft{box.x, layout::Bottom(box)}, bottomRight{layout::Right(box), layout::Bottom(box)};
-    auto joint = [&](Point corner, Point radius, float x, float y) {
-        return JointEnd(shape, corner, radius, x, y);
-    };
-    const Point innerTopLeft = joint(topLeft, shape.radii.topLeft, b.left, b.top);
-    const Point innerTopRight = joint(topRight, shape.radii.topRight, -b.right, b.top);
-    const Point innerBottomLeft = joint(bottomLeft, shape.radii.bottomLeft, b.left, -b.bottom);
-    const Point innerBottomRight = joint(bottomRight, shape.radii.bottomRight, -b.right, -b.bottom);
-    const Point quads[4][4] = {{topLeft, innerTopLeft, innerBottomLeft, bottomLeft},
-                               {topRight, bottomRight, innerBottomRight, innerTopRight},
-                               {topLeft, topRight, innerTopRight, innerTopLeft},
-                               {bottomLeft, innerBottomLeft, innerBottomRight, bottomRight}};
-    std::copy(quads[side], quads[side] + 4, out);
+// A corner of the box, with the vertical and the horizontal side that meet there.
+struct Corner {
+    uint32_t vertical, horizontal;
+    Point outer;
+    Point to;  // from the outer corner to the inner one
+    Point radius;
+};
+
+Corner TopLeft(const BoxShape& s) {
+    return {kLeft, kTop, {s.box.x, s.box.y}, {s.border.left, s.border.top}, s.radii.topLeft};
+}
+Corner TopRight(const BoxShape& s) {
+    return {kRight, kTop, {layout::Right(s.box), s.box.y}, {-s.border.right, s.border.top}, s.radii.topRight};
+}
+Corner BottomLeft(const BoxShape& s) {
+    return {kLeft,
+            kBottom,
+            {s.box.x, layout::Bottom(s.box)},
+            {s.border.left, -s.border.bottom},
+            s.radii.bottomLeft};
+}
+Corner BottomRight(const BoxShape& s) {
+    return {kRight,
+            kBottom,
+            {layout::Right(s.box), layout::Bottom(s.box)},
+            {-s.border.right, -s.border.bottom},
+            s.radii.bottomRight};
+}
+
+// Two smoothed edges along one line let shine through what is below, so sides meet in a mitre only where
+// nothing else will do. Vertical sides are drawn first.
+enum class Joint {
+    Butt,  // of one colour: the horizontal side takes the corner, the vertical one ends before it
+    Lap,   // both opaque: the mitre of the horizontal side lies on the vertical one
+    Mitre
+};
+
+Joint JointAt(const BoxShape& shape, const Corner& corner) {
+    if (!Draws(shape, corner.vertical) || !Draws(shape, corner.horizontal)) return Joint::Mitre;
+    const fresco::Color &a = shape.colors[corner.vertical], &b = shape.colors[corner.horizontal];
+    if (SameColor(a, b)) return Joint::Butt;
+    return a.a >= 1 && b.a >= 1 ? Joint::Lap : Joint::Mitre;
+}
+
+// One end of a side: on the outer edge of the box and on the inner.
+struct SideEnd {
+    Point outer, inner;
+};
+
+SideEnd SharpEnd(const BoxShape& shape, const Corner& c, uint32_t side) {
+    const Joint joint = JointAt(shape, c);
+    const Point inner{c.outer.x + c.to.x, c.outer.y + c.to.y};
+    if (joint == Joint::Butt) {
+        const Point straight{c.outer.x, inner.y};
+        return IsVertical(side) ? SideEnd{straight, inner} : SideEnd{c.outer, straight};
+    }
+    if (joint == Joint::Lap && IsVertical(side)) return {c.outer, {inner.x, c.outer.y}};
+    return {c.outer, inner};
+}
+
+// Along the joint to the inner corner, and on to where the ring of the border leaves it, but not past the
+// middle of the box.
+SideEnd RoundEnd(const BoxShape& shape, const Corner& c, uint32_t side) {
+    const float x = std::fabs(c.to.x), y = std::fabs(c.to.y);
+    float reach = 1;
+    if (x > 0) reach = std::max(reach, c.radius.x / x);
+    if (y > 0) reach = std::max(reach, c.radius.y / y);
+    if (x > 0) reach = std::min(reach, std::max(shape.box.width / 2 / x, 1.0f));
+    if (y > 0) reach = std::min(reach, std::max(shape.box.height / 2 / y, 1.0f));
+    SideEnd end{c.outer, {c.outer.x + c.to.x * reach, c.outer.y + c.to.y * reach}};
+    const bool opaque = shape.colors[c.vertical].a >= 1 && shape.colors[c.horizontal].a >= 1;
+    if (!IsVertical(side) || !opaque || !(x > 0) || !Draws(shape, c.horizontal)) return end;
+    // About a pixel further, below the horizontal side.
+    const float further = std::copysign(std::min(std::hypot(x, y) / x, 3.0f), c.to.y);
+    end.outer.y -= further;
+    end.inner.y -= further;
+    return end;
+}
+
+// One side's share of the border.
+template <class End>
+void SideQuad(const BoxShape& shape, uint32_t side, End end, Point out[4]) {
+    const Corner first = side == kRight    ? TopRight(shape)
+                         : side == kBottom ? BottomLeft(shape)
+                                           : TopLeft(shape);
+    const Corner last = side == kLeft  ? BottomLeft(shape)
+                        : side == kTop ? TopRight(shape)
+                                       : BottomRight(shape);
+    const SideEnd a = end(shape, first, side), b = end(shape, last, side);
+    const Point quad[4] = {a.outer, a.inner, b.inner, b.outer};
+    std::copy(quad, quad + 4, out);
 }
 
 void PaintSharpBorder(const BoxShape& shape, CommandBuffer& buffer) {
@@ -64,7 +130,7 @@ void PaintSharpBorder(const BoxShape& shape, CommandBuffer& buffer) {
     for (uint32_t side = 0; side < 4; ++side) {
         if (!Draws(shape, side) || shape.colors[side].a <= 0) continue;
         Point quad[4];
-        SideQuad(shape, side, quad);
+        SideQuad(shape, side, SharpEnd, quad);
         buffer.FillQuad(quad, SolidPaint(shape.colors[side]));
     }
 }
@@ -96,11 +162,22 @@ PathPtr FramePath(PaintContext& context, const BoxShape& shape) {
     });
 }
 
+// A stroke has the corners of the ring only where its middle line is round.
+bool IsStroke(const BoxShape& shape) {
+    if ((shape.bits & kShapeIrregular) != 0) return false;
+    const float half = shape.border.left / 2;
+    for (const Point& radius :
+         {shape.radii.topLeft, shape.radii.topRight, shape.radii.bottomRight, shape.radii.bottomLeft}) {
+        if (radius.x > 0 && radius.x <= half) return false;
+    }
+    return true;
+}
+
 // The whole ring in one colour; clips choose what of it shows.
 void PaintRing(PaintContext& context, const BoxShape& shape, const fresco::Color& color,
                CommandBuffer& buffer) {
     Paint paint = SolidPaint(color);
-    if ((shape.bits & kShapeIrregular) != 0) {
+    if (!IsStroke(shape)) {
         const PathPtr path = FramePath(context, shape);
         if (!path) return;
         buffer.PushState(fresco::kStateTransform);
@@ -139,7 +216,7 @@ void PaintRoundBorder(PaintContext& context, const BoxShape& shape, CommandBuffe
     for (uint32_t side = 0; side < 4; ++side) {
         if (!Draws(shape, side) || shape.colors[side].a <= 0) continue;
         Point quad[4];
-        SideQuad(shape, side, quad);
+        SideQuad(shape, side, RoundEnd, quad);
         fresco::Point3 clip[4];
         for (int i = 0; i < 4; ++i)
             clip[i] = {quad[i].x, quad[i].y, 0};

@@ -19,12 +19,27 @@ ImageSlots* SlotsOf(const LayoutNode& node) {
     return static_cast<Box*>(node.display.get())->MaskSlots();
 }
 
+// Outside of this box nothing of the content stays.
+Rect MaskClipBox(const LayoutNode& node, const Rect& box) {
+    switch (node.style.visual->maskClip) {
+        case css::MaskClipType::ContentBox:
+            return layout::Inset(layout::Inset(box, node.border()), node.padding());
+        case css::MaskClipType::PaddingBox:
+            return layout::Inset(box, node.border());
+        default:
+            return box;
+    }
+}
+
 // A gradient has no image: what it paints, as a layer of its own, is what stays of the content.
 void ApplyGradientMask(const LayoutNode& node, PaintContext& context, const ResolvedImageLayer& layer,
-                       const Rect& box, CommandBuffer& buffer) {
+                       const Rect& box, const Rect& clip, CommandBuffer& buffer) {
     CommandBuffer* mask =
         buffer.BeginLayer(fresco::kLayerContent, fresco::MakeLayerPaint(1, fresco::kBlendDestinationIn));
-    PaintGradientLayer(context, *node.style.visual->maskImage.gradient, layer, {box.x, box.y}, box, *mask);
+    mask->PushState(fresco::kStateClip);
+    mask->ClipRect(clip, fresco::kClipIntersect);
+    PaintGradientLayer(context, *node.style.visual->maskImage.gradient, layer, {box.x, box.y}, clip, *mask);
+    mask->PopState();
     mask->EndLayer();
 }
 
@@ -44,8 +59,9 @@ void ApplyMask(const LayoutNode& node, PaintContext& context, CommandBuffer& buf
     if (!node.visuals || node.visuals->masks.empty()) return;
     const ResolvedImageLayer& layer = node.visuals->masks[0];
     const Rect box = PaintBox(node, context.snapToPixels);
+    Rect area = MaskClipBox(node, box);
     if (node.style.visual->maskImage.gradient) {
-        ApplyGradientMask(node, context, layer, box, buffer);
+        ApplyGradientMask(node, context, layer, box, area, buffer);
         return;
     }
     const ImageSlot& slot = (*SlotsOf(node))[0];
@@ -53,15 +69,16 @@ void ApplyMask(const LayoutNode& node, PaintContext& context, CommandBuffer& buf
     Rect tile = layer.tile;
     tile.x += box.x;
     tile.y += box.y;
-    if (!layer.repeatX && !layer.repeatY) {
+    // Along an axis without repeat there is one row or column of tiles.
+    Rect tiles = area;
+    if (!layer.repeatX) tiles.x = tile.x, tiles.width = tile.width;
+    if (!layer.repeatY) tiles.y = tile.y, tiles.height = tile.height;
+    area = layout::Intersection(area, tiles);
+    if (!layer.repeatX && !layer.repeatY && layout::Near(area, tile)) {
         buffer.SetMaskImage(image, tile, slot.source, 0);
-    } else {
-        // Along an axis without repeat there is one row or column of tiles.
-        Rect area = box;
-        if (!layer.repeatX) area.x = tile.x, area.width = tile.width;
-        if (!layer.repeatY) area.y = tile.y, area.height = tile.height;
-        buffer.SetMaskImageTiled(image, area, {slot.source, tile, layer.spacingX, layer.spacingY}, 0);
+        return;
     }
+    buffer.SetMaskImageTiled(image, area, {slot.source, tile, layer.spacingX, layer.spacingY}, 0);
 }
 
 }  // namespace qorvex::dsp

@@ -4,6 +4,10 @@
 // contexts of z-index 0 in tree order, however deep; contexts of positive z-index (CSS 2.1, appendix E,
 // without floats). A positioned node that is no context paints together with its own in-flow content, as one
 // layer.
+//
+// Children of a node that preserves 3D paint from the farthest to the nearest, by the middle of their boxes;
+// only what is equally near keeps the order above. Planes that cross are not cut, and the node's own content
+// stays behind all of them.
 #pragma once
 
 #include "core/memory/temp_vector.h"
@@ -20,6 +24,7 @@ struct PaintEntry {
     uint32_t layer =
         0;  // 0: in flow; else the tree order of the positioned node or context that it paints with
     uint32_t order = 0;  // tree order
+    int32_t depth = 0;   // larger is nearer; 0 for all where space is flat
 };
 
 using PaintList = TempVector<PaintEntry>;

@@ -29,7 +29,13 @@ TEST_F(BoxPaintTest, BackgroundsAndBorders) {
         // Takes room, paints nothing, hides nothing.
         {"background-color: red; border: 4px dashed blue", "FillRect 100 50 60 40 #ff0000ff\n"},
         {"border-top: 4px solid blue; border-left: 2px solid red",
-         "FillQuad 100 50 102 54 102 90 100 90 #ff0000ff\nFillQuad 100 50 160 50 160 54 102 54 #0000ffff\n"},
+         "FillQuad 100 50 102 50 102 90 100 90 #ff0000ff\nFillQuad 100 50 102 54 160 54 160 50 #0000ffff\n"},
+        // A translucent side must not lie on its neighbour.
+        {"border-top: 4px solid #0000ff80; border-left: 2px solid red",
+         "FillQuad 100 50 102 54 102 90 100 90 #ff0000ff\nFillQuad 100 50 102 54 160 54 160 50 #0000ff80\n"},
+        // Of one colour: no joint that shows.
+        {"border-top: 4px solid blue; border-left: 2px solid blue",
+         "FillQuad 100 54 102 54 102 90 100 90 #0000ffff\nFillQuad 100 50 100 54 160 54 160 50 #0000ffff\n"},
         {"background-color: red; border-radius: 8px",
          "FillRoundedRect 100 50 60 40 r 8 8 8 8 8 8 8 8 #ff0000ff\n"},
         // Too large: all radii shrink by the same factor.
@@ -39,6 +45,9 @@ TEST_F(BoxPaintTest, BackgroundsAndBorders) {
         {"background-color: red; width: 40px; border-radius: 50%", "FillEllipse 120 70 20 20 #ff0000ff\n"},
         {"border: 2px solid blue; border-radius: 8px",
          "StrokeRoundedRect 101 51 58 38 r 7 7 7 7 7 7 7 7 #0000ffff\n"},
+        // No stroke has outer corners that are round and inner ones that are not.
+        {"border: 16px solid blue; border-radius: 8px",
+         "PushState 2\nMultiplyTransform 1 0 0 1 100 50\nFillPath #0000ffff\nPopState 0\n"},
         {"border: 2px solid blue; border-radius: 50%", "StrokeEllipse 130 70 29 19 #0000ffff\n"},
         {"border: 2px solid blue; border-top-width: 6px; border-radius: 8px",
          "PushState 2\nMultiplyTransform 1 0 0 1 100 50\nFillPath #0000ffff\nPopState 0\n"},
@@ -49,7 +58,16 @@ TEST_F(BoxPaintTest, BackgroundsAndBorders) {
         std::string records = Join(Frame());
         EXPECT_EQ(records, c.records) << c.style;
     }
-    EXPECT_EQ(caches.paths.Size(), 1u);
+    EXPECT_EQ(caches.paths.Size(), 2u);
+}
+
+TEST_F(BoxPaintTest, ImagesReachAPixelBelowTheSidesThatHideThem) {
+    LayoutHandle* box =
+        page.Add(page.body, std::string(kBox) + "background-image: linear-gradient(red, blue)");
+    page.Change(box, "border: 4px solid blue");
+    EXPECT_EQ(CountOf(Frame(), "ClipRect 103 53 54 34 2"), 1u);
+    page.Change(box, "border: 4px solid #0000ff80; border-top: 1px solid blue");
+    EXPECT_EQ(CountOf(Frame(), "ClipRect 100 50 60 40 2"), 1u);
 }
 
 TEST_F(BoxPaintTest, RoundBordersOfSeveralColoursClipEachSide) {

@@ -63,6 +63,19 @@ TEST_F(PaintOrderTest, ContextsAndClipsKeepTheirChildren) {
     EXPECT_EQ(Order(clip), "clipped");
 }
 
+TEST_F(PaintOrderTest, ChildrenInSpacePaintFromFarToNear) {
+    LayoutHandle* space = Add(page.body, "space", "transform: rotateY(20deg); transform-style: preserve-3d");
+    Add(space, "near", "transform: translateZ(20px)");
+    Add(space, "far", "transform: translateZ(-20px)");
+    Add(space, "plane", "");
+    Add(space, "above", "position: relative");
+    Add(space, "farther", "transform: rotateY(180deg) translateZ(30px); position: relative; z-index: 5");
+    EXPECT_EQ(Order(space), "farther far plane above near");
+    // Flat, the depth counts for nothing.
+    page.Change(space, "transform-style: flat");
+    EXPECT_EQ(Order(space), "plane near far above farther");
+}
+
 TEST_F(PaintOrderTest, WhatTouchesNoAreaIsLeftOut) {
     for (int i = 0; i < 300; ++i)
         Add(page.body, "row", "");
