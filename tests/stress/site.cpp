@@ -6,6 +6,8 @@
 #include <cstring>
 #include <string_view>
 
+#include "../support/image_files.h"
+
 namespace stress {
 namespace {
 
@@ -47,6 +49,16 @@ constexpr File kFiles[] = {
     {"coui://stress/away.html",
      "<html><head><script src=a.js></script></head><body>leaving<script>setTimeout(function () {"
      "try { location.href = 'coui://stress/rich.html'; } catch (e) {} }, 40)</script></body></html>"},
+    {"coui://stress/pictures.html",
+     "<html><head><link rel=stylesheet href=a.css><style>.g{background-image:url(beat.gif);width:20px;height:"
+     "20px}</style></head><body><img id=app src=still.png><img src=cut.gif width=9><img src=none.png><div "
+     "class=g></div><p qor-inline>in <img src=beat.gif> line</p><script>var n = 0, names = ['still.png', "
+     "'beat.gif', 'cut.gif', 'none.png', '', 'a.js'];function swap() { var app = "
+     "document.getElementById('app');"
+     "if (!app || n++ > 300) return; app.src = names[n % 6]; if (n % 4 == 0) app.width = n % 50;"
+     "var lost = new Image(n % 3); lost.onload = lost.onerror = function () { window.told = n; };"
+     "lost.src = names[(n + 1) % 6] + '?' + n % 7; if (n % 5 == 0) { document.body.appendChild(lost);"
+     "lost.parentNode.removeChild(lost); } requestAnimationFrame(swap); } swap();</script></body></html>"},
     {"coui://stress/a.css",
      "@font-face{font-family:Web;src:url(coui://stress/web.ttf)}body{margin:0;background-color:#fff}"
      ".b0{background-color:red;height:10px}.b1{width:50%;opacity:.5}.b2{transform:translate(4px,4px) "
@@ -64,9 +76,17 @@ constexpr File kFiles[] = {
 };
 
 const File* Find(std::string_view url) {
-    const File* found =
-        std::find_if(std::begin(kFiles), std::end(kFiles), [&](const File& file) { return file.url == url; });
-    return found == std::end(kFiles) ? nullptr : found;
+    static const std::string kStill = qorvex::test::Png(qorvex::test::Plain(12, 8, 0xFFCC6633));
+    static const std::string kBeat = qorvex::test::Gif(20, 20, {2, 0, 7});
+    static const File kPictures[] = {{"coui://stress/still.png", kStill},
+                                     {"coui://stress/beat.gif", kBeat},
+                                     {"coui://stress/cut.gif", std::string_view(kBeat).substr(0, 300)}};
+    url = url.substr(0, url.find('?'));
+    const auto named = [&](const File& file) { return file.url == url; };
+    const File* found = std::find_if(std::begin(kFiles), std::end(kFiles), named);
+    if (found != std::end(kFiles)) return found;
+    found = std::find_if(std::begin(kPictures), std::end(kPictures), named);
+    return found == std::end(kPictures) ? nullptr : found;
 }
 
 // A font file that is none: reads come short and garbled.
@@ -89,14 +109,11 @@ class BrokenFont final : public qorvex::ISyncStreamReader {
 
 }  // namespace
 
-const char* const kPages[8] = {
-    "coui://stress/plain.html",
-    "coui://stress/rich.html",
-    "coui://stress/busy.html",
-    "coui://stress/loader.html",
-    "coui://stress/away.html",
-    "coui://stress/missing.html",
-    "relative.html",
+const char* const kPages[9] = {
+    "coui://stress/plain.html",    "coui://stress/rich.html",
+    "coui://stress/busy.html",     "coui://stress/loader.html",
+    "coui://stress/pictures.html", "coui://stress/away.html",
+    "coui://stress/missing.html",  "relative.html",
     "coui://stress/a.js",
 };
 
