@@ -8,6 +8,7 @@
 #include "fresco/commands/buffer_pool.h"
 #include "fresco/core/heap.h"
 #include "fresco/core/log.h"
+#include "fresco/images/animation.h"
 
 namespace fresco {
 namespace {
@@ -83,6 +84,7 @@ void Library::Start(IAllocator* allocator, Logging::ILogHandler* log, uint32_t s
     std::lock_guard lock(process.startMutex);
     if (process.starts++ > 0) return;
     DrainBufferPool();
+    CloseAnimations();
     process.severity.store(severity, std::memory_order_relaxed);
     process.log.store(log, std::memory_order_release);
     process.allocator.store(allocator, std::memory_order_release);
@@ -93,6 +95,7 @@ void Library::Stop() {
     std::lock_guard lock(process.startMutex);
     if (process.starts == 0 || --process.starts > 0) return;
     DrainBufferPool();
+    CloseAnimations();
     process.allocator.store(nullptr, std::memory_order_release);
     process.log.store(nullptr, std::memory_order_release);
 }

@@ -25,7 +25,7 @@ void FreePixels(void* pixels);
 
 bool DecodePng(const uint8_t* data, size_t size, DecodedFrame* frame);
 bool DecodeJpeg(const uint8_t* data, size_t size, const DecodeHints& hints, DecodedFrame* frame);
-// Frames of an animation are asked for in order, from 0 on; what the next one builds on is kept per thread.
+// Frames of an animation are asked for in order, from 0 on (animation.h).
 bool DecodeWebp(const uint8_t* data, size_t size, uint32_t index, DecodedFrame* frame);
 bool DecodeGif(const uint8_t* data, size_t size, uint32_t index, DecodedFrame* frame);
 

@@ -1,30 +1,36 @@
 // GIF: frames are painted on a canvas one after the other. https://www.w3.org/Graphics/GIF/spec-gif89a.txt
 #include <gif_lib.h>
 
-#include "fresco/core/heap.h"
-#include "fresco/images/decoders.h"
+#include "fresco/images/animation.h"
 
 namespace fresco {
 namespace {
 
-// Frames that are wholly there, from a walk over the blocks; 0 for what is no GIF.
-uint32_t CountFrames(const uint8_t* data, size_t size) {
-    if (size < 13) return 0;
+// What a walk over the blocks tells without unpacking any.
+struct GifExtent {
+    uint32_t frames = 0;  // that are wholly there
+    uint64_t pixels = 0;  // of all; a frame may be larger than the canvas, which cuts it
+};
+
+GifExtent MeasureGif(const uint8_t* data, size_t size) {
+    GifExtent extent;
+    if (size < 13) return extent;
     size_t at = 13;
     const auto tableSize = [](uint8_t flags) { return flags & 0x80 ? size_t(3) << ((flags & 7) + 1) : 0; };
     at += tableSize(data[10]);
-    uint32_t frames = 0;
     const auto skipBlocks = [&] {
         while (at < size && data[at] != 0)
             at += size_t(data[at]) + 1;
         return at++ < size;
     };
+    const auto word = [&](size_t offset) { return uint64_t(data[offset]) | uint64_t(data[offset + 1]) << 8; };
     while (at < size && data[at] != 0x3B) {
         if (data[at] == 0x2C) {
             if (size - at < 11) break;
+            extent.pixels += word(at + 5) * word(at + 7);
             at += 10 + tableSize(data[at + 9]) + 1;
             if (!skipBlocks()) break;
-            ++frames;
+            ++extent.frames;
         } else if (data[at] == 0x21) {
             at += 2;
             if (!skipBlocks()) break;
@@ -32,38 +38,33 @@ uint32_t CountFrames(const uint8_t* data, size_t size) {
             break;
         }
     }
-    return frames;
+    return extent;
 }
 
-// The animation that this thread is in the middle of.
-class GifAnimation {
+class GifAnimation final : public AnimationReader {
   public:
-    ~GifAnimation() { Close(); }
-
-    bool Continues(const uint8_t* data, size_t size, uint32_t index) const {
-        return file_ && data_ == data && size_ == size && index > 0 && next_ <= index;
+    using AnimationReader::AnimationReader;
+    ~GifAnimation() override {
+        int error = 0;
+        if (file_) DGifCloseFile(file_, &error);
     }
-    bool Open(const uint8_t* data, size_t size);
-    // Paints frames up to and with `index`.
-    bool Advance(uint32_t index, DecodedFrame* frame);
-    void Close();
+    bool Open();
+    bool ReadNext(DecodedFrame* frame) override;
 
   private:
     static int ReadBytes(GifFileType* file, GifByteType* out, int count);
     bool PaintFrame(const GraphicsControlBlock& control);
     void Dispose();
+    bool GiveFrame(DecodedFrame* frame) const;
 
     GifFileType* file_ = nullptr;
-    const uint8_t* data_ = nullptr;
-    size_t size_ = 0, at_ = 0;
-    uint32_t next_ = 0;
-    uint32_t delay_ = 0;
+    size_t at_ = 0;
+    bool painted_ = false;
     Vector<uint32_t> canvas_, restore_;
     Vector<uint8_t> line_;
     int disposal_ = 0;
     int left_ = 0, top_ = 0, right_ = 0, bottom_ = 0;  // of the last frame, within the canvas
 };
-thread_local GifAnimation t_animation;
 
 int GifAnimation::ReadBytes(GifFileType* file, GifByteType* out, int count) {
     auto* self = static_cast<GifAnimation*>(file->UserData);
@@ -73,31 +74,17 @@ int GifAnimation::ReadBytes(GifFileType* file, GifByteType* out, int count) {
     return int(read);
 }
 
-void GifAnimation::Close() {
-    int error = 0;
-    if (file_) DGifCloseFile(file_, &error);
-    file_ = nullptr;
-    // Emptied alone, the thread would keep the memory, and past the end of the client's allocator.
-    Vector<uint32_t>().swap(canvas_);
-    Vector<uint32_t>().swap(restore_);
-    Vector<uint8_t>().swap(line_);
-}
-
-bool GifAnimation::Open(const uint8_t* data, size_t size) {
-    Close();
-    data_ = data, size_ = size, at_ = 0, next_ = 0, disposal_ = 0;
-    left_ = top_ = right_ = bottom_ = 0;
+bool GifAnimation::Open() {
     int error = 0;
     file_ = DGifOpen(this, ReadBytes, &error);
     if (!file_) return false;
-    const uint64_t width = uint64_t(file_->SWidth), height = uint64_t(file_->SHeight);
-    if (width == 0 || height == 0 || width > kMaxImageSide || height > kMaxImageSide ||
-        width * height * 4 > kMaxImageBytes) {
-        FreePixels(AllocatePixels(width, height));  // says why
-        Close();
+    const GifExtent extent = MeasureGif(data_, size_);
+    // A file that is cut within its first frame shows what there is of it.
+    const uint32_t frames = std::max(1u, extent.frames);
+    if (!SetExtent(uint64_t(std::max(0, file_->SWidth)), uint64_t(std::max(0, file_->SHeight)), frames,
+                   extent.pixels))
         return false;
-    }
-    canvas_.assign(size_t(width * height), 0);
+    canvas_.assign(size_t(Width()) * Height(), 0);
     return true;
 }
 
@@ -146,9 +133,16 @@ bool GifAnimation::PaintFrame(const GraphicsControlBlock& control) {
     return true;
 }
 
-bool GifAnimation::Advance(uint32_t index, DecodedFrame* frame) {
+bool GifAnimation::GiveFrame(DecodedFrame* frame) const {
+    frame->pixels = AllocatePixels(Width(), Height());
+    if (!frame->pixels) return false;
+    std::memcpy(frame->pixels, canvas_.data(), canvas_.size() * 4);
+    return true;
+}
+
+bool GifAnimation::ReadNext(DecodedFrame* frame) {
     GraphicsControlBlock control = {DISPOSAL_UNSPECIFIED, false, 0, NO_TRANSPARENT_COLOR};
-    while (next_ <= index) {
+    for (;;) {
         GifRecordType type;
         if (DGifGetRecordType(file_, &type) == GIF_ERROR || type == TERMINATE_RECORD_TYPE) return false;
         if (type == EXTENSION_RECORD_TYPE) {
@@ -160,37 +154,27 @@ bool GifAnimation::Advance(uint32_t index, DecodedFrame* frame) {
                 if (DGifGetExtensionNext(file_, &block) == GIF_ERROR) return false;
             }
         } else if (type == IMAGE_DESC_RECORD_TYPE) {
-            // A cut first frame shows what there is of it.
             const bool whole = PaintFrame(control);
-            if (!whole && (next_ > 0 || right_ == left_)) return false;
-            delay_ = uint32_t(std::max(0, control.DelayTime));
-            control = {DISPOSAL_UNSPECIFIED, false, 0, NO_TRANSPARENT_COLOR};
-            ++next_;
-            if (!whole) break;
+            if (!whole && (painted_ || right_ == left_)) return false;
+            painted_ = true;
+            if (!frame) return true;
+            frame->delay = uint32_t(std::max(0, control.DelayTime));
+            return GiveFrame(frame);
         }
     }
-    frame->width = uint32_t(file_->SWidth), frame->height = uint32_t(file_->SHeight);
-    frame->delay = delay_;
-    frame->pixels = AllocatePixels(frame->width, frame->height);
-    if (!frame->pixels) return false;
-    std::memcpy(frame->pixels, canvas_.data(), canvas_.size() * 4);
-    return true;
+}
+
+AnimationPtr OpenGif(const uint8_t* data, size_t size) {
+    auto* animation = HeapNew<GifAnimation>(data, size);
+    AnimationPtr owner(animation);
+    if (!animation || !animation->Open()) return nullptr;
+    return owner;
 }
 
 }  // namespace
 
 bool DecodeGif(const uint8_t* data, size_t size, uint32_t index, DecodedFrame* frame) {
-    GifAnimation& animation = t_animation;
-    const uint32_t frames = std::max(1u, CountFrames(data, size));
-    frame->frameCount = frames;
-    if (index >= frames) {
-        animation.Close();
-        return true;
-    }
-    if (!animation.Continues(data, size, index) && !animation.Open(data, size)) return false;
-    const bool read = animation.Advance(index, frame);
-    if (!read || index + 1 >= frames) animation.Close();
-    return read;
+    return ReadAnimationFrame(OpenGif, data, size, index, frame);
 }
 
 }  // namespace fresco

@@ -1,69 +1,56 @@
 #include <webp/decode.h>
 #include <webp/demux.h>
 
-#include "fresco/images/decoders.h"
+#include "fresco/images/animation.h"
 
 namespace fresco {
 namespace {
 
-// The animation that this thread is in the middle of.
-struct Animation {
-    WebPAnimDecoder* decoder = nullptr;
-    const uint8_t* data = nullptr;
-    size_t size = 0;
-    uint32_t next = 0;
-    int timestamp = 0;  // ms, end of the last frame
+class WebpAnimation final : public AnimationReader {
+  public:
+    using AnimationReader::AnimationReader;
+    ~WebpAnimation() override { WebPAnimDecoderDelete(decoder_); }
 
-    ~Animation() { Close(); }
-    void Close() {
-        WebPAnimDecoderDelete(decoder);
-        decoder = nullptr;
-    }
-};
-thread_local Animation t_animation;
-
-bool NextFrame(Animation& animation, const WebPAnimInfo& info, DecodedFrame* frame) {
-    uint8_t* canvas = nullptr;
-    int end = 0;
-    if (!WebPAnimDecoderGetNext(animation.decoder, &canvas, &end)) return false;
-    if (frame) {
-        frame->pixels = AllocatePixels(info.canvas_width, info.canvas_height);
-        if (!frame->pixels) return false;
-        std::memcpy(frame->pixels, canvas, size_t(info.canvas_width) * info.canvas_height * 4);
-        frame->delay = uint32_t(std::max(0, end - animation.timestamp) + 5) / 10;
-    }
-    animation.timestamp = end;
-    ++animation.next;
-    return true;
-}
-
-bool DecodeAnimated(const uint8_t* data, size_t size, uint32_t index, DecodedFrame* frame) {
-    Animation& animation = t_animation;
-    const bool goesOn = animation.decoder && animation.data == data && animation.size == size &&
-                        animation.next <= index && index > 0;
-    if (!goesOn) {
-        animation.Close();
-        const WebPData webp{data, size};
+    bool Open() {
+        const WebPData webp{data_, size_};
+        // The decoder takes the canvas twice before we could say no, so the header is asked first.
+        WebPDemuxer* demuxer = WebPDemux(&webp);
+        if (!demuxer) return false;
+        const bool fits = SetExtent(WebPDemuxGetI(demuxer, WEBP_FF_CANVAS_WIDTH),
+                                    WebPDemuxGetI(demuxer, WEBP_FF_CANVAS_HEIGHT),
+                                    WebPDemuxGetI(demuxer, WEBP_FF_FRAME_COUNT), 0);
+        WebPDemuxDelete(demuxer);
         WebPAnimDecoderOptions options;
-        if (!WebPAnimDecoderOptionsInit(&options)) return false;
+        if (!fits || !WebPAnimDecoderOptionsInit(&options)) return false;
         options.color_mode = MODE_RGBA;
-        animation.decoder = WebPAnimDecoderNew(&webp, &options);
-        animation.data = data, animation.size = size, animation.next = 0, animation.timestamp = 0;
+        decoder_ = WebPAnimDecoderNew(&webp, &options);
+        return decoder_ != nullptr;
     }
-    WebPAnimInfo info;
-    if (!animation.decoder || !WebPAnimDecoderGetInfo(animation.decoder, &info)) return false;
-    frame->width = info.canvas_width, frame->height = info.canvas_height;
-    frame->frameCount = info.frame_count;
-    if (index >= info.frame_count) {
-        animation.Close();
+
+    bool ReadNext(DecodedFrame* frame) override {
+        uint8_t* canvas = nullptr;
+        int end = 0;
+        if (!WebPAnimDecoderGetNext(decoder_, &canvas, &end)) return false;
+        const int duration = std::max(0, end - timestamp_);
+        timestamp_ = end;
+        if (!frame) return true;
+        frame->delay = uint32_t(duration + 5) / 10;
+        frame->pixels = AllocatePixels(Width(), Height());
+        if (!frame->pixels) return false;
+        std::memcpy(frame->pixels, canvas, size_t(Width()) * Height() * 4);
         return true;
     }
-    while (animation.next < index) {
-        if (!NextFrame(animation, info, nullptr)) return animation.Close(), false;
-    }
-    const bool read = NextFrame(animation, info, frame);
-    if (!read || animation.next >= info.frame_count) animation.Close();
-    return read;
+
+  private:
+    WebPAnimDecoder* decoder_ = nullptr;
+    int timestamp_ = 0;  // ms, end of the last frame
+};
+
+AnimationPtr OpenWebp(const uint8_t* data, size_t size) {
+    auto* animation = HeapNew<WebpAnimation>(data, size);
+    AnimationPtr owner(animation);
+    if (!animation || !animation->Open()) return nullptr;
+    return owner;
 }
 
 }  // namespace
@@ -72,13 +59,7 @@ bool DecodeWebp(const uint8_t* data, size_t size, uint32_t index, DecodedFrame* 
     WebPBitstreamFeatures features;
     if (WebPGetFeatures(data, size, &features) != VP8_STATUS_OK) return false;
     const uint64_t width = uint64_t(features.width), height = uint64_t(features.height);
-    if (features.has_animation) {
-        // The library takes the canvas twice before we could say no.
-        if (width > kMaxImageSide || height > kMaxImageSide || width * height * 4 > kMaxImageBytes) {
-            return AllocatePixels(width, height) != nullptr;
-        }
-        return DecodeAnimated(data, size, index, frame);
-    }
+    if (features.has_animation) return ReadAnimationFrame(OpenWebp, data, size, index, frame);
     frame->width = uint32_t(width), frame->height = uint32_t(height);
     frame->hasAlpha = features.has_alpha;
     if (index > 0) return true;

@@ -33,6 +33,7 @@ class IDisplayElement : public AtomicRefCounted<IDisplayElement, MemoryTag::Rend
         kHasMask = 1u << 2,
         kIsText = 1u << 3,         // a DisplayText
         kFlowsChildren = 1u << 4,  // a DisplayParagraph: it gives its children their boxes
+        kReplaced = 1u << 5,       // a DisplayImage: sides that the style leaves open come from its content
     };
 
     IDisplayElement(const IDisplayElement&) = delete;

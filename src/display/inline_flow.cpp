@@ -31,7 +31,7 @@ bool IsText(const LayoutNode& node) {
 // Its content flows with the lines around it; without content it is a box like others.
 bool IsInline(const LayoutNode& node) {
     return node.style.layout->display == css::CSSDisplay::Inline && !node.children.empty() &&
-           !node.flags.measuredByDisplayElement;
+           !node.flags.measuredByDisplayElement && !node.flags.isReplaced;
 }
 
 // Edges that Yoga has resolved for a node of its own tree; percentages have no base there and count as 0.

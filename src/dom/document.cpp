@@ -92,6 +92,7 @@ void Document::DropTree() {
     ids_.clear();
     collections_.clear();
     deferred_scripts_.clear();
+    std::exchange(waiting_for_images_, {});
     for (NodeSet* set :
          {&style_dirty_nodes_, &selector_dirty_elements_, &layout_changes_, &transform_changes_,
           &visual_changes_, &restyle_changes_, &text_commits_, &image_changes_, &image_commits_})
@@ -109,6 +110,7 @@ void Document::Unload() {
     if (IImageLoader* images = host_->GetImageLoader()) images->ForgetDocument(*this);
     if (ISVGLoader* svgs = host_->GetSVGLoader()) svgs->ForgetDocument(*this);
     image_clock_.Clear();
+    std::exchange(waiting_for_images_, {});
     if (loader_) loader_->StopLoading();
     builder_.reset();
     build_state_ = BuildState::Built;

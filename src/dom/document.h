@@ -188,6 +188,10 @@ class Document : public Element {
     }
     // Images that hold back "load".
     void CountPendingImage(int change) { pending_images_ += change; }
+    // An element that waits for its image lives, and holds back "load", until it has had its event or the
+    // page ends.
+    void HoldForImage(Node& node);
+    void LetGoForImage(Node& node);
 
     // Work that the next frame runs on the layout channel ahead of its layout.
     using LayoutTask = Function<void(TaskFamilyHandle), MemoryTag::DOM>;
@@ -318,6 +322,7 @@ class Document : public Element {
 
     ImageClock image_clock_;
     int pending_images_ = 0;
+    HashMap<Node*, qsl::RefPtr<Node>, MemoryTag::DOM> waiting_for_images_;
 
     EventListenerTable listeners_;
     NodeVector doomed_;

@@ -81,7 +81,7 @@ void Document::RunDeferredScripts() {
 }
 
 bool Document::HasPendingWork() const {
-    return pending_images_ > 0 || loader_->HasPendingWork();
+    return pending_images_ > 0 || !waiting_for_images_.empty() || loader_->HasPendingWork();
 }
 
 void Document::MaybeFinishLoad() {

@@ -173,6 +173,18 @@ IImageLoader* Document::GetImageLoader() const {
     return unloaded_ ? nullptr : host_->GetImageLoader();
 }
 
+void Document::HoldForImage(Node& node) {
+    if (!unloaded_) waiting_for_images_[&node] = RefPtr<Node>(&node);
+}
+
+void Document::LetGoForImage(Node& node) {
+    // It may be the last reference, and must not end inside the map.
+    RefPtr<Node>* held = waiting_for_images_.get(&node);
+    if (!held) return;
+    const RefPtr<Node> last = std::move(*held);
+    waiting_for_images_.erase(&node);
+}
+
 ISVGLoader* Document::GetSVGLoader() const {
     return unloaded_ ? nullptr : host_->GetSVGLoader();
 }

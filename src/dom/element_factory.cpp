@@ -7,6 +7,7 @@
 #include "dom/ascii.h"
 #include "dom/document.h"
 #include "dom/html_elements.h"
+#include "dom/html_image_element.h"
 #include "dom/html_link_element.h"
 #include "dom/html_script_element.h"
 #include "dom/html_style_element.h"

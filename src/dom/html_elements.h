@@ -1,4 +1,4 @@
-// The element classes whose own behaviour is small or comes with a subsystem of its own (controls, images,
+// The element classes whose own behaviour is small or comes with a subsystem of its own (controls,
 // canvas, media, custom elements). Each is a plain HTMLElement otherwise.
 #pragma once
 
@@ -15,7 +15,6 @@ namespace qorvex::dom {
     X(HTMLButtonElement, kIsFormControl) \
     X(HTMLSourceElement, 0)              \
     X(HTMLCanvasElement, 0)              \
-    X(HTMLImageElement, 0)               \
     X(HTMLTextAreaElement, kIsFormControl)
 
 #define QORVEX_DECLARE(Class, flags)                                                     \

@@ -13,9 +13,14 @@ namespace qorvex::layout {
 
 namespace {
 
+// Yoga asks such a node for its size and takes no children for it.
+bool IsMeasured(const LayoutNode& node) {
+    return node.flags.measuredByDisplayElement || node.flags.isReplaced;
+}
+
 // Measured nodes are leaves to Yoga, and so is the last level that takes part in layout.
 uint32_t FlexChildCount(const LayoutNode& node) {
-    const bool leaf = node.flags.measuredByDisplayElement || node.depth + 1 >= limits::kMaxLayoutDepth;
+    const bool leaf = IsMeasured(node) || node.depth + 1 >= limits::kMaxLayoutDepth;
     return leaf ? 0 : static_cast<uint32_t>(node.children.size());
 }
 
@@ -32,9 +37,9 @@ void ReportDepth(LayoutHandle& handle) {
 static void SyncOneLevel(LayoutHandle& handle, const HandleSet* changed, TempVector<LayoutHandle*>& made) {
     LayoutNode& node = handle.node();
     YGNode* owner = node.flex;
-    if (!node.flags.measuredByDisplayElement) YGNodeSetMeasureFunc(owner, nullptr);
+    if (!IsMeasured(node)) YGNodeSetMeasureFunc(owner, nullptr);
     const uint32_t wanted = FlexChildCount(node);
-    if (wanted == 0 && !node.children.empty() && !node.flags.measuredByDisplayElement) ReportDepth(handle);
+    if (wanted == 0 && !node.children.empty() && !IsMeasured(node)) ReportDepth(handle);
     const bool flows = node.display && node.display->Has(dsp::IDisplayElement::kFlowsChildren);
     if (flows) handle.store().flowsText = true;
     // What a paragraph flows is no child of its node, but the flow asks Yoga for edges and sizes of it.
@@ -68,8 +73,7 @@ static void SyncOneLevel(LayoutHandle& handle, const HandleSet* changed, TempVec
         if (YGNode* former = YGNodeGetOwner(child)) YGNodeRemoveChild(former, child);
         YGNodeInsertChild(owner, child, i);
     }
-    if (node.flags.measuredByDisplayElement && !YGNodeHasMeasureFunc(owner))
-        YGNodeSetMeasureFunc(owner, MeasureFlexNode);
+    if (IsMeasured(node) && !YGNodeHasMeasureFunc(owner)) YGNodeSetMeasureFunc(owner, MeasureFlexNode);
 }
 
 static void SyncFlexTree(LayoutHandle& handle, const HandleSet* changed) {

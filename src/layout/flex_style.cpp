@@ -96,9 +96,31 @@ void SyncContainer(YGNodeRef node, const LayoutStyle& style, css::TextAlignType 
     YGNodeStyleSetFlexDirection(node, direction);
     YGNodeStyleSetJustifyContent(node, justify);
     YGNodeStyleSetAlignItems(node, items);
-    YGNodeStyleSetAlignSelf(node, Pick(kAlignSelf, style.alignSelf));
     YGNodeStyleSetAlignContent(node, Pick(kAlignItems, style.alignContent));
     YGNodeStyleSetFlexWrap(node, Pick(kFlexWraps, style.flexWrap));
+}
+
+// A picture stretches in flex containers alone; in lines and blocks it keeps its size.
+YGAlign SelfAlignment(const LayoutNode& node) {
+    const YGAlign self = Pick(kAlignSelf, node.style.layout->alignSelf);
+    if (self != YGAlignAuto || !node.flags.isReplaced || node.parent == nullptr) return self;
+    const LayoutNode& parent = node.parent->node();
+    if (parent.style.layout->display == css::CSSDisplay::Flex) return self;
+    const css::TextAlignType align = parent.style.text->textAlign;
+    const bool aligned = parent.style.layout->display != css::CSSDisplay::Inline &&
+                         (align == css::TextAlignType::Right || align == css::TextAlignType::Center);
+    return aligned ? self : YGAlignFlexStart;
+}
+
+// Children that stand for themselves need not have changed when their container becomes another kind.
+void SyncChildAlignment(LayoutNode& container) {
+    const bool isFlex = container.style.layout->display == css::CSSDisplay::Flex;
+    if (std::exchange(container.wasFlexContainer, isFlex) == isFlex) return;
+    for (const HandlePtr& child : container.children) {
+        const LayoutNode& node = child->node();
+        if (node.flags.isReplaced && node.flex != nullptr)
+            YGNodeStyleSetAlignSelf(node.flex, SelfAlignment(node));
+    }
 }
 
 void SyncFlex(YGNodeRef node, const css::CSSFlexValue& flex, const FlexStyleContext& context) {
@@ -191,16 +213,25 @@ void SyncPosition(YGNodeRef node, const LayoutNode& layoutNode, const LayoutStyl
                   const FlexStyleContext& c) {
     const float viewWidth = c.lengths.vw * 100;
     const float viewHeight = c.lengths.vh * 100;
+    // Between opposite insets Yoga would stretch a picture; the first one alone places it.
+    const auto second = [&](const Extent& size, const Extent& start, const Extent& end) {
+        const bool gives = !layoutNode.flags.isReplaced || size.IsLength() || !start.IsLength();
+        return gives ? end : Extent{};
+    };
     SyncInset(node, YGEdgeLeft, style.left, layoutNode, viewWidth, c.lengths);
-    SyncInset(node, YGEdgeRight, style.right, layoutNode, viewWidth, c.lengths);
+    SyncInset(node, YGEdgeRight, second(style.width, style.left, style.right), layoutNode, viewWidth,
+              c.lengths);
     SyncInset(node, YGEdgeTop, style.top, layoutNode, viewHeight, c.lengths);
-    SyncInset(node, YGEdgeBottom, style.bottom, layoutNode, viewHeight, c.lengths);
+    SyncInset(node, YGEdgeBottom, second(style.height, style.top, style.bottom), layoutNode, viewHeight,
+              c.lengths);
 }
 
-// Opposite insets of a fixed box with an auto size give its size, as they do for an absolute one.
-Extent FixedSize(const Extent& size, const Extent& start, const Extent& end, float viewSize,
-                 const LengthContext& lengths) {
-    if (size.IsLength() || !start.IsLength() || !end.IsLength()) return AgainstView(size, viewSize);
+// Opposite insets of a fixed box with an auto size give its size, as they do for an absolute one; not that of
+// a picture.
+Extent FixedSize(const LayoutNode& node, const Extent& size, const Extent& start, const Extent& end,
+                 float viewSize, const LengthContext& lengths) {
+    if (size.IsLength() || !start.IsLength() || !end.IsLength() || node.flags.isReplaced)
+        return AgainstView(size, viewSize);
     const float taken = ResolveExtent(start, lengths, viewSize, 0) + ResolveExtent(end, lengths, viewSize, 0);
     return Extent::Pixels(std::fmax(viewSize - taken, 0.0f));
 }
@@ -210,9 +241,10 @@ void SyncSizes(YGNodeRef node, const LayoutNode& layoutNode, const LayoutStyle& 
     if (layoutNode.flags.isFixed) {
         const float viewWidth = lengths.vw * 100;
         const float viewHeight = lengths.vh * 100;
-        SetLength(node, kWidth, FixedSize(style.width, style.left, style.right, viewWidth, lengths), lengths);
-        SetLength(node, kHeight, FixedSize(style.height, style.top, style.bottom, viewHeight, lengths),
-                  lengths);
+        SetLength(node, kWidth,
+                  FixedSize(layoutNode, style.width, style.left, style.right, viewWidth, lengths), lengths);
+        SetLength(node, kHeight,
+                  FixedSize(layoutNode, style.height, style.top, style.bottom, viewHeight, lengths), lengths);
         SetLength(node, kMinWidth, AgainstView(style.minWidth, viewWidth), lengths);
         SetLength(node, kMinHeight, AgainstView(style.minHeight, viewHeight), lengths);
         SetLength(node, kMaxWidth, AgainstView(style.maxWidth, viewWidth), lengths);
@@ -271,6 +303,8 @@ bool SyncStyleToYoga(LayoutHandle& handle, FlexStyleContext& context) {
     YGNodeStyleSetDisplay(node, YGDisplayFlex);
     YGNodeStyleSetPositionType(node, PositionType(layoutNode, &handle == context.root));
     SyncContainer(node, style, layoutNode.style.text->textAlign);
+    YGNodeStyleSetAlignSelf(node, SelfAlignment(layoutNode));
+    SyncChildAlignment(layoutNode);
     SyncFlex(node, style.flex, context);
     SyncEdges(node, style, context.lengths);
     SyncSizes(node, layoutNode, style, context.lengths);

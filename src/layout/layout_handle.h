@@ -46,6 +46,7 @@ struct NodeFlags {
     bool containsFixedDescendants = false;  // has a transform, a perspective or a filter
     bool preserves3d = false;
     bool measuredByDisplayElement = false;
+    bool isReplaced = false;  // sides that its style leaves open come from its display element
 };
 
 // An immutable record of the layout side that several nodes and both halves hold.
@@ -182,6 +183,8 @@ struct LayoutNode {
     bool descendantNeedsTransform = false;
     // The commit gave the node other children, so what their bounds add up to is not known.
     bool childrenChanged = false;
+    // What Yoga was told last about the node as a container.
+    bool wasFlexContainer = false;
 
     const Edges& border() const { return edges.border(); }
     const Edges& padding() const { return edges.padding(); }

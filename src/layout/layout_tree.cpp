@@ -3,6 +3,7 @@
 #include "core/memory/temp_vector.h"
 #include "display/dirty_region.h"
 #include "layout/layout_store.h"
+#include "layout/node_flags.h"
 
 #include <algorithm>
 
@@ -24,7 +25,7 @@ HandlePtr LayoutTree::Create(NewNode&& node) {
     data.node = std::move(node.link);
     data.scroll = node.scroll;
     data.isImage = node.isImage;
-    data.flags.measuredByDisplayElement = data.display && data.display->Has(dsp::IDisplayElement::kMeasures);
+    SetDisplayFlags(data.flags, data.display.get());
     data.changed = true;
     changed_.Insert(handle.get());
     return handle;
@@ -119,7 +120,7 @@ void LayoutTree::SetScroll(LayoutHandle& handle, ScrollPosition scroll) {
 void LayoutTree::SetDisplayElement(LayoutHandle& handle, dsp::DisplayElementPtr display) {
     LayoutData& data = handle.data();
     data.display = std::move(display);
-    data.flags.measuredByDisplayElement = data.display && data.display->Has(dsp::IDisplayElement::kMeasures);
+    SetDisplayFlags(data.flags, data.display.get());
     MarkChanged(handle);
 }
 

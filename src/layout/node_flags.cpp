@@ -15,7 +15,12 @@ void RefreshNodeFlags(LayoutNode& node) {
                                      transform.perspective.kind != css::PerspectiveKind::None ||
                                      !node.style.visual->filter.empty();
     flags.preserves3d = transform.transformStyle == css::TransformStyleProperty::Preserve3D;
-    flags.measuredByDisplayElement = node.display && node.display->Has(dsp::IDisplayElement::kMeasures);
+    SetDisplayFlags(flags, node.display.get());
+}
+
+void SetDisplayFlags(NodeFlags& flags, const dsp::IDisplayElement* display) {
+    flags.measuredByDisplayElement = display && display->Has(dsp::IDisplayElement::kMeasures);
+    flags.isReplaced = display && display->Has(dsp::IDisplayElement::kReplaced);
 }
 
 }  // namespace qorvex::layout

@@ -6,5 +6,7 @@
 namespace qorvex::layout {
 
 void RefreshNodeFlags(LayoutNode& node);
+// Those that follow from the display element, which may be null.
+void SetDisplayFlags(NodeFlags& flags, const dsp::IDisplayElement* display);
 
 }  // namespace qorvex::layout

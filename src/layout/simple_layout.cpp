@@ -70,7 +70,7 @@ float AtLeastZero(float value) {
 
 // Extents of the in-flow children add up, although the children overlap.
 void FitAutoSizes(LayoutNode& node, const LayoutStyle& style) {
-    if (node.flags.measuredByDisplayElement) return;
+    if (node.flags.measuredByDisplayElement || node.flags.isReplaced) return;
     if (style.width.IsLength() && style.height.IsLength()) return;
     Size sum{node.padding().left + node.padding().right + node.border().left + node.border().right,
              node.padding().top + node.padding().bottom + node.border().top + node.border().bottom};
@@ -82,6 +82,26 @@ void FitAutoSizes(LayoutNode& node, const LayoutStyle& style) {
     }
     if (!style.width.IsLength()) node.box.width = sum.width;
     if (!style.height.IsLength()) node.box.height = sum.height;
+}
+
+// Given sides are those of the border box; open ones follow from the picture.
+Size SizeReplaced(LayoutHandle& handle, const LayoutStyle& style, const LengthContext& lengths,
+                  const Rect& containing) {
+    const LayoutNode& node = handle.node();
+    const Edges &border = node.border(), &padding = node.padding();
+    const float across = border.left + border.right + padding.left + padding.right;
+    const float down = border.top + border.bottom + padding.top + padding.bottom;
+    const auto inner = [&](const css::Extent& side, float base, float edges) {
+        return side.IsLength() ? AtLeastZero(ResolveExtent(side, lengths, base, 0) - edges) : kUnknown;
+    };
+    const auto mode = [](const css::Extent& side) {
+        return side.IsLength() ? dsp::MeasureMode::Exactly : dsp::MeasureMode::Undefined;
+    };
+    Size size;
+    node.display->Measure(handle, inner(style.width, containing.width, across),
+                          inner(style.height, containing.height, down), mode(style.width), mode(style.height),
+                          size);
+    return {size.width + across, size.height + down};
 }
 
 // A paragraph reads edges and sizes of what it flows from the nodes of the flex engine.
@@ -120,6 +140,10 @@ void LayoutSimpleSubtree(LayoutHandle& handle, LayoutPass& pass, LengthContext l
         ++pass.update.counters.measured;
         node.box.width = AtLeastZero(size.width);
         node.box.height = AtLeastZero(size.height);
+    } else if (node.flags.isReplaced) {
+        const Size size = SizeReplaced(handle, style, lengths, containing);
+        node.box.width = size.width;
+        node.box.height = size.height;
     } else {
         node.box.width = AtLeastZero(ResolveExtent(style.width, lengths, containing.width, 0));
         node.box.height = AtLeastZero(ResolveExtent(style.height, lengths, containing.height, 0));

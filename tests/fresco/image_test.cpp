@@ -40,8 +40,13 @@ std::vector<uint8_t> Webp() {
     return file;
 }
 
-// Two frames of 2 by 1: red and blue, then a green pixel over the first.
-std::vector<uint8_t> Gif() {
+struct GifFrame {
+    int width, height;
+    int delay;
+    uint8_t color;  // of the first pixel; all others are blue
+};
+
+std::vector<uint8_t> MakeGif(int width, int height, const std::vector<GifFrame>& frames) {
     std::vector<uint8_t> file;
     int error = 0;
     GifFileType* gif = EGifOpen(
@@ -55,19 +60,26 @@ std::vector<uint8_t> Gif() {
     const GifColorType colors[4] = {{255, 0, 0}, {0, 0, 255}, {0, 255, 0}, {0, 0, 0}};
     ColorMapObject* map = GifMakeMapObject(4, colors);
     EGifSetGifVersion(gif, true);
-    EGifPutScreenDesc(gif, 2, 1, 2, 0, map);
-    for (int frame = 0; frame < 2; ++frame) {
-        const GraphicsControlBlock control = {DISPOSE_DO_NOT, false, frame ? 1 : 7, NO_TRANSPARENT_COLOR};
+    EGifPutScreenDesc(gif, width, height, 2, 0, map);
+    for (const GifFrame& frame : frames) {
+        const GraphicsControlBlock control = {DISPOSE_DO_NOT, false, frame.delay, NO_TRANSPARENT_COLOR};
         GifByteType block[4];
         EGifGCBToExtension(&control, block);
         EGifPutExtension(gif, GRAPHICS_EXT_FUNC_CODE, 4, block);
-        GifPixelType line[2] = {GifPixelType(frame ? 2 : 0), 1};
-        EGifPutImageDesc(gif, 0, 0, frame ? 1 : 2, 1, false, nullptr);
-        EGifPutLine(gif, line, frame ? 1 : 2);
+        EGifPutImageDesc(gif, 0, 0, frame.width, frame.height, false, nullptr);
+        std::vector<GifPixelType> line(size_t(frame.width), 1);
+        line[0] = frame.color;
+        for (int y = 0; y < frame.height; ++y)
+            EGifPutLine(gif, line.data(), frame.width);
     }
     EGifCloseFile(gif, &error);
     GifFreeMapObject(map);
     return file;
+}
+
+// Red and blue, then a green pixel over the first.
+std::vector<uint8_t> Gif() {
+    return MakeGif(2, 1, {{2, 1, 7, 0}, {1, 1, 1, 2}});
 }
 
 std::vector<uint8_t> Png() {
@@ -102,6 +114,46 @@ TEST(Image, DecodesEachFormat) {
     EXPECT_EQ(second.bytes, (std::vector<uint8_t>{0, 255, 0, 255, 0, 0, 255, 255}));
     EXPECT_EQ(past.result, ImageDecodeResult::LastFrame);
     EXPECT_TRUE(past.bytes.empty());
+}
+
+// Frames that are asked for out of order, of several files in turn, and by callers who stop in the middle.
+TEST(Image, AnimationsAreReadInAnyOrder) {
+    const std::vector<uint8_t> red = {255, 0, 0, 255}, blue = {0, 0, 255, 255}, green = {0, 255, 0, 255};
+    const auto a = MakeGif(1, 1, {{1, 1, 0, 0}, {1, 1, 0, 1}, {1, 1, 0, 2}});
+    const auto b = MakeGif(1, 1, {{1, 1, 0, 2}, {1, 1, 0, 0}, {1, 1, 0, 1}});
+    EXPECT_EQ(Decode(a, 0).bytes, red);
+    EXPECT_EQ(Decode(b, 0).bytes, green);
+    EXPECT_EQ(Decode(a, 2).bytes, green);
+    EXPECT_EQ(Decode(b, 1).bytes, red);
+    EXPECT_EQ(Decode(b, 0).bytes, green);
+    EXPECT_EQ(Decode(a, 1).bytes, blue);
+
+    Canvas canvas;  // counts what stays behind at its end
+    const long before = canvas.allocator.live;
+    std::vector<std::vector<uint8_t>> files(200, a);
+    for (const auto& file : files)
+        Decode(file, 0);
+    EXPECT_LT(canvas.allocator.live - before, 200);  // the oldest made room
+}
+
+TEST(Image, AnimationsBeyondTheLimitsAreRefused) {
+    Canvas canvas;
+    const GifFrame dot = {1, 1, 0, 0};
+    const auto many = MakeGif(1, 1, std::vector<GifFrame>(kMaxAnimationFrames, dot));
+    uint32_t shown = 0;
+    for (uint32_t i = 0; i < kMaxAnimationFrames; ++i)
+        shown += Decode(many, i).bytes.size() == 4;
+    EXPECT_EQ(shown, kMaxAnimationFrames);
+    EXPECT_TRUE(canvas.log.lines.empty());
+
+    EXPECT_EQ(Decode(MakeGif(1, 1, std::vector<GifFrame>(kMaxAnimationFrames + 1, dot))).result,
+              ImageDecodeResult::Failed);
+    EXPECT_EQ(Decode(MakeGif(8192, 4096, {dot, dot, dot})).result, ImageDecodeResult::Failed);
+    // Frames that unpack to far more than the canvas which cuts them.
+    const auto wide = MakeGif(1, 1, std::vector<GifFrame>(5, {16000, 1000, 0, 0}));
+    EXPECT_EQ(Decode(wide).result, ImageDecodeResult::Failed);
+    ASSERT_EQ(canvas.log.lines.size(), 3u);
+    EXPECT_EQ(canvas.log.lines[1], "Refusing to decode an animation of 3 frames of 8192 x 4096 pixels");
 }
 
 TEST(Image, DamagedFilesFailWithoutHarm) {

@@ -6,6 +6,8 @@
 #include <fstream>
 #include <sstream>
 
+#include "support/image_files.h"
+
 namespace qorvex::pages {
 namespace {
 
@@ -18,6 +20,25 @@ std::string ReadFile(std::istream& lines, int& number) {
         text += line + "\n";
     }
     return text;
+}
+
+// "NAME WxH RRGGBB", or a delay for each frame instead of the colour.
+std::pair<std::string, std::string> ReadPicture(const std::string& line, bool animated) {
+    std::istringstream words(line);
+    std::string name, size;
+    words >> name >> size;
+    unsigned width = 0, height = 0;
+    EXPECT_EQ(std::sscanf(size.c_str(), "%ux%u", &width, &height), 2) << line;
+    if (animated) {
+        std::vector<uint32_t> delays;
+        for (uint32_t delay; words >> delay;)
+            delays.push_back(delay);
+        return {name, test::Gif(width, height, delays)};
+    }
+    uint32_t rgb = 0;
+    EXPECT_TRUE(words >> std::hex >> rgb) << line;
+    const uint32_t rgba = (rgb >> 16 & 255) | (rgb & 0xFF00) | (rgb & 255) << 16 | 0xFF000000;
+    return {name, test::Png(test::Plain(width, height, rgba))};
 }
 
 }  // namespace
@@ -52,6 +73,8 @@ PageCase ReadPageCase(const std::string& path, bool (*isDirective)(const std::st
         const auto [word, rest] = SplitAt(line, ' ');
         if (word == "file") {
             page.files.emplace_back(rest, ReadFile(lines, number));
+        } else if (word == "picture" || word == "animation") {
+            page.files.push_back(ReadPicture(rest, word == "animation"));
         } else if (word == "simple") {
             page.complexSelectors = false;
         } else if (word == "view") {

@@ -4,6 +4,8 @@
 //   view WxH                    size before loading (1000x500)
 //   simple selectors            a game that switched the restyling of combinators off
 //   file NAME ... end           a file beside the page, for links
+//   picture NAME WxH RRGGBB     a PNG beside the page
+//   animation NAME WxH DELAY... a GIF beside the page: red, blue, green frames, hundredths of a second each
 //   expect SELECTOR { property: value; ... }   the computed style of the first match
 //   same SELECTOR | SELECTOR    all longhands alike
 //   feed SELECTOR               every longhand's text, set on a fresh sibling, gives the same style again
@@ -14,6 +16,8 @@
 //   js EXPRESSION | TEXT        what the page's script makes of it
 //   script STATEMENTS           runs, then a frame
 //   resize WxH                  and a frame
+//   wait MILLISECONDS           one frame, that much later
+//   requests NAME | N           how often the file was asked for
 //   log LEVEL TEXT              must be logged; TEXT may end in "..." for any rest
 //   nolog TEXT                  no line has this in it
 //

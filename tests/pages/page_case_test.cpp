@@ -63,10 +63,13 @@ class CaseRunner {
 
     static const std::map<std::string, Handler>& Handlers() {
         static const std::map<std::string, Handler> kHandlers = {
-            {"expect", &CaseRunner::Expect}, {"same", &CaseRunner::Same},   {"feed", &CaseRunner::Feed},
-            {"none", &CaseRunner::None},     {"box", &CaseRunner::Box},     {"snapped", &CaseRunner::Snapped},
-            {"pixel", &CaseRunner::Pixel},   {"js", &CaseRunner::Evaluate}, {"script", &CaseRunner::Script},
-            {"resize", &CaseRunner::Resize}, {"log", &CaseRunner::NoteLog}, {"nolog", &CaseRunner::NoLog}};
+            {"expect", &CaseRunner::Expect}, {"same", &CaseRunner::Same},
+            {"feed", &CaseRunner::Feed},     {"none", &CaseRunner::None},
+            {"box", &CaseRunner::Box},       {"snapped", &CaseRunner::Snapped},
+            {"pixel", &CaseRunner::Pixel},   {"js", &CaseRunner::Evaluate},
+            {"script", &CaseRunner::Script}, {"resize", &CaseRunner::Resize},
+            {"log", &CaseRunner::NoteLog},   {"nolog", &CaseRunner::NoLog},
+            {"wait", &CaseRunner::Wait},     {"requests", &CaseRunner::Requests}};
         return kHandlers;
     }
 
@@ -202,6 +205,15 @@ class CaseRunner {
         client_.view->Resize(width, height);
         client_.Frame();
         client_.Frame();
+    }
+
+    void Wait(const std::string& text) { client_.Frame(std::stod(text)); }
+
+    // How often the page's folder was asked for the file.
+    void Requests(const std::string& text) {
+        const auto [name, count] = SplitAt(text, '|');
+        const std::vector<std::string>& all = client_.files.requests;
+        EXPECT_EQ(std::to_string(std::count(all.begin(), all.end(), kFolder + name)), count);
     }
 
     void NoteLog(const std::string& text) {

@@ -70,7 +70,7 @@ class Rounds {
         View* view = system_->CreateView(settings);
         ViewRenderer* renderer = renderer_->CreateViewRenderer(view);
         renderer->SetRenderTargetSimple(target_.Color(), nullptr, target_.Width(), target_.Height(), 1);
-        view->LoadURL(stress::kPages[number % 4]);
+        view->LoadURL(stress::kPages[number % 5]);
         for (unsigned frame = 0; frame < 8; ++frame) {
             library_->ExecuteWork(WorkType::Resources, WorkExecutionMode::RunUntilEmpty, 0);
             system_->Advance(clock_.Step(16));

@@ -17,7 +17,7 @@ class Site final : public qorvex::IAsyncResourceHandler {
 
 // What the operations choose from: URLs of pages (some missing or malformed), of sheets, and scripts to run
 // in a page (some of which throw).
-extern const char* const kPages[8];
+extern const char* const kPages[9];
 extern const char* const kSheets[4];
 extern const char* const kScripts[12];
 

@@ -53,8 +53,10 @@ struct FrameResult {
     size_t size = 0;
 };
 
-// Refused above either: no page needs more, and a lying header must not take the machine's memory.
+// Refused above any: no page needs more, and a lying header must not take the machine's memory. The bytes are
+// those of all frames together.
 constexpr uint32_t kMaxImageSide = 16384;
 constexpr uint64_t kMaxImageBytes = 256ull << 20;
+constexpr uint32_t kMaxAnimationFrames = 10000;
 
 }  // namespace fresco

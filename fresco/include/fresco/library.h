@@ -17,6 +17,8 @@ class Library {
     static SurfaceId GetSurfaceName();
     // Frame `frameIndex` of a PNG, JPEG, WebP or GIF in memory. `delay` is in hundredths of a second. A hint
     // of 0 is none; with hints a JPEG may come smaller than it is, but not smaller than they say.
+    // Frames of an animation are cheap in order, from 0 on, while the file stays where it is; who stops early
+    // asks for one past the last, so that nothing is kept for the next one.
     static ImageDecodeResult DecodeImageMemory(const void* data, size_t size, uint32_t frameIndex,
                                                uint32_t widthHint, uint32_t heightHint, bool premultiply,
                                                ImageInfo& info, uint32_t& frameCount, uint32_t& delay,

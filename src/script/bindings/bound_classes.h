@@ -26,6 +26,7 @@ namespace qorvex::script {
     X(kEventTargetClass)             \
     X(kHTMLCollectionClass)          \
     X(kHTMLElementClass)             \
+    X(kHTMLImageElementClass)        \
     X(kHTMLLinkElementClass)         \
     X(kHTMLScriptElementClass)       \
     X(kNamedNodeMapClass)            \

@@ -5,13 +5,13 @@
 #include "dom/html_link_element.h"
 #include "dom/html_script_element.h"
 #include "script/bindings/bound_classes.h"
+#include "script/bindings/reflected_attributes.h"
 #include "script/member_callbacks.h"
 
 namespace qorvex::script {
 
 namespace {
 
-using dom::Element;
 using dom::HTMLElement;
 using Bind = Binding<HTMLElement>;
 
@@ -23,38 +23,6 @@ constexpr AttributeDescription kAttributes[] = {
     Bind::ReadOnly<&HTMLElement::GetOffsetWidth>("offsetWidth"),
     Bind::ReadOnly<&HTMLElement::GetOffsetHeight>("offsetHeight"),
 };
-
-// https://html.spec.whatwg.org/#reflecting-content-attributes-in-idl-attributes
-template <FixedString kName>
-Atom GetReflected(Element& element) {
-    return element.GetAttribute(kName.text).value_or(Atom());
-}
-template <FixedString kName>
-void SetReflected(Element& element, std::string_view value) {
-    element.SetAttribute(kName.text, value);
-}
-template <FixedString kName>
-bool GetReflectedFlag(Element& element) {
-    return element.HasAttribute(kName.text);
-}
-template <FixedString kName>
-void SetReflectedFlag(Element& element, bool value) {
-    if (value) {
-        element.SetAttribute(kName.text, "");
-    } else {
-        element.RemoveAttribute(kName.text);
-    }
-}
-
-template <class T, FixedString kName>
-constexpr AttributeDescription Reflected() {
-    return Binding<T>::template ReadWrite<&GetReflected<kName>, &SetReflected<kName>>(kText<kName>.text);
-}
-template <class T, FixedString kName>
-constexpr AttributeDescription ReflectedFlag() {
-    return Binding<T>::template ReadWrite<&GetReflectedFlag<kName>, &SetReflectedFlag<kName>>(
-        kText<kName>.text);
-}
 
 constexpr AttributeDescription kLinkAttributes[] = {
     Reflected<dom::HTMLLinkElement, "href">(),
