@@ -9,6 +9,7 @@
 //   feed SELECTOR               every longhand's text, set on a fresh sibling, gives the same style again
 //   none SELECTOR               nothing matches
 //   box SELECTOR | X Y W H      of the first match with an id: its place on the page
+//   snapped SELECTOR | X Y W H  the same to whole pixels, of boxes that end between them
 //   pixel X Y | RRGGBB          over white
 //   js EXPRESSION | TEXT        what the page's script makes of it
 //   script STATEMENTS           runs, then a frame

@@ -6,6 +6,7 @@
 #include <qorvex/debug_interface.h>
 
 #include <algorithm>
+#include <cmath>
 #include <filesystem>
 #include <map>
 
@@ -60,10 +61,10 @@ class CaseRunner {
 
     static const std::map<std::string, Handler>& Handlers() {
         static const std::map<std::string, Handler> kHandlers = {
-            {"expect", &CaseRunner::Expect}, {"same", &CaseRunner::Same},     {"feed", &CaseRunner::Feed},
-            {"none", &CaseRunner::None},     {"box", &CaseRunner::Box},       {"pixel", &CaseRunner::Pixel},
-            {"js", &CaseRunner::Evaluate},   {"script", &CaseRunner::Script}, {"resize", &CaseRunner::Resize},
-            {"log", &CaseRunner::NoteLog},   {"nolog", &CaseRunner::NoLog}};
+            {"expect", &CaseRunner::Expect}, {"same", &CaseRunner::Same},   {"feed", &CaseRunner::Feed},
+            {"none", &CaseRunner::None},     {"box", &CaseRunner::Box},     {"snapped", &CaseRunner::Snapped},
+            {"pixel", &CaseRunner::Pixel},   {"js", &CaseRunner::Evaluate}, {"script", &CaseRunner::Script},
+            {"resize", &CaseRunner::Resize}, {"log", &CaseRunner::NoteLog}, {"nolog", &CaseRunner::NoLog}};
         return kHandlers;
     }
 
@@ -135,18 +136,38 @@ class CaseRunner {
 
     void Box(const std::string& text) {
         const auto [id, wanted] = SplitAt(text, '|');
+        EXPECT_EQ(BoxOf(id), wanted);
+    }
+
+    // The right and bottom edges land where they would by themselves.
+    void Snapped(const std::string& text) {
+        const auto [id, wanted] = SplitAt(text, '|');
+        float x = 0, y = 0, width = 0, height = 0;
+        const std::string box = BoxOf(id);
+        ASSERT_EQ(std::sscanf(box.c_str(), "%f %f %f %f", &x, &y, &width, &height), 4);
+        EXPECT_EQ(Numbers(std::round(x), std::round(y), std::round(x + width) - std::round(x),
+                          std::round(y + height) - std::round(y)),
+                  wanted)
+            << box;
+    }
+
+    static std::string Numbers(float x, float y, float width, float height) {
+        char numbers[96];
+        std::snprintf(numbers, sizeof numbers, "%g %g %g %g", double{x}, double{y}, double{width},
+                      double{height});
+        return numbers;
+    }
+
+    std::string BoxOf(const std::string& id) {
         boxes_.clear();
         debug_->VisitElementBoxes(
             client_.view,
             [](void* out, const ElementBox& box) {
-                char numbers[96];
-                std::snprintf(numbers, sizeof numbers, "%g %g %g %g", double{box.X}, double{box.Y},
-                              double{box.Width}, double{box.Height});
-                static_cast<std::map<std::string, std::string>*>(out)->emplace(std::string("#") + box.Id,
-                                                                               numbers);
+                static_cast<std::map<std::string, std::string>*>(out)->emplace(
+                    std::string("#") + box.Id, Numbers(box.X, box.Y, box.Width, box.Height));
             },
             &boxes_);
-        EXPECT_EQ(boxes_[id], wanted);
+        return boxes_[id];
     }
 
     void Pixel(const std::string& text) {
@@ -224,14 +245,19 @@ class CaseRunner {
 };
 
 // One test a folder, so that a run of a single theme is a filter; the folders are known when tests are
-// listed.
+// listed. The second root holds pages that the build made of tables (tests/layout/conformance).
+constexpr const char* kRoots[] = {QORVEX_SOURCE_DIR "/tests/pages/cases/", QORVEX_GENERATED_PAGES "/"};
+
 class PageCases : public testing::TestWithParam<std::string> {};
 
 TEST_P(PageCases, ComputeWhatTheySay) {
     std::vector<fs::path> files;
-    for (const auto& entry :
-         fs::directory_iterator(fs::path(QORVEX_SOURCE_DIR "/tests/pages/cases") / GetParam()))
-        files.push_back(entry.path());
+    for (const char* root : kRoots) {
+        if (!fs::exists(root + GetParam())) continue;
+        for (const auto& entry : fs::directory_iterator(root + GetParam()))
+            files.push_back(entry.path());
+    }
+    EXPECT_FALSE(files.empty());
     std::sort(files.begin(), files.end());
     const char* only = std::getenv("QORVEX_CASE");  // a part of a name, to run one page by hand
     for (const fs::path& file : files) {
@@ -244,8 +270,10 @@ TEST_P(PageCases, ComputeWhatTheySay) {
 
 std::vector<std::string> Themes() {
     std::vector<std::string> themes;
-    for (const auto& entry : fs::directory_iterator(QORVEX_SOURCE_DIR "/tests/pages/cases"))
-        themes.push_back(entry.path().filename().string());
+    for (const char* root : kRoots) {
+        for (const auto& entry : fs::directory_iterator(root))
+            themes.push_back(entry.path().filename().string());
+    }
     std::sort(themes.begin(), themes.end());
     return themes;
 }
