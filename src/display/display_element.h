@@ -33,6 +33,7 @@ class IDisplayElement : public AtomicRefCounted<IDisplayElement, MemoryTag::Rend
         kHasMask = 1u << 2,
         kIsText = 1u << 3,         // a DisplayText
         kFlowsChildren = 1u << 4,  // a DisplayParagraph: it gives its children their boxes
+        kPaintsContent = 1u << 5,  // a box that shows more than its style
     };
 
     IDisplayElement(const IDisplayElement&) = delete;
