@@ -183,7 +183,11 @@ class TransformPass {
         }
         if (node.display) {
             const float ink = node.display->InkOverflow();
-            reach = Outset(reach, {ink, ink, ink, ink});
+            const layout::Size content = node.display->ContentSize();
+            // Lines may be aligned to either side.
+            const float wider = ink + std::max(content.width - box.width, 0.0f);
+            const float taller = ink + std::max(content.height - box.height, 0.0f);
+            reach = Outset(reach, {wider, wider, ink, taller});
         }
         if (node.visuals) reach = Outset(reach, PaintOutset(*node.visuals));
         node.paintBounds = ToVisual(layout::MapBounds(node.world.Get(), reach));

@@ -36,6 +36,7 @@ class OtherView {
             static_cast<OtherView*>(self)->frame_ = id;
         };
         settings.CallbackUserData = this;
+        settings.EnableComplexCSSSelectorsStyling = game.options.complex_selectors;
         view_ = game.system->CreateView(settings);
         view_->ContinuousRepaint(repaintsAll);
         renderer_ = game.system_renderer->CreateViewRenderer(view_);
