@@ -1,15 +1,20 @@
 // Are all numbers of a record finite? Derived from the field types of the record table.
 #pragma once
 #include <fresco/command_records.h>
+#include <cstring>
 
 namespace fresco {
 
-// Zero times anything finite is zero; the sum of the products stays zero only when all are finite.
+// By the bits, which are compared side by side; a sum of floats would wait for each one.
 inline bool AllFinite(const float* values, size_t count) {
-    float sum = 0;
-    for (size_t i = 0; i < count; ++i)
-        sum += values[i] * 0.0f;
-    return sum == 0.0f;
+    constexpr uint32_t kExponent = 0x7F800000u;
+    uint32_t others = 0;
+    for (size_t i = 0; i < count; ++i) {
+        uint32_t bits;
+        std::memcpy(&bits, values + i, sizeof(bits));
+        others |= static_cast<uint32_t>((bits & kExponent) == kExponent);
+    }
+    return others == 0;
 }
 
 inline bool IsFinite(const uint32_t&) {

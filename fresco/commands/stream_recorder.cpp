@@ -36,6 +36,17 @@ void StreamRecorder::Refuse(CommandType type) {
 }
 
 template <class Record>
+void StreamRecorder::Append(const Record& record) {
+    static_assert(std::is_trivially_copyable_v<Record> && alignof(Record) == 4 && sizeof(Record) % 4 == 0);
+    if (!IsFinite(record)) return Refuse(Record::kType);
+    constexpr uint32_t kSize = sizeof(RecordHeader) + sizeof(Record);
+    uint8_t* out = stream_.Extend(kSize);
+    const RecordHeader header{uint32_t(Record::kType), kSize};
+    std::memcpy(out, &header, sizeof(header));
+    std::memcpy(out + sizeof(header), &record, sizeof(record));
+}
+
+template <class Record>
 void StreamRecorder::Append(const Record& record, std::initializer_list<Chunk> tail) {
     static_assert(std::is_trivially_copyable_v<Record> && alignof(Record) == 4);
     if (!IsFinite(record)) return Refuse(Record::kType);
@@ -44,9 +55,7 @@ void StreamRecorder::Append(const Record& record, std::initializer_list<Chunk> t
         size += chunk.size;
     const size_t padded = (size + 3) & ~size_t(3);
     if (padded > kMaxRecordSize) return Refuse(Record::kType);
-    const size_t start = stream_.size();
-    stream_.resize(start + padded);
-    uint8_t* out = stream_.data() + start;
+    uint8_t* out = stream_.Extend(padded);
     const RecordHeader header{uint32_t(Record::kType), uint32_t(padded)};
     std::memcpy(out, &header, sizeof(header));
     std::memcpy(out + sizeof(header), &record, sizeof(record));
@@ -55,6 +64,7 @@ void StreamRecorder::Append(const Record& record, std::initializer_list<Chunk> t
         if (chunk.size) std::memcpy(out, chunk.data, chunk.size);
         out += chunk.size;
     }
+    if (padded != size) std::memset(out, 0, padded - size);
 }
 
 template <class Record>
@@ -91,11 +101,11 @@ void StreamRecorder::AppendGradient(Record record, const GradientStop* stops, ui
 void StreamRecorder::AppendEffects(size_t recordStart, const Effect* const* effects, uint32_t count) {
     for (uint32_t i = 0; i < count; ++i) {
         const EffectHeader header{uint32_t(effects[i]->GetKind()), Padded(effects[i]->GetDataSize())};
-        const size_t start = stream_.size();
-        stream_.resize(start + sizeof(header) + header.size);
-        std::memcpy(stream_.data() + start, &header, sizeof(header));
-        std::memcpy(stream_.data() + start + sizeof(header), effects[i]->GetData(),
-                    effects[i]->GetDataSize());
+        const size_t size = effects[i]->GetDataSize();
+        uint8_t* out = stream_.Extend(sizeof(header) + header.size);
+        std::memcpy(out, &header, sizeof(header));
+        if (size) std::memcpy(out + sizeof(header), effects[i]->GetData(), size);
+        std::memset(out + sizeof(header) + size, 0, header.size - size);
     }
     auto* header = reinterpret_cast<RecordHeader*>(stream_.data() + recordStart);
     header->size = uint32_t(stream_.size() - recordStart);

@@ -1,6 +1,7 @@
 // The CommandBuffer that writes the stream. It follows the transform, since callers may ask for it; it does
 // not look at anything else it records.
 #pragma once
+#include "fresco/commands/stream_bytes.h"
 #include "fresco/commands/tails.h"
 #include "fresco/core/heap.h"
 
@@ -93,7 +94,9 @@ class StreamRecorder final : public CommandBuffer {
         size_t size;
     };
     template <class Record>
-    void Append(const Record& record, std::initializer_list<Chunk> tail = {});
+    void Append(const Record& record);
+    template <class Record>
+    void Append(const Record& record, std::initializer_list<Chunk> tail);
     template <class Record>
     void AppendPath(Record record, const Path& path);
     template <class Record>
@@ -106,7 +109,7 @@ class StreamRecorder final : public CommandBuffer {
     void EndLayerState(Matrix4* matrix);
     uint32_t KeepPixels(const void* data, size_t size);
 
-    Vector<uint8_t> stream_;
+    StreamBytes stream_;
     Vector<State> states_;
     Vector<Pixels> pixels_;
     Matrix4 transform_;

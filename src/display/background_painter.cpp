@@ -2,6 +2,7 @@
 
 #include "css/values/style_groups.h"
 #include "display/gradient_painter.h"
+#include "display/transforms.h"
 
 #include <algorithm>
 
@@ -63,6 +64,12 @@ void DrawImageLayer(const ImageSlot& slot, const ResolvedImageLayer& layer, cons
 
 }  // namespace
 
+void PaintPlainColor(const LayoutNode& node, bool snapToPixels, CommandBuffer& buffer) {
+    const Rect box = PaintBox(node, snapToPixels);
+    if (box.width * box.height > kMinArea)
+        buffer.FillRect(box, SolidPaint(ToFresco(node.style.visual->backgroundColor)));
+}
+
 void PaintBackgroundColor(const LayoutNode& node, const BoxShape& shape, CommandBuffer& buffer) {
     const css::VisualStyle& visual = *node.style.visual;
     if (visual.backgroundColor.alpha <= 0) return;
@@ -102,40 +109,6 @@ void PaintBackgroundImages(PaintContext& context, const LayoutNode& node, const 
         }
     }
     if (clipped) buffer.PopState();
-}
-
-bool PaintBorderImage(const LayoutNode& node, const BoxShape& shape, const ImageSlots* slots,
-                      CommandBuffer& buffer) {
-    const css::VisualStyle& visual = *node.style.visual;
-    if (!HasBorderImage(visual) || !slots || slots->empty() || slots->front().resource < 0 || !node.visuals)
-        return false;
-    const ImageSlot& slot = slots->front();
-    const Edges& outset = node.visuals->borderImageOutset;
-    const Rect area = layout::Inset(shape.box, {-outset.left, -outset.right, -outset.top, -outset.bottom});
-    const Edges& w = node.visuals->borderImageWidth;
-    const Edges& s = slot.slices;
-    // The nine pieces as columns and rows of the image and of the area.
-    const float columns[4] = {area.x, area.x + w.left, layout::Right(area) - w.right, layout::Right(area)};
-    const float rows[4] = {area.y, area.y + w.top, layout::Bottom(area) - w.bottom, layout::Bottom(area)};
-    const float left = slot.source.x, top = slot.source.y;
-    const float sourceColumns[4] = {left, left + s.left, left + slot.intrinsic.width - s.right,
-                                    left + slot.intrinsic.width};
-    const float sourceRows[4] = {top, top + s.top, top + slot.intrinsic.height - s.bottom,
-                                 top + slot.intrinsic.height};
-    const auto image = static_cast<fresco::ImageId>(slot.resource);
-    for (int row = 0; row < 3; ++row) {
-        for (int column = 0; column < 3; ++column) {
-            if (row == 1 && column == 1 && !visual.borderImageSlice.fill) continue;
-            const Rect dst{columns[column], rows[row], 0, columns[column + 1] - columns[column],
-                           rows[row + 1] - rows[row]};
-            const Rect src{sourceColumns[column], sourceRows[row], 0,
-                           sourceColumns[column + 1] - sourceColumns[column],
-                           sourceRows[row + 1] - sourceRows[row]};
-            if (!layout::IsEmpty(dst) && !layout::IsEmpty(src))
-                buffer.DrawImage(image, dst, src, fresco::Paint());
-        }
-    }
-    return true;
 }
 
 }  // namespace qorvex::dsp

@@ -1,4 +1,4 @@
-// Draws the background colour and images of a box, and its border image.
+// Draws the background colour and images of a box.
 #pragma once
 
 #include "display/box.h"
@@ -9,12 +9,11 @@
 
 namespace qorvex::dsp {
 
+// The whole of a box with a colour and nothing else.
+void PaintPlainColor(const layout::LayoutNode& node, bool snapToPixels, fresco::CommandBuffer& buffer);
 void PaintBackgroundColor(const layout::LayoutNode& node, const BoxShape& shape,
                           fresco::CommandBuffer& buffer);
 void PaintBackgroundImages(PaintContext& context, const layout::LayoutNode& node, const BoxShape& shape,
                            const ImageSlots* slots, fresco::CommandBuffer& buffer);
-// False when there is no border image to draw, and the border of the style shows.
-bool PaintBorderImage(const layout::LayoutNode& node, const BoxShape& shape, const ImageSlots* slots,
-                      fresco::CommandBuffer& buffer);
 
 }  // namespace qorvex::dsp

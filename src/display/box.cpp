@@ -1,6 +1,7 @@
 #include "display/box.h"
 
 #include "display/background_painter.h"
+#include "display/border_image.h"
 #include "display/border_painter.h"
 #include "display/box_shape.h"
 #include "display/shadow_painter.h"
@@ -26,8 +27,7 @@ void Box::Paint(PaintContext& context, bool dirty, const layout::LayoutNode& nod
     PaintBackgroundImages(context, node, shape, BackgroundSlots(), buffer);
     PaintInsetShadows(context, node, shape, buffer);
     PaintContent(context, dirty, node, buffer);
-    const ImageSlots* border = images_ ? &images_->border : nullptr;
-    if (!PaintBorderImage(node, shape, border, buffer)) PaintBorder(context, shape, buffer);
+    if (!PaintBorderImage(context, node, shape, BorderSlots(), buffer)) PaintBorder(context, shape, buffer);
 }
 
 void Box::PaintContent(PaintContext&, bool, const layout::LayoutNode&, fresco::CommandBuffer&) {}

@@ -11,7 +11,6 @@ namespace qorvex::dsp {
 struct ImageSlot {
     int32_t resource = -1;  // the frame that shows, of an animated image
     layout::Size intrinsic;
-    layout::Edges slices;  // of a border image: where its nine pieces meet, in pixels of the image
     // The part of the image to draw, in its pixels; empty for the whole.
     layout::Rect source{};
 };
@@ -20,7 +19,7 @@ using ImageSlots = SmallVector<ImageSlot, 1, MemoryTag::Rendering>;
 
 class Box : public IDisplayElement {
   public:
-    Box() : Box(0) {}
+    Box() : IDisplayElement(kPaintsBox) {}
 
     void Paint(PaintContext& context, bool dirty, const layout::LayoutNode& node,
                fresco::CommandBuffer& buffer) override;
@@ -34,14 +33,16 @@ class Box : public IDisplayElement {
     Images* GetImages() { return images_.get(); }
     Images& EnsureImages();
     ImageSlots* BackgroundSlots() { return images_ ? &images_->background : nullptr; }
+    ImageSlots* BorderSlots() { return images_ ? &images_->border : nullptr; }
     // Null for elements without a mask image.
     ImageSlots* MaskSlots() { return images_ && Has(kHasMask) ? &images_->mask : nullptr; }
     void SetHasMask(bool on);
 
   protected:
-    explicit Box(uint32_t extraFlags) : IDisplayElement(kPaintsBox | extraFlags) {}
+    // For a subclass that paints content.
+    explicit Box(uint32_t extraFlags) : IDisplayElement(kPaintsBox | kPaintsContent | extraFlags) {}
 
-    // What a subclass shows between its background and its border.
+    // What such a subclass shows between its background and its border.
     virtual void PaintContent(PaintContext& context, bool dirty, const layout::LayoutNode& node,
                               fresco::CommandBuffer& buffer);
 

@@ -34,6 +34,7 @@ class IDisplayElement : public AtomicRefCounted<IDisplayElement, MemoryTag::Rend
         kIsText = 1u << 3,         // a DisplayText
         kFlowsChildren = 1u << 4,  // a DisplayParagraph: it gives its children their boxes
         kReplaced = 1u << 5,       // a DisplayImage: sides that the style leaves open come from its content
+        kPaintsContent = 1u << 6,  // a box that shows more than its style
     };
 
     IDisplayElement(const IDisplayElement&) = delete;
@@ -44,6 +45,9 @@ class IDisplayElement : public AtomicRefCounted<IDisplayElement, MemoryTag::Rend
 
     // How far the painted content reaches beyond the box, in pixels: overhanging glyphs.
     float InkOverflow() const { return inkOverflow_; }
+    // What the content takes from the box's corner: words that do not break may be longer than the box. Zero
+    // for content that keeps to its box.
+    layout::Size ContentSize() const { return contentSize_; }
 
     virtual ~IDisplayElement() = default;
     // Records the element's own commands, without its children.
@@ -62,12 +66,16 @@ class IDisplayElement : public AtomicRefCounted<IDisplayElement, MemoryTag::Rend
 
   protected:
     explicit IDisplayElement(uint32_t flags) : flags_(flags) {}
-    void SetInkOverflow(float pixels) { inkOverflow_ = pixels; }
+    void SetInk(float overflow, layout::Size content) {
+        inkOverflow_ = overflow;
+        contentSize_ = content;
+    }
     void SetFlag(Flag flag, bool on) { flags_ = on ? flags_ | flag : flags_ & ~flag; }
 
   private:
     uint32_t flags_;
     float inkOverflow_ = 0;
+    layout::Size contentSize_;
 };
 
 using DisplayElementPtr = qsl::RefPtr<IDisplayElement>;

@@ -12,7 +12,8 @@ namespace qorvex::dsp {
 
 class DisplayParagraph final : public Box {
   public:
-    DisplayParagraph() : Box(kMeasures | kFlowsChildren) {}
+    // Its content paints itself.
+    DisplayParagraph() : Box(kMeasures | kFlowsChildren) { SetFlag(kPaintsContent, false); }
 
     void Measure(layout::LayoutHandle& handle, float availableWidth, float availableHeight,
                  MeasureMode widthMode, MeasureMode heightMode, layout::Size& out) override;

@@ -75,7 +75,8 @@ bool DisplayText::EnsureLayout(const layout::LayoutNode& node, const layout::Tex
     }
     laid_ = wanted;
     laidOut_ = unpublished_ = true;
-    SetInkOverflow(std::ceil(info_.usedSize * kOverhang + node.style.text->computedStrokeWidth));
+    SetInk(std::ceil(info_.usedSize * kOverhang + node.style.text->computedStrokeWidth),
+           {std::ceil(info_.width), std::ceil(info_.height)});
     return true;
 }
 

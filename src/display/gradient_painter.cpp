@@ -1,7 +1,6 @@
 #include "display/gradient_painter.h"
 
 #include "core/limits.h"
-#include "core/memory/temp_vector.h"
 
 #include <algorithm>
 #include <cmath>
@@ -15,7 +14,7 @@ using layout::Rect;
 
 namespace {
 
-using Stops = TempVector<fresco::GradientStop>;
+using Stops = GradientFill::Stops;
 
 fresco::Color Premultiplied(const css::Color& c) {
     return {c.red * c.alpha, c.green * c.alpha, c.blue * c.alpha, c.alpha};
@@ -64,55 +63,70 @@ void NormaliseRepeat(Stops& stops, float& from, float& to) {
         stop.offset = (stop.offset - from) / span;
 }
 
-class GradientFill {
-  public:
-    GradientFill(const Gradient& gradient, const ResolvedImageLayer& layer, const css::LengthContext& lengths)
-        : radial_(gradient.IsRadial()) {
-        const float unit = std::max(layer.tile.width, layer.tile.height);
-        const float length =
-            radial_ ? layer.end.x * unit
-                    : std::hypot(layer.end.x - layer.start.x, layer.end.y - layer.start.y) * unit;
-        PlaceStops(gradient, length, lengths, stops_);
-        float from = 0, to = 1;
-        if (gradient.IsRepeating()) NormaliseRepeat(stops_, from, to);
-        const uint32_t spread = gradient.IsRepeating() ? fresco::kSpreadRepeat : fresco::kSpreadPad;
-        if (radial_) {
-            ShiftStops(from / (to - from));
-            radialGeometry_ = {layer.start, {layer.end.x * (to - from), layer.end.y * (to - from)}, spread};
-            return;
-        }
-        auto at = [&](float t) {
-            return Point{layer.start.x + (layer.end.x - layer.start.x) * t,
-                         layer.start.y + (layer.end.y - layer.start.y) * t};
-        };
-        linearGeometry_ = {at(from), at(to), spread};
-    }
-
-    // Circles repeat from the centre: where the first stop lies away from it, the stops carry the distance.
-    void ShiftStops(float periods) {
-        const float phase = periods - std::floor(periods);
-        const uint32_t count = stops_.size();
-        if (phase < 1e-4f) return;
-        for (uint32_t i = 0; i < count; ++i)
-            stops_.push_back({stops_[i].offset + phase, stops_[i].color});
-        for (uint32_t i = 0; i < count; ++i)
-            stops_[i].offset += phase - 1;
-    }
-
-    void Draw(const Rect& rect, CommandBuffer& buffer) const {
-        const fresco::Paint paint;
-        radial_ ? buffer.FillRadialGradient(rect, paint, stops_.data(), stops_.size(), radialGeometry_)
-                : buffer.FillLinearGradient(rect, paint, stops_.data(), stops_.size(), linearGeometry_);
-    }
-
-  private:
-    bool radial_;
-    Stops stops_;
-    fresco::LinearGradient linearGeometry_;
-    fresco::RadialGradient radialGeometry_;
-};
-
 }  // namespace
+
+GradientFill::GradientFill(const Gradient& gradient, const ResolvedImageLayer& layer,
+                           const css::LengthContext& lengths)
+    : radial_(gradient.IsRadial()), unit_(std::max(layer.tile.width, layer.tile.height)) {
+    const float length = radial_
+                             ? layer.end.x * unit_
+                             : std::hypot(layer.end.x - layer.start.x, layer.end.y - layer.start.y) * unit_;
+    PlaceStops(gradient, length, lengths, stops_);
+    float from = 0, to = 1;
+    if (gradient.IsRepeating()) NormaliseRepeat(stops_, from, to);
+    spread_ = gradient.IsRepeating() ? fresco::kSpreadRepeat : fresco::kSpreadPad;
+    if (radial_) {
+        ShiftStops(from / (to - from));
+        start_ = layer.start;
+        end_ = {layer.end.x * (to - from), layer.end.y * (to - from)};
+        return;
+    }
+    auto at = [&](float t) {
+        return Point{layer.start.x + (layer.end.x - layer.start.x) * t,
+                     layer.start.y + (layer.end.y - layer.start.y) * t};
+    };
+    start_ = at(from);
+    end_ = at(to);
+}
+
+// Circles repeat from the centre: where the first stop lies away from it, the stops carry the distance.
+void GradientFill::ShiftStops(float periods) {
+    const float phase = periods - std::floor(periods);
+    const uint32_t count = stops_.size();
+    if (phase < 1e-4f) return;
+    for (uint32_t i = 0; i < count; ++i)
+        stops_.push_back({stops_[i].offset + phase, stops_[i].color});
+    for (uint32_t i = 0; i < count; ++i)
+        stops_[i].offset += phase - 1;
+}
+
+void GradientFill::Fill(const Rect& rect, Point start, Point end, CommandBuffer& buffer) const {
+    const fresco::Paint paint;
+    if (radial_) {
+        buffer.FillRadialGradient(rect, paint, stops_.data(), stops_.size(), {start, end, spread_});
+    } else {
+        buffer.FillLinearGradient(rect, paint, stops_.data(), stops_.size(), {start, end, spread_});
+    }
+}
+
+void GradientFill::Draw(const Rect& rect, CommandBuffer& buffer) const {
+    Fill(rect, start_, end_, buffer);
+}
+
+void GradientFill::DrawPart(const Rect& part, const Rect& destination, CommandBuffer& buffer) const {
+    // In units of the part's larger side, from the part's corner.
+    const float unit = std::max(part.width, part.height), scale = unit_ / unit;
+    auto within = [&](Point p) { return Point{p.x * scale - part.x / unit, p.y * scale - part.y / unit}; };
+    const Point end = radial_ ? Point{end_.x * scale, end_.y * scale} : within(end_);
+    const float scaleX = destination.width / part.width, scaleY = destination.height / part.height;
+    if (layout::Near(scaleX, 1) && layout::Near(scaleY, 1))
+        return Fill(destination, within(start_), end, buffer);
+    buffer.PushState(fresco::kStateTransform);
+    buffer.Translate(destination.x, destination.y);
+    buffer.Scale(scaleX, scaleY);
+    Fill({0, 0, 0, part.width, part.height}, within(start_), end, buffer);
+    buffer.PopState();
+}
 
 void PaintGradientLayer(PaintContext& context, const Gradient& gradient, const ResolvedImageLayer& layer,
                         Point origin, const Rect& area, CommandBuffer& buffer) {

@@ -5,7 +5,6 @@
 
 namespace qorvex::dsp {
 
-using layout::kChildGroup;
 using layout::LayoutNode;
 using layout::Rect;
 
@@ -30,9 +29,10 @@ bool PaintsBefore(const PaintEntry& a, const PaintEntry& b) {
 
 class Collector {
   public:
-    Collector(const LayoutNode& context, std::span<const Rect> areas, PaintList& out,
+    Collector(const LayoutNode& context, std::span<const Rect> areas, bool runs, PaintList& out,
               layout::WorkCounters& counters)
         : areas_(areas),
+          runs_(runs),
           out_(out),
           counters_(counters),
           inSpace_(context.flags.preserves3d),
@@ -40,17 +40,7 @@ class Collector {
 
     // Depth first, in tree order. Recursion ends at contexts and clips, and at the depth limit.
     void Walk(const LayoutNode& parent, uint32_t layer) {
-        const uint32_t count = parent.children.size();
-        for (uint32_t i = 0; i < count; ++i) {
-            // A group of children out of sight costs one test.
-            if (i % kChildGroup == 0 && parent.below && i / kChildGroup < parent.below->groups.size() &&
-                !TouchesAny(areas_, parent.below->groups[i / kChildGroup].visual)) {
-                i += kChildGroup - 1;
-                order_ += kChildGroup;
-                continue;
-            }
-            Take(parent.children[i]->node(), layer);
-        }
+        ForEachChild(parent, areas_, [&](const LayoutNode& child) { Take(child, layer); });
     }
 
   private:
@@ -61,13 +51,16 @@ class Collector {
         if (!TouchesAny(areas_, node.visualAabb)) return;
         const bool positioned = node.flags.isPositioned || node.establishesStackingContext;
         const uint32_t own = positioned ? order_ : layer;
+        const bool unit = PaintsAsUnit(node);
+        const bool run = runs_ && !unit && !node.children.empty() && PaintsInTreeOrder(node);
         // What has no transform lies in the plane of the context.
         const int32_t depth = !inSpace_ ? 0 : node.local ? DepthOf(node) : planeDepth_;
-        out_.push_back({&node, node.establishesStackingContext ? node.zIndex : 0, own, order_, depth});
-        if (!PaintsAsUnit(node)) Walk(node, own);
+        out_.push_back({&node, node.establishesStackingContext ? node.zIndex : 0, own, order_, depth, run});
+        if (!unit && !run) Walk(node, own);
     }
 
     std::span<const Rect> areas_;
+    bool runs_;
     PaintList& out_;
     layout::WorkCounters& counters_;
     bool inSpace_;
@@ -75,15 +68,25 @@ class Collector {
     uint32_t order_ = 0;
 };
 
+void Collect(const LayoutNode& context, std::span<const Rect> areas, bool runs, PaintList& out,
+             layout::WorkCounters& counters) {
+    const uint32_t first = out.size();
+    Collector(context, areas, runs, out, counters).Walk(context, 0);
+    // Most lists were found in their order.
+    if (!std::is_sorted(out.begin() + first, out.end(), PaintsBefore))
+        std::sort(out.begin() + first, out.end(), PaintsBefore);
+}
+
 }  // namespace
 
 void CollectPaintOrder(const LayoutNode& context, std::span<const Rect> areas, PaintList& out,
                        layout::WorkCounters& counters) {
-    const uint32_t first = out.size();
-    Collector(context, areas, out, counters).Walk(context, 0);
-    // Most lists hold nothing but in-flow content, which was found in its order.
-    if (!std::is_sorted(out.begin() + first, out.end(), PaintsBefore))
-        std::sort(out.begin() + first, out.end(), PaintsBefore);
+    Collect(context, areas, false, out, counters);
+}
+
+void CollectPaintRuns(const LayoutNode& context, std::span<const Rect> areas, PaintList& out,
+                      layout::WorkCounters& counters) {
+    Collect(context, areas, true, out, counters);
 }
 
 }  // namespace qorvex::dsp

@@ -25,6 +25,8 @@ struct PaintEntry {
         0;  // 0: in flow; else the tree order of the positioned node or context that it paints with
     uint32_t order = 0;  // tree order
     int32_t depth = 0;   // larger is nearer; 0 for all where space is flat
+    // All below paints in tree order right after the node, and is not listed.
+    bool withSubtree = false;
 };
 
 using PaintList = TempVector<PaintEntry>;
@@ -34,6 +36,10 @@ using PaintList = TempVector<PaintEntry>;
 // in `areas` (view coordinates) is left out with its subtree; no rectangles ask for everything.
 void CollectPaintOrder(const layout::LayoutNode& context, std::span<const layout::Rect> areas, PaintList& out,
                        layout::WorkCounters& counters);
+// The same order, but a plain node over nothing than in-flow content stands for all of its subtree: a page's
+// list is as long as its layers ask for.
+void CollectPaintRuns(const layout::LayoutNode& context, std::span<const layout::Rect> areas, PaintList& out,
+                      layout::WorkCounters& counters);
 
 // A plain node paints by itself; a context or clip recurses.
 inline bool PaintsAsUnit(const layout::LayoutNode& node) {
@@ -46,6 +52,24 @@ inline bool TouchesAny(std::span<const layout::Rect> areas, const layout::Rect& 
         if (layout::Intersects(area, rect)) return true;
     }
     return false;
+}
+
+// Is there nothing below but in-flow content, up to the contexts' and clips' own?
+inline bool PaintsInTreeOrder(const layout::LayoutNode& node) {
+    return !node.below || !node.below->sum.layered;
+}
+
+// Calls visit(child) for the children that may touch the areas.
+template <typename Visit>
+void ForEachChild(const layout::LayoutNode& parent, std::span<const layout::Rect> areas, Visit&& visit) {
+    const uint32_t count = parent.children.size();
+    if (parent.below && count > layout::ChildGroups::kFanout && parent.below->groups.Fit(count)) {
+        parent.below->groups.Walk([&](const layout::ChildSum& sum) { return TouchesAny(areas, sum.visual); },
+                                  [&](uint32_t i) { visit(parent.children[i]->node()); });
+        return;
+    }
+    for (const layout::HandlePtr& child : parent.children)
+        visit(child->node());
 }
 
 }  // namespace qorvex::dsp

@@ -1,6 +1,7 @@
 #include "display/record_node.h"
 
 #include "css/values/style_groups.h"
+#include "display/background_painter.h"
 #include "display/box_shape.h"
 #include "display/clip_path.h"
 #include "display/dirty_region.h"
@@ -39,15 +40,16 @@ class StateScope {
     int pushes_ = 0;
 };
 
-bool IsVisible(const LayoutNode& node) {
-    return node.style.visual->visibility == css::Visibility::Visible;
-}
-
+// The caller has looked at the visual bounds, which a node without children paints all by itself.
 void PaintOwn(const LayoutNode& node, PaintContext& context, Areas areas, CommandBuffer& buffer) {
-    if (!node.display || !IsVisible(node) || !TouchesAny(areas, node.paintBounds)) return;
+    if (node.ownPaint == 0 || (!node.children.empty() && !TouchesAny(areas, node.paintBounds))) return;
+    ++context.counters.recorded;
+    if (node.ownPaint == layout::kPaintsColor) {
+        PaintPlainColor(node, context.snapToPixels, buffer);
+        return;
+    }
     context.lengths.em = node.style.text->computedFontSize;
     node.display->Paint(context, context.partialRedraw, node, buffer);
-    ++context.counters.recorded;
 }
 
 void ClipToPaddingBox(const LayoutNode& node, const PaintContext& context, CommandBuffer& buffer) {
@@ -106,21 +108,46 @@ void PushChildState(const LayoutNode& node, const PaintContext& context, StateSc
     if (scrolled) buffer.Translate(-node.scroll.x, -node.scroll.y);
 }
 
-void RecordChildren(const LayoutNode& node, PaintContext& context, Areas areas, CommandBuffer& buffer) {
-    if (node.children.empty() || areas.empty()) return;
-    const TempMark mark;
-    PaintList list;
-    CollectPaintOrder(node, areas, list, context.counters);
-    if (list.empty()) return;
-    StateScope scope(buffer);
-    PushChildState(node, context, scope, buffer);
+// In-flow content needs no list: it paints in tree order.
+void RecordFlow(const LayoutNode& parent, PaintContext& context, Areas areas, CommandBuffer& buffer) {
+    ForEachChild(parent, areas, [&](const LayoutNode& child) {
+        if (child.IsBeyondLimit()) return;
+        ++context.counters.visited;
+        if (!TouchesAny(areas, child.visualAabb)) return;
+        if (PaintsAsUnit(child)) {
+            RecordNode(child, context, areas, &buffer);
+            return;
+        }
+        PaintOwn(child, context, areas, buffer);
+        if (!child.children.empty()) RecordFlow(child, context, areas, buffer);
+    });
+}
+
+void RecordLayers(const PaintList& list, PaintContext& context, Areas areas, CommandBuffer& buffer) {
     for (const PaintEntry& entry : list) {
         if (PaintsAsUnit(*entry.node)) {
             RecordNode(*entry.node, context, areas, &buffer);
-        } else {
-            PaintOwn(*entry.node, context, areas, buffer);
+            continue;
         }
+        PaintOwn(*entry.node, context, areas, buffer);
+        if (entry.withSubtree) RecordFlow(*entry.node, context, areas, buffer);
     }
+}
+
+void RecordChildren(const LayoutNode& node, PaintContext& context, Areas areas, CommandBuffer& buffer) {
+    if (node.children.empty() || areas.empty()) return;
+    const bool inOrder = PaintsInTreeOrder(node);
+    const TempMark mark;
+    PaintList list;
+    if (inOrder) {
+        if (!TouchesAny(areas, node.below->sum.visual)) return;
+    } else {
+        CollectPaintRuns(node, areas, list, context.counters);
+        if (list.empty()) return;
+    }
+    StateScope scope(buffer);
+    PushChildState(node, context, scope, buffer);
+    inOrder ? RecordFlow(node, context, areas, buffer) : RecordLayers(list, context, areas, buffer);
 }
 
 void RecordContent(const LayoutNode& node, PaintContext& context, Areas areas, CommandBuffer& buffer) {

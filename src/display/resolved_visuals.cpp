@@ -52,6 +52,7 @@ bool Near(const ResolvedVisuals& a, const ResolvedVisuals& b) {
            NearPoint(a.radii.bottomRight, b.radii.bottomRight) &&
            NearPoint(a.radii.bottomLeft, b.radii.bottomLeft) && NearList(a.backgrounds, b.backgrounds) &&
            NearList(a.masks, b.masks) && Near(a.borderImageWidth, b.borderImageWidth) &&
+           NearList(a.borderImages, b.borderImages) && Near(a.borderImageSlice, b.borderImageSlice) &&
            Near(a.borderImageOutset, b.borderImageOutset) && NearList(a.boxShadows, b.boxShadows) &&
            NearList(a.textShadows, b.textShadows) && NearList(a.filters, b.filters);
 }

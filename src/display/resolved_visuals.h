@@ -45,6 +45,9 @@ struct ResolvedVisuals {
     fresco::CornerRadii radii;
     List<ResolvedImageLayer> backgrounds;
     List<ResolvedImageLayer> masks;  // at most one
+    // At most one; its tile is the whole source, at the corner of the border image area.
+    List<ResolvedImageLayer> borderImages;
+    layout::Edges borderImageSlice;  // in pixels of the source
     layout::Edges borderImageWidth;
     layout::Edges borderImageOutset;
     List<ResolvedShadow> boxShadows;

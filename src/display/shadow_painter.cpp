@@ -4,6 +4,8 @@
 #include "display/path_cache.h"
 #include "display/shadow_cache.h"
 
+#include <algorithm>
+
 namespace qorvex::dsp {
 
 using fresco::CommandBuffer;
@@ -59,7 +61,13 @@ void PaintOuterShadow(PaintContext& context, const BoxShape& shape, const Resolv
     } else {
         CommandBuffer* target = context.shadows.Render(key.view(), rect.width + 2 * margin,
                                                        rect.height + 2 * margin, context.record, surface);
-        if (target == nullptr) return;
+        if (target == nullptr) {
+            // Larger than any surface: sharp is nearer to the truth than nothing, unless hardly anything is
+            // left of the shape.
+            if (shadow.blur <= std::min(rect.width, rect.height))
+                FillRounded(buffer, rect, radii, SolidPaint(color));
+            return;
+        }
         FillRounded(*target, {margin, margin, 0, rect.width, rect.height}, radii, SolidPaint(color));
         target->ApplyBlur(shadow.blur);
     }
@@ -133,7 +141,15 @@ void PaintBlurredInset(PaintContext& context, const Rect& padding, const Resolve
         const Rect whole{0, 0, 0, hole.width + 2 * margin, hole.height + 2 * margin};
         CommandBuffer* target =
             context.shadows.Render(key.view(), whole.width, whole.height, context.record, surface);
-        if (target == nullptr) return;
+        if (target == nullptr) {
+            // As above; a hole that the blur closes leaves the box solid.
+            if (shadow.blur <= std::min(hole.width, hole.height)) {
+                PaintSharpInset(context, padding, hole, radii, color, buffer);
+            } else {
+                buffer.FillRect(padding, SolidPaint(color));
+            }
+            return;
+        }
         const PathPtr path = HolePath(context, whole, {margin, margin, 0, hole.width, hole.height}, radii);
         if (path) target->FillPath(*path, SolidPaint(color));
         target->ApplyBlur(shadow.blur);

@@ -2,6 +2,7 @@
 
 #include "display/dirty_region.h"
 #include "display/local_transform.h"
+#include "display/own_paint.h"
 #include "display/resolved_visuals.h"
 #include "layout/scroll.h"
 
@@ -9,10 +10,10 @@
 
 namespace qorvex::dsp {
 
-using layout::ChildGroup;
+using layout::ChildGroups;
+using layout::ChildSum;
 using layout::Edges;
 using layout::HandlePtr;
-using layout::kChildGroup;
 using layout::LayoutHandle;
 using layout::LayoutNode;
 using layout::LayoutPass;
@@ -49,20 +50,13 @@ struct Above {
     bool moved;  // the matrix or the scroll position differs from the last pass
 };
 
-struct Bounds {
-    Rect content{};  // document coordinates
-    Rect visual{};   // view coordinates
-
-    void Add(const LayoutNode& child) {
-        content =
-            layout::Union(content, child.local ? layout::MapBounds(*child.local, child.aabb) : child.aabb);
-        visual = layout::Union(visual, child.visualAabb);
-    }
-    void Add(const ChildGroup& group) {
-        content = layout::Union(content, group.content);
-        visual = layout::Union(visual, group.visual);
-    }
-};
+void AddTo(ChildSum& sum, const LayoutNode& child) {
+    sum.content =
+        layout::Union(sum.content, child.local ? layout::MapBounds(*child.local, child.aabb) : child.aabb);
+    sum.visual = layout::Union(sum.visual, child.visualAabb);
+    sum.layered = sum.layered || child.flags.isPositioned || child.establishesStackingContext ||
+                  (child.below && child.below->sum.layered && !child.flags.shouldOverflowClip);
+}
 
 class TransformPass {
   public:
@@ -80,6 +74,7 @@ class TransformPass {
         const Rect box = PaintBox(node, pass_.snapToPixels);
         bool ownMatricesChanged = false, worldChanged = false;
         if (self) {
+            if (node.needsTransform || pass_.everything) node.ownPaint = FindOwnPaint(node);
             UpdateStacking(node);
             lengths_.em = node.style.text->computedFontSize;
             ownMatricesChanged = UpdateLocalMatrices(node, box, lengths_) ||
@@ -149,49 +144,34 @@ class TransformPass {
                 layout::RoundOut(layout::MapBounds(node.world.Get(), ClipBox(node, pass_.snapToPixels)));
             below.clip = layout::Intersection(below.clip, clip);
         }
-        Bounds bounds;
-        const bool dirty = node.children.size() <= kChildGroup ? UpdateFewChildren(node, below, bounds)
-                                                               : UpdateChildGroups(node, below, bounds);
-        node.below->content = bounds.content;
-        childrenVisual_ = bounds.visual;
-        return dirty;
-    }
-
-    bool UpdateFewChildren(LayoutNode& node, const Above& below, Bounds& bounds) {
         bool dirty = false;
-        for (const HandlePtr& child : node.children) {
-            dirty = Visit(*child, below) || dirty;
-            bounds.Add(child->node());
-        }
+        auto add = [&](uint32_t child, ChildSum& sum) {
+            dirty = Visit(*node.children[child], below) || dirty;
+            AddTo(sum, node.children[child]->node());
+        };
+        node.below->sum = SumChildren(node, below.moved || pass_.everything, add);
+        childrenVisual_ = node.below->sum.visual;
         return dirty;
     }
 
-    bool UpdateChildGroups(LayoutNode& node, const Above& below, Bounds& bounds) {
+    template <typename AddChild>
+    static ChildSum SumChildren(LayoutNode& node, bool all, AddChild&& add) {
         const uint32_t count = node.children.size();
-        const uint32_t groups = (count + kChildGroup - 1) / kChildGroup;
-        auto& known = node.below->groups;
-        const bool all = below.moved || pass_.everything || known.size() != groups;
-        known.resize(groups);
-        bool dirty = false;
-        for (uint32_t g = 0; g < groups; ++g) {
-            if (all || known[g].dirty) {
-                Bounds group;
-                const uint32_t end = std::min((g + 1) * kChildGroup, count);
-                for (uint32_t i = g * kChildGroup; i < end; ++i) {
-                    dirty = Visit(*node.children[i], below) || dirty;
-                    group.Add(node.children[i]->node());
-                }
-                known[g] = {group.content, group.visual, false};
-            }
-            bounds.Add(known[g]);
+        ChildGroups& groups = node.below->groups;
+        if (count > ChildGroups::kFanout) {
+            if (!groups.Fit(count)) groups.Resize(count);
+            return groups.Update(all, add);
         }
-        return dirty;
+        ChildSum sum;
+        for (uint32_t i = 0; i < count; ++i)
+            add(i, sum);
+        return sum;
     }
 
     static void UpdateBounds(LayoutNode& node, const Rect& box) {
         const bool overflows =
-            !node.flags.shouldOverflowClip && node.below && !layout::IsEmpty(node.below->content);
-        node.aabb = overflows ? layout::Union(box, node.below->content) : box;
+            !node.flags.shouldOverflowClip && node.below && !layout::IsEmpty(node.below->sum.content);
+        node.aabb = overflows ? layout::Union(box, node.below->sum.content) : box;
     }
 
     void UpdatePaintBounds(LayoutNode& node, const Rect& box) {
@@ -203,7 +183,11 @@ class TransformPass {
         }
         if (node.display) {
             const float ink = node.display->InkOverflow();
-            reach = Outset(reach, {ink, ink, ink, ink});
+            const layout::Size content = node.display->ContentSize();
+            // Lines may be aligned to either side.
+            const float wider = ink + std::max(content.width - box.width, 0.0f);
+            const float taller = ink + std::max(content.height - box.height, 0.0f);
+            reach = Outset(reach, {wider, wider, ink, taller});
         }
         if (node.visuals) reach = Outset(reach, PaintOutset(*node.visuals));
         node.paintBounds = ToVisual(layout::MapBounds(node.world.Get(), reach));
@@ -239,9 +223,11 @@ class TransformPass {
 
         const bool spreads = node.visuals && !node.visuals->filters.empty();
         if (!paints && !(spreads && dirtyBelow)) return false;
-        // A node that paints as a unit may show any change of its own on all of its subtree.
+        // A node that paints as a unit may show any change of its own on all of its subtree; so does one that
+        // has become another kind of layer.
         const bool unit = spreads || node.establishesStackingContext || node.previousStacking ||
-                          node.flags.shouldOverflowClip;
+                          node.flags.shouldOverflowClip || node.previousClip ||
+                          node.flags.isPositioned != node.previousPositioned;
         pass_.dirty.Add(layout::Intersection(unit ? before.visual : before.paint, above.clip));
         pass_.dirty.Add(layout::Intersection(unit ? node.visualAabb : node.paintBounds, above.clip));
         return true;
@@ -268,11 +254,7 @@ void MarkForTransform(LayoutHandle& handle) {
     uint32_t index = handle.node().index;
     for (LayoutHandle* parent = handle.node().parent; parent != nullptr; parent = parent->node().parent) {
         LayoutNode& node = parent->node();
-        const uint32_t group = index / kChildGroup;
-        ChildGroup* known =
-            node.below && group < node.below->groups.size() ? &node.below->groups[group] : nullptr;
-        const bool groupKnown = !known || known->dirty;
-        if (known) known->dirty = true;
+        const bool groupKnown = !node.below || !node.below->groups.MarkDirty(index);
         if (node.descendantNeedsTransform && groupKnown) break;
         node.descendantNeedsTransform = true;
         index = node.index;
@@ -292,8 +274,9 @@ Rect ClipToAncestors(const LayoutNode& node) {
     for (const LayoutHandle* above = node.parent; above != nullptr; above = above->node().parent) {
         const LayoutNode& parent = above->node();
         if (parent.flags.shouldOverflowClip) {
-            area = layout::Intersection(
-                area, layout::RoundOut(layout::MapBounds(parent.world.Get(), ClipBox(parent, true))));
+            // A pixel more: whether boxes are snapped is not known here.
+            const Rect clip = Outset(ClipBox(parent, true), {1, 1, 1, 1});
+            area = layout::Intersection(area, layout::RoundOut(layout::MapBounds(parent.world.Get(), clip)));
         }
         const bool spreads = parent.visuals && !parent.visuals->filters.empty();
         if (spreads && !layout::IsEmpty(area)) area = parent.visualAabb;

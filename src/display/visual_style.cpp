@@ -2,6 +2,7 @@
 
 #include "css/values/style_groups.h"
 #include "display/background_geometry.h"
+#include "display/border_image.h"
 #include "display/transforms.h"
 
 #include <algorithm>
@@ -10,7 +11,6 @@ namespace qorvex::dsp {
 
 using css::LengthContext;
 using css::ResolveLength;
-using layout::Edges;
 using layout::LayoutHandle;
 using layout::LayoutNode;
 using layout::Rect;
@@ -52,26 +52,6 @@ FilterExtent ResolveFilter(const css::FilterFunction& filter, const LengthContex
         default:
             return {};
     }
-}
-
-float ResolveSide(const css::NumberOrLength& side, float border, float base, const LengthContext& lengths) {
-    switch (side.kind) {
-        case css::NumberOrLengthKind::Number:
-            return std::max(side.length.value * border, 0.0f);
-        case css::NumberOrLengthKind::Length:
-            return std::max(ResolveLength(side.length, lengths, base), 0.0f);
-        default:
-            return border;
-    }
-}
-
-// The records run top, right, bottom, left.
-template <typename Sides>
-Edges ResolveSides(const Sides& sides, const Edges& border, const Rect& box, const LengthContext& lengths) {
-    return {ResolveSide(sides[3], border.left, box.width, lengths),
-            ResolveSide(sides[1], border.right, box.width, lengths),
-            ResolveSide(sides[0], border.top, box.height, lengths),
-            ResolveSide(sides[2], border.bottom, box.height, lengths)};
 }
 
 // True when the stored values differ, which makes the node paint anew.
@@ -116,10 +96,7 @@ void ResolveVisuals(const LayoutNode& node, const Rect& box, const LengthContext
         out.textShadows.push_back(ResolveShadow(item, lengths));
     for (const css::FilterFunction& filter : style.filter)
         out.filters.push_back(ResolveFilter(filter, lengths));
-    if (style.borderImageSource.kind > css::ImageKind::Initial) {
-        out.borderImageWidth = ResolveSides(style.borderImageWidth.sides, node.border(), box, lengths);
-        out.borderImageOutset = ResolveSides(style.borderImageOutset.sides, node.border(), box, lengths);
-    }
+    ResolveBorderImage(node, box, lengths, out);
     ResolveBackgrounds(node, box, lengths, out);
 }
 

@@ -13,13 +13,6 @@ using css::ImageValue;
 namespace {
 
 // CSS Backgrounds 3, section 6.2: percentages of the image, clamped to it.
-layout::Edges SliceEdges(const css::BorderImageSliceType& slice, layout::Size image) {
-    const auto edge = [&](size_t side, float length) {
-        const auto& value = slice.sides[side];
-        return std::clamp(value.isPercent ? value.value * length / 100 : value.value, 0.0f, length);
-    };
-    return {edge(3, image.width), edge(1, image.width), edge(0, image.height), edge(2, image.height)};
-}
 
 }  // namespace
 
@@ -96,8 +89,6 @@ void StyleImages::Commit(dsp::Box& box, const css::VisualStyle& style) const {
         for (const Image& image : groups_[group])
             targets[group]->push_back(image.use.MakeSlot());
     }
-    for (dsp::ImageSlot& slot : slots.border)
-        slot.slices = SliceEdges(style.borderImageSlice, slot.intrinsic);
 }
 
 }  // namespace qorvex::dom

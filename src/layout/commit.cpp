@@ -65,7 +65,7 @@ void CopyToLayoutSide(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
     if (!SameChildren(node.children, data.children)) {
         node.children = data.children;
         // The bounds by groups are made anew: any child may have moved to another one.
-        if (node.below) node.below->groups.clear();
+        if (node.below) node.below->groups.Clear();
         node.childrenChanged = true;
     }
 }

@@ -9,22 +9,9 @@ bool Near(const Rect& a, const Rect& b) {
     return Near(a.x, b.x) && Near(a.y, b.y) && Near(a.width, b.width) && Near(a.height, b.height);
 }
 
-bool IsEmpty(const Rect& rect) {
-    return !(rect.width > 0 && rect.height > 0);
-}
-
 bool IsFinite(const Rect& rect) {
     return std::isfinite(rect.x) && std::isfinite(rect.y) && std::isfinite(rect.width) &&
            std::isfinite(rect.height);
-}
-
-bool Intersects(const Rect& a, const Rect& b) {
-    return a.x < Right(b) && b.x < Right(a) && a.y < Bottom(b) && b.y < Bottom(a);
-}
-
-bool Contains(const Rect& outer, const Rect& inner) {
-    return outer.x <= inner.x && outer.y <= inner.y && Right(outer) >= Right(inner) &&
-           Bottom(outer) >= Bottom(inner);
 }
 
 Rect Union(const Rect& a, const Rect& b) {
@@ -48,14 +35,6 @@ Rect Inset(const Rect& rect, const Edges& edges) {
     return {rect.x + edges.left, rect.y + edges.top, rect.z,
             std::max(rect.width - edges.left - edges.right, 0.0f),
             std::max(rect.height - edges.top - edges.bottom, 0.0f)};
-}
-
-Rect SnapToPixels(const Rect& rect) {
-    const float fractionX = rect.x - std::trunc(rect.x);
-    const float fractionY = rect.y - std::trunc(rect.y);
-    return {std::round(rect.x), std::round(rect.y), rect.z,
-            std::round(fractionX + rect.width) - std::round(fractionX),
-            std::round(fractionY + rect.height) - std::round(fractionY)};
 }
 
 Rect RoundOut(const Rect& rect) {

@@ -57,15 +57,38 @@ inline float Right(const Rect& rect) {
 inline float Bottom(const Rect& rect) {
     return rect.y + rect.height;
 }
-bool IsEmpty(const Rect& rect);
-bool Intersects(const Rect& a, const Rect& b);
-bool Contains(const Rect& outer, const Rect& inner);
+inline bool IsEmpty(const Rect& rect) {
+    return !(rect.width > 0 && rect.height > 0);
+}
+inline bool Intersects(const Rect& a, const Rect& b) {
+    return a.x < Right(b) && b.x < Right(a) && a.y < Bottom(b) && b.y < Bottom(a);
+}
+inline bool Contains(const Rect& outer, const Rect& inner) {
+    return outer.x <= inner.x && outer.y <= inner.y && Right(outer) >= Right(inner) &&
+           Bottom(outer) >= Bottom(inner);
+}
 // Empty rectangles count as nothing in a union.
 Rect Union(const Rect& a, const Rect& b);
 Rect Intersection(const Rect& a, const Rect& b);
 Rect Inset(const Rect& rect, const Edges& edges);
-// Each edge lands on the pixel that it would reach alone; halves round away from zero.
-Rect SnapToPixels(const Rect& rect);
+// To the next whole number, halves away from zero. As std::round, which is a call.
+inline float RoundToPixel(float value) {
+    constexpr float kAllWhole = 8388608;  // from here on a float has no fraction
+    if (!(std::fabs(value) < kAllWhole)) return value;
+    const auto whole = static_cast<float>(static_cast<int32_t>(value));
+    const float rest = value - whole;
+    return whole + static_cast<float>(rest >= 0.5f) - static_cast<float>(rest <= -0.5f);
+}
+// Each edge lands on the pixel that it would reach alone.
+inline Rect SnapToPixels(const Rect& rect) {
+    auto fraction = [](float value) {
+        constexpr float kAllWhole = 8388608;
+        return std::fabs(value) < kAllWhole ? value - static_cast<float>(static_cast<int32_t>(value)) : 0;
+    };
+    const float x = fraction(rect.x), y = fraction(rect.y);
+    return {RoundToPixel(rect.x), RoundToPixel(rect.y), rect.z,
+            RoundToPixel(x + rect.width) - RoundToPixel(x), RoundToPixel(y + rect.height) - RoundToPixel(y)};
+}
 // Outward to whole pixels.
 Rect RoundOut(const Rect& rect);
 

@@ -13,6 +13,7 @@
 #include "core/memory/containers.h"
 #include "css/values/layout_style_refs.h"
 #include "display/display_element.h"
+#include "layout/child_groups.h"
 #include "layout/geometry.h"
 #include "layout/node_link.h"
 #include "qsl/ref_ptr.h"
@@ -118,55 +119,53 @@ struct LayoutData {
     bool inTree = false;
 };
 
-// Union of the bounds of some neighbouring children, so that one changed child of ten thousand costs the look
-// at its group and not at all its siblings.
-struct ChildGroup {
-    Rect content{};
-    Rect visual{};
-    bool dirty = true;
-};
-inline constexpr uint32_t kChildGroup = 64;
-
-// What a node with children knows of them.
-struct ChildBounds {
-    Rect content{};                // their aabb together, document coordinates
-    ScrollPosition appliedScroll;  // under which their matrices were made
-    // Bounds of kChildGroup children each, kept only by nodes with more children than that.
-    Vector<ChildGroup, MemoryTag::LayoutNodes> groups;
+// What a node paints by itself; found when its style, its display element or its borders change, so that the
+// recording asks for nothing that is not there.
+enum OwnPaint : uint8_t {
+    kPaintsColor = 1,       // a background colour on a box with square corners
+    kPaintsRoundColor = 2,  // the same with round ones
+    kPaintsImages = 4,      // of the background
+    kPaintsShadows = 8,     // of the box
+    kPaintsBorder = 16,     // of colours or of an image
+    kPaintsContent = 32,    // text, or what else the display element shows
 };
 
 struct LayoutNode {
-    LayoutHandle* parent = nullptr;
+    // First what the recording reads of every node.
     HandleVector children;
+    Rect visualAabb{};  // what the node and its subtree can touch, view coordinates
+    Rect box{};         // document coordinates; z and the pixel grid play no part yet
+    NodeFlags flags;
+    bool establishesStackingContext = false;
+    uint8_t ownPaint = 0;  // OwnPaint
+    int32_t zIndex = 0;
+    // Depth below the root, which is 0. Nodes at kMaxLayoutDepth and deeper keep zero boxes.
+    uint32_t depth = 0;
+    css::LaidOutStyle style;
+    dsp::DisplayElementPtr display;
+    Rect paintBounds{};  // what the node's own content can touch, view coordinates
+    // Made by the transform pass where there are children.
+    UniquePtr<ChildBounds, MemoryTag::LayoutNodes> below;
+
+    LayoutHandle* parent = nullptr;
     // Its context points back at the handle. Only of nodes that Yoga lays out: none in a page, or a part of
     // it, that the simple engine places.
     YGNode* flex = nullptr;
-    css::LaidOutStyle style;
-    dsp::DisplayElementPtr display;
     ScrollPosition scroll;
-
-    Rect box{};  // document coordinates; z and the pixel grid play no part yet
     SharedEdges edges;
-    Rect aabb{};         // snapped box and in-flow overflow, document coordinates
-    Rect paintBounds{};  // what the node's own content can touch, view coordinates
-    Rect visualAabb{};   // the same with its subtree
-    // Made by the transform pass where there are children.
-    UniquePtr<ChildBounds, MemoryTag::LayoutNodes> below;
+    Rect aabb{};  // snapped box and in-flow overflow, document coordinates
     WorldMatrix world;
     // Present only where the style needs them.
     UniquePtr<Matrix, MemoryTag::LayoutNodes> local;
     UniquePtr<Matrix, MemoryTag::LayoutNodes> perspective;
     UniquePtr<dsp::ResolvedVisuals, MemoryTag::LayoutNodes> visuals;
 
-    int32_t zIndex = 0;
-    int32_t previousZIndex = 0;  // as of the last SyncTrees, like previousStacking
+    int32_t previousZIndex = 0;  // as of the last SyncTrees, like the others of this kind
     // Place among the parent's children, for the bounds that the parent keeps by groups of children.
     uint32_t index = 0;
-    // Depth below the root, which is 0. Nodes at kMaxLayoutDepth and deeper keep zero boxes.
-    uint32_t depth = 0;
-    NodeFlags flags;
-    bool establishesStackingContext = false;
     bool previousStacking = false;
+    bool previousPositioned = false;
+    bool previousClip = false;
 
     // One frame long; SyncTrees clears them.
     bool visualChanged = false;
@@ -189,7 +188,9 @@ struct LayoutNode {
     const Edges& border() const { return edges.border(); }
     const Edges& padding() const { return edges.padding(); }
     const Edges& margin() const { return edges.margin(); }
-    Size ScrollSize() const { return below ? Size{below->content.width, below->content.height} : Size{}; }
+    Size ScrollSize() const {
+        return below ? Size{below->sum.content.width, below->sum.content.height} : Size{};
+    }
     // Beyond the depth limit a node takes no part in layout, transforms and painting.
     bool IsBeyondLimit() const { return depth >= limits::kMaxLayoutDepth; }
 };

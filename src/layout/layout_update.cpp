@@ -28,6 +28,8 @@ void SyncTrees(LayoutUpdateData& update) {
         node.boxMetricsChanged = false;
         node.previousStacking = node.establishesStackingContext;
         node.previousZIndex = node.zIndex;
+        node.previousPositioned = node.flags.isPositioned;
+        node.previousClip = node.flags.shouldOverflowClip;
     });
 }
 

@@ -3,6 +3,7 @@
 #include "layout/page_fixture.h"
 
 #include <map>
+#include <random>
 
 namespace qorvex::test {
 namespace {
@@ -26,6 +27,25 @@ class PaintOrderTest : public LayoutTest {
         std::string order;
         for (const dsp::PaintEntry& entry : list)
             order += (order.empty() ? "" : " ") + names[entry.node];
+        return order;
+    }
+
+    // The same from runs, whose subtrees are all that is left.
+    std::string OrderOfRuns(const LayoutHandle* context) {
+        layout::WorkCounters counters;
+        const TempMark mark;
+        PaintList list;
+        dsp::CollectPaintRuns(context->node(), {}, list, counters);
+        std::string order;
+        auto add = [&](auto& self, const layout::LayoutNode& node, bool below) -> void {
+            order += (order.empty() ? "" : " ") + names[&node];
+            if (!below) return;
+            dsp::ForEachChild(node, {}, [&](const layout::LayoutNode& child) {
+                self(self, child, !dsp::PaintsAsUnit(child));
+            });
+        };
+        for (const dsp::PaintEntry& entry : list)
+            add(add, *entry.node, entry.withSubtree);
         return order;
     }
 
@@ -74,6 +94,34 @@ TEST_F(PaintOrderTest, ChildrenInSpacePaintFromFarToNear) {
     // Flat, the depth counts for nothing.
     page.Change(space, "transform-style: flat");
     EXPECT_EQ(Order(space), "plane near far above farther");
+}
+
+TEST_F(PaintOrderTest, RunsHoldTheSameOrder) {
+    const char* styles[] = {"",
+                            "",
+                            "",
+                            "position: relative",
+                            "opacity: 0.5",
+                            "position: relative; z-index: -1",
+                            "position: absolute; z-index: 1",
+                            "overflow: hidden"};
+    std::mt19937 random(3);
+    std::vector<LayoutHandle*> boxes{page.body};
+    std::vector<std::string> kept(1000);
+    for (int i = 0; i < 300; ++i) {
+        kept[i] = std::to_string(i);
+        // A few parents with many children.
+        const uint32_t parents = static_cast<uint32_t>(std::min<size_t>(boxes.size(), 12));
+        boxes.push_back(
+            Add(boxes[random() % parents], kept[i].c_str(), styles[random() % std::size(styles)]));
+        if (i % 10 != 0) continue;
+        // And styles that change later.
+        page.Change(boxes[random() % boxes.size()], "position: static; opacity: 1; overflow: visible");
+        for (const LayoutHandle* box : boxes) {
+            if (box == page.body || dsp::PaintsAsUnit(box->node()))
+                ASSERT_EQ(Order(box), OrderOfRuns(box)) << i;
+        }
+    }
 }
 
 TEST_F(PaintOrderTest, WhatTouchesNoAreaIsLeftOut) {

@@ -45,6 +45,7 @@ class Allocator final : public qorvex::IAllocator {
     }
 
     int64_t blocks() const { return blocks_; }
+    int64_t peak_bytes() const { return peak_bytes_; }
     uint64_t requests() const { return requests_; }
     uint64_t wrong_tags() const { return wrong_tags_; }
 
@@ -66,16 +67,22 @@ class Allocator final : public qorvex::IAllocator {
         *HeaderOf(block) = {size, raw, tag};
         ++blocks_;
         ++requests_;
+        const int64_t bytes = bytes_ += static_cast<int64_t>(size);
+        // Only tests that use one thread ask for it.
+        if (bytes > peak_bytes_) peak_bytes_ = bytes;
         return block;
     }
     void Free(void* block, qorvex::MemoryTag tag) {
         if (!block) return;
         if (HeaderOf(block)->tag != tag) ++wrong_tags_;
         --blocks_;
+        bytes_ -= static_cast<int64_t>(HeaderOf(block)->size);
         std::free(HeaderOf(block)->raw);
     }
 
     std::atomic<int64_t> blocks_{0};
+    std::atomic<int64_t> bytes_{0};
+    std::atomic<int64_t> peak_bytes_{0};
     std::atomic<uint64_t> requests_{0};
     std::atomic<uint64_t> wrong_tags_{0};
 };
