@@ -10,12 +10,6 @@ namespace qorvex::dom {
 using css::ImageKind;
 using css::ImageValue;
 
-namespace {
-
-// CSS Backgrounds 3, section 6.2: percentages of the image, clamped to it.
-
-}  // namespace
-
 bool StyleImages::AreNamedBy(const css::VisualStyle& style) {
     return style.borderImageSource.kind == ImageKind::Url || style.maskImage.kind == ImageKind::Url ||
            std::any_of(style.backgroundImage.begin(), style.backgroundImage.end(),
