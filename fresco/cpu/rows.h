@@ -25,8 +25,12 @@ struct TexelSample {
 enum class BlendFactor : uint8_t { Zero, One, Alpha, Inverse };
 
 // Positions along a gradient: u + du * x in entries of the table; for a radial one the distance of (u, v)
-// from 0 is.
+// from 0 is. Entry i holds for positions from i on; the last one is for the very end.
 struct GradientWalk {
+    // A position on the edge of two entries belongs to the second, whatever its arithmetic lost: stripes of
+    // hard stops that are laid edge to edge must fit.
+    static constexpr float kOnEdge = 1.0f / 512;
+
     const uint32_t* colors;
     float last;       // index of the table's last entry, one period
     uint32_t spread;  // GradientSpread

@@ -194,7 +194,7 @@ float TableIndex(float t, const GradientWalk& walk) {
         t = t - Floor(t / twice + 0.5f) * twice;
         t = AtLeast(t, 0 - t);
     }
-    return AtMost(AtLeast(t, 0), walk.last) + 0.5f;
+    return AtMost(AtLeast(t, 0), walk.last) + GradientWalk::kOnEdge;
 }
 
 void LinearGradient(uint32_t* dst, int x, int count, const GradientWalk& walk) {

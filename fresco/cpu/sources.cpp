@@ -43,16 +43,16 @@ inline uint32_t Mix(uint32_t a, uint32_t b, uint32_t weight) {
 void GradientTable::Build(const GradientStop* stops, uint32_t count, float opacity, double length) {
     const double wanted = std::clamp(length * 2, double(kMinSize), double(kMaxSize));
     const int size = int(std::bit_ceil(uint32_t(wanted)));
-    colors.resize(size_t(size));
+    colors.resize(size_t(size) + 1);
     if (count == 0) return std::fill(colors.begin(), colors.end(), 0u);
-    const float unit = 1.0f / float(size - 1);
+    const float unit = 1.0f / float(size);
     const auto channels = [opacity](const Color& c, float out[4]) {
         const float scale = opacity * 255;
         out[0] = std::min(c.r, c.a) * scale, out[1] = std::min(c.g, c.a) * scale;
         out[2] = std::min(c.b, c.a) * scale, out[3] = c.a * scale;
     };
-    // Entry i stands for i * unit; those below an offset belong to the segment that ends there. An offset
-    // below an earlier one counts as equal to it.
+    // Entry i has the colour of its middle, (i + 0.5) * unit; those below an offset belong to the segment
+    // that ends there. An offset below an earlier one counts as equal to it.
     float from[4], to[4], step[4] = {};
     int entry = 0;
     float last = stops[0].offset;
@@ -63,7 +63,7 @@ void GradientTable::Build(const GradientStop* stops, uint32_t count, float opaci
         entry = end;
     };
     const auto entriesBelow = [&](float offset) {
-        return int(std::clamp(std::ceil(double(offset) * (size - 1)), 0.0, double(size)));
+        return int(std::clamp(std::ceil(double(offset) * size - 0.5), 0.0, double(size)));
     };
     fillUntil(entriesBelow(last));
     for (uint32_t k = 1; k < count; ++k) {
@@ -73,7 +73,7 @@ void GradientTable::Build(const GradientStop* stops, uint32_t count, float opaci
         const int end = entriesBelow(offset);
         if (end > entry) {
             const float slope = unit / (offset - last),
-                        start = (float(entry) * unit - last) / (offset - last);
+                        start = ((float(entry) + 0.5f) * unit - last) / (offset - last);
             for (int c = 0; c < 4; ++c) {
                 step[c] = (to[c] - from[c]) * slope;
                 from[c] += (to[c] - from[c]) * start;
@@ -85,6 +85,7 @@ void GradientTable::Build(const GradientStop* stops, uint32_t count, float opaci
     channels(stops[count - 1].color, from);
     std::fill(step, step + 4, 0.0f);
     fillUntil(size);
+    colors[size_t(size)] = colors[size_t(size) - 1];
 }
 
 GradientSource::GradientSource(const LinearGradient& geometry, const Homography& toPlane,
@@ -138,7 +139,7 @@ uint32_t GradientSource::Lookup(double t) const {
     } else if (spread_ == kSpreadReflect) {
         t = std::abs(t - 2 * std::floor(t / 2 + 0.5));
     }
-    const double index = std::clamp(t, 0.0, 1.0) * double(table_.colors.size() - 1) + 0.5;
+    const double index = std::clamp(t, 0.0, 1.0) * double(table_.colors.size() - 1) + GradientWalk::kOnEdge;
     return table_.colors[size_t(index)];
 }
 

@@ -73,7 +73,14 @@ GradientFill::GradientFill(const Gradient& gradient, const ResolvedImageLayer& l
                              : std::hypot(layer.end.x - layer.start.x, layer.end.y - layer.start.y) * unit_;
     PlaceStops(gradient, length, lengths, stops_);
     float from = 0, to = 1;
-    if (gradient.IsRepeating()) NormaliseRepeat(stops_, from, to);
+    if (gradient.IsRepeating()) {
+        NormaliseRepeat(stops_, from, to);
+    } else if (radial_ && stops_[stops_.size() - 1].offset > 1) {
+        // Beyond its shape a radial gradient goes on to its last stop.
+        to = stops_[stops_.size() - 1].offset;
+        for (fresco::GradientStop& stop : stops_)
+            stop.offset /= to;
+    }
     spread_ = gradient.IsRepeating() ? fresco::kSpreadRepeat : fresco::kSpreadPad;
     if (radial_) {
         ShiftStops(from / (to - from));

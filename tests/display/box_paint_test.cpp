@@ -158,6 +158,9 @@ TEST_F(BoxPaintTest, Gradients) {
          "FillLinearGradient 100 50 60 40 #000000ff 0 0.333333 1 0.333333", 1},
         {"background-image: radial-gradient(circle closest-side, red, blue)",
          "FillRadialGradient 100 50 60 40 #000000ff 0.5 0.333333 0.333333 0.333333", 1},
+        // A last stop beyond the shape makes it that much larger.
+        {"background-image: radial-gradient(circle closest-side, red, blue 200%)",
+         "FillRadialGradient 100 50 60 40 #000000ff 0.5 0.333333 0.666667 0.666667", 1},
         {"background-image: linear-gradient(red, blue); background-size: 30px 20px", "FillLinearGradient", 4},
         {"background-image: linear-gradient(red, blue); background-size: 30px 20px; background-repeat: "
          "no-repeat; "

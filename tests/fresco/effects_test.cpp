@@ -105,6 +105,27 @@ TEST(Effects, GradientsFollowTheirFormulas) {
     }
 }
 
+TEST(Effects, HardStopsThatMeetShareNoPixel) {
+    const Color half{0, 0, 0.5f, 0.5f}, none{0, 0, 0, 0};
+    const LinearGradient diagonal{{0, 1}, {1, 0}, kSpreadPad};
+    for (const float side : {12.0f, 24.0f, 40.0f, 60.0f}) {
+        for (const float at : {0.25f, 0.5f, 0.75f}) {
+            const GradientStop before[] = {{0, half}, {at, half}, {at, none}, {1, none}};
+            const GradientStop after[] = {{0, none}, {at, none}, {at, half}, {1, half}};
+            Canvas canvas;
+            CommandBuffer* b = Buffer();
+            const Rect rect{0, 0, 0, side, side};
+            b->FillLinearGradient(rect, Paint{}, before, 4, diagonal);
+            b->FillLinearGradient(rect, Paint{}, after, 4, diagonal);
+            canvas.Draw(b);
+            for (int y = 0; y < int(side); ++y) {
+                for (int x = 0; x < int(side); ++x)
+                    ASSERT_EQ(canvas.At(x, y), canvas.At(0, 0)) << side << " " << at << " " << x << "," << y;
+            }
+        }
+    }
+}
+
 TEST(Effects, PicturesGoThroughAnyTransform) {
     // A ramp: what is seen tells where it comes from.
     std::vector<uint32_t> ramp;

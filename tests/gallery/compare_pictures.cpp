@@ -1,7 +1,7 @@
-// compare-pictures A B [--threshold N] [--allow PERCENT] [--difference OUT]: prints the share of pixels that have a
-// channel which differs by more than N (8), in percent. Exit 0; 1 when that is above PERCENT (0.1) or the sizes
-// differ; 2 for a file or an argument that cannot be used. OUT shows the first picture pale, differences in red, and
-// darker the larger they are.
+// compare-pictures A B [--threshold N] [--allow PERCENT] [--difference OUT]: prints the share of pixels that
+// have a channel which differs by more than N (8), in percent. Exit 0; 1 when that is above PERCENT (0.1) or
+// the sizes differ; 2 for a file or an argument that cannot be used. OUT shows the first picture pale,
+// differences in red, and darker the larger they are.
 #include <png.h>
 
 #include <algorithm>
@@ -93,8 +93,8 @@ int main(int argc, char** argv) {
         MarkDifference(&a.rgb[i], distance, threshold, &shown.rgb[i]);
     }
     const double percent = 300.0 * double(differing) / double(std::max<size_t>(a.rgb.size(), 1));
-    std::printf("%.3f%% of the pixels differ by more than %d, the largest difference is %d\n", percent, threshold,
-                largest);
+    std::printf("%.3f%% of the pixels differ by more than %d, the largest difference is %d\n", percent,
+                threshold, largest);
     if (difference && !shown.Write(difference)) return Refuse("cannot be written", difference);
     return percent > allowed ? 1 : 0;
 }
