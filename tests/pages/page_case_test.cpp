@@ -10,6 +10,7 @@
 #include <map>
 
 #include "core/frame/client.h"
+#include "support/image_files.h"
 
 namespace qorvex::pages {
 namespace {
@@ -35,6 +36,7 @@ class CaseRunner {
     void Run() {
         for (const auto& [name, text] : page_.files)
             client_.files.Put(kFolder + name, text);
+        client_.files.Put("any.png", test::Png(test::Plain(4, 4, 0xFF808080)));
         client_.Load(page_.html, std::string(kFolder) + "index.html");
         size_t checks = 0;
         for (const Directive& directive : page_.directives) {

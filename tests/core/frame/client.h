@@ -132,6 +132,7 @@ class Files final : public qorvex::IAsyncResourceHandler {
         qorvex::IAsyncResourceResponse* response;
     };
 
+    // "any.png" stands for all pictures that are not there.
     void Put(const std::string& url, const std::string& text) { files_[url] = text; }
     void SetDeferred(bool deferred) { deferred_ = deferred; }
     void OnResourceRequest(const qorvex::IAsyncResourceRequest* request,
@@ -152,7 +153,8 @@ class Files final : public qorvex::IAsyncResourceHandler {
     }
     void Answer(const std::string& url, qorvex::IAsyncResourceResponse* response) {
         using Status = qorvex::IAsyncResourceResponse::Status;
-        const auto found = files_.find(url);
+        auto found = files_.find(url);
+        if (found == files_.end() && url.ends_with(".png")) found = files_.find("any.png");
         if (found == files_.end()) {
             response->SetStatus(404);
             response->Finish(Status::Failure);

@@ -1,6 +1,7 @@
 // Images from the handler to the screen: one request for all who show one, every bad answer, every moment at
 // which the last user can go, orphans, animations, the client's own images, lost rendering resources.
 #include <gtest/gtest.h>
+#include <qorvex/debug_interface.h>
 #include <qorvex/frame_stats.h>
 #include <qorvex/images_list.h>
 
@@ -172,7 +173,7 @@ TEST_F(ImageTest, VectorImagesFailInOneWay) {
     EXPECT_EQ(log().Count("SVG images are not available in this build"), 1u);
     EXPECT_EQ(log().Count(" load FAILED"), 2u);
     EXPECT_EQ(log().Count("Will reuse SVG: "), 2u);
-    Run("document.getElementById('a').remove()");
+    Run("document.body.removeChild(document.getElementById('a'))");
     Frames(2);
     EXPECT_TRUE(log().Lines(Logging::Error).empty());
 }
@@ -202,7 +203,7 @@ TEST_F(ImageTest, TheLastUserGoesBeforeOrAfterDecoding) {
     Load("", "<div id=a></div>");
     Run("var a = document.getElementById('a'); a.style.backgroundImage = 'url(red.png)'");
     client_->view->Advance(client_->time += 16);  // answered; not decoded yet
-    Run("a.remove()");
+    Run("document.body.removeChild(a)");
     client_->view->Advance(client_->time += 16);
     client_->ServeResources();
     EXPECT_TRUE(log().Contains("Freeing decoded data as image "));
@@ -210,7 +211,7 @@ TEST_F(ImageTest, TheLastUserGoesBeforeOrAfterDecoding) {
     Run("document.body.appendChild(a)");
     client_->view->Advance(client_->time += 16);
     client_->ServeResources();
-    Run("a.remove()");
+    Run("document.body.removeChild(a)");
     client_->view->Advance(client_->time += 16);
     EXPECT_TRUE(log().Contains(" upload to GPU canceled."));
     EXPECT_FALSE(log().Contains(" now on GPU "));
@@ -220,7 +221,7 @@ TEST_F(ImageTest, TheLastUserGoesBeforeOrAfterDecoding) {
 
 TEST_F(ImageTest, OrphansComeBackForFreeAndArePruned) {
     Load("div { background-image: url(red.png); }", "<div id=a></div>");
-    Run("var a = document.getElementById('a'); a.remove()");
+    Run("var a = document.getElementById('a'); document.body.removeChild(a)");
     Frames(2);
     EXPECT_EQ(Cached(), (std::pair<uint32_t, uint32_t>{0, 1}));
     Run("document.body.appendChild(a)");
@@ -228,7 +229,7 @@ TEST_F(ImageTest, OrphansComeBackForFreeAndArePruned) {
     EXPECT_EQ(Pixel(5, 5), kSeenRed) << "in the frame that asked";
     EXPECT_TRUE(log().Contains("CachedImagesManager: Resurrecting image: coui://page/red.png assigned id 0"));
     EXPECT_EQ(Requests("coui://page/red.png"), 1u);
-    Run("a.remove()");
+    Run("document.body.removeChild(a)");
     Frames(1);
     client_->system->PruneOrphanedResources();
     EXPECT_EQ(Cached(), (std::pair<uint32_t, uint32_t>{0, 0}));
@@ -272,9 +273,10 @@ TEST_F(ImageTest, ARequestThatAnotherViewWaitsForGoesOn) {
                        Page("", "<div style='background-image: url(red.png)'></div>"));
     other->LoadURL("coui://page/other.html");
     for (int i = 0; i < 6; ++i) {
+        client_->Frame();
         other->Advance(client_->time);
-        client_->ServeResources();
     }
+    EXPECT_EQ(Cached().first, 1u);
     client_->files.SetDeferred(true);
     Run("document.getElementById('a').style.backgroundImage = 'url(green.png)';");
     Frames(1);
@@ -383,7 +385,7 @@ TEST_F(ImageTest, ClientsOwnImagesShowTheirContents) {
     EXPECT_TRUE(
         log().Contains("Trying to update image with ID - 0 (index in provided list 0 out of 3). Skipped."));
     EXPECT_TRUE(log().Contains("Trying to update image with ID 8. Skipped."));
-    Run("document.getElementById('a').remove()");
+    Run("document.body.removeChild(document.getElementById('a'))");
     Frames(1);
     EXPECT_TRUE(log().Contains("scheduled to be freed with GPU resource id "));
     EXPECT_EQ(Cached(), (std::pair<uint32_t, uint32_t>{0, 0}));
@@ -392,7 +394,7 @@ TEST_F(ImageTest, ClientsOwnImagesShowTheirContents) {
 TEST_F(ImageTest, LostRenderingResourcesAreLoadedAgain) {
     Load("div { background-image: url(red.png); } #b { left: 30px; background-image: url(green.png); }",
          "<div id=a></div><div id=b></div>");
-    Run("document.getElementById('b').remove()");
+    Run("document.body.removeChild(document.getElementById('b'))");
     Frames(1);
     client_->renderer->FreeRenderingResources();
     client_->system_renderer->FreeRenderingResources();
@@ -430,18 +432,25 @@ TEST_P(UnrulyImages, EndRight) {
     for (int i = 0; i < 12; ++i)
         client_->files.Put("coui://page/" + std::to_string(i) + ".png",
                            Png(Plain(8 + static_cast<uint32_t>(i), 8, kBlue)));
-    client_->Load(Page("", "<div id=a></div><div id=b style='left: 30px'></div>"));
+    client_->files.Put("coui://page/index.html", Page("", "<div id=a></div><div id=b></div>"));
+    client_->view->LoadURL("coui://page/index.html");
+    auto* debug = static_cast<IDebugInterface*>(client_->library->GetFeatureInterface(kDebugFeature));
+    for (int i = 0; i < 2000 && !debug->IsLoaded(client_->view); ++i) {
+        client_->Frame();
+        std::this_thread::yield();
+    }
+    ASSERT_TRUE(debug->IsLoaded(client_->view));
     for (int step = 0; step < 120; ++step) {
         const std::string file = std::to_string(step * 7 % 12) + ".png";
         Run("{ const d = document.createElement('div'); d.style.backgroundImage = 'url(" + file +
             ")'; document.body.appendChild(d);"
-            "  const all = document.body.children; if (all.length > 6) all[2].remove();"
+            "  const all = document.body.children; if (all.length > 6) document.body.removeChild(all[2]);"
             "  all[all.length - 2].style.maskImage = 'url(" +
             file + ")'; }");
         client_->Frame();
         if (step == 60) client_->renderer->FreeRenderingResources();
     }
-    Run("while (document.body.children.length > 2) document.body.lastChild.remove();"
+    Run("while (document.body.children.length > 2) document.body.removeChild(document.body.lastChild);"
         "document.body.children[0].style.cssText = 'background-image: url(red.png)';"
         "document.body.children[1].style.cssText = 'left: 30px; background-image: url(green.png)';");
     for (int i = 0; i < 400 && !(Pixel(5, 5) == kSeenRed && Pixel(35, 5) == kSeenGreen); ++i) {
