@@ -50,10 +50,10 @@ constexpr File kFiles[] = {
      "<html><head><script src=a.js></script></head><body>leaving<script>setTimeout(function () {"
      "try { location.href = 'coui://stress/rich.html'; } catch (e) {} }, 40)</script></body></html>"},
     {"coui://stress/pictures.html",
-     "<html><head><link rel=stylesheet href=a.css><style>.g{background-image:url(beat.gif);width:20px;height:"
-     "20px}</style></head><body><img id=app src=still.png><img src=cut.gif width=9><img src=none.png><div "
-     "class=g></div><p qor-inline>in <img src=beat.gif> line</p><script>var n = 0, names = ['still.png', "
-     "'beat.gif', 'cut.gif', 'none.png', '', 'a.js'];function swap() { var app = "
+     "<html><head><link rel=stylesheet href=a.css><style>.g{background-image:url(b.gif);width:20px;height:"
+     "20px}</style></head><body><img id=app src=a.png><img src=cut.gif width=9><img src=none.png><div "
+     "class=g></div><p qor-inline>in <img src=b.gif> line</p><script>var n = 0, names = ['a.png', "
+     "'b.gif', 'cut.gif', 'none.png', '', 'a.js'];function swap() { var app = "
      "document.getElementById('app');"
      "if (!app || n++ > 300) return; app.src = names[n % 6]; if (n % 4 == 0) app.width = n % 50;"
      "var lost = new Image(n % 3); lost.onload = lost.onerror = function () { window.told = n; };"
@@ -61,11 +61,9 @@ constexpr File kFiles[] = {
      "lost.parentNode.removeChild(lost); } requestAnimationFrame(swap); } swap();</script></body></html>"},
     {"coui://stress/a.css",
      "@font-face{font-family:Web;src:url(coui://stress/web.ttf)}body{margin:0;background-color:#fff}"
-     ".b0{background:url(still.png),url(beat.gif);height:10px}.b1{width:50%;opacity:.5;background-image:url("
-     "beat.gif)}."
+     ".b0{background:url(a.png),url(b.gif);height:10px}.b1{width:50%;opacity:.5;background-image:url(b.gif)}."
      "b2{"
-     "border:3px solid;border-image:url(still.png) "
-     "3;mask-image:url(still.png)}.b2{transform:translate(4px,4px) "
+     "border:3px solid;border-image:url(a.png) 3;mask-image:url(c.png)}.b2{transform:translate(4px,4px) "
      "rotate(5deg)}#app{position:absolute;padding:4px;font-family:Web,sans-serif;font-size:12px}"},
     {"coui://stress/b.css",
      ".card{display:flex;flex-direction:row;border:1px solid #000;border-radius:4px}.shadow{box-shadow:2px "
@@ -79,18 +77,22 @@ constexpr File kFiles[] = {
     {"coui://stress/c.js", "null.missing();"},
 };
 
-const File* Find(std::string_view url) {
-    static const std::string kStill = qorvex::test::Png(qorvex::test::Plain(12, 8, 0xFFCC6633));
-    static const std::string kBeat = qorvex::test::Gif(20, 20, {2, 0, 7});
-    static const File kPictures[] = {{"coui://stress/still.png", kStill},
-                                     {"coui://stress/beat.gif", kBeat},
-                                     {"coui://stress/cut.gif", std::string_view(kBeat).substr(0, 300)}};
+// Pictures by their letter; any other is missing.
+std::string MakePicture(std::string_view url) {
+    constexpr std::string_view kAt = "coui://stress/";
+    if (!url.starts_with(kAt)) return {};
+    url.remove_prefix(kAt.size());
     url = url.substr(0, url.find('?'));
-    const auto named = [&](const File& file) { return file.url == url; };
-    const File* found = std::find_if(std::begin(kFiles), std::end(kFiles), named);
-    if (found != std::end(kFiles)) return found;
-    found = std::find_if(std::begin(kPictures), std::end(kPictures), named);
-    return found == std::end(kPictures) ? nullptr : found;
+    if (url == "a.png" || url == "c.png") return qorvex::test::Png(qorvex::test::Plain(12, 8, 0x80402010));
+    if (url == "b.gif") return qorvex::test::Gif(6, 6, {1, 3, 5});
+    if (url == "cut.gif") return qorvex::test::Gif(6, 6, {1, 3, 5}).substr(0, 80);
+    return {};
+}
+
+const File* Find(std::string_view url) {
+    const File* found =
+        std::find_if(std::begin(kFiles), std::end(kFiles), [&](const File& file) { return file.url == url; });
+    return found == std::end(kFiles) ? nullptr : found;
 }
 
 // A font file that is none: reads come short and garbled.
@@ -148,12 +150,14 @@ const char* const kScripts[12] = {
 void Site::OnResourceRequest(const qorvex::IAsyncResourceRequest* request, IAsyncResourceResponse* response) {
     const std::string_view url = request->GetAbsoluteURL();
     const File* file = Find(url);
-    if (!file) {
+    const std::string picture = file ? std::string() : MakePicture(url);
+    if (!file && picture.empty()) {
         response->SetStatus(404);
         response->Finish(IAsyncResourceResponse::Status::Failure);
         return;
     }
-    std::memcpy(response->GetSpace(file->text.size()), file->text.data(), file->text.size());
+    const std::string_view bytes = file ? file->text : std::string_view(picture);
+    std::memcpy(response->GetSpace(bytes.size()), bytes.data(), bytes.size());
     response->SetHeader("Content-Type", "text/plain");
     response->SetStatus(200);
     response->Finish(IAsyncResourceResponse::Status::Success);
