@@ -3,6 +3,8 @@
 
 #include <algorithm>
 #include <fstream>
+#include <iterator>
+#include <random>
 #include <string>
 #include <vector>
 
@@ -192,6 +194,30 @@ TEST(TextServices, DirectionOfTextsAndBadUtf8) {
         Runs runs(text.size());
         service.ComputeTextDirection(text.data(), static_cast<unsigned>(text.size()), &runs);
         EXPECT_EQ(std::count(runs.levels.begin(), runs.levels.end(), 0xFFu), 0);
+    }
+}
+
+// What is plainly backward is answered without the algorithm. A mark behind the text asks the algorithm and
+// changes nothing.
+TEST(TextServices, PlainlyBackwardTextIsWhatTheAlgorithmSays) {
+    constexpr uint32_t kCodes[] = {' ',   '!',   '(',   ')',   '-',   '.',   '/',   0x5D0, 0x5EA, 0x60C,
+                                   0x61B, 0x620, 0x640, 0x64A, 0x64B, 0x65F, 0x66E, 0x670, 0x6D3, '7'};
+    constexpr uint32_t kMark = 0x200F;
+    host::IcuInternationalization services;
+    std::mt19937 random(2);
+    for (int round = 0; round < 3000; ++round) {
+        std::string text;
+        // A letter in front, so that the mark does not decide the direction of the paragraph.
+        AppendUtf8(0x5D0, text);
+        for (uint32_t i = random() % 10; i > 0; --i)
+            AppendUtf8(kCodes[random() % std::size(kCodes)], text);
+        std::string marked = text;
+        AppendUtf8(kMark, marked);
+        Runs plain(text.size()), asked(marked.size());
+        services.ComputeTextDirection(text.data(), static_cast<unsigned>(text.size()), &plain);
+        services.ComputeTextDirection(marked.data(), static_cast<unsigned>(marked.size()), &asked);
+        asked.levels.resize(text.size());
+        ASSERT_EQ(plain.levels, asked.levels) << text;
     }
 }
 
