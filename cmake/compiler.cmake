@@ -48,6 +48,10 @@ if(QORVEX_MOLD)
     add_link_options(-fuse-ld=mold)
 endif()
 
+# Symbols are found when a program is loaded, not on the first call of each inside some frame of a game; and
+# what the loader has written stays read-only.
+add_link_options(-Wl,-z,relro,-z,now)
+
 find_package(Threads REQUIRED)
 
 # qorvex_uses_rapidjson(TARGET...): its stack adds to a null pointer before its first push.

@@ -1,6 +1,7 @@
 #include "print_log_handler.h"
 
 #include <algorithm>
+#include <string>
 
 namespace qorvex::host {
 
@@ -9,9 +10,12 @@ void PrintLogHandler::WriteLog(Logging::Severity severity, const char* text, uns
     const std::uint32_t row = std::min<std::uint32_t>(severity, std::size(kNames) - 1);
     counts_[row].fetch_add(1, std::memory_order_relaxed);
     // The length counts the terminator.
-    const int size = length > 0 ? static_cast<int>(length) - 1 : 0;
+    std::string line(text, length > 0 ? length - 1 : 0);
+    // One message, one line: a script's stack has line feeds, and a page must not be able to forge lines.
+    std::replace_if(
+        line.begin(), line.end(), [](unsigned char c) { return c < ' ' || c == 0x7F; }, ' ');
     const std::lock_guard lock(mutex_);
-    std::fprintf(stream_, "%s: %.*s\n", kNames[row], size, text);
+    std::fprintf(stream_, "%s: %s\n", kNames[row], line.c_str());
 }
 
 std::uint64_t PrintLogHandler::CountFrom(std::uint32_t severity) const {

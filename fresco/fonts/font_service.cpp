@@ -10,6 +10,7 @@
 #include <cstring>
 
 #include "fresco/core/log.h"
+#include "fresco/core/prefault.h"
 #include "fresco/fonts/bitmap_face.h"
 
 namespace fresco {
@@ -57,6 +58,8 @@ void* FtReallocate(FT_Memory memory, long, long newSize, void* block) {
 bool ReadAll(IStreamReader* stream, Vector<uint8_t>* bytes, size_t most = kMaxFontBytes) {
     const size_t size = stream ? stream->GetSize() : 0;
     if (size == 0 || size > most) return false;
+    bytes->reserve(size);
+    Prefault(bytes->data(), size);
     bytes->resize(size);
     size_t done = 0;
     while (done < size) {

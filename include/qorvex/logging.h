@@ -20,8 +20,8 @@ enum Severity : uint32_t {
 class ILogHandler {
   public:
     virtual ~ILogHandler() = default;
-    /// `text` is one line without a line feed, at most 1023 characters and a terminating zero; `length`
-    /// counts the terminator. The text is valid during the call only. The handler must not call the engine.
+    /// `text`: up to 1023 characters and a zero that `length` counts, valid during the call. What scripts log
+    /// or throw may have line feeds; a handler of lines replaces them. The handler must not call the engine.
     virtual void WriteLog(Severity severity, const char* text, unsigned length) {
         (void)severity, (void)text, (void)length;
     }

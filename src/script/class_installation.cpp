@@ -2,6 +2,9 @@
 
 #include <JavaScriptCore/JavaScript.h>
 
+#include <algorithm>
+#include <span>
+
 #include "script/class_description.h"
 #include "script/engine_seam.h"
 #include "script/evaluate.h"
@@ -11,68 +14,19 @@ namespace qorvex::script {
 
 namespace {
 
-// Gives the functions that build classes, in the order of ClassBuilder; what they are handed is what the C
-// API cannot express. They run whenever a class is first used, so they keep what they need of the language
-// before any script of the page can change it. Descriptors are kept as well: making one costs more than
-// defining a property with it.
-constexpr std::string_view kBuilders = R"('use strict'; {
-    const global = globalThis;
-    let build;
-    const { defineProperty, create, setPrototypeOf, prototype: root } = Object;
-    const { toStringTag, hasInstance } = Symbol;
-    const { apply } = Reflect;
-    const instanceOf = Function.prototype[hasInstance];
+// What the C API cannot express, as a function of what it needs of the language: it runs when a class is
+// first used, and by then scripts of the page may have changed what the global names stand for.
+constexpr std::string_view kScriptTools = R"('use strict';
+(function(global, defineProperty, setPrototypeOf, apply, instanceOf, hasInstance) {
     const kind = (writable, enumerable, configurable) =>
         ({ __proto__: null, value: undefined, writable, enumerable, configurable });
-    const access = enumerable =>
-        ({ __proto__: null, get: undefined, set: undefined, enumerable, configurable: true });
-    const accessor = access(true), hiddenAccessor = access(false);
-    const method = kind(true, true, true), constant = kind(false, true, false), fixed = kind(false, false, false);
-    const hidden = kind(true, false, true), label = kind(false, false, true);
+    const constant = kind(false, true, false), fixed = kind(false, false, false), hidden = kind(true, false, true);
     function define(target, key, descriptor, value) {
         descriptor.value = value;
         defineProperty(target, key, descriptor);
         descriptor.value = undefined;
     }
-    function defineHidden(target, key, get, set) {
-        hiddenAccessor.get = get;
-        hiddenAccessor.set = set;
-        defineProperty(target, key, hiddenAccessor);
-    }
-    function constants(target, values, i) {
-        for (; i < values.length; i += 2) define(target, values[i], constant, values[i + 1]);
-    }
-    [
-        // A global name whose class is made when it is read; `make` does that.
-        function lazy(make, ...names) {
-            build = make;
-            for (let i = 0; i < names.length; i += 2) {
-                const name = names[i], index = names[i + 1];
-                defineHidden(global, name, () => {
-                    const made = build(index);
-                    define(global, name, hidden, made);
-                    return made;
-                }, value => define(global, name, hidden, value));
-            }
-        },
-        // Its constructor costs more than the rest of it, and a page asks for few.
-        function prototypeOf(parent, name, index) {
-            const result = create(parent || root);
-            define(result, toStringTag, label, name);
-            defineHidden(result, 'constructor', () => build(index),
-                function(value) { define(this, 'constructor', this === result ? hidden : method, value); });
-            return result;
-        },
-        // Name, getter and setter of each attribute; name and value of constants.
-        function members(target, attributes, ...values) {
-            let i = 0;
-            for (; attributes > 0; --attributes, i += 3) {
-                accessor.get = values[i + 1];
-                accessor.set = values[i + 2];
-                defineProperty(target, values[i], accessor);
-            }
-            constants(target, values, i);
-        },
+    return [
         function constructorOf(name, prototype, parent, construct, answersForGlobal, ...values) {
             const result = { [name]: function(...values) { return construct(new.target, ...values); } }[name];
             define(result, 'prototype', fixed, prototype);
@@ -83,7 +37,7 @@ constexpr std::string_view kBuilders = R"('use strict'; {
                 define(result, hasInstance, fixed,
                     function(value) { return value === global || apply(instanceOf, this, [value]); });
             }
-            constants(result, values, 0);
+            for (let i = 0; i < values.length; i += 2) define(result, values[i], constant, values[i + 1]);
             return result;
         },
         // Sixteen objects that inherit from `prototype`, handed over in one call.
@@ -92,10 +46,12 @@ constexpr std::string_view kBuilders = R"('use strict'; {
             Blank.prototype = prototype;
             return () => take(new Blank, new Blank, new Blank, new Blank, new Blank, new Blank, new Blank, new Blank,
                               new Blank, new Blank, new Blank, new Blank, new Blank, new Blank, new Blank, new Blank);
-        },
-        function tagGlobal(name) { define(global, toStringTag, label, name); }
+        }
     ];
-})";
+}))";
+
+constexpr JSPropertyAttributes kConstant = kJSPropertyAttributeReadOnly | kJSPropertyAttributeDontDelete;
+constexpr JSPropertyAttributes kLabel = kJSPropertyAttributeReadOnly | kJSPropertyAttributeDontEnum;
 
 JSValueRef InvalidConstructor(JSContextRef context, JSObjectRef, JSObjectRef, size_t, const JSValueRef[],
                               JSValueRef* exception) {
@@ -106,35 +62,18 @@ JSValueRef InvalidConstructor(JSContextRef context, JSObjectRef, JSObjectRef, si
 // Where the object that holds all of a page keeps what.
 constexpr size_t kPrototypesAt = 0;
 constexpr size_t kConstructorsAt = kScriptClassCount;
-constexpr size_t kBuildersAt = 2 * kScriptClassCount;
+constexpr size_t kToolsAt = 2 * kScriptClassCount;
 
-// Arguments of a call, on the stack, where the collector sees them.
-class Arguments {
+class ScriptName {
   public:
-    explicit Arguments(JSContextRef context) : context_(context) {}
-    void Add(JSValueRef value) { values_[count_++] = value; }
-    void Add(const char* text) {
-        JSStringRef string = JSStringCreateWithUTF8CString(text);
-        Add(JSValueMakeString(context_, string));
-        JSStringRelease(string);
-    }
-    void Add(double number) { Add(JSValueMakeNumber(context_, number)); }
-    // A function of that name, or undefined for a null callback.
-    void Add(JSStringRef name, JSObjectCallAsFunctionCallback callback) {
-        Add(callback ? JSObjectMakeFunctionWithCallback(context_, name, callback)
-                     : JSValueMakeUndefined(context_));
-    }
-    // Room for a few more of the same.
-    [[nodiscard]] bool IsFull() const { return count_ + 4 > kMost; }
-    [[nodiscard]] std::span<const JSValueRef> values() const { return {values_, count_}; }
-    [[nodiscard]] size_t count() const { return count_; }
-    void Set(size_t index, double number) { values_[index] = JSValueMakeNumber(context_, number); }
+    explicit ScriptName(const char* text) : string_(JSStringCreateWithUTF8CString(text)) {}
+    ~ScriptName() { JSStringRelease(string_); }
+    ScriptName(const ScriptName&) = delete;
+    ScriptName& operator=(const ScriptName&) = delete;
+    operator JSStringRef() const { return string_; }  // NOLINT: implicit by design
 
   private:
-    static constexpr size_t kMost = 256;
-    JSContextRef context_;
-    size_t count_ = 0;
-    JSValueRef values_[kMost];
+    JSStringRef string_;
 };
 
 class Installer {
@@ -144,19 +83,16 @@ class Installer {
     void Install() {
         const ScriptEngineLock lock(context_);
         // Without a prototype: a page can change what an array does with its entries.
-        page_.class_keeper = JSObjectMake(context_, nullptr, nullptr);
-        JSObjectSetPrototype(context_, page_.class_keeper, JSValueMakeNull(context_));
+        page_.class_keeper = MakeBare();
         JSValueProtect(context_, page_.class_keeper);
-        MakeBuilders();
+        KeepLanguage();
         InstallNames();
         // The global object's prototype cannot be changed: what its classes have stands on itself.
         for (const ScriptClass script_class : {ScriptClass::EventTarget, ScriptClass::Window}) {
             if (const ClassDescription* description = GetClassDescription(script_class))
                 DefineMembers(page_.global_object, *description);
         }
-        Arguments tag(context_);
-        tag.Add(GetScriptClassRow(ScriptClass::Window).name);
-        Call(ClassBuilder::TagGlobal, tag);
+        Label(page_.global_object, ScriptClass::Window);
     }
 
     // Null when script cannot run now.
@@ -168,16 +104,21 @@ class Installer {
         const ScriptClass parent = GetScriptClassRow(script_class).parent;
         const JSObjectRef parent_prototype = PrototypeOf(parent);
         if (parent != ScriptClass::None && !parent_prototype) return nullptr;
-        Arguments arguments(context_);
-        arguments.Add(parent_prototype ? parent_prototype : JSValueMakeNull(context_));
-        arguments.Add(GetScriptClassRow(script_class).name);
-        arguments.Add(static_cast<double>(index));
-        const JSObjectRef prototype = AsObject(context_, Call(ClassBuilder::PrototypeOf, arguments));
-        if (!prototype) return nullptr;
+        // Without a parent at first: the API looks there, too, before it defines a property, and would meet
+        // what the page has put into Object.prototype.
+        const JSObjectRef prototype = JSObjectMake(context_, nullptr, nullptr);
+        const JSValueRef root = JSObjectGetPrototype(context_, prototype);
+        JSObjectSetPrototype(context_, prototype, JSValueMakeNull(context_));
+        Label(prototype, script_class);
+        // Its constructor costs more than the rest of it, and a page asks for few.
+        DefineAccessor(prototype, "constructor", Tool(ClassTool::HiddenAccessor),
+                       Tool(ClassTool::ConstructorGetter), Tool(ClassTool::ConstructorSetter));
         const ClassDescription* description = GetClassDescription(script_class);
         // The window's own stand on the global object.
         const bool has_members = description && script_class != ScriptClass::Window;
-        if (has_members && !DefineMembers(prototype, *description)) return nullptr;
+        if (has_members) DefineMembers(prototype, *description);
+        if (exception_) return nullptr;
+        JSObjectSetPrototype(context_, prototype, parent_prototype ? parent_prototype : root);
         Keep(kPrototypesAt + index, prototype);
         return page_.prototypes[index] = prototype;
     }
@@ -195,46 +136,131 @@ class Installer {
         return constructor;
     }
 
+    JSObjectRef MakeBlankMaker(JSObjectRef prototype, JSObjectRef take) {
+        const JSValueRef arguments[] = {prototype, take};
+        return AsObject(context_, Call(ScriptTool(ClassTool::BlanksOf), arguments));
+    }
+
     [[nodiscard]] JSValueRef exception() const { return exception_; }
 
   private:
-    // The getter of a global name: gives the constructor.
-    static JSValueRef BuildClass(JSContextRef context, JSObjectRef, JSObjectRef, size_t,
+    // Reads a global name that stands for a class, without an argument, or writes it.
+    static JSValueRef AccessName(JSContextRef context, JSObjectRef function, JSObjectRef, size_t count,
                                  const JSValueRef arguments[], JSValueRef* exception) {
+        const JSValueRef undefined = JSValueMakeUndefined(context);
         ScriptingContext* page = GetScriptingContext(context);
-        if (!page) return JSValueMakeUndefined(context);
-        Installer installer(*page);
-        const double index = JSValueToNumber(context, arguments[0], nullptr);
-        const JSObjectRef made = installer.ConstructorOf(static_cast<ScriptClass>(index));
-        if (!made) *exception = installer.exception();
-        return made ? made : JSValueMakeUndefined(context);
+        if (!page) return undefined;
+        for (const LazyClassName& name : page->class_names) {
+            if (name.accessor != function) continue;
+            Installer installer(*page);
+            const JSValueRef value = count > 0 ? arguments[0] : installer.ConstructorOf(name.script_class);
+            if (value) installer.DefineValue(page->global_object, name.name, ClassTool::HiddenValue, value);
+            if (installer.exception()) *exception = installer.exception();
+            return value && count == 0 ? value : undefined;
+        }
+        return undefined;
     }
 
-    void MakeBuilders() {
-        JSStringRef source = JSStringCreateWithUTF8CString(kBuilders.data());
-        const JSObjectRef builders =
-            AsObject(context_, JSEvaluateScript(context_, source, nullptr, nullptr, 0, nullptr));
-        JSStringRelease(source);
-        for (size_t i = 0; i < page_.builders.size(); ++i) {
-            page_.builders[i] = AsObject(
-                context_, JSObjectGetPropertyAtIndex(context_, builders, static_cast<unsigned>(i), nullptr));
+    // `constructor` of every prototype: the class is that of the first prototype on the way up from `this`.
+    static JSValueRef GetConstructor(JSContextRef context, JSObjectRef, JSObjectRef this_object, size_t,
+                                     const JSValueRef[], JSValueRef* exception) {
+        ScriptingContext* page = GetScriptingContext(context);
+        JSObjectRef object = page ? this_object : nullptr;
+        // A page can make chains of any length.
+        for (int steps = 0; object && steps < kLongestChain; ++steps) {
+            const ScriptClass script_class = ClassOfPrototype(*page, object);
+            if (script_class != ScriptClass::None) {
+                Installer installer(*page);
+                const JSObjectRef made = installer.ConstructorOf(script_class);
+                if (!made) *exception = installer.exception();
+                return made ? made : JSValueMakeUndefined(context);
+            }
+            object = AsObject(context, JSObjectGetPrototype(context, object));
         }
-        Keep(kBuildersAt, builders);
+        return JSValueMakeUndefined(context);
+    }
+
+    static JSValueRef SetConstructor(JSContextRef context, JSObjectRef, JSObjectRef this_object, size_t count,
+                                     const JSValueRef arguments[], JSValueRef* exception) {
+        ScriptingContext* page = GetScriptingContext(context);
+        if (!page || count == 0) return JSValueMakeUndefined(context);
+        Installer installer(*page);
+        const bool own = ClassOfPrototype(*page, this_object) != ScriptClass::None;
+        installer.DefineValue(this_object, "constructor", own ? ClassTool::HiddenValue : ClassTool::Method,
+                              arguments[0]);
+        if (installer.exception()) *exception = installer.exception();
+        return JSValueMakeUndefined(context);
+    }
+
+    static ScriptClass ClassOfPrototype(const ScriptingContext& page, JSObjectRef object) {
+        const auto found = std::find(page.prototypes.begin(), page.prototypes.end(), object);
+        return found == page.prototypes.end() ? ScriptClass::None
+                                              : static_cast<ScriptClass>(found - page.prototypes.begin());
+    }
+
+    JSObjectRef MakeBare() {
+        const JSObjectRef object = JSObjectMake(context_, nullptr, nullptr);
+        JSObjectSetPrototype(context_, object, JSValueMakeNull(context_));
+        return object;
+    }
+
+    JSValueRef Get(JSValueRef object, const char* name) {
+        return JSObjectGetProperty(context_, AsObject(context_, object), ScriptName(name), &exception_);
+    }
+
+    JSObjectRef MakeDescriptor(bool accessor, bool enumerable) {
+        const JSObjectRef descriptor = MakeBare();
+        const auto set = [&](const char* name, JSValueRef value) {
+            JSObjectSetProperty(context_, descriptor, ScriptName(name), value, kJSPropertyAttributeNone,
+                                &exception_);
+        };
+        set("configurable", JSValueMakeBoolean(context_, true));
+        set("enumerable", JSValueMakeBoolean(context_, enumerable));
+        if (!accessor) set("writable", JSValueMakeBoolean(context_, true));
+        return descriptor;
+    }
+
+    // Before any script of the page.
+    void KeepLanguage() {
+        const JSValueRef object = Get(page_.global_object, "Object");
+        const JSValueRef symbol = Get(page_.global_object, "Symbol");
+        const JSValueRef has_instance = Get(symbol, "hasInstance");
+        const JSValueRef function_prototype = Get(Get(page_.global_object, "Function"), "prototype");
+        KeepTool(ClassTool::DefineProperty, Get(object, "defineProperty"));
+        KeepTool(ClassTool::SetPrototypeOf, Get(object, "setPrototypeOf"));
+        KeepTool(ClassTool::Apply, Get(Get(page_.global_object, "Reflect"), "apply"));
+        KeepTool(ClassTool::HasInstance, has_instance);
+        KeepTool(ClassTool::InstanceOf,
+                 JSObjectGetPropertyForKey(context_, AsObject(context_, function_prototype), has_instance,
+                                           &exception_));
+        KeepTool(ClassTool::ToStringTag, Get(symbol, "toStringTag"));
+        KeepTool(ClassTool::Accessor, MakeDescriptor(true, true));
+        KeepTool(ClassTool::HiddenAccessor, MakeDescriptor(true, false));
+        KeepTool(ClassTool::HiddenValue, MakeDescriptor(false, false));
+        KeepTool(ClassTool::Method, MakeDescriptor(false, true));
+        const ScriptName name("constructor");
+        KeepTool(ClassTool::ConstructorGetter,
+                 JSObjectMakeFunctionWithCallback(context_, name, GetConstructor));
+        KeepTool(ClassTool::ConstructorSetter,
+                 JSObjectMakeFunctionWithCallback(context_, name, SetConstructor));
     }
 
     void InstallNames() {
-        Arguments names(context_);
-        names.Add(nullptr, BuildClass);
+        page_.class_names.reserve(kScriptClassCount);
         for (size_t i = 0; i < kScriptClassCount; ++i) {
-            const ClassDescription* description = GetClassDescription(static_cast<ScriptClass>(i));
+            const auto script_class = static_cast<ScriptClass>(i);
+            const ClassDescription* description = GetClassDescription(script_class);
             if (description && !description->has_global_name) continue;
-            names.Add(kScriptClassRows[i].name);
-            names.Add(static_cast<double>(i));
-            if (!description || !description->alias) continue;
-            names.Add(description->alias);
-            names.Add(static_cast<double>(i));
+            InstallName(kScriptClassRows[i].name, script_class);
+            if (description && description->alias) InstallName(description->alias, script_class);
         }
-        Call(ClassBuilder::Lazy, names);
+    }
+
+    void InstallName(const char* name, ScriptClass script_class) {
+        // One function for both ways: a setter has an argument.
+        const JSObjectRef access = JSObjectMakeFunctionWithCallback(context_, ScriptName(name), AccessName);
+        page_.class_names.push_back({access, name, script_class});
+        DefineAccessor(page_.global_object, name, Tool(ClassTool::HiddenAccessor), access, access);
     }
 
     void Keep(size_t index, JSValueRef value) {
@@ -242,52 +268,88 @@ class Installer {
                                    nullptr);
     }
 
-    JSValueRef Call(ClassBuilder builder, const Arguments& arguments) {
-        const auto values = arguments.values();
-        const JSValueRef result =
-            JSObjectCallAsFunction(context_, page_.builders[static_cast<size_t>(builder)], nullptr,
-                                   values.size(), values.data(), &exception_);
+    void KeepTool(ClassTool tool, JSValueRef value) {
+        Keep(kToolsAt + static_cast<size_t>(tool), value);
+        page_.class_tools[static_cast<size_t>(tool)] = value;
+    }
+
+    JSValueRef Tool(ClassTool tool) const { return page_.class_tools[static_cast<size_t>(tool)]; }
+
+    // One of those in script. Null when script cannot run now.
+    JSObjectRef ScriptTool(ClassTool tool) {
+        if (!Tool(tool)) MakeScriptTools();
+        return AsObject(context_, Tool(tool));
+    }
+
+    void MakeScriptTools() {
+        const JSValueRef make =
+            JSEvaluateScript(context_, ScriptName(kScriptTools.data()), nullptr, nullptr, 0, &exception_);
+        const JSValueRef language[] = {
+            page_.global_object,    Tool(ClassTool::DefineProperty), Tool(ClassTool::SetPrototypeOf),
+            Tool(ClassTool::Apply), Tool(ClassTool::InstanceOf),     Tool(ClassTool::HasInstance)};
+        const JSObjectRef tools = AsObject(context_, Call(AsObject(context_, make), language));
+        if (!tools) return;
+        KeepTool(ClassTool::ConstructorOf, JSObjectGetPropertyAtIndex(context_, tools, 0, nullptr));
+        KeepTool(ClassTool::BlanksOf, JSObjectGetPropertyAtIndex(context_, tools, 1, nullptr));
+    }
+
+    JSValueRef Call(JSObjectRef function, std::span<const JSValueRef> arguments) {
+        if (!function || exception_) return nullptr;
+        const JSValueRef result = JSObjectCallAsFunction(context_, function, nullptr, arguments.size(),
+                                                         arguments.data(), &exception_);
         return exception_ ? nullptr : result;
     }
 
-    // A plain assignment makes what the builder would, at half the cost.
-    bool DefineMethods(JSObjectRef target, std::span<const MethodDescription> methods) {
-        for (const MethodDescription& method : methods) {
-            JSStringRef name = JSStringCreateWithUTF8CString(method.name);
-            const JSObjectRef function = JSObjectMakeFunctionWithCallback(context_, name, method.callback);
-            JSObjectSetProperty(context_, target, name, function, kJSPropertyAttributeNone, &exception_);
-            JSStringRelease(name);
-            if (exception_) return false;
-        }
-        return true;
+    void DefineProperty(JSObjectRef target, JSStringRef name, JSValueRef descriptor) {
+        const JSValueRef arguments[] = {target, JSValueMakeString(context_, name), descriptor};
+        Call(AsObject(context_, Tool(ClassTool::DefineProperty)), arguments);
     }
 
-    bool DefineMembers(JSObjectRef target, const ClassDescription& description) {
-        if (!DefineMethods(target, description.methods)) return false;
-        auto attribute = description.attributes.begin();
-        auto constant = description.constants.begin();
-        // The largest classes take several calls.
-        while (attribute != description.attributes.end() || constant != description.constants.end()) {
-            Arguments arguments(context_);
-            arguments.Add(target);
-            arguments.Add(0.0);
-            double attributes = 0;
-            for (; attribute != description.attributes.end() && !arguments.IsFull();
-                 ++attribute, ++attributes) {
-                JSStringRef name = JSStringCreateWithUTF8CString(attribute->name);
-                arguments.Add(JSValueMakeString(context_, name));
-                arguments.Add(name, attribute->getter);
-                arguments.Add(name, attribute->setter);
-                JSStringRelease(name);
-            }
-            for (; constant != description.constants.end() && !arguments.IsFull(); ++constant) {
-                arguments.Add(constant->name);
-                arguments.Add(constant->value);
-            }
-            arguments.Set(1, attributes);
-            if (!Call(ClassBuilder::Members, arguments)) return false;
+    // The descriptors are there for all: only what differs is set. Null stands for no function.
+    void DefineAccessor(JSObjectRef target, const char* name, JSValueRef descriptor, JSValueRef getter,
+                        JSValueRef setter) {
+        const JSValueRef undefined = JSValueMakeUndefined(context_);
+        SetOf(descriptor, get_, getter ? getter : undefined);
+        SetOf(descriptor, set_, setter ? setter : undefined);
+        DefineProperty(target, ScriptName(name), descriptor);
+    }
+
+    void DefineValue(JSObjectRef target, const char* name, ClassTool descriptor, JSValueRef value) {
+        SetOf(Tool(descriptor), value_, value);
+        DefineProperty(target, ScriptName(name), Tool(descriptor));
+        SetOf(Tool(descriptor), value_, JSValueMakeUndefined(context_));
+    }
+
+    void SetOf(JSValueRef descriptor, JSStringRef name, JSValueRef value) {
+        JSObjectSetProperty(context_, AsObject(context_, descriptor), name, value, kJSPropertyAttributeNone,
+                            nullptr);
+    }
+
+    void Label(JSObjectRef target, ScriptClass script_class) {
+        const ScriptName name(GetScriptClassRow(script_class).name);
+        JSObjectSetPropertyForKey(context_, target, Tool(ClassTool::ToStringTag),
+                                  JSValueMakeString(context_, name), kLabel, &exception_);
+    }
+
+    JSObjectRef MakeFunction(JSStringRef name, JSObjectCallAsFunctionCallback callback) {
+        return callback ? JSObjectMakeFunctionWithCallback(context_, name, callback) : nullptr;
+    }
+
+    void DefineMembers(JSObjectRef target, const ClassDescription& description) {
+        for (const MethodDescription& method : description.methods) {
+            const ScriptName name(method.name);
+            JSObjectSetProperty(context_, target, name, MakeFunction(name, method.callback),
+                                kJSPropertyAttributeNone, &exception_);
         }
-        return true;
+        for (const AttributeDescription& attribute : description.attributes) {
+            const ScriptName name(attribute.name);
+            DefineAccessor(target, attribute.name, Tool(ClassTool::Accessor),
+                           MakeFunction(name, attribute.getter), MakeFunction(name, attribute.setter));
+        }
+        for (const ConstantDescription& constant : description.constants) {
+            JSObjectSetProperty(context_, target, ScriptName(constant.name),
+                                JSValueMakeNumber(context_, constant.value), kConstant, &exception_);
+        }
     }
 
     JSObjectRef MakeConstructor(ScriptClass script_class, JSObjectRef prototype) {
@@ -296,23 +358,29 @@ class Installer {
         const JSObjectRef parent = ConstructorOf(row.parent);
         const bool constructs = description && description->construct;
         const bool answers_for_global = IsScriptClassOrDerived(ScriptClass::Window, script_class);
-        Arguments arguments(context_);
-        arguments.Add(row.name);
-        arguments.Add(prototype);
-        arguments.Add(parent ? parent : JSValueMakeNull(context_));
-        arguments.Add(nullptr, constructs ? description->construct : InvalidConstructor);
-        arguments.Add(JSValueMakeBoolean(context_, answers_for_global));
+        // On the stack, where the collector sees them.
+        constexpr size_t kMost = 256;
+        JSValueRef arguments[kMost] = {
+            JSValueMakeString(context_, ScriptName(row.name)), prototype,
+            parent ? parent : JSValueMakeNull(context_),
+            MakeFunction(nullptr, constructs ? description->construct : InvalidConstructor),
+            JSValueMakeBoolean(context_, answers_for_global)};
+        size_t count = 5;
         for (const ConstantDescription& constant :
              description ? description->constants : std::span<const ConstantDescription>()) {
-            arguments.Add(constant.name);
-            arguments.Add(constant.value);
+            if (count + 2 > kMost) break;
+            arguments[count++] = JSValueMakeString(context_, ScriptName(constant.name));
+            arguments[count++] = JSValueMakeNumber(context_, constant.value);
         }
-        return AsObject(context_, Call(ClassBuilder::ConstructorOf, arguments));
+        return AsObject(context_, Call(ScriptTool(ClassTool::ConstructorOf), {arguments, count}));
     }
+
+    static constexpr int kLongestChain = 10000;
 
     ScriptingContext& page_;
     JSGlobalContextRef context_;
     JSValueRef exception_ = nullptr;
+    const ScriptName get_{"get"}, set_{"set"}, value_{"value"};
 };
 
 }  // namespace
@@ -327,11 +395,16 @@ JSObjectRef GetPrototype(ScriptingContext& page, ScriptClass script_class) {
     return Installer(page).PrototypeOf(script_class);
 }
 
+JSObjectRef MakeBlankMaker(ScriptingContext& page, JSObjectRef prototype, JSObjectRef take) {
+    return Installer(page).MakeBlankMaker(prototype, take);
+}
+
 void UninstallClasses(ScriptingContext& page) {
     if (page.class_keeper) UnprotectUnlessTeardown(page.context, page.class_keeper);
     page.class_keeper = nullptr;
     page.prototypes = {};
-    page.builders = {};
+    page.class_tools = {};
+    page.class_names = {};
 }
 
 }  // namespace qorvex::script

@@ -10,6 +10,7 @@
 #include <array>
 #include <string_view>
 
+#include "core/memory/containers.h"
 #include "script/class_table.h"
 #include "script/wrapper_table.h"
 
@@ -21,9 +22,34 @@ namespace qorvex::script {
 
 class ScriptingHandleEnabled;
 
-// The script functions that make classes.
-enum class ClassBuilder : uint8_t { Lazy, PrototypeOf, Members, ConstructorOf, BlanksOf, TagGlobal };
-inline constexpr size_t kClassBuilderCount = 6;
+// What classes are made with (class_installation.cpp): functions, symbols and property descriptors of the
+// language, kept before any script of the page can change it, and two functions of our own in script, which
+// are made when they are first needed.
+enum class ClassTool : uint8_t {
+    DefineProperty,
+    SetPrototypeOf,
+    Apply,
+    InstanceOf,
+    HasInstance,
+    ToStringTag,
+    Accessor,
+    HiddenAccessor,
+    HiddenValue,
+    Method,
+    ConstructorGetter,
+    ConstructorSetter,
+    ConstructorOf,
+    BlanksOf,
+};
+inline constexpr size_t kClassToolCount = 14;
+
+// A global name whose class is made when script reads it, and the function that does that: to be compared
+// only, since a page may drop the name.
+struct LazyClassName {
+    JSObjectRef accessor;
+    const char* name;
+    ScriptClass script_class;
+};
 
 struct ScriptingContext {
     // Error raised by native code that has no exception out-parameter at hand; protected while it stands
@@ -37,7 +63,8 @@ struct ScriptingContext {
     ScriptingHandleEnabled* global_handle = nullptr;
     // What has been made of the bound classes (class_installation.h), all held by `class_keeper`.
     std::array<JSObjectRef, kScriptClassCount> prototypes{};
-    std::array<JSObjectRef, kClassBuilderCount> builders{};
+    std::array<JSValueRef, kClassToolCount> class_tools{};
+    Vector<LazyClassName, MemoryTag::DOM> class_names;
     JSObjectRef class_keeper = nullptr;
     WrapperTable wrappers;
     // Chain of the thread's contexts, see GetScriptingContext.

@@ -23,6 +23,9 @@ decltype(auto) WithHandle(const void* packed, F&& use) {
     return use(static_cast<ScriptingHandleEnabledRefCounted*>(handle));
 }
 
+// A page that has fewer wrappers than this is not worth the script that makes blanks by the handful.
+constexpr size_t kFewWrappers = 64;
+
 }  // namespace
 
 WrapperTable::~WrapperTable() {
@@ -38,30 +41,28 @@ void WrapperTable::Start(ScriptingContext& page) {
 void WrapperTable::Stop() {
     if (!page_) return;
     RemoveHeapObserver(*this);
+    let_go_ = nullptr;
     HashMap<JSObjectRef, Entry, MemoryTag::DOM> entries;
     entries.swap(entries_);
     for (auto& [object, entry] : entries) {
-        if (entry.slot->weak) dead_weak_.push_back(entry.slot->weak);
         WithHandle(entry.packed, [](auto* handle) { handle->DetachWrapper(); });
-        dead_.push_back(entry.packed);
+        Bury(entry.slot, entry.packed);
     }
-    for (const ScriptWeakRef reference : dead_weak_)
-        ReleaseWeakReference(group_, reference);
+    for (Slot* slot = dead_; slot; slot = slot->next) {
+        if (slot->weak) ReleaseWeakReference(group_, std::exchange(slot->weak, nullptr));
+    }
     // Natives may still ask for wrappers while they end; they get none.
     page_ = nullptr;
-    const auto dead = std::move(dead_);
-    for (const void* packed : dead)
-        WithHandle(packed, [](auto* handle) { handle->Release(); });
+    EndNatives();
     for (Chunk* chunk = chunks_.exchange(nullptr); chunk;) {
         Chunk* next = chunk->next;
         Delete<MemoryTag::DOM>(chunk);
         chunk = next;
     }
     free_ = nullptr;
+    weak_ = nullptr;
     blanks_ = {};
-    let_go_.clear();
-    weak_.clear();
-    dead_weak_.clear();
+    unsettled_ = 0;
 }
 
 JSObjectRef WrapperTable::Add(ScriptClass script_class, const void* packed) {
@@ -90,25 +91,37 @@ void WrapperTable::LetGo(JSObjectRef wrapper) {
     if (!entry || entry->slot->let_go || entry->slot->weak) return;
     // Most come back at once: the reference that a call holds, a node on its way from one parent to another.
     entry->slot->let_go = true;
-    let_go_.push_back(entry->slot);
+    entry->slot->next = std::exchange(let_go_, entry->slot);
+    ++unsettled_;
 }
 
 void WrapperTable::Settle() {
-    if (!page_ || (let_go_.empty() && dead_.empty() && dead_weak_.empty())) return;
+    if (!page_ || unsettled_ == 0) return;
     {
         const ScriptEngineLock lock(page_->context);
-        for (Slot* slot : let_go_)
+        while (Slot* slot = let_go_) {
+            let_go_ = slot->next;
+            --unsettled_;
             TurnOver(slot);
-        let_go_.clear();
-        for (const ScriptWeakRef reference : dead_weak_)
-            ReleaseWeakReference(group_, reference);
-        dead_weak_.clear();
+        }
+        for (Slot* slot = dead_; slot; slot = slot->next) {
+            if (slot->weak) ReleaseWeakReference(group_, std::exchange(slot->weak, nullptr));
+        }
     }
-    // Destructors may let go of others, and run script in the end.
-    const auto dead = std::move(dead_);
-    dead_.clear();
-    for (const void* packed : dead)
+    EndNatives();
+}
+
+// Destructors may let go of others, and run script in the end, which may settle or bury more: one at a time.
+void WrapperTable::EndNatives() {
+    while (Slot* slot = dead_) {
+        // One that was buried meanwhile still has its reference, which goes with the next Settle.
+        if (slot->weak) return;
+        dead_ = slot->next;
+        --unsettled_;
+        const void* packed = slot->packed;
+        FreeSlot(slot);
         WithHandle(packed, [](auto* handle) { handle->Release(); });
+    }
 }
 
 void WrapperTable::TurnOver(Slot* slot) {
@@ -118,7 +131,7 @@ void WrapperTable::TurnOver(Slot* slot) {
         return;
     slot->weak = MakeWeakReference(group_, slot->object);
     slot->root.store(nullptr, std::memory_order_release);
-    if (!std::exchange(slot->listed, true)) weak_.push_back(slot);
+    if (!std::exchange(slot->listed, true)) slot->next_weak = std::exchange(weak_, slot);
 }
 
 void WrapperTable::MarkRoots(Marker& marker) {
@@ -131,22 +144,25 @@ void WrapperTable::MarkRoots(Marker& marker) {
 }
 
 void WrapperTable::OnCollected() {
-    size_t kept = 0;
-    for (Slot* slot : weak_) {
+    for (Slot** link = &weak_; Slot* slot = *link;) {
         if (slot->weak && GetWeakObject(slot->weak)) {
-            weak_[kept++] = slot;
+            link = &slot->next_weak;
             continue;
         }
+        *link = slot->next_weak;
         slot->listed = false;
         if (!slot->weak) continue;
-        const Entry* entry = entries_.get(slot->object);
-        WithHandle(entry->packed, [](auto* handle) { handle->DetachWrapper(); });
-        dead_.push_back(entry->packed);
-        dead_weak_.push_back(slot->weak);
+        const void* packed = entries_.get(slot->object)->packed;
+        WithHandle(packed, [](auto* handle) { handle->DetachWrapper(); });
         entries_.erase(slot->object);
-        FreeSlot(slot);
+        Bury(slot, packed);
     }
-    weak_.resize(kept);
+}
+
+void WrapperTable::Bury(Slot* slot, const void* packed) {
+    slot->packed = packed;
+    slot->next = std::exchange(dead_, slot);
+    ++unsettled_;
 }
 
 // --- Slots
@@ -200,34 +216,36 @@ void WrapperTable::MakeBlanks(ScriptClass script_class) {
     const auto index = static_cast<size_t>(script_class);
     JSContextRef context = page_->context;
     Blanks& blanks = blanks_[index];
+    if (!blanks.maker && entries_.size() < kFewWrappers) return MakeOneBlank(index);
     filling_ = &blanks;
     JSValueRef exception = nullptr;
     if (!blanks.maker) {
-        const JSValueRef arguments[] = {page_->prototypes[index],
-                                        JSObjectMakeFunctionWithCallback(context, nullptr, AcceptBlanks)};
-        const JSValueRef maker =
-            JSObjectCallAsFunction(context, page_->builders[static_cast<size_t>(ClassBuilder::BlanksOf)],
-                                   nullptr, 2, arguments, &exception);
-        if (AsObject(context, maker)) {
-            blanks.maker = const_cast<JSObjectRef>(maker);
+        blanks.maker = MakeBlankMaker(*page_, page_->prototypes[index],
+                                      JSObjectMakeFunctionWithCallback(context, nullptr, AcceptBlanks));
+        if (blanks.maker) {
             JSObjectSetPropertyAtIndex(context, page_->class_keeper,
-                                       static_cast<unsigned>(kClassKeeperUses + index), maker, nullptr);
+                                       static_cast<unsigned>(kClassKeeperUses + index), blanks.maker,
+                                       nullptr);
         }
     }
     if (blanks.maker) JSObjectCallAsFunction(context, blanks.maker, nullptr, 0, nullptr, &exception);
     filling_ = nullptr;
     if (blanks.first) return ReportNativeMemory(context, kBlanksAtOnce * kNativeBytes);
     // The engine runs no script now: out of stack, or being stopped.
-    const JSObjectRef object = JSObjectMake(context, nullptr, nullptr);
-    JSObjectSetPrototype(context, object, page_->prototypes[index]);
-    blanks.first = TakeSlot(object);
-    blanks.first->next = nullptr;
+    MakeOneBlank(index);
+}
+
+void WrapperTable::MakeOneBlank(size_t index) {
+    const JSObjectRef object = JSObjectMake(page_->context, nullptr, nullptr);
+    JSObjectSetPrototype(page_->context, object, page_->prototypes[index]);
+    blanks_[index].first = TakeSlot(object);
+    blanks_[index].first->next = nullptr;
 }
 
 WrapperTable::Slot* WrapperTable::MakeWithRules(ScriptClass script_class, const void* packed) {
     JSClassRef engine_class = GetScriptClassTable()[script_class];
     if (!engine_class) return nullptr;
-    if (let_go_.size() >= Chunk::kSlots || dead_.size() >= Chunk::kSlots) Settle();
+    if (unsettled_ >= Chunk::kSlots) Settle();
     const JSObjectRef object = JSObjectMake(page_->context, engine_class, const_cast<void*>(packed));
     JSObjectSetPrototype(page_->context, object, page_->prototypes[static_cast<size_t>(script_class)]);
     return TakeSlot(object);

@@ -12,7 +12,8 @@
 //
 // Invariant: root is set exactly while the wrapper has to live whatever script does: while its object has
 // native holders, or has lost the last one since the last Settle. Otherwise `weak` is set. A dead wrapper is
-// out of the table before the engine can use its memory again.
+// out of the table before the engine can use its memory again. Collections come to their end in idle frames,
+// so the lists that follow them are chained through the slots: nothing is allocated between Add and the end.
 #pragma once
 
 #include <JavaScriptCore/JSBase.h>
@@ -62,9 +63,11 @@ class WrapperTable final : private IHeapObserver {
         std::atomic<JSObjectRef> root{nullptr};
         JSObjectRef object = nullptr;
         ScriptWeakRef weak = nullptr;
-        Slot* next = nullptr;  // of the free or blank ones
-        bool let_go = false;   // stands in let_go_
-        bool listed = false;   // stands in weak_
+        const void* packed = nullptr;  // of the dead ones: the native, with the holder that its wrapper was
+        Slot* next = nullptr;          // of the free, blank, let go or dead ones, which exclude each other
+        Slot* next_weak = nullptr;     // in weak_
+        bool let_go = false;           // stands in let_go_
+        bool listed = false;           // stands in weak_
     };
     // Slots never move, as the collector walks them beside us; `next` is set once.
     struct Chunk {
@@ -88,8 +91,11 @@ class WrapperTable final : private IHeapObserver {
 
     Slot* TakeSlot(JSObjectRef object);
     void FreeSlot(Slot* slot);
+    void Bury(Slot* slot, const void* packed);
+    void EndNatives();
     Slot* TakeBlank(ScriptClass script_class);
     void MakeBlanks(ScriptClass script_class);
+    void MakeOneBlank(size_t index);
     Slot* MakeWithRules(ScriptClass script_class, const void* packed);
     static JSValueRef AcceptBlanks(JSContextRef context, JSObjectRef, JSObjectRef, size_t count,
                                    const JSValueRef objects[], JSValueRef*);
@@ -102,10 +108,10 @@ class WrapperTable final : private IHeapObserver {
     Slot* free_ = nullptr;
     std::array<Blanks, kScriptClassCount> blanks_{};
     Blanks* filling_ = nullptr;
-    Vector<Slot*, MemoryTag::DOM> let_go_;
-    Vector<Slot*, MemoryTag::DOM> weak_;        // and some that were held again since
-    Vector<const void*, MemoryTag::DOM> dead_;  // parted natives, each with the holder that its wrapper was
-    Vector<ScriptWeakRef, MemoryTag::DOM> dead_weak_;
+    Slot* let_go_ = nullptr;
+    Slot* weak_ = nullptr;  // and some that were held again since
+    Slot* dead_ = nullptr;  // their natives are parted from them, and still to end
+    size_t unsettled_ = 0;  // let go or dead
 };
 
 }  // namespace qorvex::script

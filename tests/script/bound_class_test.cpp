@@ -115,7 +115,7 @@ TEST_F(BoundClass, ClassesThatAreMadeLateAreTheSame) {
     EXPECT_EQ(page_.prototypes[static_cast<size_t>(ScriptClass::HTMLVideoElement)], nullptr);
     Run("Object.defineProperty = Object.create = Object.setPrototypeOf = Reflect.apply = null;"
         "Object.prototype.get = Object.prototype.set = Object.prototype.value = 'page';"
-        "Object.prototype.writable = false;"
+        "Object.prototype.writable = false; Object.prototype[Symbol.toStringTag] = 'page';"
         "for (const i of [0, 5, 94, 95, 189, 200]) "
         "    Array.prototype.__defineSetter__(i, () => { throw 'entered the page'; }); 0");
     EXPECT_EQ(
@@ -127,6 +127,7 @@ TEST_F(BoundClass, ClassesThatAreMadeLateAreTheSame) {
     SetGlobal("late", node.get());
     Collect();
     EXPECT_EQ(Run("late.sum(1, 2) + Node.ELEMENT_NODE + (globalThis instanceof EventTarget)"), "5");
+    EXPECT_EQ(Run("(class extends Node {}).prototype.constructor.name + late.constructor.name"), "Node");
 }
 
 TEST_F(BoundClass, APageMayTakeTheNameOfAClass) {

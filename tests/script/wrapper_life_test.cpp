@@ -71,6 +71,17 @@ TEST_F(WrapperLife, TheCollectorEndsUnreachableObjectsOnce) {
     EXPECT_EQ(counts_.notified, 100);
 }
 
+// A collection comes to its end in whatever frame it likes, idle ones included.
+TEST_F(WrapperLife, TheEndOfWrappersAllocatesNothing) {
+    for (int i = 0; i < 500; ++i)
+        SetGlobal("last", MakeHandle<TestNode>(counts_).get());
+    Run("delete globalThis.last; 0");
+    const uint64_t before = allocator_.Allocations();
+    CollectGarbageNow(page_.context);
+    EXPECT_EQ(allocator_.Allocations(), before);
+    EXPECT_GE(counts_.destroyed, 450);
+}
+
 TEST_F(WrapperLife, CollectionOfOneWrapperReleasesWhatItsObjectHeld) {
     auto outer = MakeHandle<TestNode>(counts_);
     SetGlobal("outer", outer.get());

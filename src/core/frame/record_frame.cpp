@@ -77,6 +77,7 @@ layout::LayoutPass FrameData::MakePass() {
 }
 
 void RecordFrame(FrameData& frame) {
+    frame.render_frame->Announce();
     layout::LayoutPass pass = frame.MakePass();
     dsp::RecordRequest request{.caches = *frame.caches,
                                .scaleX = frame.scale_x,
@@ -87,16 +88,14 @@ void RecordFrame(FrameData& frame) {
                                .resourceBuffers = {},
                                .family = &frame.family};
     dsp::FrameRecord record = dsp::RecordRendering(pass, std::move(request));
-    if (!record.Empty()) {
-        SharedRecord held = MakeRef<HeldRecord>(std::move(record));
-        RenderFrame& target = *frame.render_frame;
-        if (frame.capture_callback) target.Push(MakeCaptureTask(frame, held));
-        target.Push(MakeTask("Paint", [held, images = frame.images, scene = frame.scene, stats = frame.stats,
-                                       id = frame.frame_id](TaskFamilyHandle) {
-            ExecutePaint(*held, *images, *scene, *stats, id);
-        }));
-    }
-    frame.render_frame->PushClose();
+    RenderFrame& target = *frame.render_frame;
+    if (record.Empty()) return target.PushClose();
+    SharedRecord held = MakeRef<HeldRecord>(std::move(record));
+    if (frame.capture_callback) target.Push(MakeCaptureTask(frame, held));
+    target.PushClose(MakeTask("Paint", [held, images = frame.images, scene = frame.scene, stats = frame.stats,
+                                        id = frame.frame_id](TaskFamilyHandle) {
+        ExecutePaint(*held, *images, *scene, *stats, id);
+    }));
 }
 
 }  // namespace qorvex

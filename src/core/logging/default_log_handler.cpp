@@ -32,7 +32,9 @@ void DefaultLogHandler::WriteLog(Logging::Severity severity, const char* text, u
     stream_ << " Time: ";
     stream_.WriteNumber(static_cast<int64_t>(std::time(nullptr)));
     stream_ << ' ' << kSeverityLetters[std::min<uint32_t>(severity, 5)] << " | ";
-    stream_ << std::string_view(text, length ? length - 1 : 0) << '\n';
+    // A page must not be able to forge lines, nor a script's stack break one.
+    stream_.WriteOnOneLine(std::string_view(text, length ? length - 1 : 0));
+    stream_ << '\n';
 
     const std::string_view line = stream_.view();
     if (file_) {

@@ -30,6 +30,16 @@ class FixedStream {
         return *this << std::string_view(digits, static_cast<size_t>(result.ptr - digits));
     }
 
+    // Text whose control characters, line feeds among them, become blanks: whoever writes lines stays on one.
+    void WriteOnOneLine(std::string_view text) {
+        const size_t begin = size_;
+        *this << text;
+        for (size_t i = begin; i < size_; ++i) {
+            const auto byte = static_cast<unsigned char>(buffer_[i]);
+            if (byte < ' ' || byte == 0x7F) buffer_[i] = ' ';
+        }
+    }
+
     // A zero in a page's text would end the line for whoever reads it as a C string.
     void BlankZeros() {
         for (char* at = buffer_; (at = static_cast<char*>(std::memchr(at, '\0', size_ - (at - buffer_))));)

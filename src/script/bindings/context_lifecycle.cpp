@@ -15,15 +15,40 @@ namespace qorvex::script {
 
 namespace {
 
+// Gives a property of `object` the value of another one.
+void Copy(JSContextRef context, JSObjectRef object, std::string_view to, std::string_view from) {
+    if (const JSValueRef value = GetProperty(context, object, from))
+        SetProperty(context, object, to, value, kJSPropertyAttributeNone);
+}
+
+JSObjectRef GetObject(JSContextRef context, JSObjectRef holder, std::string_view name) {
+    return holder ? AsObject(context, GetProperty(context, holder, name)) : nullptr;
+}
+
 // Dates print in one form everywhere, whatever the locale of the machine.
-constexpr std::string_view kDateShim =
-    "Date.prototype.toLocaleString = Date.prototype.toString;"
-    "Date.prototype.toLocaleDateString = Date.prototype.toDateString;"
-    "Date.prototype.toLocaleTimeString = Date.prototype.toTimeString;";
+void FixDates(JSContextRef context, JSObjectRef global) {
+    const JSObjectRef prototype = GetObject(context, GetObject(context, global, "Date"), "prototype");
+    if (!prototype) return;
+    Copy(context, prototype, "toLocaleString", "toString");
+    Copy(context, prototype, "toLocaleDateString", "toDateString");
+    Copy(context, prototype, "toLocaleTimeString", "toTimeString");
+}
+
 // So that `const log = console.log` works.
-constexpr std::string_view kConsoleShim =
-    "['assert', 'debug', 'error', 'info', 'log', 'time', 'timeEnd', 'warn']"
-    ".forEach(m => console[m] = console[m].bind(console));\n";
+void BindConsole(JSContextRef context, JSObjectRef global) {
+    constexpr std::string_view kMethods[] = {"assert", "debug", "error",   "info",
+                                             "log",    "time",  "timeEnd", "warn"};
+    const JSObjectRef console = GetObject(context, global, "console");
+    if (!console) return;
+    for (const std::string_view name : kMethods) {
+        const JSObjectRef method = GetObject(context, console, name);
+        const JSObjectRef bind = GetObject(context, method, "bind");
+        if (!bind) continue;
+        const JSValueRef self = console;
+        if (const JSValueRef bound = JSObjectCallAsFunction(context, bind, method, 1, &self, nullptr))
+            SetProperty(context, console, name, bound, kJSPropertyAttributeNone);
+    }
+}
 
 void DefineGlobals(ScriptingContext& page) {
     JSContextRef context = page.context;
@@ -62,9 +87,10 @@ ScriptingContextPtr CreateScriptingContext(dom::IWindowHost& host, dom::Document
     return page;
 }
 
-void RunPreludeScripts(ScriptingContext& context) {
-    EvaluateScript(context, kDateShim, "");
-    EvaluateScript(context, kConsoleShim, "");
+// Done by calls: as scripts, parsed and run cold for each page, the same takes a tenth of a context.
+void RunPreludeScripts(ScriptingContext& page) {
+    FixDates(page.context, page.global_object);
+    BindConsole(page.context, page.global_object);
 }
 
 void DestroyScriptingContext(ScriptingContextPtr page) {

@@ -17,7 +17,7 @@ using ScriptingContextPtr = UniquePtr<ScriptingContext, MemoryTag::General>;
 // to it. `host` and `document` outlive it.
 [[nodiscard]] ScriptingContextPtr CreateScriptingContext(dom::IWindowHost& host, dom::Document& document);
 
-// The engine's own scripts, which come before those of the client.
+// What the engine itself changes in the language of a page, before the client's own scripts.
 void RunPreludeScripts(ScriptingContext& context);
 
 // Ends the context: nothing native refers to its heap afterwards, and every wrapper is finalised. Objects

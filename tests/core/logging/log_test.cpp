@@ -67,14 +67,14 @@ TEST(Log, TheDefaultHandlerWritesFileAndStreams) {
     ::testing::internal::CaptureStderr();
     StartLogging(Logging::Trace, nullptr);
     LogWarning("to out");
-    LogError("to err");
+    LogError("to err\nE | forged\x7f");
     EndLogging();
     const std::string out = ::testing::internal::GetCapturedStdout();
     const std::string err = ::testing::internal::GetCapturedStderr();
     EXPECT_EQ(allocator.Report(), "");
     SetAllocator(nullptr);
     EXPECT_TRUE(std::regex_match(out, std::regex("\\d+ Time: \\d+ W \\| to out\n"))) << out;
-    EXPECT_TRUE(std::regex_match(err, std::regex("\\d+ Time: \\d+ A \\| to err\n"))) << err;
+    EXPECT_TRUE(std::regex_match(err, std::regex("\\d+ Time: \\d+ A \\| to err E \\| forged \n"))) << err;
     std::stringstream file;
     file << std::ifstream("qorvex_default.log").rdbuf();
     EXPECT_EQ(file.str(), out + err);
