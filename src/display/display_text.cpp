@@ -7,6 +7,7 @@
 #include "core/logging/log.h"
 #include "display/paint_context.h"
 #include "layout/layout_store.h"
+#include "layout/text/text_alignment.h"
 #include "layout/text/text_layout.h"
 
 namespace qorvex::dsp {
@@ -49,7 +50,7 @@ uint32_t DisplayText::TextLength() const {
 
 bool DisplayText::Holds(const Parameters& wanted) const {
     if (!laidOut_ || !SameTextStyle(wanted.style, laid_.style)) return false;
-    if (!Near(wanted.firstLineOffset, laid_.firstLineOffset)) return false;
+    if (!Near(wanted.firstLineOffset, laid_.firstLineOffset) || wanted.inFlow != laid_.inFlow) return false;
     const bool fits = wanted.style.fit != css::FontFitModeType::None;
     if (!fits && !Near(wanted.style.usedSize, laid_.style.usedSize)) return false;
     if (fits && !SameExtent(wanted.height, laid_.height)) return false;
@@ -66,7 +67,7 @@ bool DisplayText::EnsureLayout(const layout::LayoutNode& node, const layout::Tex
     if (services.fonts == nullptr) return false;
     if (Holds(wanted)) return true;
     if (!LayoutText({text_.view(), wanted.style, wanted.width, wanted.height, *services.fonts,
-                     iterator_.get(), services.i18n, wanted.firstLineOffset},
+                     iterator_.get(), services.i18n, wanted.firstLineOffset, true, wanted.inFlow},
                     info_)) {
         LogDebug("Measuring text without typeface");
         info_.Clear();
@@ -91,6 +92,7 @@ void DisplayText::Measure(layout::LayoutHandle& handle, float availableWidth, fl
 layout::Size DisplayText::MeasureFor(layout::LayoutHandle& handle, float availableWidth,
                                      float availableHeight) {
     placed_.clear();
+    justified_.reset();
     const css::TextLayoutStyle* group = handle.node().style.text.get();
     if (group == nullptr) return {};
     const layout::TextServices& services = handle.store().text;
@@ -128,7 +130,7 @@ const layout::TextInfo* DisplayText::LayoutInline(layout::LayoutHandle& handle,
     const css::TextLayoutStyle* group = handle.node().style.text.get();
     if (group == nullptr) return nullptr;
     const layout::TextServices& services = handle.store().text;
-    Parameters wanted{layout::MakeTextStyle(*group), request.width, NAN, request.firstLineOffset};
+    Parameters wanted{layout::MakeTextStyle(*group), request.width, NAN, request.firstLineOffset, true};
     // Both belong to the paragraph, which aligns whole lines and fits all of its text at once.
     wanted.style.align = css::TextAlignType::Left;
     wanted.style.fit = css::FontFitModeType::None;
@@ -140,6 +142,12 @@ const layout::TextInfo* DisplayText::LayoutInline(layout::LayoutHandle& handle,
 void DisplayText::PlaceLines(const layout::LinePlacement* lines, size_t count) {
     placed_.assign(lines, lines + count);
     unpublished_ = true;
+    justified_.reset();
+    for (size_t i = 0; i < count; ++i) {
+        if (lines[i].gap <= 0) continue;
+        if (!justified_) justified_ = MakeUnique<layout::TextInfo, MemoryTag::LayoutData>(info_);
+        SpreadLine(*justified_, justified_->lines[i], lines[i]);
+    }
 }
 
 void DisplayText::OffsetLine(uint32_t lineIndex, float offset, uint8_t alignment) {
@@ -175,7 +183,7 @@ void DisplayText::Publish(PaintContext& context) {
                   layout::Delivery::ThroughChannel);
     }
     auto positions = MakeRef<layout::TextPositions>();
-    ComputeTextPositions(info_, text_.view(), laid_.style.whiteSpace, Placements(), *positions);
+    ComputeTextPositions(Shown(), text_.view(), laid_.style.whiteSpace, Placements(), *positions);
     SendToDOM(*context.family, DOMTaskKind::UpdateTextPositionsInDOM, link_, std::move(positions),
               layout::Delivery::ThroughChannel);
 }

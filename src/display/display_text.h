@@ -59,6 +59,7 @@ class DisplayText final : public IDisplayElement {
         float width = 0;
         float height = 0;
         float firstLineOffset = 0;
+        bool inFlow = false;
     };
     // One question of the layout and its answer. The available size is NaN where it is not known.
     struct Answer {
@@ -80,6 +81,8 @@ class DisplayText final : public IDisplayElement {
     void Publish(PaintContext& context);
     void PaintShadows(PaintContext& context, const layout::LayoutNode& node, layout::Point corner,
                       fresco::CommandBuffer& buffer) const;
+    // The lines as they are painted.
+    const layout::TextInfo& Shown() const { return justified_ ? *justified_ : info_; }
     const layout::LinePlacement* Placements() const { return placed_.empty() ? nullptr : placed_.data(); }
 
     TaggedString<MemoryTag::Rendering> text_;
@@ -93,6 +96,8 @@ class DisplayText final : public IDisplayElement {
     bool tooManyAnswers_ = false;
     // Lines of an inline flow; empty elsewhere.
     Vector<layout::LinePlacement, MemoryTag::LayoutData> placed_;
+    // info_ with wider gaps, where the flow justifies some of these lines.
+    UniquePtr<layout::TextInfo, MemoryTag::LayoutData> justified_;
     layout::NodeLinkPtr link_;
     std::unique_ptr<i18n::IBreakIterator, DestroyIterator> iterator_;
     qsl::RefPtr<layout::TextFontStyle> publishedStyle_;

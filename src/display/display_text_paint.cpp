@@ -132,7 +132,7 @@ void DisplayText::PaintShadows(PaintContext& context, const layout::LayoutNode& 
             reported = true;
             continue;
         }
-        ForEachRun(info_, Placements(), {corner.x + shadow.x, corner.y + shadow.y}, params,
+        ForEachRun(Shown(), Placements(), {corner.x + shadow.x, corner.y + shadow.y}, params,
                    [&](const ShownRun& run) {
                        if (blurred)
                            DrawBlurredRun(context, run, shadow.blur, buffer);
@@ -167,13 +167,13 @@ void DisplayText::Paint(PaintContext& context, bool, const layout::LayoutNode& n
     params.flags = GlyphFlags(style.fontSdf);
     if (!style.color.IsTransparent()) {
         params.paint.color = ToFresco(style.color);
-        ForEachRun(info_, Placements(), {box.x, box.y}, params,
+        ForEachRun(Shown(), Placements(), {box.x, box.y}, params,
                    [&](const ShownRun& run) { buffer.DrawGlyphs(run.glyphs, run.count, run.params); });
     }
     if (style.computedStrokeWidth > 0 && !style.textStrokeColor.IsTransparent()) {
         params.paint.color = ToFresco(style.textStrokeColor);
         params.paint.strokeWidth = style.computedStrokeWidth;
-        ForEachRun(info_, Placements(), {box.x, box.y}, params,
+        ForEachRun(Shown(), Placements(), {box.x, box.y}, params,
                    [&](const ShownRun& run) { buffer.StrokeGlyphs(run.glyphs, run.count, run.params); });
     }
     if (node.style.visual->userSelect != css::UserSelect::None) Publish(context);

@@ -95,8 +95,9 @@ void InlineFlow::Walk(LayoutHandle& parent, Cursor& cursor, uint32_t depth) {
     }
 }
 
-void InlineFlow::NewLine(Cursor& cursor) {
+void InlineFlow::NewLine(Cursor& cursor, bool wraps) {
     lines_.back().width = cursor.x;
+    lines_.back().wraps = wraps;
     lines_.push_back({});
     cursor.x = 0;
 }
@@ -122,12 +123,12 @@ void InlineFlow::AddText(LayoutHandle& handle, Cursor& cursor) {
         // The first word did not fit behind what is there: the text begins on the next line.
         const bool skipped =
             i == 0 && line.runCount == 0 && info->lines.size() > 1 && offset > 0 && !line.endsParagraph;
-        if (i > 0) NewLine(cursor);
+        if (i > 0) NewLine(cursor, !info->lines[i - 1].endsParagraph);
         if (skipped) continue;
         const float start = i == 0 ? offset : 0;
         AddPiece(items_.back(), cursor,
-                 {static_cast<uint32_t>(lines_.size() - 1), i, start, std::max(line.extent - start, 0.0f),
-                  line.baseline, line.height - line.baseline});
+                 {static_cast<uint32_t>(lines_.size() - 1), i, static_cast<uint32_t>(items_.size() - 1),
+                  start, std::max(line.extent - start, 0.0f), line.baseline, line.height - line.baseline});
     }
 }
 
@@ -137,11 +138,12 @@ void InlineFlow::AddBox(LayoutHandle& handle, Cursor& cursor) {
     const OuterEdges edges(node);
     const float width = Finite(YGNodeLayoutGetWidth(node.flex)) + edges.margin.left + edges.margin.right;
     const float height = Finite(YGNodeLayoutGetHeight(node.flex)) + edges.margin.top + edges.margin.bottom;
-    if (cursor.x > 0 && cursor.x + width > cursor.width + layout::kLengthTolerance) NewLine(cursor);
+    if (cursor.x > 0 && cursor.x + width > cursor.width + layout::kLengthTolerance) NewLine(cursor, true);
     const auto first = static_cast<uint32_t>(pieces_.size());
     items_.push_back({&handle, Kind::Box, first, first});
     AddPiece(items_.back(), cursor,
-             {static_cast<uint32_t>(lines_.size() - 1), 0, cursor.x, width, height, 0});
+             {static_cast<uint32_t>(lines_.size() - 1), 0, static_cast<uint32_t>(items_.size() - 1), cursor.x,
+              width, height, 0});
 }
 
 void InlineFlow::AddInline(LayoutHandle& handle, Cursor& cursor, uint32_t depth) {
@@ -163,6 +165,66 @@ void InlineFlow::AlignLines(css::TextAlignType align, float width) {
                                                             : 0.0f;
     for (Line& line : lines_)
         line.shift = std::max(width - line.width, 0.0f) * part;
+    for (uint32_t first = 0; first < pieces_.size();) {
+        const uint32_t line = pieces_[first].line;
+        uint32_t end = first;
+        for (; end < pieces_.size() && pieces_[end].line == line; ++end)
+            pieces_[end].moved = pieces_[end].gap = 0;
+        if (align == css::TextAlignType::Justify)
+            JustifyLine(lines_[line], &pieces_[first], pieces_.data() + end, width);
+        first = end;
+    }
+}
+
+const layout::TextInfo* InlineFlow::TextOf(const Piece& piece) const {
+    const Item& item = items_[piece.item];
+    if (item.kind != Kind::Text) return nullptr;
+    const layout::TextInfo& info = static_cast<DisplayText&>(*item.handle->node().display).Info();
+    return piece.textLine < info.lines.size() ? &info : nullptr;
+}
+
+// A space at the end of a text is width behind its last character.
+float InlineFlow::SpaceBehind(const Piece& piece) const {
+    const layout::TextInfo* info = TextOf(piece);
+    if (info == nullptr) return 0;
+    const layout::TextLineInfo& line = info->lines[piece.textLine];
+    if (line.runCount == 0) return 0;
+    const layout::TextRun& last = info->runs[line.firstRun + line.runCount - 1];
+    const float space = line.extent - (last.x + last.width);
+    return space > layout::kLengthTolerance ? space : 0;
+}
+
+// White space at the ends of a line stands between no words.
+void InlineFlow::FindGaps(Piece& piece, bool startsLine, bool endsLine) const {
+    piece.firstGap = piece.endGap = 0;
+    piece.gapBehind = !endsLine && SpaceBehind(piece) > 0;
+    const layout::TextInfo* info = TextOf(piece);
+    if (info == nullptr) return;
+    const layout::TextLineInfo& line = info->lines[piece.textLine];
+    const auto place = [&](uint32_t character) {
+        return static_cast<uint32_t>(std::lower_bound(info->gaps.begin(), info->gaps.end(), character) -
+                                     info->gaps.begin());
+    };
+    piece.firstGap = place(line.firstCharacter + startsLine);
+    piece.endGap = std::max(place(line.endCharacter - (endsLine && line.endCharacter > 0)), piece.firstGap);
+}
+
+void InlineFlow::JustifyLine(const Line& line, Piece* first, Piece* end, float width) {
+    const float free = width - line.width + SpaceBehind(end[-1]);
+    if (!line.wraps || !(free > 0)) return;
+    uint32_t gaps = 0;
+    for (Piece* piece = first; piece != end; ++piece) {
+        FindGaps(*piece, piece == first, piece + 1 == end);
+        gaps += piece->endGap - piece->firstGap + piece->gapBehind;
+    }
+    if (gaps == 0) return;
+    const float gap = free / static_cast<float>(gaps);
+    float moved = 0;
+    for (Piece* piece = first; piece != end; ++piece) {
+        piece->gap = gap;
+        piece->moved = moved;
+        moved += piece->Spread() + (piece->gapBehind ? gap : 0);
+    }
 }
 
 Rect InlineFlow::Around(uint32_t firstPiece, uint32_t endPiece, Point origin) const {
@@ -171,12 +233,13 @@ Rect InlineFlow::Around(uint32_t firstPiece, uint32_t endPiece, Point origin) co
     for (uint32_t i = firstPiece; i < endPiece; ++i) {
         const Piece& piece = pieces_[i];
         const Line& line = lines_[piece.line];
-        const float x = line.shift + piece.x;
+        const float x = line.shift + piece.x + piece.moved;
+        const float width = piece.width + piece.Spread();
         const float y = line.top + line.ascent - piece.ascent;
         const bool start = i == firstPiece;
         left = start ? x : std::min(left, x);
         top = start ? y : std::min(top, y);
-        right = start ? x + piece.width : std::max(right, x + piece.width);
+        right = start ? x + width : std::max(right, x + width);
         const float end = y + piece.ascent + piece.descent;
         bottom = start ? end : std::max(bottom, end);
     }
@@ -195,8 +258,9 @@ void InlineFlow::PlaceText(LayoutPass& pass, const Item& item, Point origin) {
         const Piece& piece = pieces_[i];
         const Line& line = lines_[piece.line];
         if (piece.textLine < places.size()) {
-            places[piece.textLine] = {origin.x + line.shift - node.box.x,
-                                      origin.y + line.top + line.ascent - node.box.y};
+            places[piece.textLine] = {origin.x + line.shift + piece.moved - node.box.x,
+                                      origin.y + line.top + line.ascent - node.box.y, piece.gap,
+                                      piece.firstGap, piece.endGap};
         }
     }
     text.PlaceLines(places.data(), places.size());

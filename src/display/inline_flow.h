@@ -5,13 +5,15 @@
 // paragraph its box. Everything on a line stands on one baseline, so a line is as tall as the tallest part
 // above it and the deepest below it.
 //
-// An inline box that goes over several lines has one box around all of its lines. White space that text-align
-// would spread by `justify` is left as it is.
+// An inline box that goes over several lines has one box around all of its lines. `justify` widens the gaps
+// between words of lines that went on for want of room, whichever texts these gaps belong to; the boxes
+// behind them move along.
 #pragma once
 
 #include "css/values/length_context.h"
 #include "layout/layout_handle.h"
 #include "layout/perform_layout.h"
+#include "layout/text/text_info.h"
 
 namespace qorvex::dsp {
 
@@ -36,17 +38,26 @@ class InlineFlow {
     struct Piece {
         uint32_t line;
         uint32_t textLine;  // of a text
+        uint32_t item;
         float x;
         float width;
         float ascent;
         float descent;
+        // By justification: how far it moves, and what each of its gaps takes.
+        float moved = 0;
+        float gap = 0;
+        uint32_t firstGap = 0;
+        uint32_t endGap = 0;
+        bool gapBehind = false;  // the space that ends the text
+        float Spread() const { return gap * static_cast<float>(endGap - firstGap); }
     };
     struct Line {
         float width = 0;
         float ascent = 0;
         float descent = 0;
         float top = 0;
-        float shift = 0;  // by text-align
+        float shift = 0;     // by text-align
+        bool wraps = false;  // the next line begins because this one is full
     };
     struct Cursor {
         float width;
@@ -59,9 +70,13 @@ class InlineFlow {
     void AddBox(layout::LayoutHandle& handle, Cursor& cursor);
     void AddInline(layout::LayoutHandle& handle, Cursor& cursor, uint32_t depth);
     void AddPiece(Item& item, Cursor& cursor, const Piece& piece);
-    void NewLine(Cursor& cursor);
+    void NewLine(Cursor& cursor, bool wraps);
 
     void AlignLines(css::TextAlignType align, float width);
+    void JustifyLine(const Line& line, Piece* first, Piece* end, float width);
+    void FindGaps(Piece& piece, bool startsLine, bool endsLine) const;
+    const layout::TextInfo* TextOf(const Piece& piece) const;
+    float SpaceBehind(const Piece& piece) const;
     void PlaceText(layout::LayoutPass& pass, const Item& item, layout::Point origin);
     void PlaceBox(layout::LayoutPass& pass, const Item& item, layout::Point origin);
     void PlaceInline(layout::LayoutPass& pass, const Item& item, layout::Point origin);

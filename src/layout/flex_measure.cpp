@@ -2,8 +2,9 @@
 
 #include "display/display_element.h"
 #include "layout/layout_handle.h"
+#include "layout/length_bounds.h"
 
-#include <cmath>
+#include <utility>
 
 namespace qorvex::layout {
 
@@ -20,9 +21,6 @@ dsp::MeasureMode ModeOf(YGMeasureMode mode) {
             return dsp::MeasureMode::Undefined;
     }
 }
-float Finite(float value) {
-    return std::isfinite(value) ? value : 0;
-}
 }  // namespace
 
 YGSize MeasureFlexNode(YGNodeConstRef node, float width, YGMeasureMode widthMode, float height,
@@ -33,7 +31,7 @@ YGSize MeasureFlexNode(YGNodeConstRef node, float width, YGMeasureMode widthMode
     ++g_measureCount;
     Size size;
     display->Measure(*handle, width, height, ModeOf(widthMode), ModeOf(heightMode), size);
-    return {Finite(size.width), Finite(size.height)};
+    return {BoundSize(size.width), BoundSize(size.height)};
 }
 
 uint32_t TakeMeasureCount() {

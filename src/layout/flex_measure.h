@@ -3,6 +3,8 @@
 
 #include <yoga/Yoga.h>
 
+#include <cstdint>
+
 namespace qorvex::layout {
 
 YGSize MeasureFlexNode(YGNodeConstRef node, float width, YGMeasureMode widthMode, float height,

@@ -4,16 +4,13 @@
 #include "display/display_paragraph.h"
 #include "display/transforms.h"
 #include "layout/layout_store.h"
+#include "layout/length_bounds.h"
 
 #include <yoga/Yoga.h>
 
 namespace qorvex::layout {
 
 namespace {
-
-float Finite(float value) {
-    return std::isfinite(value) ? value : 0;
-}
 
 struct Entry {
     LayoutHandle* handle;
@@ -23,15 +20,15 @@ struct Entry {
 };
 
 void CopyEdges(YGNodeConstRef flex, float (*get)(YGNodeConstRef, YGEdge), Edges& out) {
-    out.left = Finite(get(flex, YGEdgeLeft));
-    out.right = Finite(get(flex, YGEdgeRight));
-    out.top = Finite(get(flex, YGEdgeTop));
-    out.bottom = Finite(get(flex, YGEdgeBottom));
+    out.left = BoundResult(get(flex, YGEdgeLeft));
+    out.right = BoundResult(get(flex, YGEdgeRight));
+    out.top = BoundResult(get(flex, YGEdgeTop));
+    out.bottom = BoundResult(get(flex, YGEdgeBottom));
 }
 
 void CopyMetrics(LayoutNode& node, EdgesCache& cache) {
-    node.box.width = Finite(YGNodeLayoutGetWidth(node.flex));
-    node.box.height = Finite(YGNodeLayoutGetHeight(node.flex));
+    node.box.width = BoundSize(YGNodeLayoutGetWidth(node.flex));
+    node.box.height = BoundSize(YGNodeLayoutGetHeight(node.flex));
     BoxEdges edges;
     CopyEdges(node.flex, YGNodeLayoutGetBorder, edges.border);
     CopyEdges(node.flex, YGNodeLayoutGetPadding, edges.padding);
@@ -56,8 +53,8 @@ bool IsInset(YGNodeConstRef flex, YGEdge edge) {
 // place stands.
 void PlaceFixed(LayoutNode& node, const Rect& in, Point origin) {
     const YGNodeConstRef flex = node.flex;
-    node.box.x = origin.x + Finite(YGNodeLayoutGetLeft(flex));
-    node.box.y = origin.y + Finite(YGNodeLayoutGetTop(flex));
+    node.box.x = origin.x + BoundResult(YGNodeLayoutGetLeft(flex));
+    node.box.y = origin.y + BoundResult(YGNodeLayoutGetTop(flex));
     if (IsInset(flex, YGEdgeLeft)) {
         node.box.x = in.x + YGNodeStyleGetPosition(flex, YGEdgeLeft).value + node.margin().left;
     } else if (IsInset(flex, YGEdgeRight)) {
@@ -80,8 +77,25 @@ void Place(const Entry& entry, LayoutPass& pass) {
     }
     // Yoga gives every other box relative to its parent, absolute ones too: it knows their containing block,
     // since static boxes are static to it.
-    node.box.x = entry.origin.x + Finite(YGNodeLayoutGetLeft(node.flex));
-    node.box.y = entry.origin.y + Finite(YGNodeLayoutGetTop(node.flex));
+    node.box.x = entry.origin.x + BoundResult(YGNodeLayoutGetLeft(node.flex));
+    node.box.y = entry.origin.y + BoundResult(YGNodeLayoutGetTop(node.flex));
+}
+
+// Those that Yoga laid out anew, or all.
+void QueueChildren(const LayoutNode& node, Entry& child, bool all, TempVector<Entry>& queue) {
+    const auto count = static_cast<uint32_t>(YGNodeGetChildCount(node.flex));
+    for (uint32_t i = 0; i < count; ++i) {
+        if (!all && !YGNodeGetHasNewLayout(YGNodeGetChild(node.flex, i))) continue;
+        child.handle = node.children[i].get();
+        queue.push_back(child);
+    }
+}
+
+bool Same(const Rect& a, const Rect& b) {
+    return a.x == b.x && a.y == b.y && a.width == b.width && a.height == b.height;
+}
+bool Same(const Edges& a, const Edges& b) {
+    return a.left == b.left && a.right == b.right && a.top == b.top && a.bottom == b.bottom;
 }
 
 }  // namespace
@@ -89,6 +103,9 @@ void Place(const Entry& entry, LayoutPass& pass) {
 void NoteBoxChange(LayoutHandle& handle, const OldBox& old, LayoutPass& pass) {
     LayoutNode& node = handle.node();
     ++pass.update.counters.laidOut;
+    // Most boxes that are laid out again only say that they stay.
+    if (Same(old.box, node.box) && Same(old.border, node.border()) && Same(old.padding, node.padding()))
+        return;
     const bool metrics = !Near(old.box.width, node.box.width) || !Near(old.box.height, node.box.height) ||
                          !Near(old.border, node.border()) || !Near(old.padding, node.padding());
     if (metrics) node.boxMetricsChanged = true;
@@ -121,18 +138,13 @@ void ReadYogaResults(const FlexReadRoot& root, LayoutPass& pass) {
         if (placed && node.display && node.display->Has(dsp::IDisplayElement::kFlowsChildren))
             static_cast<dsp::DisplayParagraph&>(*node.display).PlaceContent(*entry.handle, pass);
 
-        const bool descend =
-            root.everything || isNew || moved || (entry.containerChanged && node.absoluteBelow);
-        if (!descend || YGNodeGetChildCount(node.flex) == 0) continue;
         Entry child = entry;
         child.origin = {node.box.x, node.box.y};
         if (node.flags.containsFixedDescendants) child.fixedContainer = entry.handle;
         // Sticky: a nearer container that stayed does not tell what a farther one, of a fixed box, did.
         child.containerChanged = entry.containerChanged || isNew || moved;
-        for (const HandlePtr& handle : node.children) {
-            child.handle = handle.get();
-            queue.push_back(child);
-        }
+        const bool carriesAll = root.everything || moved || (child.containerChanged && node.absoluteBelow);
+        if (carriesAll || isNew) QueueChildren(node, child, carriesAll, queue);
     }
 }
 

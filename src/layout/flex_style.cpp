@@ -1,6 +1,7 @@
 #include "layout/flex_style.h"
 
 #include "core/logging/log.h"
+#include "layout/length_bounds.h"
 #include "layout/node_flags.h"
 
 #include <yoga/Yoga.h>
@@ -33,13 +34,6 @@ auto Pick(const Values& values, Code code) {
     return values[index < values.size() ? index : 0];
 }
 
-// Yoga computes in floats and tests for "undefined" by NaN; what a page may write is kept where neither
-// breaks.
-float Sane(float value) {
-    constexpr float kLargest = 1e7f;
-    return std::isnan(value) ? value : std::fmin(std::fmax(value, -kLargest), kLargest);
-}
-
 // The three forms of a Yoga length setter.
 struct LengthSetter {
     void (*points)(YGNodeRef, float);
@@ -50,14 +44,14 @@ struct LengthSetter {
 void SetLength(YGNodeRef node, const LengthSetter& setter, const Extent& extent,
                const LengthContext& lengths) {
     if (extent.IsLength() && extent.unit == LengthUnit::Percent) {
-        setter.percent(node, Sane(extent.value));
+        setter.percent(node, BoundLength(extent.value));
         return;
     }
     const float value = ResolveExtent(extent, lengths, css::kNoPercentBase, YGUndefined);
     if (std::isnan(value)) {
         setter.unset(node);
     } else {
-        setter.points(node, Sane(value));
+        setter.points(node, BoundLength(value));
     }
 }
 
@@ -133,18 +127,18 @@ void SyncFlex(YGNodeRef node, const css::CSSFlexValue& flex, const FlexStyleCont
     } else if (hasBasis) {
         grow = shrink = 1;
     }
-    YGNodeStyleSetFlexGrow(node, Sane(grow));
-    YGNodeStyleSetFlexShrink(node, Sane(shrink));
+    YGNodeStyleSetFlexGrow(node, BoundLength(grow));
+    YGNodeStyleSetFlexShrink(node, BoundLength(shrink));
     if (!hasBasis) {
         // A factor without a basis has the basis 0 (CSS Flexible Box Layout, section 7.1.1).
         const bool omitted = flex.hasGrow && flex.basisKind == css::FlexBasisKind::Initial;
         omitted ? YGNodeStyleSetFlexBasis(node, 0) : YGNodeStyleSetFlexBasisAuto(node);
     } else if (context.disableFlexBasisUnits) {
-        YGNodeStyleSetFlexBasis(node, Sane(flex.basis.value));
+        YGNodeStyleSetFlexBasis(node, BoundLength(flex.basis.value));
     } else if (flex.basis.unit == LengthUnit::Percent) {
-        YGNodeStyleSetFlexBasisPercent(node, Sane(flex.basis.value));
+        YGNodeStyleSetFlexBasisPercent(node, BoundLength(flex.basis.value));
     } else {
-        YGNodeStyleSetFlexBasis(node, Sane(ResolveLength(flex.basis, context.lengths)));
+        YGNodeStyleSetFlexBasis(node, BoundLength(ResolveLength(flex.basis, context.lengths)));
     }
 }
 
@@ -153,19 +147,19 @@ using EdgeSetter = void (*)(YGNodeRef, YGEdge, float);
 void SetEdge(YGNodeRef node, EdgeSetter points, EdgeSetter percent, YGEdge edge, const Extent& extent,
              const LengthContext& lengths) {
     if (extent.IsLength() && extent.unit == LengthUnit::Percent) {
-        percent(node, edge, Sane(extent.value));
+        percent(node, edge, BoundLength(extent.value));
     } else {
         // There are no auto margins in this layout.
-        points(node, edge, Sane(ResolveExtent(extent, lengths, css::kNoPercentBase, 0)));
+        points(node, edge, BoundLength(ResolveExtent(extent, lengths, css::kNoPercentBase, 0)));
     }
 }
 
 void SyncEdges(YGNodeRef node, const LayoutStyle& style, const LengthContext& lengths) {
     const Edges border = ResolveBorders(style, lengths);
-    YGNodeStyleSetBorder(node, YGEdgeLeft, Sane(border.left));
-    YGNodeStyleSetBorder(node, YGEdgeTop, Sane(border.top));
-    YGNodeStyleSetBorder(node, YGEdgeRight, Sane(border.right));
-    YGNodeStyleSetBorder(node, YGEdgeBottom, Sane(border.bottom));
+    YGNodeStyleSetBorder(node, YGEdgeLeft, border.left);
+    YGNodeStyleSetBorder(node, YGEdgeTop, border.top);
+    YGNodeStyleSetBorder(node, YGEdgeRight, border.right);
+    YGNodeStyleSetBorder(node, YGEdgeBottom, border.bottom);
 
     auto margin = [&](YGEdge edge, const Extent& value) {
         SetEdge(node, YGNodeStyleSetMargin, YGNodeStyleSetMarginPercent, edge, value, lengths);
@@ -198,7 +192,7 @@ void SyncInset(YGNodeRef node, YGEdge edge, const Extent& extent, const LayoutNo
     }
     const bool isPercent = extent.IsLength() && extent.unit == LengthUnit::Percent;
     if (isPercent && !layoutNode.flags.isFixed) {
-        YGNodeStyleSetPositionPercent(node, edge, Sane(extent.value));
+        YGNodeStyleSetPositionPercent(node, edge, BoundLength(extent.value));
         return;
     }
     if (isPercent) {
@@ -206,7 +200,7 @@ void SyncInset(YGNodeRef node, YGEdge edge, const Extent& extent, const LayoutNo
             "Using % values with position:fixed is not supported. Percents will be calculated against "
             "viewport.");
     }
-    YGNodeStyleSetPosition(node, edge, Sane(ResolveExtent(extent, lengths, viewSize, YGUndefined)));
+    YGNodeStyleSetPosition(node, edge, BoundLength(ResolveExtent(extent, lengths, viewSize, YGUndefined)));
 }
 
 void SyncPosition(YGNodeRef node, const LayoutNode& layoutNode, const LayoutStyle& style,
@@ -259,21 +253,24 @@ void SyncSizes(YGNodeRef node, const LayoutNode& layoutNode, const LayoutStyle& 
     SetLength(node, kMaxHeight, style.maxHeight, lengths);
 }
 
-// Static boxes are static in Yoga too: an absolute box is then laid out against its nearest ancestor that is
-// not. The root always is one.
+// A box between an absolute one and its containing block is static in Yoga too, which then looks for the
+// nearest ancestor that is not; the root always is one. Without an absolute box below it makes no difference,
+// and Yoga walks through all static boxes of a containing block whenever it lays that out.
 YGPositionType PositionType(const LayoutNode& node, bool isRoot) {
     if (isRoot) return YGPositionTypeRelative;
     if (node.flags.isFixed || node.flags.isAbsolute) return YGPositionTypeAbsolute;
-    return node.flags.isPositioned ? YGPositionTypeRelative : YGPositionTypeStatic;
+    const bool isStatic = !node.flags.isPositioned && node.absoluteBelow;
+    return isStatic ? YGPositionTypeStatic : YGPositionTypeRelative;
 }
 
 // See LayoutNode::absoluteBelow.
-void MarkAbsoluteBelow(const LayoutNode& node) {
+void MarkAbsoluteBelow(const LayoutNode& node, const LayoutHandle* root) {
     if (!node.flags.isFixed && !node.flags.isAbsolute && !node.absoluteBelow) return;
     for (LayoutHandle* parent = node.parent; parent != nullptr; parent = parent->node().parent) {
         LayoutNode& above = parent->node();
         if (above.absoluteBelow) break;
         above.absoluteBelow = true;
+        if (above.flex) YGNodeStyleSetPositionType(above.flex, PositionType(above, parent == root));
     }
 }
 
@@ -281,7 +278,9 @@ void MarkAbsoluteBelow(const LayoutNode& node) {
 
 Edges ResolveBorders(const LayoutStyle& style, const LengthContext& lengths) {
     auto width = [&](const css::BorderWidth& border, css::BorderStyleType type) {
-        return type >= css::BorderStyleType::Dotted ? ResolveBorderWidth(border, lengths) : 0.0f;
+        return type >= css::BorderStyleType::Dotted
+                   ? BoundResult(BoundLength(ResolveBorderWidth(border, lengths)))
+                   : 0.0f;
     };
     return {width(style.borderLeftWidth, style.borderLeftStyle),
             width(style.borderRightWidth, style.borderRightStyle),
@@ -309,7 +308,7 @@ bool SyncStyleToYoga(LayoutHandle& handle, FlexStyleContext& context) {
     SyncEdges(node, style, context.lengths);
     SyncSizes(node, layoutNode, style, context.lengths);
     SyncPosition(node, layoutNode, style, context);
-    MarkAbsoluteBelow(layoutNode);
+    MarkAbsoluteBelow(layoutNode, context.root);
     return true;
 }
 

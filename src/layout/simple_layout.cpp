@@ -7,6 +7,7 @@
 #include "layout/flex_results.h"
 #include "layout/flex_style.h"
 #include "layout/layout_store.h"
+#include "layout/length_bounds.h"
 #include "layout/node_flags.h"
 
 #include <yoga/Yoga.h>
@@ -17,12 +18,17 @@ namespace qorvex::layout {
 
 using css::LayoutStyle;
 using css::LengthContext;
-using css::ResolveExtent;
-using css::ResolveLength;
 
 namespace {
 
 constexpr float kUnknown = std::numeric_limits<float>::quiet_NaN();
+
+float Resolve(const css::Extent& extent, const LengthContext& lengths, float base) {
+    return BoundResult(BoundLength(css::ResolveExtent(extent, lengths, base, 0)));
+}
+float Resolve(const css::Length& length, const LengthContext& lengths, float base) {
+    return BoundResult(BoundLength(css::ResolveLength(length, lengths, base)));
+}
 
 struct Containers {
     const LayoutNode* positioned;  // null only for the root
@@ -45,13 +51,10 @@ void ResolveEdges(LayoutHandle& handle, const LayoutStyle& style, const LengthCo
     BoxEdges edges;
     edges.border = ResolveBorders(style, lengths);
     // Stored for scripts; in this engine margins move nothing.
-    edges.margin = {ResolveExtent(style.marginLeft, lengths, base, 0),
-                    ResolveExtent(style.marginRight, lengths, base, 0),
-                    ResolveExtent(style.marginTop, lengths, base, 0),
-                    ResolveExtent(style.marginBottom, lengths, base, 0)};
-    edges.padding = {
-        ResolveLength(style.paddingLeft, lengths, base), ResolveLength(style.paddingRight, lengths, base),
-        ResolveLength(style.paddingTop, lengths, base), ResolveLength(style.paddingBottom, lengths, base)};
+    edges.margin = {Resolve(style.marginLeft, lengths, base), Resolve(style.marginRight, lengths, base),
+                    Resolve(style.marginTop, lengths, base), Resolve(style.marginBottom, lengths, base)};
+    edges.padding = {Resolve(style.paddingLeft, lengths, base), Resolve(style.paddingRight, lengths, base),
+                     Resolve(style.paddingTop, lengths, base), Resolve(style.paddingBottom, lengths, base)};
     handle.node().edges.Set(edges, handle.store().recentEdges);
 }
 
@@ -59,13 +62,9 @@ Point PlaceIn(const Rect& in, const LayoutNode& node, const LayoutStyle& style,
               const LengthContext& lengths) {
     Point place{in.x, in.y};
     if (!node.flags.isPositioned) return place;
-    place.x += ResolveExtent(style.left, lengths, in.width, 0);
-    place.y += ResolveExtent(style.top, lengths, in.height, 0);
+    place.x += Resolve(style.left, lengths, in.width);
+    place.y += Resolve(style.top, lengths, in.height);
     return place;
-}
-
-float AtLeastZero(float value) {
-    return value > 0 ? value : 0;
 }
 
 // Extents of the in-flow children add up, although the children overlap.
@@ -138,15 +137,15 @@ void LayoutSimpleSubtree(LayoutHandle& handle, LayoutPass& pass, LengthContext l
         node.display->Measure(handle, kUnknown, kUnknown, dsp::MeasureMode::Undefined,
                               dsp::MeasureMode::Undefined, size);
         ++pass.update.counters.measured;
-        node.box.width = AtLeastZero(size.width);
-        node.box.height = AtLeastZero(size.height);
+        node.box.width = BoundSize(size.width);
+        node.box.height = BoundSize(size.height);
     } else if (node.flags.isReplaced) {
         const Size size = SizeReplaced(handle, style, lengths, containing);
-        node.box.width = size.width;
-        node.box.height = size.height;
+        node.box.width = BoundSize(size.width);
+        node.box.height = BoundSize(size.height);
     } else {
-        node.box.width = AtLeastZero(ResolveExtent(style.width, lengths, containing.width, 0));
-        node.box.height = AtLeastZero(ResolveExtent(style.height, lengths, containing.height, 0));
+        node.box.width = BoundSize(Resolve(style.width, lengths, containing.width));
+        node.box.height = BoundSize(Resolve(style.height, lengths, containing.height));
     }
     const Containers below{node.flags.isPositioned || in.positioned == nullptr ? &node : in.positioned,
                            node.flags.containsFixedDescendants ? &handle : in.fixed};

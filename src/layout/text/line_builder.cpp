@@ -37,6 +37,7 @@ class LineBuilder {
     }
 
     void Build(const TempVector<LineSpan>& spans) {
+        if (request_.notesGaps) NoteGaps();
         out_.lines.reserve(spans.size());
         out_.glyphs.reserve(shaped_ ? shaped_->glyphs.size() : characters_.codes.size());
         if (shaped_) {
@@ -89,18 +90,23 @@ class LineBuilder {
         span.width += ellipsis_.advance;
     }
 
+    bool IsGap(uint32_t character) const {
+        return ClassOf(characters_.codes[character]) != CharacterClass::Other && StartsCluster(character);
+    }
+    void NoteGaps() {
+        for (uint32_t i = 0; i < characters_.codes.size(); ++i)
+            if (IsGap(i)) out_.gaps.push_back(i);
+    }
+
     // Shares the free width among the gaps between words.
     void Spread(LineSpan& span) {
         uint32_t gaps = 0;
-        const auto isGap = [&](uint32_t i) {
-            return ClassOf(characters_.codes[i]) != CharacterClass::Other && StartsCluster(i);
-        };
         for (uint32_t i = span.first + 1; i + 1 < span.end; ++i)
-            gaps += isGap(i);
+            gaps += IsGap(i);
         const float extra = request_.availableWidth - span.width;
         if (gaps == 0 || extra <= 0) return;
         for (uint32_t i = span.first + 1; i + 1 < span.end; ++i) {
-            if (isGap(i)) map_.advances[i] += extra / static_cast<float>(gaps);
+            if (IsGap(i)) map_.advances[i] += extra / static_cast<float>(gaps);
         }
         span.width = request_.availableWidth;
     }

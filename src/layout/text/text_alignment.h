@@ -8,4 +8,7 @@ namespace qorvex::layout {
 // Lines get the width of the widest one (of the available width when justified).
 void AlignLines(const TextStyle& style, float availableWidth, TextInfo& info);
 
+// Widens gaps of one line of an inline flow, as its placement tells.
+void SpreadLine(TextInfo& info, TextLineInfo& line, const LinePlacement& placement);
+
 }  // namespace qorvex::layout

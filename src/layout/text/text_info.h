@@ -50,6 +50,9 @@ struct TextLineInfo {
 struct LinePlacement {
     float x = 0;
     float baseline = 0;
+    float gap = 0;  // what justification adds to each of these gaps, see TextInfo::gaps
+    uint32_t firstGap = 0;
+    uint32_t endGap = 0;
 };
 
 struct TextInfo {
@@ -61,6 +64,8 @@ struct TextInfo {
     TextArray<uint32_t> clusters;
     // For each character the edge in its run at which reading it begins; empty with `clusters`.
     TextArray<float> positions;
+    // The characters between words, ascending; of texts in an inline flow, whose lines others share.
+    TextArray<uint32_t> gaps;
     float width = 0;
     float height = 0;
     float usedSize = 0;    // font size of this layout in pixels
@@ -72,6 +77,7 @@ struct TextInfo {
         glyphs.clear();
         clusters.clear();
         positions.clear();
+        gaps.clear();
         width = height = 0;
         wrapped = false;
     }

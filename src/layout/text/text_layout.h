@@ -27,6 +27,7 @@ struct TextRequest {
     IInternationalizationManager* i18n = nullptr;  // read by the complex path alone
     float firstLineOffset = 0;
     bool applyLineHeight = true;
+    bool notesGaps = false;  // fill TextInfo::gaps
 };
 
 // One layout at style.usedSize, by the path that the text needs. False, with an empty result, when no
