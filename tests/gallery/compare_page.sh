@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
-# One page of the gallery looks as its picture in docs/gallery, and loads without a line from Warning on. At most 0.1%
-# of the pixels may have a channel that differs by more than 8 of 255: text of another FreeType is within, a case that
-# is drawn wrong is not. Usage: compare_page.sh PLAYER COMPARE-PICTURES PAGE PICTURE [PLAYER OPTIONS]
+# One page of the gallery looks as its picture in docs/gallery, and loads without a line from Warning on. At most 0.01%
+# of the pixels, 48, may have a channel that differs by more than 8 of 255: less than the corners of one border that
+# are sharp instead of round. Usage: compare_page.sh PLAYER COMPARE-PICTURES PAGE PICTURE [PLAYER OPTIONS]
 set -uo pipefail
 player=$1 compare=$2 page=$3 picture=$4
 shift 4
@@ -15,4 +15,4 @@ if [ $code -ne 0 ] || [ -s "$work/err.txt" ]; then
     head -n 10 "$work/err.txt"
     exit 1
 fi
-"$compare" "$picture" "$work/page.png"
+"$compare" "$picture" "$work/page.png" --allow 0.01
