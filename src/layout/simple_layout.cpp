@@ -91,7 +91,7 @@ Size SizeReplaced(LayoutHandle& handle, const LayoutStyle& style, const LengthCo
     const float across = border.left + border.right + padding.left + padding.right;
     const float down = border.top + border.bottom + padding.top + padding.bottom;
     const auto inner = [&](const css::Extent& side, float base, float edges) {
-        return side.IsLength() ? AtLeastZero(ResolveExtent(side, lengths, base, 0) - edges) : kUnknown;
+        return side.IsLength() ? std::max(ResolveExtent(side, lengths, base, 0) - edges, 0.0f) : kUnknown;
     };
     const auto mode = [](const css::Extent& side) {
         return side.IsLength() ? dsp::MeasureMode::Exactly : dsp::MeasureMode::Undefined;
