@@ -6,6 +6,7 @@
 #include <string_view>
 
 #include "core/memory/containers.h"
+#include "css/values/layout_style_refs.h"
 #include "display/display_element.h"
 #include "layout/node_link.h"
 #include "layout/text/text_info.h"
@@ -37,7 +38,8 @@ class DisplayText final : public IDisplayElement {
     // Already transformed (text-transform) UTF-8. On the layout thread, or at the commit.
     void SetText(std::string_view text);
     std::string_view Text() const { return text_.view(); }
-    const layout::TextInfo& Info() const { return info_; }
+    // Of the last layout; null before the first one.
+    const layout::TextInfo* Info() const { return lines_ ? &lines_->info : nullptr; }
 
     void Paint(PaintContext& context, bool dirty, const layout::LayoutNode& node,
                fresco::CommandBuffer& buffer) override;
@@ -53,16 +55,33 @@ class DisplayText final : public IDisplayElement {
     void PlaceLines(const layout::LinePlacement* lines, size_t count);
 
   private:
+    // What lines depend on besides the text. The group stands for all of its text values.
     struct Parameters {
-        layout::TextStyle style;
-        float width = 0;
+        css::StyleHandle<css::TextLayoutStyle> style;
+        float usedSize = 0;
+        float width = 0;  // NaN: not known
         float height = 0;
         float firstLineOffset = 0;
+        bool inFlow = false;  // what belongs to a paragraph is left to it
+        bool complexText = true;
+    };
+    // Made by the first layout: a text that is not shown has none of it.
+    struct Lines {
+        layout::TextInfo info;
+        Parameters parameters;
+        bool valid = false;
+        bool unpublished = false;
+        // In an inline flow; empty elsewhere.
+        Vector<layout::LinePlacement, MemoryTag::LayoutData> placed;
+        qsl::RefPtr<layout::TextFontStyle> publishedStyle;
+
+        const layout::LinePlacement* Placements() const { return placed.empty() ? nullptr : placed.data(); }
     };
     struct DestroyIterator {
         void operator()(i18n::IBreakIterator* iterator) const;
     };
 
+    static layout::TextStyle MakeStyle(const Parameters& parameters);
     // Lays out when the style, the text or the available box differ from those of the stored lines. False
     // without a loaded typeface.
     bool EnsureLayout(const layout::LayoutNode& node, const layout::TextServices& services,
@@ -71,18 +90,11 @@ class DisplayText final : public IDisplayElement {
     void Publish(PaintContext& context);
     void PaintShadows(PaintContext& context, const layout::LayoutNode& node, layout::Point corner,
                       fresco::CommandBuffer& buffer) const;
-    const layout::LinePlacement* Placements() const { return placed_.empty() ? nullptr : placed_.data(); }
 
     TaggedString<MemoryTag::Rendering> text_;
-    layout::TextInfo info_;
-    Parameters laid_;  // of info_
-    bool laidOut_ = false;
-    bool unpublished_ = false;
-    // Lines of an inline flow; empty elsewhere.
-    Vector<layout::LinePlacement, MemoryTag::LayoutData> placed_;
+    UniquePtr<Lines, MemoryTag::LayoutData> lines_;
     layout::NodeLinkPtr link_;
     std::unique_ptr<i18n::IBreakIterator, DestroyIterator> iterator_;
-    qsl::RefPtr<layout::TextFontStyle> publishedStyle_;
 };
 
 }  // namespace qorvex::dsp

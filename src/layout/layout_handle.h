@@ -39,13 +39,13 @@ using HandleVector = Vector<HandlePtr, MemoryTag::LayoutNodes>;
 
 // Facts that follow from a node's style alone. Computed on the layout side, mirrored to the DOM side.
 struct NodeFlags {
-    bool isPositioned = false;  // position is not static
-    bool isFixed = false;
-    bool isAbsolute = false;
-    bool shouldOverflowClip = false;        // either overflow axis is not visible
-    bool containsFixedDescendants = false;  // has a transform, a perspective or a filter
-    bool preserves3d = false;
-    bool measuredByDisplayElement = false;
+    bool isPositioned : 1 = false;  // position is not static
+    bool isFixed : 1 = false;
+    bool isAbsolute : 1 = false;
+    bool shouldOverflowClip : 1 = false;        // either overflow axis is not visible
+    bool containsFixedDescendants : 1 = false;  // has a transform, a perspective or a filter
+    bool preserves3d : 1 = false;
+    bool measuredByDisplayElement : 1 = false;
 };
 
 // An immutable record of the layout side that several nodes and both halves hold.
@@ -104,18 +104,20 @@ struct LayoutResult {
 struct LayoutData {
     LayoutHandle* parent = nullptr;
     HandleVector children;  // DOM order among the siblings that have handles
-    css::LaidOutStyle style;
     dsp::DisplayElementPtr display;
-    ScrollPosition scroll;
     NodeLinkPtr node;
-    LayoutResult result;
-    int32_t zIndex = 0;
+    // The small fields stand in the room that a style leaves at its end.
+    [[no_unique_address]] css::LaidOutStyle style;
     NodeFlags flags;
-    bool establishesStackingContext = false;
-    bool isImage = false;
-    bool changed = false;  // an edit that the next commit must carry over
-    bool inTree = false;
+    bool establishesStackingContext : 1 = false;
+    bool isImage : 1 = false;
+    bool changed : 1 = false;  // an edit that the next commit must carry over
+    bool inTree : 1 = false;
+    int32_t zIndex = 0;
+    ScrollPosition scroll;
+    LayoutResult result;
 };
+static_assert(sizeof(LayoutData) == 160);
 
 // Union of the bounds of some neighbouring children, so that one changed child of ten thousand costs the look
 // at its group and not at all its siblings.
@@ -140,46 +142,47 @@ struct LayoutNode {
     // Its context points back at the handle. Only of nodes that Yoga lays out: none in a page, or a part of
     // it, that the simple engine places.
     YGNode* flex = nullptr;
-    css::LaidOutStyle style;
     dsp::DisplayElementPtr display;
+    // As in LayoutData, the small fields follow.
+    [[no_unique_address]] css::LaidOutStyle style;
+    NodeFlags flags;
+    bool establishesStackingContext : 1 = false;
+    bool previousStacking : 1 = false;  // as of the last SyncTrees, like previousZIndex
+
+    // One frame long; SyncTrees clears them.
+    bool visualChanged : 1 = false;
+    bool rectChanged : 1 = false;
+    bool boxMetricsChanged : 1 = false;
+
+    // Sticky and conservative: there is an absolute or fixed box below, whose containing block may lie above
+    // this node. When it is set here, it is set on all ancestors.
+    bool absoluteBelow : 1 = false;
+    // The transform pass must look at this node, or somewhere below it.
+    bool needsTransform : 1 = true;
+    bool descendantNeedsTransform : 1 = false;
+    // The commit gave the node other children, so what their bounds add up to is not known.
+    bool childrenChanged : 1 = false;
+
+    int32_t zIndex = 0;
+    int32_t previousZIndex = 0;
+    // Place among the parent's children, for the bounds that the parent keeps by groups of children.
+    uint32_t index = 0;
     ScrollPosition scroll;
 
-    Rect box{};  // document coordinates; z and the pixel grid play no part yet
     SharedEdges edges;
+    Rect box{};          // document coordinates; z and the pixel grid play no part yet
     Rect aabb{};         // snapped box and in-flow overflow, document coordinates
     Rect paintBounds{};  // what the node's own content can touch, view coordinates
     Rect visualAabb{};   // the same with its subtree
     // Made by the transform pass where there are children.
     UniquePtr<ChildBounds, MemoryTag::LayoutNodes> below;
-    WorldMatrix world;
+    [[no_unique_address]] WorldMatrix world;
+    // Depth below the root, which is 0. Nodes at kMaxLayoutDepth and deeper keep zero boxes.
+    uint32_t depth = 0;
     // Present only where the style needs them.
     UniquePtr<Matrix, MemoryTag::LayoutNodes> local;
     UniquePtr<Matrix, MemoryTag::LayoutNodes> perspective;
     UniquePtr<dsp::ResolvedVisuals, MemoryTag::LayoutNodes> visuals;
-
-    int32_t zIndex = 0;
-    int32_t previousZIndex = 0;  // as of the last SyncTrees, like previousStacking
-    // Place among the parent's children, for the bounds that the parent keeps by groups of children.
-    uint32_t index = 0;
-    // Depth below the root, which is 0. Nodes at kMaxLayoutDepth and deeper keep zero boxes.
-    uint32_t depth = 0;
-    NodeFlags flags;
-    bool establishesStackingContext = false;
-    bool previousStacking = false;
-
-    // One frame long; SyncTrees clears them.
-    bool visualChanged = false;
-    bool rectChanged = false;
-    bool boxMetricsChanged = false;
-
-    // Sticky and conservative: there is an absolute or fixed box below, whose containing block may lie above
-    // this node. When it is set here, it is set on all ancestors.
-    bool absoluteBelow = false;
-    // The transform pass must look at this node, or somewhere below it.
-    bool needsTransform = true;
-    bool descendantNeedsTransform = false;
-    // The commit gave the node other children, so what their bounds add up to is not known.
-    bool childrenChanged = false;
 
     const Edges& border() const { return edges.border(); }
     const Edges& padding() const { return edges.padding(); }
@@ -188,6 +191,7 @@ struct LayoutNode {
     // Beyond the depth limit a node takes no part in layout, transforms and painting.
     bool IsBeyondLimit() const { return depth >= limits::kMaxLayoutDepth; }
 };
+static_assert(sizeof(LayoutNode) == 232);
 
 class LayoutHandle {
   public:

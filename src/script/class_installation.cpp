@@ -19,7 +19,8 @@ constexpr std::string_view kBuilders = R"('use strict'; {
     const global = globalThis;
     let build;
     const { defineProperty, create, setPrototypeOf, prototype: root } = Object;
-    const { toStringTag, hasInstance } = Symbol;
+    const { toStringTag, hasInstance, iterator } = Symbol;
+    const { values: walkArray } = Array.prototype;
     const { apply } = Reflect;
     const instanceOf = Function.prototype[hasInstance];
     const kind = (writable, enumerable, configurable) =>
@@ -56,9 +57,10 @@ constexpr std::string_view kBuilders = R"('use strict'; {
             }
         },
         // Its constructor costs more than the rest of it, and a page asks for few.
-        function prototypeOf(parent, name, index) {
+        function prototypeOf(parent, name, index, list) {
             const result = create(parent || root);
             define(result, toStringTag, label, name);
+            if (list) define(result, iterator, hidden, walkArray);
             defineHidden(result, 'constructor', () => build(index),
                 function(value) { define(this, 'constructor', this === result ? hidden : method, value); });
             return result;
@@ -172,9 +174,10 @@ class Installer {
         arguments.Add(parent_prototype ? parent_prototype : JSValueMakeNull(context_));
         arguments.Add(GetScriptClassRow(script_class).name);
         arguments.Add(static_cast<double>(index));
+        const ClassDescription* description = GetClassDescription(script_class);
+        arguments.Add(JSValueMakeBoolean(context_, description && description->properties.indexed));
         const JSObjectRef prototype = AsObject(context_, Call(ClassBuilder::PrototypeOf, arguments));
         if (!prototype) return nullptr;
-        const ClassDescription* description = GetClassDescription(script_class);
         // The window's own stand on the global object.
         const bool has_members = description && script_class != ScriptClass::Window;
         if (has_members && !DefineMembers(prototype, *description)) return nullptr;
