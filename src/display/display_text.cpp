@@ -41,43 +41,62 @@ void DisplayText::SetText(std::string_view text) {
     if (iterator_) iterator_->ClearText();
     text_ = text;
     if (iterator_) iterator_->SetText(text_.data(), static_cast<unsigned>(text_.size()));
-    laidOut_ = false;
+    if (lines_) lines_->valid = false;
 }
 
 uint32_t DisplayText::TextLength() const {
     return static_cast<uint32_t>(text_.size());
 }
 
+layout::TextStyle DisplayText::MakeStyle(const Parameters& parameters) {
+    layout::TextStyle style = layout::MakeTextStyle(*parameters.style);
+    style.usedSize = parameters.usedSize;
+    style.complexText = parameters.complexText;
+    if (parameters.inFlow) {
+        // Both belong to the paragraph, which aligns whole lines and fits all of its text at once.
+        style.align = css::TextAlignType::Left;
+        style.fit = css::FontFitModeType::None;
+    }
+    return style;
+}
+
 bool DisplayText::Holds(const Parameters& wanted) const {
-    if (!laidOut_ || !SameTextStyle(wanted.style, laid_.style)) return false;
-    if (!Near(wanted.firstLineOffset, laid_.firstLineOffset) || wanted.inFlow != laid_.inFlow) return false;
-    const bool fits = wanted.style.fit != css::FontFitModeType::None;
-    if (!fits && !Near(wanted.style.usedSize, laid_.style.usedSize)) return false;
-    if (fits && !SameExtent(wanted.height, laid_.height)) return false;
-    if (SameExtent(wanted.width, laid_.width)) return true;
+    if (!lines_ || !lines_->valid) return false;
+    const Parameters& laid = lines_->parameters;
+    if (wanted.inFlow != laid.inFlow || wanted.complexText != laid.complexText) return false;
+    if (!(wanted.style == laid.style) && !SameTextStyle(MakeStyle(wanted), MakeStyle(laid))) return false;
+    if (!Near(wanted.firstLineOffset, laid.firstLineOffset)) return false;
+    const css::TextLayoutStyle& style = *wanted.style;
+    const bool fits = !wanted.inFlow && style.fontFitMode != css::FontFitModeType::None;
+    if (!fits && !Near(wanted.usedSize, laid.usedSize)) return false;
+    if (fits && !SameExtent(wanted.height, laid.height)) return false;
+    if (SameExtent(wanted.width, laid.width)) return true;
     // Lines that fit a narrower width without a break are the same in a wider one, and the other way round.
-    const bool followsWidth = fits || wanted.style.align != css::TextAlignType::Left ||
-                              wanted.style.overflow != css::TextOverflowMode::Clip ||
-                              wanted.firstLineOffset > 0;
-    return !followsWidth && !info_.wrapped && !(wanted.width < info_.width);
+    const bool aligned = !wanted.inFlow && style.textAlign != css::TextAlignType::Left;
+    const bool followsWidth =
+        fits || aligned || style.textOverflow != css::TextOverflowMode::Clip || wanted.firstLineOffset > 0;
+    return !followsWidth && !lines_->info.wrapped && !(wanted.width < lines_->info.width);
 }
 
 bool DisplayText::EnsureLayout(const layout::LayoutNode& node, const layout::TextServices& services,
                                const Parameters& wanted) {
     if (services.fonts == nullptr) return false;
     if (Holds(wanted)) return true;
-    if (!LayoutText({text_.view(), wanted.style, wanted.width, wanted.height, *services.fonts,
-                     iterator_.get(), services.i18n, wanted.firstLineOffset, true, wanted.inFlow},
-                    info_)) {
+    if (!lines_) lines_ = MakeUnique<Lines, MemoryTag::LayoutData>();
+    layout::TextInfo& info = lines_->info;
+    const layout::TextStyle style = MakeStyle(wanted);
+    lines_->valid = LayoutText({text_.view(), style, wanted.width, wanted.height, *services.fonts,
+                                iterator_.get(), services.i18n, wanted.firstLineOffset, true, wanted.inFlow},
+                               info);
+    if (!lines_->valid) {
         LogDebug("Measuring text without typeface");
-        info_.Clear();
-        laidOut_ = false;
+        info.Clear();
         return false;
     }
-    laid_ = wanted;
-    laidOut_ = unpublished_ = true;
-    SetInk(std::ceil(info_.usedSize * kOverhang + node.style.text->computedStrokeWidth),
-           {std::ceil(info_.width), std::ceil(info_.height)});
+    lines_->parameters = wanted;
+    lines_->unpublished = true;
+    SetInk(std::ceil(info.usedSize * kOverhang + node.style.text->computedStrokeWidth),
+           {std::ceil(info.width), std::ceil(info.height)});
     return true;
 }
 
@@ -91,99 +110,106 @@ void DisplayText::Measure(layout::LayoutHandle& handle, float availableWidth, fl
 
 layout::Size DisplayText::MeasureFor(layout::LayoutHandle& handle, float availableWidth,
                                      float availableHeight) {
-    placed_.clear();
-    justified_.reset();
-    const css::TextLayoutStyle* group = handle.node().style.text.get();
-    if (group == nullptr) return {};
+    if (lines_) {
+        lines_->placed.clear();
+        lines_->justified.reset();
+    }
+    const auto& style = handle.node().style.text;
+    if (!style) return {};
     const layout::TextServices& services = handle.store().text;
-    Parameters wanted{layout::MakeTextStyle(*group), availableWidth, availableHeight};
-    wanted.style.complexText = services.complexText;
-    if (!EnsureLayout(handle.node(), services, wanted)) return {};
-    return {std::ceil(info_.width), std::ceil(info_.height)};
+    if (!EnsureLayout(handle.node(), services,
+                      {style, style->computedFontSize, availableWidth, availableHeight, 0, false,
+                       services.complexText}))
+        return {};
+    return {std::ceil(lines_->info.width), std::ceil(lines_->info.height)};
 }
 
 void DisplayText::Remember(const Answer& answer) {
-    for (Answer& known : answers_) {
+    if (!lines_) return;
+    for (Answer& known : lines_->answers) {
         if (!SameExtent(known.width, answer.width) || !SameExtent(known.height, answer.height)) continue;
         known = answer;
         return;
     }
-    tooManyAnswers_ = tooManyAnswers_ || answers_.size() == kMostAnswers;
-    if (!tooManyAnswers_) answers_.push_back(answer);
+    lines_->tooManyAnswers = lines_->tooManyAnswers || lines_->answers.size() == Lines::kMostAnswers;
+    if (!lines_->tooManyAnswers) lines_->answers.push_back(answer);
 }
 
 bool DisplayText::KeepsSize(layout::LayoutHandle& handle) {
-    bool keeps = !tooManyAnswers_ && !answers_.empty();
-    for (size_t i = 0; keeps && i < answers_.size(); ++i) {
-        const layout::Size size = MeasureFor(handle, answers_[i].width, answers_[i].height);
-        keeps = size.width == answers_[i].size.width && size.height == answers_[i].size.height;
+    if (!lines_) return false;
+    const auto& answers = lines_->answers;
+    bool keeps = !lines_->tooManyAnswers && !answers.empty();
+    for (size_t i = 0; keeps && i < answers.size(); ++i) {
+        const layout::Size size = MeasureFor(handle, answers[i].width, answers[i].height);
+        keeps = size.width == answers[i].size.width && size.height == answers[i].size.height;
     }
     if (!keeps) {
-        answers_.clear();
-        tooManyAnswers_ = false;
+        lines_->answers.clear();
+        lines_->tooManyAnswers = false;
     }
     return keeps;
 }
 
 const layout::TextInfo* DisplayText::LayoutInline(layout::LayoutHandle& handle,
                                                   const InlineTextRequest& request) {
-    const css::TextLayoutStyle* group = handle.node().style.text.get();
-    if (group == nullptr) return nullptr;
+    const auto& style = handle.node().style.text;
+    if (!style) return nullptr;
     const layout::TextServices& services = handle.store().text;
-    Parameters wanted{layout::MakeTextStyle(*group), request.width, NAN, request.firstLineOffset, true};
-    // Both belong to the paragraph, which aligns whole lines and fits all of its text at once.
-    wanted.style.align = css::TextAlignType::Left;
-    wanted.style.fit = css::FontFitModeType::None;
-    wanted.style.complexText = services.complexText;
-    wanted.style.usedSize = wanted.style.fontSize * request.scale;
-    return EnsureLayout(handle.node(), services, wanted) ? &info_ : nullptr;
+    const bool done = EnsureLayout(handle.node(), services,
+                                   {style, style->computedFontSize * request.scale, request.width, NAN,
+                                    request.firstLineOffset, true, services.complexText});
+    return done ? &lines_->info : nullptr;
 }
 
 void DisplayText::PlaceLines(const layout::LinePlacement* lines, size_t count) {
-    placed_.assign(lines, lines + count);
-    unpublished_ = true;
-    justified_.reset();
+    if (!lines_) return;
+    lines_->placed.assign(lines, lines + count);
+    lines_->unpublished = true;
+    UniquePtr<layout::TextInfo, MemoryTag::LayoutData>& justified = lines_->justified;
+    justified.reset();
     for (size_t i = 0; i < count; ++i) {
         if (lines[i].gap <= 0) continue;
-        if (!justified_) justified_ = MakeUnique<layout::TextInfo, MemoryTag::LayoutData>(info_);
-        SpreadLine(*justified_, justified_->lines[i], lines[i]);
+        if (!justified) justified = MakeUnique<layout::TextInfo, MemoryTag::LayoutData>(lines_->info);
+        SpreadLine(*justified, justified->lines[i], lines[i]);
     }
 }
 
 void DisplayText::OffsetLine(uint32_t lineIndex, float offset, uint8_t alignment) {
     using css::TextAlignType;
-    if (lineIndex >= placed_.size()) return;
+    if (!lines_ || lineIndex >= lines_->placed.size()) return;
     const auto align = static_cast<TextAlignType>(alignment);
     const float part = align == TextAlignType::Center ? 0.5f : align == TextAlignType::Right ? 1.0f : 0.0f;
-    placed_[lineIndex].x += offset * part;
+    lines_->placed[lineIndex].x += offset * part;
 }
 
 void DisplayText::GrowLastLine(float amount) {
-    if (info_.lines.empty()) return;
-    info_.lines.back().height += amount;
-    info_.height += amount;
+    if (!lines_ || lines_->info.lines.empty()) return;
+    lines_->info.lines.back().height += amount;
+    lines_->info.height += amount;
 }
 
 void DisplayText::Publish(PaintContext& context) {
-    if (!unpublished_ || !link_ || context.family == nullptr) return;
-    unpublished_ = false;
+    if (!lines_->unpublished || !link_ || context.family == nullptr) return;
+    lines_->unpublished = false;
+    const layout::TextInfo& info = lines_->info;
+    const css::TextLayoutStyle& group = *lines_->parameters.style;
     auto style = MakeRef<layout::TextFontStyle>();
-    for (const uint32_t font : laid_.style.typefaces)
+    for (const uint32_t font : group.typefaces)
         if (style->font == css::kNoTypeface) style->font = font;
-    style->size = info_.usedSize;
-    style->letterSpacing = laid_.style.letterSpacing;
-    if (!info_.lines.empty()) {
-        style->lineHeight = info_.lines[0].height;
-        style->baseline = info_.lines[0].baseline;
+    style->size = info.usedSize;
+    style->letterSpacing = group.computedLetterSpacing;
+    if (!info.lines.empty()) {
+        style->lineHeight = info.lines[0].height;
+        style->baseline = info.lines[0].baseline;
     }
     using layout::DOMTaskKind;
-    if (!publishedStyle_ || !publishedStyle_->Same(*style)) {
-        publishedStyle_ = style;
+    if (!lines_->publishedStyle || !lines_->publishedStyle->Same(*style)) {
+        lines_->publishedStyle = style;
         SendToDOM(*context.family, DOMTaskKind::UpdateFontStyleDataInDOM, link_, std::move(style),
                   layout::Delivery::ThroughChannel);
     }
     auto positions = MakeRef<layout::TextPositions>();
-    ComputeTextPositions(Shown(), text_.view(), laid_.style.whiteSpace, Placements(), *positions);
+    ComputeTextPositions(lines_->Shown(), text_.view(), group.whiteSpace, lines_->Placements(), *positions);
     SendToDOM(*context.family, DOMTaskKind::UpdateTextPositionsInDOM, link_, std::move(positions),
               layout::Delivery::ThroughChannel);
 }

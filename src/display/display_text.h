@@ -6,6 +6,7 @@
 #include <string_view>
 
 #include "core/memory/containers.h"
+#include "css/values/layout_style_refs.h"
 #include "display/display_element.h"
 #include "layout/node_link.h"
 #include "layout/text/text_info.h"
@@ -37,7 +38,8 @@ class DisplayText final : public IDisplayElement {
     // Already transformed (text-transform) UTF-8. On the layout thread, or at the commit.
     void SetText(std::string_view text);
     std::string_view Text() const { return text_.view(); }
-    const layout::TextInfo& Info() const { return info_; }
+    // Of the last layout; null before the first one.
+    const layout::TextInfo* Info() const { return lines_ ? &lines_->info : nullptr; }
 
     void Paint(PaintContext& context, bool dirty, const layout::LayoutNode& node,
                fresco::CommandBuffer& buffer) override;
@@ -54,12 +56,15 @@ class DisplayText final : public IDisplayElement {
     void PlaceLines(const layout::LinePlacement* lines, size_t count);
 
   private:
+    // What lines depend on besides the text. The group stands for all of its text values.
     struct Parameters {
-        layout::TextStyle style;
-        float width = 0;
+        css::StyleHandle<css::TextLayoutStyle> style;
+        float usedSize = 0;
+        float width = 0;  // NaN: not known
         float height = 0;
         float firstLineOffset = 0;
-        bool inFlow = false;
+        bool inFlow = false;  // what belongs to a paragraph is left to it
+        bool complexText = true;
     };
     // One question of the layout and its answer. The available size is NaN where it is not known.
     struct Answer {
@@ -67,10 +72,31 @@ class DisplayText final : public IDisplayElement {
         float height;
         layout::Size size;
     };
+    // Made by the first layout: a text that is not shown has none of it.
+    struct Lines {
+        layout::TextInfo info;
+        Parameters parameters;
+        bool valid = false;
+        bool unpublished = false;
+        // Of the layout's cached sizes; more of them than are kept here are too many to compare.
+        static constexpr size_t kMostAnswers = 4;
+        bool tooManyAnswers = false;
+        SmallVector<Answer, 2, MemoryTag::LayoutData> answers;
+        // In an inline flow; empty elsewhere.
+        Vector<layout::LinePlacement, MemoryTag::LayoutData> placed;
+        // info with wider gaps, where the flow justifies some of these lines.
+        UniquePtr<layout::TextInfo, MemoryTag::LayoutData> justified;
+        qsl::RefPtr<layout::TextFontStyle> publishedStyle;
+
+        // The lines as they are painted.
+        const layout::TextInfo& Shown() const { return justified ? *justified : info; }
+        const layout::LinePlacement* Placements() const { return placed.empty() ? nullptr : placed.data(); }
+    };
     struct DestroyIterator {
         void operator()(i18n::IBreakIterator* iterator) const;
     };
 
+    static layout::TextStyle MakeStyle(const Parameters& parameters);
     // Lays out when the style, the text or the available box differ from those of the stored lines. False
     // without a loaded typeface.
     bool EnsureLayout(const layout::LayoutNode& node, const layout::TextServices& services,
@@ -81,26 +107,11 @@ class DisplayText final : public IDisplayElement {
     void Publish(PaintContext& context);
     void PaintShadows(PaintContext& context, const layout::LayoutNode& node, layout::Point corner,
                       fresco::CommandBuffer& buffer) const;
-    // The lines as they are painted.
-    const layout::TextInfo& Shown() const { return justified_ ? *justified_ : info_; }
-    const layout::LinePlacement* Placements() const { return placed_.empty() ? nullptr : placed_.data(); }
 
     TaggedString<MemoryTag::Rendering> text_;
-    layout::TextInfo info_;
-    Parameters laid_;  // of info_
-    bool laidOut_ = false;
-    bool unpublished_ = false;
-    // Of the layout's cached sizes; more of them than are kept here are too many to compare.
-    static constexpr size_t kMostAnswers = 4;
-    SmallVector<Answer, 2, MemoryTag::LayoutData> answers_;
-    bool tooManyAnswers_ = false;
-    // Lines of an inline flow; empty elsewhere.
-    Vector<layout::LinePlacement, MemoryTag::LayoutData> placed_;
-    // info_ with wider gaps, where the flow justifies some of these lines.
-    UniquePtr<layout::TextInfo, MemoryTag::LayoutData> justified_;
+    UniquePtr<Lines, MemoryTag::LayoutData> lines_;
     layout::NodeLinkPtr link_;
     std::unique_ptr<i18n::IBreakIterator, DestroyIterator> iterator_;
-    qsl::RefPtr<layout::TextFontStyle> publishedStyle_;
 };
 
 }  // namespace qorvex::dsp

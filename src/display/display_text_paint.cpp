@@ -132,7 +132,7 @@ void DisplayText::PaintShadows(PaintContext& context, const layout::LayoutNode& 
             reported = true;
             continue;
         }
-        ForEachRun(Shown(), Placements(), {corner.x + shadow.x, corner.y + shadow.y}, params,
+        ForEachRun(lines_->Shown(), lines_->Placements(), {corner.x + shadow.x, corner.y + shadow.y}, params,
                    [&](const ShownRun& run) {
                        if (blurred)
                            DrawBlurredRun(context, run, shadow.blur, buffer);
@@ -151,15 +151,16 @@ void DisplayText::Paint(PaintContext& context, bool, const layout::LayoutNode& n
         return;
     }
     const css::TextLayoutStyle& style = *node.style.text;
-    if (placed_.empty()) {
+    if (lines_ && !lines_->placed.empty()) {
+        if (!lines_->valid) return;
+    } else {
         // The box may have become another one than the last measure was asked about.
         if (node.parent == nullptr) return;
         const layout::TextServices& services = node.parent->store().text;
-        Parameters wanted{layout::MakeTextStyle(style), node.box.width, node.box.height};
-        wanted.style.complexText = services.complexText;
-        if (!EnsureLayout(node, services, wanted)) return;
-    } else if (!laidOut_) {
-        return;
+        if (!EnsureLayout(node, services,
+                          {node.style.text, style.computedFontSize, node.box.width, node.box.height, 0, false,
+                           services.complexText}))
+            return;
     }
 
     PaintShadows(context, node, {box.x, box.y}, buffer);
@@ -167,13 +168,13 @@ void DisplayText::Paint(PaintContext& context, bool, const layout::LayoutNode& n
     params.flags = GlyphFlags(style.fontSdf);
     if (!style.color.IsTransparent()) {
         params.paint.color = ToFresco(style.color);
-        ForEachRun(Shown(), Placements(), {box.x, box.y}, params,
+        ForEachRun(lines_->Shown(), lines_->Placements(), {box.x, box.y}, params,
                    [&](const ShownRun& run) { buffer.DrawGlyphs(run.glyphs, run.count, run.params); });
     }
     if (style.computedStrokeWidth > 0 && !style.textStrokeColor.IsTransparent()) {
         params.paint.color = ToFresco(style.textStrokeColor);
         params.paint.strokeWidth = style.computedStrokeWidth;
-        ForEachRun(Shown(), Placements(), {box.x, box.y}, params,
+        ForEachRun(lines_->Shown(), lines_->Placements(), {box.x, box.y}, params,
                    [&](const ShownRun& run) { buffer.StrokeGlyphs(run.glyphs, run.count, run.params); });
     }
     if (node.style.visual->userSelect != css::UserSelect::None) Publish(context);

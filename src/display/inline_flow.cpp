@@ -253,7 +253,7 @@ void InlineFlow::PlaceText(LayoutPass& pass, const Item& item, Point origin) {
     auto& text = static_cast<DisplayText&>(*node.display);
     const TempMark mark;
     TempVector<layout::LinePlacement> places;
-    places.resize(text.Info().lines.size(), layout::LinePlacement{});
+    places.resize(text.Info() ? text.Info()->lines.size() : 0, layout::LinePlacement{});
     for (uint32_t i = item.firstPiece; i < item.endPiece; ++i) {
         const Piece& piece = pieces_[i];
         const Line& line = lines_[piece.line];

@@ -53,7 +53,10 @@ class Text final : public CharacterData {
     qsl::RefPtr<Text> SplitText(size_t offset);
 
     // The text as it is shown: after text-transform.
-    std::string_view GetDisplayedText() const { return transformed_ ? transformed_->view() : GetData(); }
+    std::string_view GetDisplayedText() const {
+        const NodeRareData* rare = GetRareData();
+        return rare && rare->transformed_text ? rare->transformed_text->view() : GetData();
+    }
     // Hands the shown text to the display element; at the commit, while the layout side is idle.
     void CommitDisplayedText();
 
@@ -70,8 +73,8 @@ class Text final : public CharacterData {
 
   private:
     void UpdateTransformedText();
+    void ForgetTransformedText();
 
-    UniquePtr<NodeText, MemoryTag::DOM> transformed_;
     qsl::RefPtr<layout::TextPositions> positions_;
     qsl::RefPtr<layout::TextFontStyle> font_style_;
 };

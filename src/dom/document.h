@@ -214,6 +214,11 @@ class Document : public Element {
 
     // --- Seats
     EventListenerTable& GetEventListenerTable() { return listeners_; }
+    // What walks along siblings have cost so far; tests count it.
+    struct TreeWork {
+        uint64_t dependentsVisited = 0;
+        uint64_t siblingsSearched = 0;
+    } work;
     uint8_t mutationObserverKinds = 0;
     IMutationRegistry* mutationRegistry = nullptr;
     IDomInspector* inspector = nullptr;

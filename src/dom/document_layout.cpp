@@ -58,7 +58,7 @@ void Document::RebuildLayoutTree() {
                                                  .display = root.display_element_,
                                                  .link = root.GetLayoutLink(),
                                                  .scroll = root.GetStoredScroll()});
-    root.style_.written = {};
+    root.style_.written.Clear();
     if (HasDisplay(root)) AppendLayoutSubtree(root, *root.layout_node_);
     layout_tree_built_ = true;
 }
@@ -80,7 +80,7 @@ void Document::AppendLayoutSubtree(Node& top, layout::LayoutHandle& handle) {
             layout::LayoutHandle* made = child.get() == html_
                                              ? child->layout_node_.get()
                                              : child->CreateLayoutNode(layout_tree_, *entry.parent).get();
-            if (made) child->style_.written = {};
+            if (made) child->style_.written.Clear();
             queue.push_back({child.get(), made ? made : entry.parent});
         }
     }
@@ -108,7 +108,7 @@ bool Document::AttachLayoutNode(Node& node) {
     } else if (!node.CreateLayoutNode(layout_tree_, parent_handle)) {
         return false;
     }
-    node.style_.written = {};
+    node.style_.written.Clear();
     QueueLayoutChange(node);
     return true;
 }
@@ -123,7 +123,7 @@ void Document::DetachLayoutNode(Node& node) {
 bool Document::TakeChange(Node& node) {
     if (!node.layout_node_ || !node.IsInDocument()) return false;
     layout_tree_.UpdateStyle(*node.layout_node_, node.style_);
-    node.style_.written = {};
+    node.style_.written.Clear();
     return true;
 }
 

@@ -105,7 +105,7 @@ RefPtr<HTMLCollection> Document::GetElementsByTagName(Node& root, std::string_vi
     }
     if (tag == css::TagId::Custom) {
         return Collect(root, [&](Element& element) {
-            return element.GetTag() == tag && EqualsIgnoringAsciiCase(element.GetNodeName().view(), name);
+            return element.GetTag() == tag && EqualsIgnoringAsciiCase(element.GetMarkupName().view(), name);
         });
     }
     const auto wanted = [&](Element& element) { return tag == css::TagId::Any || element.GetTag() == tag; };

@@ -77,9 +77,11 @@ void Element::MarkStyleDirty() {
 }
 
 // Whatever a rule with a combinator may reach from this element is queued: its subtree, and the siblings
-// behind it with theirs when a rule looks at siblings. A queued element is not walked again before it is
-// matched.
+// behind it with theirs when a rule looks at siblings. Who is queued was queued together with all that stood
+// below and behind it, and what came there since is matched anyway; so a walk ends where another one began,
+// and a script that dirties n siblings costs n steps.
 void Element::QueueDependents() {
+    if (pendingStyleBits & kQueuedForMatching) return;
     Document& document = *GetDocument();
     TempMark mark;
     TempVector<Node*> queue;
@@ -87,8 +89,10 @@ void Element::QueueDependents() {
     Node* parent = GetParent();
     if (parent && parent->GetChildCount() > 1 && document.GetStyleEngine().SiblingInvalidatingRules() > 0) {
         const auto siblings = parent->GetChildren();
-        for (size_t i = GetIndexInParent() + 1; i < siblings.size(); ++i)
+        for (size_t i = GetIndexInParent() + 1; i < siblings.size(); ++i) {
+            if (siblings[i]->pendingStyleBits & kQueuedForMatching) break;
             queue.push_back(siblings[i].get());
+        }
     }
     for (size_t i = 0; i < queue.size(); ++i) {
         Node& node = *queue[i];
@@ -100,6 +104,7 @@ void Element::QueueDependents() {
         for (const RefPtr<Node>& child : node.GetChildren())
             queue.push_back(child.get());
     }
+    document.work.dependentsVisited += queue.size();
 }
 
 void Element::MarkPseudoDependentChain(uint16_t bits) {

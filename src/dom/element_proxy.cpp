@@ -61,7 +61,7 @@ bool ElementProxy::HasAttribute(const char* name) const {
 }
 
 const char* ElementProxy::GetTag() const {
-    return element_.GetNodeName().c_str();
+    return element_.GetMarkupName().c_str();
 }
 
 bool ElementProxy::HasEventListeners() const {

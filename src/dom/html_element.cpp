@@ -37,7 +37,7 @@ dsp::DisplayElementPtr HTMLElement::CreateDisplayElement() {
 }
 
 RefPtr<Node> HTMLElement::CloneNode(bool deep) {
-    RefPtr<Element> clone = CreateElementByTag(GetTag(), GetNodeName().view(), *GetDocument());
+    RefPtr<Element> clone = CreateElementByTag(GetTag(), GetMarkupName().view(), *GetDocument());
     CopyElementTo(*clone);
     CopyStateTo(static_cast<HTMLElement&>(*clone));
     CopyCommon(*clone, deep);

@@ -108,12 +108,11 @@ class DOM_A final : public HTMLElement {
 class CustomElement final : public HTMLElement {
   public:
     CustomElement(Document& document, Atom name) : HTMLElement(document, css::TagId::Custom), name_(name) {}
-    // As selectors compare it, lower case; the tag's own entry in the table stands for all custom elements.
-    Atom GetNodeName() const override { return name_; }
+    Atom GetMarkupName() const override { return name_; }
     void ToDebugString(NodeText& out) const override;
 
   private:
-    Atom name_;
+    Atom name_;  // lower case
 };
 
 }  // namespace qorvex::dom

@@ -68,19 +68,30 @@ size_t Node::GetIndexInParent() const {
     if (!parent_) return kNoIndex;
     const NodeVector& siblings = parent_->children_;
     const size_t count = siblings.size();
-    // Removals before this node shift it down, insertions shift it up: look around the last known place.
+    if (index_hint_ < count && siblings[index_hint_] == this) return index_hint_;
+    if (count > 0 && siblings.front() == this) return index_hint_ = 0;
+    return FindIndexInParent();
+}
+
+// Removals before this node shift it down, insertions shift it up: it is looked for around the last known
+// place. Where many came or went it is far from there and so are its neighbours: then all are told their
+// places, so that asking each of n siblings costs n.
+size_t Node::FindIndexInParent() const {
+    constexpr size_t kNear = 64;
+    const NodeVector& siblings = parent_->children_;
+    const size_t count = siblings.size();
     const size_t guess = std::min<size_t>(index_hint_, count);
-    for (size_t distance = 0; distance <= std::max(guess, count - guess); ++distance) {
-        if (guess + distance < count && siblings[guess + distance] == this) {
-            index_hint_ = static_cast<uint32_t>(guess + distance);
-            return index_hint_;
-        }
-        if (distance <= guess && distance != 0 && siblings[guess - distance] == this) {
-            index_hint_ = static_cast<uint32_t>(guess - distance);
-            return index_hint_;
-        }
+    document_->work.siblingsSearched += kNear;
+    for (size_t distance = 1; distance <= kNear; ++distance) {
+        if (guess + distance < count && siblings[guess + distance] == this)
+            return index_hint_ = static_cast<uint32_t>(guess + distance);
+        if (distance <= guess && siblings[guess - distance] == this)
+            return index_hint_ = static_cast<uint32_t>(guess - distance);
     }
-    return kNoIndex;
+    document_->work.siblingsSearched += count;
+    for (size_t i = 0; i < count; ++i)
+        siblings[i]->index_hint_ = static_cast<uint32_t>(i);
+    return index_hint_ < count && siblings[index_hint_] == this ? index_hint_ : kNoIndex;
 }
 
 Node* Node::GetPreviousSibling() const {

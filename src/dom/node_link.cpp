@@ -15,7 +15,7 @@ void NodeLink::SetInLayoutTree(bool in_tree) {
 }
 
 std::string_view NodeLink::DebugName() const {
-    return node_ ? node_->GetNodeName().view() : std::string_view();
+    return node_ ? node_->GetMarkupName().view() : std::string_view();
 }
 
 void NodeLink::Receive(layout::DOMTaskKind kind, const layout::DOMTaskData& data) {

@@ -24,6 +24,8 @@ struct NodeRareData {
     ~NodeRareData();
 
     layout::ScrollPosition scroll;
+    // Of a text: what text-transform makes of it.
+    UniquePtr<TaggedString<MemoryTag::DOM>, MemoryTag::DOM> transformed_text;
     // Declarations of an element that come between the default sheet and the author's.
     UniquePtr<css::StyleDeclarationSet, MemoryTag::DOM> extra_style;
     // Null while the style names no images.

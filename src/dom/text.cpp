@@ -34,7 +34,7 @@ RefPtr<Text> Text::SplitText(size_t offset) {
 }
 
 void Text::OnInsertedIntoDocument() {
-    transformed_.reset();
+    ForgetTransformedText();
     CharacterData::OnInsertedIntoDocument();
     if (!display_element_) {
         display_element_ = MakeRef<dsp::DisplayText>(
@@ -55,17 +55,21 @@ void Text::OnTextChanged() {
     MarkLayoutDirty();
 }
 
+void Text::ForgetTransformedText() {
+    if (NodeRareData* rare = GetRareData()) rare->transformed_text.reset();
+}
+
 void Text::UpdateTransformedText() {
     if (!IsInDocument()) return;
     NodeText transformed;
     switch (TransformText(GetStyle(), *GetDocument(), GetData(), transformed)) {
         case TextTransformResult::NotWanted:
-            transformed_.reset();
+            ForgetTransformedText();
             break;
         case TextTransformResult::Failed:
             break;  // what was shown stays
         case TextTransformResult::Done:
-            transformed_ = MakeUnique<NodeText, MemoryTag::DOM>(std::move(transformed));
+            EnsureRareData().transformed_text = MakeUnique<NodeText, MemoryTag::DOM>(std::move(transformed));
             break;
     }
 }

@@ -16,10 +16,6 @@ namespace qorvex::layout {
 
 namespace {
 
-bool Written(const css::LaidOutStyle& style, css::StyleGroup group) {
-    return style.written[static_cast<size_t>(group)] != 0;
-}
-
 bool SameChildren(const HandleVector& a, const HandleVector& b) {
     return a.size() == b.size() && std::equal(a.begin(), a.end(), b.begin());
 }
@@ -39,8 +35,8 @@ void Sever(LayoutHandle& handle) {
 void CopyToLayoutSide(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
     LayoutData& data = handle.data();
     LayoutNode& node = handle.node();
-    data.changed = data.changed || Written(data.style, css::StyleGroup::Visual) ||
-                   Written(data.style, css::StyleGroup::TextLayout);
+    data.changed = data.changed || data.style.written.Has(css::StyleGroup::Visual) ||
+                   data.style.written.Has(css::StyleGroup::TextLayout);
     if (data.changed && data.inTree && dirty != nullptr) {
         dirty->Add(dsp::ClipToAncestors(node));
     }
@@ -51,8 +47,9 @@ void CopyToLayoutSide(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
     node.zIndex = data.zIndex;
     node.parent = data.parent;
     // A layout or transform value may change paint order and stacking although every box stays.
-    node.visualChanged = node.visualChanged || data.changed || Written(data.style, css::StyleGroup::Layout) ||
-                         Written(data.style, css::StyleGroup::Transform);
+    node.visualChanged = node.visualChanged || data.changed ||
+                         data.style.written.Has(css::StyleGroup::Layout) ||
+                         data.style.written.Has(css::StyleGroup::Transform);
     // Text, its font or its element changed: the cached size may be wrong.
     if (data.changed && node.flex && YGNodeHasMeasureFunc(node.flex)) {
         if (dirty == nullptr)
@@ -61,7 +58,7 @@ void CopyToLayoutSide(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
             YGNodeMarkDirty(node.flex);
     }
     data.changed = false;
-    data.style.written.fill(0);
+    data.style.written.Clear();
     if (!SameChildren(node.children, data.children)) {
         node.children = data.children;
         // The bounds by groups are made anew: any child may have moved to another one.

@@ -40,14 +40,14 @@ using HandleVector = Vector<HandlePtr, MemoryTag::LayoutNodes>;
 
 // Facts that follow from a node's style alone. Computed on the layout side, mirrored to the DOM side.
 struct NodeFlags {
-    bool isPositioned = false;  // position is not static
-    bool isFixed = false;
-    bool isAbsolute = false;
-    bool shouldOverflowClip = false;        // either overflow axis is not visible
-    bool containsFixedDescendants = false;  // has a transform, a perspective or a filter
-    bool preserves3d = false;
-    bool measuredByDisplayElement = false;
-    bool isReplaced = false;  // sides that its style leaves open come from its display element
+    bool isPositioned : 1 = false;  // position is not static
+    bool isFixed : 1 = false;
+    bool isAbsolute : 1 = false;
+    bool shouldOverflowClip : 1 = false;        // either overflow axis is not visible
+    bool containsFixedDescendants : 1 = false;  // has a transform, a perspective or a filter
+    bool preserves3d : 1 = false;
+    bool measuredByDisplayElement : 1 = false;
+    bool isReplaced : 1 = false;  // sides that its style leaves open come from its display element
 };
 
 // An immutable record of the layout side that several nodes and both halves hold.
@@ -106,18 +106,20 @@ struct LayoutResult {
 struct LayoutData {
     LayoutHandle* parent = nullptr;
     HandleVector children;  // DOM order among the siblings that have handles
-    css::LaidOutStyle style;
     dsp::DisplayElementPtr display;
-    ScrollPosition scroll;
     NodeLinkPtr node;
-    LayoutResult result;
-    int32_t zIndex = 0;
+    // The small fields stand in the room that a style leaves at its end.
+    [[no_unique_address]] css::LaidOutStyle style;
     NodeFlags flags;
-    bool establishesStackingContext = false;
-    bool isImage = false;
-    bool changed = false;  // an edit that the next commit must carry over
-    bool inTree = false;
+    bool establishesStackingContext : 1 = false;
+    bool isImage : 1 = false;
+    bool changed : 1 = false;  // an edit that the next commit must carry over
+    bool inTree : 1 = false;
+    int32_t zIndex = 0;
+    ScrollPosition scroll;
+    LayoutResult result;
 };
+static_assert(sizeof(LayoutData) == 160);
 
 // What a node paints by itself; found when its style, its display element or its borders change, so that the
 // recording asks for nothing that is not there.

@@ -20,7 +20,7 @@ HandlePtr LayoutTree::Create(NewNode&& node) {
     LayoutData& data = handle->data();
     data.style = node.style;
     // The first commit carries everything.
-    data.style.written.fill(1);
+    data.style.written.AddAll();
     data.display = std::move(node.display);
     data.node = std::move(node.link);
     data.scroll = node.scroll;
@@ -105,10 +105,9 @@ void LayoutTree::MarkChanged(LayoutHandle& handle) {
 
 void LayoutTree::UpdateStyle(LayoutHandle& handle, const css::LaidOutStyle& style) {
     LayoutData& data = handle.data();
-    const auto pending = data.style.written;
+    const css::WrittenGroups pending = data.style.written;
     data.style = style;
-    for (size_t i = 0; i < pending.size(); ++i)
-        data.style.written[i] |= pending[i] | style.written[i];
+    data.style.written |= pending;
     changed_.Insert(&handle);
 }
 

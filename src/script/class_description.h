@@ -38,6 +38,8 @@ struct PropertyAccessDescription {
     JSObjectSetPropertyCallback set = nullptr;
     JSObjectDeletePropertyCallback remove = nullptr;
     JSObjectGetPropertyNamesCallback names = nullptr;
+    // A list with a length: script walks it as it walks an array.
+    bool indexed = false;
 };
 
 struct ClassDescription {

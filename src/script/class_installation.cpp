@@ -114,6 +114,7 @@ class Installer {
         DefineAccessor(prototype, "constructor", Tool(ClassTool::HiddenAccessor),
                        Tool(ClassTool::ConstructorGetter), Tool(ClassTool::ConstructorSetter));
         const ClassDescription* description = GetClassDescription(script_class);
+        if (description && description->properties.indexed) DefineIterator(prototype);
         // The window's own stand on the global object.
         const bool has_members = description && script_class != ScriptClass::Window;
         if (has_members) DefineMembers(prototype, *description);
@@ -234,6 +235,8 @@ class Installer {
                  JSObjectGetPropertyForKey(context_, AsObject(context_, function_prototype), has_instance,
                                            &exception_));
         KeepTool(ClassTool::ToStringTag, Get(symbol, "toStringTag"));
+        KeepTool(ClassTool::Iterator, Get(symbol, "iterator"));
+        KeepTool(ClassTool::WalkArray, Get(Get(Get(page_.global_object, "Array"), "prototype"), "values"));
         KeepTool(ClassTool::Accessor, MakeDescriptor(true, true));
         KeepTool(ClassTool::HiddenAccessor, MakeDescriptor(true, false));
         KeepTool(ClassTool::HiddenValue, MakeDescriptor(false, false));
@@ -329,6 +332,12 @@ class Installer {
         const ScriptName name(GetScriptClassRow(script_class).name);
         JSObjectSetPropertyForKey(context_, target, Tool(ClassTool::ToStringTag),
                                   JSValueMakeString(context_, name), kLabel, &exception_);
+    }
+
+    // Lists are walked as arrays are.
+    void DefineIterator(JSObjectRef target) {
+        JSObjectSetPropertyForKey(context_, target, Tool(ClassTool::Iterator), Tool(ClassTool::WalkArray),
+                                  kJSPropertyAttributeDontEnum, &exception_);
     }
 
     JSObjectRef MakeFunction(JSStringRef name, JSObjectCallAsFunctionCallback callback) {

@@ -32,6 +32,8 @@ enum class ClassTool : uint8_t {
     InstanceOf,
     HasInstance,
     ToStringTag,
+    Iterator,
+    WalkArray,
     Accessor,
     HiddenAccessor,
     HiddenValue,
@@ -41,7 +43,7 @@ enum class ClassTool : uint8_t {
     ConstructorOf,
     BlanksOf,
 };
-inline constexpr size_t kClassToolCount = 14;
+inline constexpr size_t kClassToolCount = static_cast<size_t>(ClassTool::BlanksOf) + 1;
 
 // A global name whose class is made when script reads it, and the function that does that: to be compared
 // only, since a page may drop the name.

@@ -136,7 +136,7 @@ void DomTest::Listen(EventTarget& target, std::string_view type, std::function<v
 
 std::string DomTest::Shape(const Node& node) {
     if (node.IsText()) return "'" + std::string(static_cast<const Text&>(node).GetData()) + "'";
-    std::string shape(node.GetNodeName().view());
+    std::string shape(node.GetMarkupName().view());
     std::transform(shape.begin(), shape.end(), shape.begin(),
                    [](unsigned char c) { return std::tolower(c); });
     if (node.Is(kHasId)) shape += "#" + std::string(static_cast<const Element&>(node).GetId().view());

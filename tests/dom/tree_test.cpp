@@ -243,6 +243,24 @@ TEST_F(TreeTest, AScriptThatTakesItsSiblingsAwayLeavesNobodyOut) {
     }
 }
 
+// Insertions at the front and removals there move everybody away from where they were last seen.
+TEST_F(TreeTest, LookingForEachOfManySiblingsSearchesEachOnce) {
+    LoadEmpty();
+    constexpr size_t kCount = 3000;
+    RefPtr<Element> box = Make("div");
+    for (size_t i = 0; i < kCount; ++i)
+        box->InsertBefore(Make("p"), box->GetFirstChild());
+    std::vector<RefPtr<Node>> children(box->GetChildren().begin(), box->GetChildren().end());
+    document_->work = {};
+    for (size_t i = kCount; i-- > 0;)
+        ASSERT_EQ(children[i]->GetIndexInParent(), i);
+    EXPECT_LE(document_->work.siblingsSearched, 3 * kCount);
+    while (box->GetChildCount() > 1)
+        box->RemoveChild(box->GetFirstChild());
+    EXPECT_EQ(box->GetFirstChild(), children.back().get());
+    EXPECT_LE(document_->work.siblingsSearched, 3 * kCount);
+}
+
 TEST_F(TreeTest, DeepTreesAreMadeWalkedAndTakenApart) {
     LoadEmpty();
     constexpr int kDepth = 100000;

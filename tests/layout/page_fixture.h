@@ -83,7 +83,7 @@ class Page {
     void Change(layout::LayoutHandle* handle, std::string_view style) {
         css::LayoutStyleRefs changed = css::DefaultStyles();
         static_cast<css::LaidOutStyle&>(changed) = handle->data().style;
-        changed.written.fill(0);
+        changed.written.Clear();
         EXPECT_TRUE(ApplyDeclarations(changed, style)) << style;
         tree.UpdateStyle(*handle, changed);
     }

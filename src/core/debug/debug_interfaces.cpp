@@ -17,7 +17,7 @@ ViewImpl& Impl(View* view) {
 }
 
 void ReportBox(dom::Element& element, ElementBoxCallback callback, void* user_data) {
-    String tag(element.GetNodeName().view());
+    String tag(element.GetMarkupName().view());
     for (char& c : tag)
         c = ToLowerASCII(c);
     ElementBox box;

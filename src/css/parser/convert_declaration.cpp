@@ -97,7 +97,8 @@ uint8_t FindExpressionFlags(std::string_view valueText) {
     uint8_t flags = 0;
     for (scanner.Next(token); token.kind != TokenKind::End; scanner.Next(token)) {
         if (token.kind != TokenKind::Function && !token.Is('(')) continue;
-        // Written as text, "10px - var(--x)" is a dimension and a parenthesis: the bytes decide, not the token.
+        // Written as text, "10px - var(--x)" is a dimension and a parenthesis: the bytes decide, not the
+        // token.
         const std::string_view before(text.data(), token.begin + token.size - text.data());
         if (before.ends_with("var(")) flags |= kHasVar;
         if (before.ends_with("calc(")) flags |= kHasCalc;

@@ -40,7 +40,7 @@ bool UpdateCustomProperties(LayoutStyleRefs& style, const LayoutStyleRefs& paren
             map->map.insert_or_assign(entry.first, entry.second);
         style.customProperties = std::move(map);
     }
-    style.written[kCustomPropertiesFlag] = 1;
+    style.written.AddCustomProperties();
     return true;
 }
 

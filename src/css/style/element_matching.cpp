@@ -40,7 +40,7 @@ void ElementMatcher::Collect(RuleIndex& index, Element& element, MatchContext& c
     CollectBucket(index, index.FindByTag(tag), element, context, record);
     if (tag == TagId::Custom) {
         // One bucket serves all custom tags; the quick rules in it were taken without a look at the name.
-        const Atom name = element.GetNodeName();
+        const Atom name = element.GetMarkupName();
         candidates_.erase_if([&](const Candidate& candidate) {
             const SimpleSelector& key = candidate.rule->selector.key.simple[0];
             return candidate.rule->selector.IsQuick() && key.type == SelectorType::Tag && key.name != name;

@@ -148,7 +148,7 @@ class ElementSolver {
     void Take(const StyleHandle<Group>& group) {
         if (style_.Handle<Group>() == group) return;
         style_.Handle<Group>() = group;
-        style_.written[static_cast<size_t>(kGroupOf<Group>)] = 1;
+        style_.written.Add(kGroupOf<Group>);
     }
 
     bool IsLandmark(const dom::Node& node) const {

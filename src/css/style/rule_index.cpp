@@ -230,6 +230,24 @@ CssVector<uint64_t> RuleIndex::GetAllRuleIds() const {
     return ids;
 }
 
+// One pass over the index, however many groups there are.
+void RuleIndex::PutToSleep(CssVector<ActiveMediaGroup>& groups) {
+    CssVector<uint64_t> ids;
+    for (const ActiveMediaGroup& group : groups)
+        ids.append(group.ruleIds.begin(), group.ruleIds.end());
+    CssVector<IndexedRule> taken = TakeRules({ids.data(), ids.size()});
+    for (ActiveMediaGroup& group : groups) {
+        MediaGroup& sleeping = inactiveMediaGroups_.emplace_back();
+        sleeping.features = std::move(group.features);
+        for (const uint64_t id : group.ruleIds) {
+            IndexedRule* rule =
+                std::lower_bound(taken.begin(), taken.end(), id,
+                                 [](const auto& rule, uint64_t id) { return rule.ruleId < id; });
+            if (rule != taken.end() && rule->ruleId == id) sleeping.rules.push_back(std::move(*rule));
+        }
+    }
+}
+
 bool RuleIndex::UpdateMedia(const LengthContext& metrics) {
     bool moved = false;
     CssVector<ActiveMediaGroup> activated;
@@ -243,12 +261,13 @@ bool RuleIndex::UpdateMedia(const LengthContext& metrics) {
         }
         return moved = true;
     });
+    CssVector<ActiveMediaGroup> ended;
     activeMediaGroups_.erase_if([&](ActiveMediaGroup& group) {
         if (EvaluateMedia(group.features, metrics)) return false;
-        CssVector<IndexedRule> rules = TakeRules({group.ruleIds.data(), group.ruleIds.size()});
-        inactiveMediaGroups_.push_back({std::move(group.features), std::move(rules)});
+        ended.push_back(std::move(group));
         return moved = true;
     });
+    PutToSleep(ended);
     for (ActiveMediaGroup& group : activated)
         activeMediaGroups_.push_back(std::move(group));
     return moved;

@@ -109,6 +109,7 @@ class RuleIndex {
     void CountCombinators(const ComplexSelector& selector, int32_t change);
     void AddMediaGroup(const MediaFeatureList& features, const CssVector<Ruleset>& rules, RuleIdList& ids);
     CssVector<IndexedRule> TakeRules(std::span<const uint64_t> ruleIds);
+    void PutToSleep(CssVector<ActiveMediaGroup>& groups);
     void Rebuild();
     template <class Visitor>
     void ForEachRule(Visitor&& visit);

@@ -13,7 +13,7 @@ enum class CompoundResult : uint8_t { NoMatch, Match, MatchApartFromPseudoState 
 
 bool MatchesTag(const SimpleSelector& simple, const Element& element) {
     if (element.GetTag() != simple.tag) return false;
-    return simple.tag != TagId::Custom || element.GetNodeName() == simple.name;
+    return simple.tag != TagId::Custom || element.GetMarkupName() == simple.name;
 }
 
 void RecordDependencies(Element& element, uint8_t usedPseudoBits) {

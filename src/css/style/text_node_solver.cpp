@@ -33,7 +33,7 @@ template <class Group>
 bool Take(LayoutStyleRefs& style, const StyleHandle<Group>& group) {
     if (style.Handle<Group>() == group) return false;
     style.Handle<Group>() = group;
-    style.written[static_cast<size_t>(kGroupOf<Group>)] = 1;
+    style.written.Add(kGroupOf<Group>);
     return true;
 }
 
@@ -60,7 +60,7 @@ uint32_t SolveTextNode(dom::Node& text, StyleRun& run) {
     if (Take(style, run.textStyles.LayoutFor(display, kind))) mask |= dom::kChangeLayout;
     mask |= TakeParentText(style, parent);
     if (Take(style, run.textStyles.VisualFor(*parent.visual))) mask |= dom::kChangeVisual;
-    if (style.written[static_cast<size_t>(StyleGroup::Transform)]) mask |= dom::kChangeTransform;
+    if (style.written.Has(StyleGroup::Transform)) mask |= dom::kChangeTransform;
 
     const bool inLayout = text.Is(dom::kInLayoutTree);
     if (display != CSSDisplay::None && !inLayout) mask |= dom::kChangeEnteredLayout | dom::kChangeLayout;

@@ -28,8 +28,7 @@ const StyleHandle<LayoutStyle>& TextStyleCache::LayoutFor(CSSDisplay display, ui
         layouts_[static_cast<size_t>(display) % kDisplays][textKind % kTextKinds];
     if (!handle) {
         handle = DefaultStyles().layout;
-        uint8_t written = 0;
-        LayoutStyle& layout = handle.MakeMutable(written);
+        LayoutStyle& layout = handle.MakeMutable();
         layout.display = display;
         layout.textKind = textKind;
     }
@@ -43,8 +42,7 @@ const StyleHandle<VisualStyle>& TextStyleCache::VisualFor(const VisualStyle& par
     }
     StyleHandle<VisualStyle>& made = visuals_[nextVisual_++ % kVisuals];
     made = DefaultStyles().visual;
-    uint8_t written = 0;
-    VisualStyle& visual = made.MakeMutable(written);
+    VisualStyle& visual = made.MakeMutable();
     ForEachTextVisual([&](auto field) { visual.*field = parent.*field; });
     return made;
 }

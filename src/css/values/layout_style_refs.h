@@ -2,7 +2,6 @@
 // halves of a layout handle; a copy copies references, never style data.
 #pragma once
 
-#include <array>
 #include <cstdint>
 #include <utility>
 
@@ -29,10 +28,8 @@ class StyleHandle {
     friend bool operator==(const StyleHandle& a, const StyleHandle& b) { return a.group_ == b.group_; }
 
     // The group for writing: itself while nobody else holds it, else a copy that this handle moves to.
-    // `written` is set when a copy was made, and by the caller's store through it.
-    Group& MakeMutable(uint8_t& written) {
+    Group& MakeMutable() {
         if (!group_->HasOneRef()) group_ = MakeRef<Group>(*group_);
-        written = 1;
         return *group_;
     }
 
@@ -49,8 +46,22 @@ struct RareStyle {
     Declaration& StoreEvaluated(Declaration declaration);
 };
 
-// Index of the flag in `written`: the style groups in order, then the custom properties.
-inline constexpr size_t kCustomPropertiesFlag = kStyleGroupCount;
+// A flag for each counted handle of a style.
+class WrittenGroups {
+  public:
+    bool Has(StyleGroup group) const { return (bits_ >> static_cast<unsigned>(group)) & 1; }
+    void Add(StyleGroup group) { bits_ |= static_cast<uint8_t>(1u << static_cast<unsigned>(group)); }
+    void AddCustomProperties() { bits_ |= 1u << kStyleGroupCount; }
+    void AddAll() { bits_ = (1u << (kStyleGroupCount + 1)) - 1; }
+    void Clear() { bits_ = 0; }
+    WrittenGroups& operator|=(WrittenGroups other) {
+        bits_ |= other.bits_;
+        return *this;
+    }
+
+  private:
+    uint8_t bits_ = 0;
+};
 
 // What boxes and paint depend on, and all that the layout side keeps of a style.
 struct LaidOutStyle {
@@ -59,7 +70,7 @@ struct LaidOutStyle {
     StyleHandle<TextLayoutStyle> text;
     StyleHandle<TransformStyle> transform;
     // Set when a group is made private, cleared when layout has taken it over.
-    std::array<uint8_t, 7> written = {};
+    WrittenGroups written;
 };
 
 struct LayoutStyleRefs : LaidOutStyle {
@@ -134,7 +145,8 @@ inline constexpr StyleGroup kGroupOf<TransitionStyle> = StyleGroup::Transition;
 
 template <class Group>
 Group& LayoutStyleRefs::Mutable() {
-    return Handle<Group>().MakeMutable(written[static_cast<size_t>(kGroupOf<Group>)]);
+    written.Add(kGroupOf<Group>);
+    return Handle<Group>().MakeMutable();
 }
 
 // The groups with all initial values. Made by the library at start and freed at its end; nothing else creates

@@ -22,8 +22,12 @@ void ComputeTextPositions(const TextInfo& info, std::string_view text, css::Whit
     Characters characters;
     DecodeCharacters(text, whiteSpace, characters);
     const size_t count = characters.codes.size();
-    out.offsets.assign(characters.offsets.begin(), characters.offsets.end());
-    out.offsets.push_back(static_cast<uint32_t>(text.size()));
+    out.offsets.clear();
+    if (count != text.size()) {
+        out.offsets.reserve(count + 1);
+        out.offsets.append(characters.offsets.begin(), characters.offsets.end());
+        out.offsets.push_back(static_cast<uint32_t>(text.size()));
+    }
     out.x.resize(count + 1, 0.0f);
     out.lines.reserve(info.lines.size());
     float top = 0;

@@ -18,8 +18,13 @@ struct TextLinePosition {
 // Of UpdateTextPositionsInDOM. Pixels from the corner of the text's box.
 struct TextPositions final : DOMTaskData {
     TextArray<float> x;  // the edge of each character at which reading it begins, and one for the end
-    TextArray<uint32_t> offsets;  // of each character in the shown UTF-8 text, and its length
     TextArray<TextLinePosition> lines;
+
+    // Where a character stands in the shown UTF-8 text; behind the last one the text's length.
+    uint32_t OffsetOf(size_t character) const {
+        return offsets.empty() ? static_cast<uint32_t>(character) : offsets[character];
+    }
+    TextArray<uint32_t> offsets;  // empty where all characters are single bytes
 };
 
 // Of UpdateFontStyleDataInDOM.

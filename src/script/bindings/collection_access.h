@@ -24,7 +24,7 @@ JSValueRef GetIndexed(JSContextRef context, JSObjectRef object, JSStringRef name
 
 template <class T, auto kGetItem>
 constexpr PropertyAccessDescription IndexedAccess() {
-    return {.has = HasIndexName, .get = GetIndexed<T, kGetItem>};
+    return {.has = HasIndexName, .get = GetIndexed<T, kGetItem>, .indexed = true};
 }
 
 }  // namespace qorvex::script

@@ -28,7 +28,7 @@ std::optional<std::string_view> GetNothing(Element&) {
 }
 
 dom::NodeText GetLocalName(Element& element) {
-    dom::NodeText name(element.GetNodeName().view());
+    dom::NodeText name(element.GetMarkupName().view());
     for (size_t i = 0; i < name.size(); ++i) {
         char& c = name.data()[i];
         if (c >= 'A' && c <= 'Z') c = static_cast<char>(c + ('a' - 'A'));

@@ -83,5 +83,25 @@ TEST_F(RuleIndexTest, FindsWhatAWalkOverAllRulesFinds) {
     EXPECT_GT(matches, 1000u);
 }
 
+// A turned screen: however many groups end at once, the index is gone through once.
+TEST_F(RuleIndexTest, MediaGroupsThatEndTogetherTakeOnePass) {
+    std::string sheet = ".a { height: 1px }";
+    for (int i = 0; i < 100; ++i)
+        sheet += "@media (orientation: landscape) { .a { left: " + std::to_string(i) +
+                 "px } p > .a { top: 2px } }";
+    Load("<p><i id='x' class='a'></i></p>", sheet);
+    RuleIndex& index = engine_->GetAuthorRules();
+    EXPECT_EQ(Computed("x", "left"), "99px");
+    const uint64_t generation = index.GetGeneration();
+    document_->SetViewSize(600, 800);
+    EXPECT_EQ(Computed("x", "left"), "auto");
+    EXPECT_EQ(Computed("x", "top"), "auto");
+    EXPECT_EQ(index.GetGeneration(), generation + 1);
+    EXPECT_EQ(index.GetSearchableRuleCount(), 1u);
+    document_->SetViewSize(800, 600);
+    EXPECT_EQ(Computed("x", "left"), "99px");
+    EXPECT_EQ(index.GetSearchableRuleCount(), 201u);
+}
+
 }  // namespace
 }  // namespace qorvex::css::test

@@ -18,10 +18,12 @@ class StyleHost final : public qorvex::test::IdleHost {
     dom::Node* GetHoveredNode() const override { return hovered; }
     dom::Node* GetActiveNode() const override { return active; }
     layout::IFontResolver* GetFontResolver() override { return fonts; }
+    layout::FontManager* GetFontManager() override { return fontManager; }
 
     dom::Node* hovered = nullptr;
     dom::Node* active = nullptr;
     layout::IFontResolver* fonts = nullptr;
+    layout::FontManager* fontManager = nullptr;
 };
 
 using qorvex::test::IdleLoader;  // tests hand their sheets to the engine themselves

@@ -129,6 +129,29 @@ TEST_F(WorkCount, HoverDeepInAPageAllocatesNothing) {
     EXPECT_EQ(allocator_.Allocations(), before);
 }
 
+// In whatever order a script comes to them.
+TEST_F(WorkCount, DirtyingManySiblingsVisitsEachOnce) {
+    constexpr int kRows = 1000;
+    for (const int step : {1, -1, 7}) {
+        Load(Rows(kRows), ".row + .row { height: 1px } .on ~ .row .cell { width: 3px }");
+        Solve();
+        const std::string before = DumpAll();
+        const auto rows = Body().GetChildren();
+        document_->work = {};
+        for (int i = 0; i < kRows; ++i) {
+            const int at = step > 0 ? i * step % kRows : kRows - 1 - i;
+            static_cast<dom::Element&>(*rows[at]).SetAttribute("class", i % 3 ? "row" : "row on");
+        }
+        EXPECT_LE(document_->work.dependentsVisited, 4u * kRows) << step;
+        Solve();
+        const std::string after = DumpAll();
+        EXPECT_FALSE(before == after);
+        document_->RequestFullStyleSolve();
+        Solve();
+        EXPECT_TRUE(DumpAll() == after) << step;
+    }
+}
+
 TEST_F(WorkCount, AColourChangeDoesNotLayOutText) {
     Load("<div id='top'>text</div>", kSheet);
     Solve();

@@ -171,8 +171,8 @@ TEST_F(ComplexTextTest, PositionsOfCharacters) {
     TextPositions positions;
     ComputeTextPositions(info, text, style_.whiteSpace, nullptr, positions);
     ASSERT_EQ(positions.x.size(), 6u);
-    EXPECT_EQ(positions.offsets[3], 3u);
-    EXPECT_EQ(positions.offsets[4], 5u);
+    EXPECT_EQ(positions.OffsetOf(3), 3u);
+    EXPECT_EQ(positions.OffsetOf(4), 5u);
     EXPECT_FLOAT_EQ(positions.x[0], 0);
     EXPECT_GT(positions.x[1], 0);
     // Reading the first Hebrew letter begins at the right end of the line.
