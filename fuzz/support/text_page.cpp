@@ -28,7 +28,8 @@ host::IcuInternationalization& TextServices() {
 }
 
 void CheckText(const dsp::DisplayText& text, css::WhiteSpaceMode white_space) {
-    const layout::TextInfo& info = text.Info();
+    if (text.Info() == nullptr) return;
+    const layout::TextInfo& info = *text.Info();
     Require(std::isfinite(info.width) && std::isfinite(info.height), "a text whose size is no number");
     for (const fresco::Glyph& glyph : info.glyphs)
         Require(std::isfinite(glyph.x) && std::isfinite(glyph.y), "a glyph whose place is no number");

@@ -179,8 +179,8 @@ void InlineFlow::AlignLines(css::TextAlignType align, float width) {
 const layout::TextInfo* InlineFlow::TextOf(const Piece& piece) const {
     const Item& item = items_[piece.item];
     if (item.kind != Kind::Text) return nullptr;
-    const layout::TextInfo& info = static_cast<DisplayText&>(*item.handle->node().display).Info();
-    return piece.textLine < info.lines.size() ? &info : nullptr;
+    const layout::TextInfo* info = static_cast<DisplayText&>(*item.handle->node().display).Info();
+    return info != nullptr && piece.textLine < info->lines.size() ? info : nullptr;
 }
 
 // A space at the end of a text is width behind its last character.

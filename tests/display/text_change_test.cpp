@@ -68,7 +68,7 @@ TEST_F(TextChangeTest, OtherDigitsOfTheSameWidthMoveNothing) {
     EXPECT_EQ(labels.page.Counters().laidOut, 0u);
     EXPECT_EQ(labels.page.Counters().measured, 0u);
     EXPECT_TRUE(labels.page.dirty.HasArea());
-    EXPECT_EQ(labels.displays[1]->Info().lines.size(), 1u);
+    EXPECT_EQ(labels.displays[1]->Info()->lines.size(), 1u);
     labels.page.dirty.Clear();
     labels.Change(1, "999");
     labels.page.Frame();

@@ -5,6 +5,7 @@
 #include <fresco/scene.h>
 #include <qorvex/qorvex.h>
 
+#include <algorithm>
 #include <atomic>
 #include <cstdlib>
 #include <cstring>
@@ -167,7 +168,8 @@ class Files final : public qorvex::IAsyncResourceHandler {
             response->Finish(Status::Failure);
             return;
         }
-        std::memcpy(response->GetSpace(found->second.size()), found->second.data(), found->second.size());
+        std::copy(found->second.begin(), found->second.end(),
+                  static_cast<char*>(response->GetSpace(found->second.size())));
         response->SetStatus(200);
         response->Finish(Status::Success);
     }
