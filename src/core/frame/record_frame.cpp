@@ -92,10 +92,9 @@ void RecordFrame(FrameData& frame) {
     if (record.Empty()) return target.PushClose();
     SharedRecord held = MakeRef<HeldRecord>(std::move(record));
     if (frame.capture_callback) target.Push(MakeCaptureTask(frame, held));
-    target.PushClose(MakeTask("Paint", [held, images = frame.images, scene = frame.scene, stats = frame.stats,
-                                        id = frame.frame_id](TaskFamilyHandle) {
-        ExecutePaint(*held, *images, *scene, *stats, id);
-    }));
+    target.PushClose(MakeTask(
+        "Paint", [held, images = frame.images, scene = frame.scene, stats = frame.stats, id = frame.frame_id](
+                     TaskFamilyHandle) { ExecutePaint(*held, *images, *scene, *stats, id); }));
 }
 
 }  // namespace qorvex
