@@ -68,8 +68,8 @@ class RecordPage {
         layout::LayoutHandle& box = *boxes_[boxes_.size() / 2];
         on_ = !on_;
         css::LaidOutStyle style = colors_[on_];
-        style.written.fill(0);
-        style.written[static_cast<size_t>(css::StyleGroup::Visual)] = 1;
+        style.written = {};
+        style.written.Add(css::StyleGroup::Visual);
         tree_.UpdateStyle(box, style);
         Commit();
         layout::LayoutPass pass = MakePass();
