@@ -72,7 +72,7 @@ TEST_F(ParagraphTest, TextAndInlineBoxesShareALine) {
 }
 
 TEST_F(ParagraphTest, LinesBreakAcrossElementsAndStandOnOneBaseline) {
-    LayoutHandle* p = Paragraph("width:120px");
+    LayoutHandle* p = Paragraph("width:200px");
     LayoutHandle* small = Text(p, "aaa bbb ");
     LayoutHandle* span = Inline(p);
     LayoutHandle* large = Text(span, "cccccccc ddd", "font-size:40px");
@@ -87,6 +87,34 @@ TEST_F(ParagraphTest, LinesBreakAcrossElementsAndStandOnOneBaseline) {
     EXPECT_NEAR(Box(large).left, Right(small), 0.01f);
     // One baseline: the small text hangs lower than the top of the line.
     EXPECT_GT(Box(small).top, Box(large).top);
+}
+
+// Three texts share lines: the gaps of every full line take up its free width, the last line stays.
+TEST_F(ParagraphTest, JustifyWidensGapsAcrossElements) {
+    LayoutHandle* p = Paragraph("width:200px");
+    LayoutHandle* first = Text(p, "aa ");
+    LayoutHandle* span = Inline(p, "padding-left:3px");
+    Text(span, "bb");
+    LayoutHandle* second = Text(p, " cccc dd eeeee ffff ggg hhhhhh jjjj kkkkk lll mmmmmm nn ooooo");
+    LayoutHandle* last = Text(p, " iii");
+    page.Settle();
+    const float left = Box(span).left;
+    const layout::TextInfo plain = static_cast<DisplayText&>(*second->node().display).Info();
+    ASSERT_GT(plain.lines.size(), 2u);
+    const float end = Right(last);
+
+    for (const char* align : {"text-align:justify", "text-align:left", "text-align:justify"}) {
+        page.Change(p, align);
+        page.Settle();
+        const bool justified = std::string_view(align) == "text-align:justify";
+        SCOPED_TRACE(align);
+        // The space that ends the first text is a gap too.
+        EXPECT_EQ(Box(span).left > left + 0.01f, justified);
+        EXPECT_EQ(Right(first) < Box(span).left - 0.01f, justified);
+        EXPECT_EQ(std::fabs(Right(second) - 200) < 0.01f, justified);
+        EXPECT_LE(Right(second), 200.01f);
+        EXPECT_FLOAT_EQ(Right(last), end);
+    }
 }
 
 TEST_F(ParagraphTest, BlocksStandAsPiecesAndAlignmentMovesLines) {
