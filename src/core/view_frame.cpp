@@ -89,7 +89,9 @@ void ViewImpl::OpenFrameId() {
     if (frame_open_) return;
     open_frame_id_ = frame_id_++;
     frame_open_ = true;
-    frame_queue_.RegisterFrame(open_frame_id_);
+    const bool full = frame_queue_.RegisterFrame(open_frame_id_);
+    // The client paints again after a pause, and what it never painted shows nowhere.
+    if (std::exchange(frames_dropped_, full) && !full) picture_lost_ = true;
     stats_.Begin(open_frame_id_);
 }
 
@@ -181,6 +183,12 @@ void ViewImpl::DropFrameOnLayoutSide() {
 void ViewImpl::CommitFrame(layout::LayoutWork work) {
     StageTimer timer(stats_, open_frame_id_, &FrameStats::Commit);
     if (continuous_repaint_) MarkWholeViewDirty();
+    if (picture_lost_ && ShouldRecord()) {
+        picture_lost_ = false;
+        MarkWholeViewDirty();
+        // Some of them may never have been drawn.
+        render_caches_.shadows.Clear();
+    }
     update_.reset();
     const layout::LayoutTree& tree = document_->GetLayoutTree();
     if (work == layout::LayoutWork::None && tree.Changed().Empty() && tree.Removed().Empty()) return;
@@ -226,6 +234,7 @@ FrameDataPtr ViewImpl::MakeFrameData() {
     frame->height = height_;
     frame->dirty = std::exchange(dirty_region_, dsp::DirtyRegion());
     frame->should_record = ShouldRecord();
+    if (!frame->should_record) picture_lost_ = true;
     frame->show_paint_rectangles = show_paint_rectangles_;
     frame->paint_option = paint_option_;
     frame->disable_flex_basis_units = disable_flex_basis_units_;

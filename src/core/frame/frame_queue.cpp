@@ -4,17 +4,19 @@
 
 namespace qorvex {
 
-void FrameQueue::RegisterFrame(uint32_t id) {
+bool FrameQueue::RegisterFrame(uint32_t id) {
     LogTrace("Registering frame for painting ", id);
     RenderFramePtr dropped;  // dies after the lock
     qsl::MutexLock lock(mutex_);
     // A client that never paints (a server, a minimised window) must not grow the queue for ever: the oldest
     // frame goes, and a later Paint of it finds it missing.
-    if (entries_.size() >= limits::kMaxWaitingFrames) {
+    const bool full = entries_.size() >= limits::kMaxWaitingFrames;
+    if (full) {
         dropped = std::move(entries_[0].frame);
         entries_.erase(entries_.begin());
     }
     entries_.push_back(Entry{id, nullptr});
+    return full;
 }
 
 void FrameQueue::SetFrame(uint32_t id, const RenderFramePtr& frame) {

@@ -24,8 +24,8 @@ class FrameQueue {
     // All the room it will ever need, so that a frame without work allocates nothing.
     FrameQueue() { entries_.reserve(limits::kMaxWaitingFrames); }
 
-    // Main thread.
-    void RegisterFrame(uint32_t id);
+    // Main thread. True when the queue was full, and the oldest frame has gone unpainted.
+    bool RegisterFrame(uint32_t id);
     // Main or layout thread. An id that is not there is ignored.
     void SetFrame(uint32_t id, const RenderFramePtr& frame);
     void ClearFrames();
