@@ -76,7 +76,8 @@ void ViewImpl::AdvanceDocument() {
     }
     CommitFrame(work);
     QueueCacheOperations();
-    const bool nothing_to_do = work == layout::LayoutWork::None && !dirty_region_.HasArea();
+    const bool fading = ShouldRecord() && !render_caches_.highlighted.Empty();
+    const bool nothing_to_do = work == layout::LayoutWork::None && !dirty_region_.HasArea() && !fading;
     if (nothing_to_do && requested_frames_ == 0) {
         CompleteIdleFrame();
         return;
@@ -89,9 +90,7 @@ void ViewImpl::OpenFrameId() {
     if (frame_open_) return;
     open_frame_id_ = frame_id_++;
     frame_open_ = true;
-    const bool full = frame_queue_.RegisterFrame(open_frame_id_);
-    // The client paints again after a pause, and what it never painted shows nowhere.
-    if (std::exchange(frames_dropped_, full) && !full) picture_lost_ = true;
+    frame_queue_.RegisterFrame(open_frame_id_);
     stats_.Begin(open_frame_id_);
 }
 
@@ -183,6 +182,7 @@ void ViewImpl::DropFrameOnLayoutSide() {
 void ViewImpl::CommitFrame(layout::LayoutWork work) {
     StageTimer timer(stats_, open_frame_id_, &FrameStats::Commit);
     if (continuous_repaint_) MarkWholeViewDirty();
+    if (link_->TakeRedraw()) picture_lost_ = true;
     if (picture_lost_ && ShouldRecord()) {
         picture_lost_ = false;
         MarkWholeViewDirty();
@@ -245,6 +245,7 @@ FrameDataPtr ViewImpl::MakeFrameData() {
     frame->render_frame = std::move(open_frame_);
     if (scene_) frame->scene_frame = scene_->NewFrame();
     frame->scene = scene_;
+    frame->link = link_.get();
     frame->caches = &render_caches_;
     frame->images = RefPtr<CachedImagesManager>(services_.images);
     frame->stats = &stats_;

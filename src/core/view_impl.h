@@ -273,7 +273,6 @@ class ViewImpl final : public View,
     bool rendering_enabled_ = true;
     // Changes went unrecorded or unpainted: the next frame that is recorded shows everything.
     bool picture_lost_ = false;
-    bool frames_dropped_ = false;
     bool continuous_repaint_ = false;
     bool show_paint_rectangles_ = false;
     bool paint_option_ = false;

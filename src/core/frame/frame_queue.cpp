@@ -4,19 +4,18 @@
 
 namespace qorvex {
 
-bool FrameQueue::RegisterFrame(uint32_t id) {
+void FrameQueue::RegisterFrame(uint32_t id) {
     LogTrace("Registering frame for painting ", id);
     RenderFramePtr dropped;  // dies after the lock
     qsl::MutexLock lock(mutex_);
     // A client that never paints (a server, a minimised window) must not grow the queue for ever: the oldest
     // frame goes, and a later Paint of it finds it missing.
-    const bool full = entries_.size() >= limits::kMaxWaitingFrames;
-    if (full) {
+    if (entries_.size() >= limits::kMaxWaitingFrames) {
         dropped = std::move(entries_[0].frame);
         entries_.erase(entries_.begin());
+        if (dropped && dropped->GetState() != RenderFrame::State::Discarded) lost_.store(true);
     }
     entries_.push_back(Entry{id, nullptr});
-    return full;
 }
 
 void FrameQueue::SetFrame(uint32_t id, const RenderFramePtr& frame) {
