@@ -69,6 +69,7 @@ class View {
     virtual void ContinuousRepaint(bool enabled) = 0;
     // Outlines what each frame redraws.
     virtual void ShowPaintRectangles(bool enabled) = 0;
+    // True: a frame that has anything to draw draws the whole view, not only what changed.
     virtual void SetPaintOption(bool enabled) = 0;
     virtual void EnableGPUMetadataEmission(bool enabled) = 0;
 

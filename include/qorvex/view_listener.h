@@ -36,7 +36,8 @@ class IViewListener {
         (void)url;
         return true;
     }
-    // With ViewSettings::InterceptAllRequests, before the page itself and before each of its resources.
+    // With ViewSettings::InterceptAllRequests, before the page itself and before each of its scripts and
+    // stylesheets. Images, fonts and what script requests reach the resource handler alone.
     virtual InterceptRequestStatus OnResourceRequestIntercepted(const char* url) {
         (void)url;
         return InterceptRequestStatus::Allow;

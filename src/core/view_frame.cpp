@@ -76,7 +76,8 @@ void ViewImpl::AdvanceDocument() {
     }
     CommitFrame(work);
     QueueCacheOperations();
-    const bool nothing_to_do = work == layout::LayoutWork::None && !dirty_region_.HasArea();
+    const bool fading = ShouldRecord() && !render_caches_.highlighted.Empty();
+    const bool nothing_to_do = work == layout::LayoutWork::None && !dirty_region_.HasArea() && !fading;
     if (nothing_to_do && requested_frames_ == 0) {
         CompleteIdleFrame();
         return;
@@ -181,6 +182,13 @@ void ViewImpl::DropFrameOnLayoutSide() {
 void ViewImpl::CommitFrame(layout::LayoutWork work) {
     StageTimer timer(stats_, open_frame_id_, &FrameStats::Commit);
     if (continuous_repaint_) MarkWholeViewDirty();
+    if (link_->TakeRedraw()) picture_lost_ = true;
+    if (picture_lost_ && ShouldRecord()) {
+        picture_lost_ = false;
+        MarkWholeViewDirty();
+        // Some of them may never have been drawn.
+        render_caches_.shadows.Clear();
+    }
     update_.reset();
     const layout::LayoutTree& tree = document_->GetLayoutTree();
     if (work == layout::LayoutWork::None && tree.Changed().Empty() && tree.Removed().Empty()) return;
@@ -226,6 +234,7 @@ FrameDataPtr ViewImpl::MakeFrameData() {
     frame->height = height_;
     frame->dirty = std::exchange(dirty_region_, dsp::DirtyRegion());
     frame->should_record = ShouldRecord();
+    if (!frame->should_record) picture_lost_ = true;
     frame->show_paint_rectangles = show_paint_rectangles_;
     frame->paint_option = paint_option_;
     frame->disable_flex_basis_units = disable_flex_basis_units_;
@@ -236,6 +245,7 @@ FrameDataPtr ViewImpl::MakeFrameData() {
     frame->render_frame = std::move(open_frame_);
     if (scene_) frame->scene_frame = scene_->NewFrame();
     frame->scene = scene_;
+    frame->link = link_.get();
     frame->caches = &render_caches_;
     frame->images = RefPtr<CachedImagesManager>(services_.images);
     frame->stats = &stats_;

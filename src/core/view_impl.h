@@ -271,6 +271,8 @@ class ViewImpl final : public View,
     float scale_x_ = 1;
     float scale_y_ = 1;
     bool rendering_enabled_ = true;
+    // Changes went unrecorded or unpainted: the next frame that is recorded shows everything.
+    bool picture_lost_ = false;
     bool continuous_repaint_ = false;
     bool show_paint_rectangles_ = false;
     bool paint_option_ = false;

@@ -96,6 +96,7 @@ uint32_t DocumentLoader::LoadResource(const URL& url, dom::Element& element, boo
         Prefetch prefetch = std::move(*found);
         prefetched_.erase(key);
         id = prefetch.id;
+        prefetch_keys_.erase(id);
         active_loads_.insert_or_assign(id, std::move(waiter));
         if (prefetch.job) AdoptPrefetch(id, std::move(prefetch.job));
     } else {
@@ -131,11 +132,11 @@ void DocumentLoader::ResolveJob(uint32_t id, ResourceJobPtr job) {
         ParseStylesheetJob(prefetched_stylesheets_.take(id), std::move(job));
         return;
     }
-    for (auto& [url, prefetch] : prefetched_) {
-        if (prefetch.id != id) continue;
+    if (prefetch_keys_.contains(id)) {
         LogDebug("DocumentLoader | Got resource pre-fetch result for: ", job->GetAbsoluteURL(),
                  " with status: ", outcome);
-        prefetch.job = std::move(job);
+        Prefetch* prefetch = prefetched_.get(prefetch_keys_.take(id));
+        if (prefetch && prefetch->id == id) prefetch->job = std::move(job);
         return;
     }
     // An answer to a request that StopLoading has given up is no mistake.
@@ -151,6 +152,7 @@ void DocumentLoader::RequestPrefetch(const URL& url) {
     // on the channel either way.
     Prefetch prefetch;
     prefetch.id = MakeTrackedRequest(absolute);
+    prefetch_keys_.insert_or_assign(prefetch.id, UrlKey(key));
     prefetched_.insert_or_assign(std::move(key), std::move(prefetch));
 }
 
@@ -192,10 +194,7 @@ void DocumentLoader::Abort(uint32_t id) {
 }
 
 bool DocumentLoader::HasPendingWork() const {
-    if (!active_loads_.empty() || !active_stylesheets_.empty() || !request_ids_.empty()) return true;
-    for (const auto& [url, prefetch] : prefetched_)
-        if (!prefetch.job) return true;
-    return false;
+    return !active_loads_.empty() || !active_stylesheets_.empty() || !request_ids_.empty();
 }
 
 void DocumentLoader::StopLoading() {
@@ -210,6 +209,7 @@ void DocumentLoader::StopLoading() {
     for (uint32_t id : ids)
         if (host_.GiveUpRequest(id, *document_)) context_.Abort(id);
     prefetched_.clear();
+    prefetch_keys_.clear();
     prefetched_stylesheets_.clear();
     // The page goes for good: elements that the building waited for must not hold it. Else the page may stay,
     // if nothing comes of the next one, and late answers still find their elements.

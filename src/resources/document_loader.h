@@ -96,6 +96,8 @@ class DocumentLoader final : public dom::IDocumentLoader {
     // The client was told to give up, and may still answer.
     HashSet<uint32_t, MemoryTag::Resources> aborted_ids_;
     HashMap<UrlKey, Prefetch, MemoryTag::Resources> prefetched_;
+    // Of those that are still on their way.
+    HashMap<uint32_t, UrlKey, MemoryTag::Resources> prefetch_keys_;
     // Prefetches that turned out to be sheets while their bytes were still on the way.
     HashMap<uint32_t, UrlKey, MemoryTag::Resources> prefetched_stylesheets_;
     uint32_t next_stylesheet_id_ = 0;

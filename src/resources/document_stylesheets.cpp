@@ -44,6 +44,7 @@ uint32_t DocumentLoader::LoadAndParseStylesheet(const URL& url, dom::Element& el
     if (Prefetch* found = prefetched_.get(key)) {
         Prefetch prefetch = std::move(*found);
         prefetched_.erase(key);
+        prefetch_keys_.erase(prefetch.id);
         if (prefetch.job)
             ParseStylesheetJob(key, std::move(prefetch.job));
         else

@@ -25,7 +25,7 @@ class ResourceContext : public AtomicRefCounted<ResourceContext, MemoryTag::Reso
     ClientResponsePool& GetResponses() const { return responses_; }
     bool AreRequestsOnWorkers() const { return requests_on_workers_; }
     ResourceMappingTable& GetMappings() { return mappings_; }
-    const URL& GetBaseURL() const { return base_url_; }
+    // Main thread: requests are made absolute before they go to a resource thread.
     void SetBaseURL(URL url) { base_url_ = std::move(url); }
 
     // Makes the request and, with in-place handler calls, hands it to the handler at once. The task is for

@@ -9,7 +9,8 @@ void ResourceMappingTable::Add(const ResourceMapping& mapping) {
     Entry entry;
     entry.extension = std::string_view(mapping.Name);
     for (uint32_t i = 0; i < mapping.TargetCount; ++i)
-        entry.substitutes.emplace_back(mapping.Targets[i]);
+        if (mapping.Targets[i]) entry.substitutes.emplace_back(mapping.Targets[i]);
+    if (entry.substitutes.empty()) return;
     entries_.push_back(std::move(entry));
 }
 

@@ -13,6 +13,12 @@ std::string_view UpToDot(std::string_view url) {
     return dot == std::string_view::npos ? std::string_view() : url.substr(0, dot + 1);
 }
 
+URL WithExtension(std::string_view stem, std::string_view extension) {
+    ResourceRequestDescription::Text text(stem);
+    text.append(extension);
+    return URL(text.view());
+}
+
 }  // namespace
 
 const char* AsyncResourceRequest::GetURL() const {
@@ -70,7 +76,7 @@ IAsyncResourceRequest::AlternativeURLs AsyncResourceRequest::GetAlternativeURLs(
             static_cast<unsigned>(alternative_pointers_.size())};
 }
 
-void AsyncResourceRequest::ApplyMapping(const ResourceMappingTable& table, const URL& base) {
+void AsyncResourceRequest::ApplyMapping(const ResourceMappingTable& table) {
     const std::string_view absolute = description_.absolute_url.GetText();
     mapping_ = table.Find(absolute);
     if (!mapping_) return;
@@ -82,11 +88,10 @@ void AsyncResourceRequest::ApplyMapping(const ResourceMappingTable& table, const
     for (const auto& alternative : alternatives_)
         alternative_pointers_.push_back(alternative.c_str());
 
-    ResourceRequestDescription::Text replaced(UpToDot(description_.url.GetText()));
-    replaced.append(mapping_->substitutes[0]);
-    description_.url.Parse(replaced, 0);
-    description_.absolute_url =
-        description_.url.IsRelative() ? description_.url.Merge(base) : description_.url;
+    description_.absolute_url = WithExtension(stem, mapping_->substitutes[0]);
+    // A relative URL without a dot of its own names nothing that could be replaced.
+    if (const std::string_view own = UpToDot(description_.url.GetText()); !own.empty())
+        description_.url = WithExtension(own, mapping_->substitutes[0]);
 }
 
 }  // namespace qorvex

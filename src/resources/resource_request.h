@@ -53,9 +53,9 @@ class AsyncResourceRequest : public IAsyncResourceRequest {
     AlternativeURLs GetAlternativeURLs() const override;
 
     const ResourceRequestDescription& GetDescription() const { return description_; }
-    // Replaces the extension by the first substitute of the entry that fits, and lists the others. `base`
-    // makes a relative URL absolute again.
-    void ApplyMapping(const ResourceMappingTable& table, const URL& base);
+    // Replaces the extension by the first substitute of the entry that fits, and lists the others. It needs
+    // nothing but the table, since it may run on a resource thread.
+    void ApplyMapping(const ResourceMappingTable& table);
 
   private:
     ResourceRequestDescription description_;

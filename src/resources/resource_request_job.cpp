@@ -31,7 +31,7 @@ void ResourceRequestJob::SetCallbacks(ResourceJobCallback on_finished, ResourceJ
 
 void ResourceRequestJob::Dispatch() {
     LogDebug("Trying to load resource ", GetAbsoluteURL());
-    ApplyMapping(context_->GetMappings(), context_->GetBaseURL());
+    ApplyMapping(context_->GetMappings());
     if (IAsyncResourceHandler* handler = context_->GetHandler())
         handler->OnResourceRequest(this, &context_->GetResponses().Open(*this));
     else

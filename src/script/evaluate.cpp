@@ -3,6 +3,7 @@
 #include <JavaScriptCore/JavaScript.h>
 
 #include "core/logging/log.h"
+#include "qsl/utf8.h"
 #include "script/native_private.h"
 #include "script/script_text.h"
 #include "script/scripting_context.h"
@@ -11,8 +12,19 @@ namespace qorvex::script {
 
 namespace {
 
+// The text with U+FFFD in the place of what is no UTF-8.
+String Repaired(std::string_view text) {
+    String repaired;
+    for (size_t at = 0; at < text.size();) {
+        const size_t start = at;
+        const bool bad = qsl::NextCodePoint(text, at) == qsl::kReplacementCharacter;
+        repaired.append(bad ? qsl::kReplacementText : text.substr(start, at - start));
+    }
+    return repaired;
+}
+
 // The C API takes zero-terminated text, which a view need not be.
-JSStringRef MakeString(std::string_view text) {
+JSStringRef MakeStringOfUTF8(std::string_view text) {
     constexpr size_t kStackBytes = 512;
     if (text.size() < kStackBytes) {
         char copy[kStackBytes];
@@ -21,6 +33,14 @@ JSStringRef MakeString(std::string_view text) {
         return JSStringCreateWithUTF8CString(copy);
     }
     return JSStringCreateWithUTF8CString(String(text).c_str());
+}
+
+JSStringRef MakeString(std::string_view text) {
+    const JSStringRef string = MakeStringOfUTF8(text);
+    if (text.empty() || text[0] == '\0' || JSStringGetLength(string) != 0) return string;
+    // One bad byte, and the engine takes nothing: a script saved in another encoding would vanish unheard.
+    JSStringRelease(string);
+    return MakeStringOfUTF8(Repaired(text));
 }
 
 // A property as text; a missing one is empty, and so is everything of a value that is no object.

@@ -30,15 +30,16 @@ class ResourceRequestTest : public ResourceTest {
 };
 
 TEST_F(ResourceRequestTest, MappingChangesTheURLAndOffersAlternatives) {
-    const char* targets[] = {"dds", "ktx", "png"};
+    const char* targets[] = {"dds", nullptr, "ktx", "png"};
     ResourceMapping mapping;
     mapping.Name = "PNG";
     mapping.Targets = targets;
-    mapping.TargetCount = 3;
+    mapping.TargetCount = 4;
     context->GetMappings().Add(mapping);
     context->SetBaseURL(MakeURL("coui://ui/index.html"));
     auto entry = Request("images/hero.png");
     EXPECT_EQ(entry.url, "coui://ui/images/hero.dds");
+    EXPECT_STREQ(entry.request->GetURL(), "images/hero.dds");
     const auto alternatives = entry.request->GetAlternativeURLs();
     ASSERT_EQ(alternatives.Count, 2u);
     EXPECT_STREQ(alternatives.URLs[0], "coui://ui/images/hero.ktx");

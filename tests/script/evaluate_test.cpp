@@ -23,6 +23,17 @@ TEST_F(Evaluate, LogsAnErrorOnceAndKeepsWhatTheScriptDid) {
     EXPECT_EQ(log_.Count("Scripting error: SyntaxError"), 1u);
 }
 
+TEST_F(Evaluate, TextThatIsNoUnicodeLosesNothingElse) {
+    EvaluateScript(page_, "// caf\xE9\nglobalThis.x = 'a\xE9\xF0\x9F\x98\x80'", "latin.js");
+    EXPECT_EQ(Run("x"), "a\uFFFD\U0001F600");
+    EXPECT_EQ(Run("x.length"), "4");
+    // Halves of pairs on their way out.
+    EXPECT_EQ(Run("'ab\\ud83dcd\\udc00e'"), "ab\uFFFDcd\uFFFDe");
+    EXPECT_EQ(Run("'\u00E9\\ud83d'"), "\u00E9\uFFFD");
+    EXPECT_EQ(Run("'\\ud83d\\ude00'"), "\U0001F600");
+    EXPECT_EQ(Run("'\\ud83d'.repeat(300)").size(), 900u);
+}
+
 TEST_F(Evaluate, ReportsExceptionsWithPlaceAndStack) {
     ReportException(page_.context, nullptr);
     EXPECT_EQ(log_.Count("Unable to report an exception where there is no such."), 1u);

@@ -9,6 +9,7 @@
 
 #include "core/debug/frame_stats_recorder.h"
 #include "core/frame/render_frame.h"
+#include "core/frame/render_link.h"
 #include "core/tasks/task_system.h"
 #include "display/dirty_region.h"
 #include "display/record_rendering.h"
@@ -31,7 +32,7 @@ class FrameData : public AtomicRefCounted<FrameData, MemoryTag::LayoutData> {
     dsp::DirtyRegion dirty;  // swapped out of the view
     bool should_record = true;
     bool show_paint_rectangles = false;
-    bool paint_option = false;
+    bool paint_option = false;  // no partial redraw
     bool disable_flex_basis_units = false;
     bool snap_to_pixels = true;
     layout::FlexAlgorithm flex_algorithm = layout::FlexAlgorithm::Yoga;
@@ -44,6 +45,7 @@ class FrameData : public AtomicRefCounted<FrameData, MemoryTag::LayoutData> {
 
     // Borrowed from the view, which waits for its frame before it goes.
     fresco::IScene* scene = nullptr;
+    RenderLink* link = nullptr;
     dsp::RenderCaches* caches = nullptr;
     RefPtr<CachedImagesManager> images;
     FrameStatsRecorder* stats = nullptr;

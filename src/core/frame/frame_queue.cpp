@@ -13,6 +13,7 @@ void FrameQueue::RegisterFrame(uint32_t id) {
     if (entries_.size() >= limits::kMaxWaitingFrames) {
         dropped = std::move(entries_[0].frame);
         entries_.erase(entries_.begin());
+        if (dropped && dropped->GetState() != RenderFrame::State::Discarded) lost_.store(true);
     }
     entries_.push_back(Entry{id, nullptr});
 }

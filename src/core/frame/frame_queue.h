@@ -24,7 +24,7 @@ class FrameQueue {
     // All the room it will ever need, so that a frame without work allocates nothing.
     FrameQueue() { entries_.reserve(limits::kMaxWaitingFrames); }
 
-    // Main thread.
+    // Main thread. When the queue is full, the oldest frame goes unpainted.
     void RegisterFrame(uint32_t id);
     // Main or layout thread. An id that is not there is ignored.
     void SetFrame(uint32_t id, const RenderFramePtr& frame);
@@ -34,6 +34,8 @@ class FrameQueue {
     bool Find(uint32_t id, RenderFramePtr* frame) const;
     void Remove(uint32_t id);
     void DiscardAll();
+    // Whether frames that had something to draw were lost because nobody painted; true once.
+    bool TakeLoss() { return lost_.load(std::memory_order_relaxed) && lost_.exchange(false); }
 
     // How often the rendering resources were freed: grows on the render thread, read anywhere. It stands here
     // and not in the renderer because a renderer may go while the view looks.
@@ -45,6 +47,7 @@ class FrameQueue {
     size_t IndexOf(uint32_t id) const QSL_REQUIRES(mutex_);
 
     std::atomic<uint32_t> resets_{0};
+    std::atomic<bool> lost_{false};
     mutable qsl::Mutex mutex_;
     Vector<Entry, MemoryTag::Rendering> entries_ QSL_GUARDED_BY(mutex_);
 };

@@ -11,8 +11,17 @@ namespace {
 // buffers go back to the rendering library with it.
 using SharedRecord = RefPtr<struct HeldRecord>;
 struct HeldRecord : AtomicRefCounted<HeldRecord, MemoryTag::Rendering> {
-    explicit HeldRecord(dsp::FrameRecord&& taken) : record(std::move(taken)) {}
+    HeldRecord(dsp::FrameRecord&& taken, RenderLink& owner) : record(std::move(taken)), link(owner) {}
+    ~HeldRecord() {
+        if (!record.surfacesToFree.empty()) link.LeaveSurfaces(record.surfacesToFree);
+    }
+    void FreeSurfaces(fresco::IScene& scene) {
+        for (const auto& list : {std::exchange(record.surfacesToFree, {}), link.TakeLeftSurfaces()})
+            scene.FreeSurfaces(list.data(), static_cast<uint32_t>(list.size()));
+    }
+
     dsp::FrameRecord record;
+    RenderLink& link;  // what runs or drops a frame holds it
 };
 
 double PaintedArea(const dsp::FrameRecord& record) {
@@ -38,7 +47,7 @@ void ExecutePaint(HeldRecord& held, CachedImagesManager& images, fresco::IScene&
     LogTrace("Execute Paint");
     if (!record.buffers.empty())
         scene.ExecuteBackEnd(record.buffers.data(), static_cast<uint32_t>(record.buffers.size()));
-    scene.FreeSurfaces(record.surfacesToFree.data(), static_cast<uint32_t>(record.surfacesToFree.size()));
+    held.FreeSurfaces(scene);
     scene.FreeImages(record.imagesToFree.data(), static_cast<uint32_t>(record.imagesToFree.size()));
     const auto pixels = static_cast<uint64_t>(PaintedArea(record));
     stats.Update(frame_id, [&](FrameStats& frame) { frame.PaintedPixels += pixels; });
@@ -82,6 +91,7 @@ void RecordFrame(FrameData& frame) {
     dsp::RecordRequest request{.caches = *frame.caches,
                                .scaleX = frame.scale_x,
                                .scaleY = frame.scale_y,
+                               .partialRedraw = !frame.paint_option,
                                .showPaintRectangles = frame.show_paint_rectangles,
                                .record = frame.should_record,
                                .frameNumber = frame.frame_id,
@@ -90,7 +100,7 @@ void RecordFrame(FrameData& frame) {
     dsp::FrameRecord record = dsp::RecordRendering(pass, std::move(request));
     RenderFrame& target = *frame.render_frame;
     if (record.Empty()) return target.PushClose();
-    SharedRecord held = MakeRef<HeldRecord>(std::move(record));
+    SharedRecord held = MakeRef<HeldRecord>(std::move(record), *frame.link);
     if (frame.capture_callback) target.Push(MakeCaptureTask(frame, held));
     target.PushClose(MakeTask(
         "Paint", [held, images = frame.images, scene = frame.scene, stats = frame.stats, id = frame.frame_id](

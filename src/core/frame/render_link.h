@@ -32,11 +32,33 @@ class RenderLink : public AtomicRefCounted<RenderLink, MemoryTag::Rendering> {
     }
     bool HasRenderer() const { return renderers_.load(std::memory_order_acquire) != 0; }
 
+    // The target lacks what frames that never ran would have drawn on it: the view is to draw all of itself.
+    // Asked on the render thread, taken on the main thread.
+    void AskForRedraw() { redraw_.store(true, std::memory_order_release); }
+    bool TakeRedraw() {
+        return redraw_.load(std::memory_order_relaxed) && redraw_.exchange(false, std::memory_order_acquire);
+    }
+
+    using SurfaceList = Vector<fresco::SurfaceId, MemoryTag::Rendering>;
+    // Surfaces that a frame which never ran was to free; the next one that runs does. Any thread.
+    void LeaveSurfaces(const SurfaceList& surfaces) QSL_EXCLUDES(mutex_) {
+        qsl::MutexLock lock(mutex_);
+        for (fresco::SurfaceId surface : surfaces)
+            left_surfaces_.push_back(surface);
+    }
+    SurfaceList TakeLeftSurfaces() QSL_EXCLUDES(mutex_) {
+        qsl::MutexLock lock(mutex_);
+        return std::exchange(left_surfaces_, {});
+    }
+
   private:
     fresco::IScene* scene_;
     FrameStatsRecorder stats_;
-    FrameQueue frames_;
     std::atomic<uint32_t> renderers_{0};
+    std::atomic<bool> redraw_{false};
+    qsl::Mutex mutex_;
+    SurfaceList left_surfaces_ QSL_GUARDED_BY(mutex_);
+    FrameQueue frames_;  // goes first: frames that never ran leave their surfaces above
 };
 
 }  // namespace qorvex

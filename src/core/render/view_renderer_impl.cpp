@@ -34,6 +34,7 @@ ViewRendererImpl::ViewRendererImpl(ViewImpl& view, RendererRegistry& registry)
       scene_(*link_->GetScene()),
       family_(view.GetTaskFamily()) {
     link_->CountRenderer(+1);
+    link_->AskForRedraw();  // its target shows nothing yet
     registry_.Add(this);
 }
 
@@ -42,6 +43,7 @@ ViewRendererImpl::~ViewRendererImpl() = default;
 PaintStatus ViewRendererImpl::Paint(unsigned frame_id, bool wait_for_completion) {
     ThreadScope scope;
     LogTrace("Paint frame");
+    if (frame_queue_.TakeLoss()) link_->AskForRedraw();
     RenderFramePtr frame;
     PaintStatus status = PaintStatus::NothingExecuted;
     if (!frame_queue_.Find(frame_id, &frame)) {

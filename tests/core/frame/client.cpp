@@ -27,15 +27,13 @@ Client::Client(Options given) : options(given) {
     view_settings.Height = options.height;
     view_settings.OnFrameComplete = &OnFrameComplete;
     view_settings.CallbackUserData = this;
+    view_settings.WaitForViewRendererToRecord = options.wait_for_renderer;
     view_settings.EnableComplexCSSSelectorsStyling = options.complex_selectors;
     view = system->CreateView(view_settings);
 
     system_renderer = system->CreateSystemRenderer({});
     system_renderer->RegisterRenderThread(nullptr, nullptr, 0);
-    renderer = system_renderer->CreateViewRenderer(view);
-    pixels.assign(static_cast<size_t>(options.width) * options.height, 0);
-    target_ = {pixels.data(), options.width, options.height, options.width * 4};
-    renderer->SetRenderTargetSimple(&target_, nullptr, options.width, options.height, 1);
+    MakeRenderer();
 
     const unsigned family = view->GetTaskFamilyId();
     for (int i = 0; i < options.layout_threads; ++i)
@@ -47,6 +45,14 @@ Client::Client(Options given) : options(given) {
         workers_.emplace_back([this] {
             library->ExecuteWork(qorvex::WorkType::Resources, qorvex::WorkExecutionMode::RunUntilStopped, 0);
         });
+}
+
+void Client::MakeRenderer() {
+    if (renderer) renderer->Destroy();
+    renderer = system_renderer->CreateViewRenderer(view);
+    pixels.assign(static_cast<size_t>(options.width) * options.height, 0);
+    target_ = {pixels.data(), options.width, options.height, options.width * 4};
+    renderer->SetRenderTargetSimple(&target_, nullptr, options.width, options.height, 1);
 }
 
 void Client::DestroyView() {
@@ -90,7 +96,7 @@ void Client::Frame(double dt) {
 }
 
 void Client::Paint() {
-    renderer->Paint(last_frame - 1, options.layout_threads > 0 || !options.dedicated_layout);
+    if (renderer) renderer->Paint(last_frame - 1, options.layout_threads > 0 || !options.dedicated_layout);
 }
 
 void Client::Load(const std::string& html, const std::string& url) {

@@ -226,6 +226,7 @@ struct Options {
     unsigned height = 48;
     unsigned severity = qorvex::Logging::Trace;
     bool pools = true;
+    bool wait_for_renderer = false;
     const char* switches = nullptr;
     // Nothing is pruned that a test does not prune.
     qorvex::CacheLimits image_limits{1000, 1u << 30, 1000, 1u << 30};
@@ -250,6 +251,8 @@ class Client {
     void ServeResources();
     // RGBA of a pixel over white.
     uint32_t Pixel(unsigned x, unsigned y) const;
+    // A new renderer, and an empty target for it.
+    void MakeRenderer();
     void DestroyView();
 
     Allocator allocator;

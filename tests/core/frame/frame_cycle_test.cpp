@@ -149,6 +149,106 @@ TEST(FrameCycle, FreedRenderingResourcesRedrawTheWholeView) {
     EXPECT_EQ(client.Pixel(12, 12), kBlue);
 }
 
+// With the first renderer the whole page shows, though nothing changes any more.
+TEST(FrameCycle, WhatWasNotRecordedShowsWhenThereIsARenderer) {
+    fresco::CpuRenderTarget target{};
+    Client client;
+    client.renderer->Destroy();
+    client.renderer = nullptr;
+    client.view->Destroy();
+    qorvex::ViewSettings settings;
+    settings.Width = client.options.width;
+    settings.Height = client.options.height;
+    settings.WaitForViewRendererToRecord = true;
+    client.view = client.system->CreateView(settings);
+    client.files.Put("coui://page/index.html", kPage);
+    client.view->LoadURL("coui://page/index.html");
+    for (int i = 0; i < 6; ++i) {
+        client.ServeResources();
+        client.view->Advance(client.time += 16);
+    }
+    target = {client.pixels.data(), settings.Width, settings.Height, settings.Width * 4};
+    client.renderer = client.system_renderer->CreateViewRenderer(client.view);
+    client.renderer->SetRenderTargetSimple(&target, nullptr, settings.Width, settings.Height, 1);
+    for (unsigned frame = 6; frame < 9; ++frame) {
+        client.view->Advance(client.time += 16);
+        client.renderer->Paint(frame, true);
+    }
+    EXPECT_EQ(client.Pixel(40, 40), kRed);
+    EXPECT_EQ(client.Pixel(12, 12), kBlue);
+}
+
+// Frames wait for a client that paints nothing for a while, but not for ever.
+TEST(FrameCycle, AClientThatPaintsAgainSeesWhatItMissed) {
+    Client client;
+    client.Load(kPage);
+    client.view->ExecuteScript("document.getElementById('box').style.backgroundColor = '#00ff00'");
+    for (int i = 0; i < 300; ++i, ++client.last_frame)
+        client.view->Advance(client.time += 16);
+    client.Paint();
+    client.Frame();
+    EXPECT_EQ(client.Pixel(12, 12), kGreen);
+    EXPECT_EQ(client.Pixel(40, 40), kRed);
+}
+
+// A box whose shadow lives in a surface of its own, filled by the frame that first shows it.
+constexpr const char* kShadowPage =
+    "<html><body style='margin:0;background-color:#ff0000'><div id='box' style='position:absolute;left:20px;"
+    "top:10px;width:10px;height:10px;box-shadow:0 0 6px 4px #0000ff'></div></body></html>";
+
+TEST(FrameCycle, NewRenderersGetTheWholeView) {
+    for (bool wait : {false, true}) {
+        Options options;
+        options.wait_for_renderer = wait;
+        Client client(options);
+        client.renderer->Destroy();
+        client.renderer = nullptr;
+        client.Load(kShadowPage);
+        client.MakeRenderer();
+        client.Frame();
+        EXPECT_EQ(client.Pixel(2, 2), kRed) << "wait " << wait;
+        EXPECT_NE(client.Pixel(18, 15), kRed) << "the shadow, wait " << wait;
+        const std::vector<uint32_t> first = client.pixels;
+        client.MakeRenderer();
+        client.Frame();
+        EXPECT_EQ(client.pixels, first) << "wait " << wait;
+    }
+}
+
+TEST(FrameCycle, PaintOptionDrawsTheWholeViewOnEveryChange) {
+    Client client;
+    client.Load(kPage);
+    const auto paints_far_corner = [&] {
+        std::fill(client.pixels.begin(), client.pixels.end(), 0);
+        client.view->ExecuteScript(
+            "var b = document.getElementById('box').style; b.left = b.left == '9px' "
+            "? '8px' : '9px'");
+        client.Frame();
+        client.Frame();
+        return client.Pixel(60, 40) == kRed;
+    };
+    EXPECT_FALSE(paints_far_corner());
+    client.view->SetPaintOption(true);
+    EXPECT_TRUE(paints_far_corner());
+}
+
+TEST(FrameCycle, PaintRectanglesFadeFromAStillPage) {
+    Client client;
+    client.Load(kPage);
+    const std::vector<uint32_t> plain = client.pixels;
+    client.view->ShowPaintRectangles(true);
+    client.view->ExecuteScript("document.getElementById('box').style.left = '9px'");
+    client.Frame();
+    EXPECT_NE(client.pixels, plain);
+    client.view->ExecuteScript("document.getElementById('box').style.left = '8px'");
+    for (int i = 0; i < 20; ++i)
+        client.Frame();
+    EXPECT_EQ(client.pixels, plain);
+    auto* debug =
+        static_cast<qorvex::IDebugInterface*>(client.library->GetFeatureInterface(qorvex::kDebugFeature));
+    EXPECT_FALSE(debug->HasChanged(client.view)) << "nothing is left to fade";
+}
+
 TEST(FrameCycle, CaptureHandsOutTheFrame) {
     Client client;
     client.Load(kPage);
