@@ -78,8 +78,7 @@ bool DisplayText::Holds(const Parameters& wanted) const {
     return !followsWidth && !lines_->info.wrapped && !(wanted.width < lines_->info.width);
 }
 
-bool DisplayText::EnsureLayout(const layout::LayoutNode& node, const layout::TextServices& services,
-                               const Parameters& wanted) {
+bool DisplayText::EnsureLayout(const layout::TextServices& services, const Parameters& wanted) {
     if (services.fonts == nullptr) return false;
     if (Holds(wanted)) return true;
     if (!lines_) lines_ = MakeUnique<Lines, MemoryTag::LayoutData>();
@@ -95,8 +94,7 @@ bool DisplayText::EnsureLayout(const layout::LayoutNode& node, const layout::Tex
     }
     lines_->parameters = wanted;
     lines_->unpublished = true;
-    SetInk(std::ceil(info.usedSize * kOverhang + node.style.text->computedStrokeWidth),
-           {std::ceil(info.width), std::ceil(info.height)});
+    SetInk(std::ceil(info.usedSize * kOverhang), {std::ceil(info.width), std::ceil(info.height)});
     return true;
 }
 
@@ -117,9 +115,8 @@ layout::Size DisplayText::MeasureFor(layout::LayoutHandle& handle, float availab
     const auto& style = handle.node().style.text;
     if (!style) return {};
     const layout::TextServices& services = handle.store().text;
-    if (!EnsureLayout(handle.node(), services,
-                      {style, style->computedFontSize, availableWidth, availableHeight, 0, false,
-                       services.complexText}))
+    if (!EnsureLayout(services, {style, style->computedFontSize, availableWidth, availableHeight, 0, false,
+                                 services.complexText}))
         return {};
     return {std::ceil(lines_->info.width), std::ceil(lines_->info.height)};
 }
@@ -155,9 +152,8 @@ const layout::TextInfo* DisplayText::LayoutInline(layout::LayoutHandle& handle,
     const auto& style = handle.node().style.text;
     if (!style) return nullptr;
     const layout::TextServices& services = handle.store().text;
-    const bool done = EnsureLayout(handle.node(), services,
-                                   {style, style->computedFontSize * request.scale, request.width, NAN,
-                                    request.firstLineOffset, true, services.complexText});
+    const bool done = EnsureLayout(services, {style, style->computedFontSize * request.scale, request.width,
+                                              NAN, request.firstLineOffset, true, services.complexText});
     return done ? &lines_->info : nullptr;
 }
 

@@ -99,8 +99,7 @@ class DisplayText final : public IDisplayElement {
     static layout::TextStyle MakeStyle(const Parameters& parameters);
     // Lays out when the style, the text or the available box differ from those of the stored lines. False
     // without a loaded typeface.
-    bool EnsureLayout(const layout::LayoutNode& node, const layout::TextServices& services,
-                      const Parameters& wanted);
+    bool EnsureLayout(const layout::TextServices& services, const Parameters& wanted);
     [[nodiscard]] bool Holds(const Parameters& wanted) const;
     layout::Size MeasureFor(layout::LayoutHandle& handle, float availableWidth, float availableHeight);
     void Remember(const Answer& answer);

@@ -157,9 +157,8 @@ void DisplayText::Paint(PaintContext& context, bool, const layout::LayoutNode& n
         // The box may have become another one than the last measure was asked about.
         if (node.parent == nullptr) return;
         const layout::TextServices& services = node.parent->store().text;
-        if (!EnsureLayout(node, services,
-                          {node.style.text, style.computedFontSize, node.box.width, node.box.height, 0, false,
-                           services.complexText}))
+        if (!EnsureLayout(services, {node.style.text, style.computedFontSize, node.box.width, node.box.height,
+                                     0, false, services.complexText}))
             return;
     }
 

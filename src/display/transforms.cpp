@@ -33,6 +33,13 @@ Rect ToVisual(const Rect& bounds) {
     return layout::RoundOut(Outset(bounds, {1, 1, 1, 1}));
 }
 
+// Of outlined glyphs. The lines of a text stay when only its outline changes, so it is no part of what the
+// text knows of itself.
+float StrokeReach(const css::TextLayoutStyle& style) {
+    constexpr float kFarthest = 1e5f;
+    return style.computedStrokeWidth > 0 ? std::min(style.computedStrokeWidth, kFarthest) : 0;
+}
+
 bool Same(const Rect& a, const Rect& b) {
     return a.x == b.x && a.y == b.y && a.width == b.width && a.height == b.height;
 }
@@ -182,7 +189,8 @@ class TransformPass {
             subtree = layout::Intersection(subtree, layout::RoundOut(clip));
         }
         if (node.display) {
-            const float ink = node.display->InkOverflow();
+            float ink = node.display->InkOverflow();
+            if (node.display->Has(IDisplayElement::kIsText)) ink += StrokeReach(*node.style.text);
             const layout::Size content = node.display->ContentSize();
             // Lines may be aligned to either side.
             const float wider = ink + std::max(content.width - box.width, 0.0f);

@@ -17,6 +17,9 @@ DecodedImage DecodedImage::Decode(std::span<const uint8_t> file) {
         if (more == fresco::ImageDecodeResult::Failed) return {};
         if (!frame.pixels) break;
         image.frames_.push_back({frame.pixels, delay});
+        // One description stands for all frames.
+        const fresco::Image& first = image.description_;
+        if (index > 0 && (info.width != first.width || info.height != first.height)) return {};
         const uint32_t opaque = index == 0 ? fresco::kImageOpaque : image.description_.flags;
         image.description_ = {info.width,          info.height,    info.format,
                               info.flags & opaque, frame.rowPitch, nullptr};

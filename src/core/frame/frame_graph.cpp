@@ -1,6 +1,5 @@
 #include "core/frame/frame_graph.h"
 
-#include "core/logging/log.h"
 #include "core/main_thread.h"
 #include "display/visual_style.h"
 
@@ -30,10 +29,7 @@ TaskPtr MakePassTask(const char* name, const FrameDataPtr& frame, Body body) {
 TaskPtr MakeLayoutTask(const FrameDataPtr& frame, layout::LayoutWork work) {
     if (work == layout::LayoutWork::Layout) return MakePassTask("Layout", frame, layout::PerformLayout);
     if (work == layout::LayoutWork::Transforms) {
-        return MakePassTask("UpdateNodeTransforms", frame, [](layout::LayoutPass& pass) {
-            LogTrace("Performing node transforms update");
-            layout::UpdateNodeTransforms(pass);
-        });
+        return MakePassTask("UpdateNodeTransforms", frame, layout::UpdateNodeTransforms);
     }
     if (frame->dirty.Empty()) return TaskPtr();
     return MakePassTask("UpdateNodeFlags", frame, layout::UpdateNodeFlags);

@@ -58,6 +58,7 @@ void StyleEngine::AddStyleSheet(dom::Document& document, dom::Element* owner, St
             fonts->AddFontFace(face);
     }
     author_.UpdateMedia(document.GetLengthContext());
+    LogTrace("Style added in document!");
     document.RequestFullStyleSolve();
 }
 
