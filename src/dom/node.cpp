@@ -218,7 +218,8 @@ void Node::CopyCommon(Node& target, bool deep) {
         const NodeVector children = source->children_;
         for (const RefPtr<Node>& child : children) {
             RefPtr<Node> clone = child->CloneNode(false);
-            copy->AppendChild(clone);
+            // Past AppendChild, by which a script gathers its source: a clone has the source already.
+            copy->InsertBefore(clone, nullptr);
             if (child->HasChildNodes()) work.push_back({child, std::move(clone)});
         }
     }
