@@ -222,8 +222,14 @@ void Document::ElementDisconnected(Element& element) {
 }
 
 void Document::NodeInserted(Node& node) {
-    // The solve walks down from a dirty node by itself.
-    if (!needs_full_style_solve_) MarkNodeDirty(node);
+    if (!needs_full_style_solve_) {
+        // The solve walks down from a dirty node by itself. Those behind it are matched anew where rules look
+        // at siblings: what stands before them has changed.
+        if (node.IsElement() && style_engine_->SiblingInvalidatingRules() > 0 && node.GetNextSibling())
+            node.MarkStyleDirty();
+        else
+            MarkNodeDirty(node);
+    }
     if (!dataBinding) return;
     for (Node* below = &node; below; below = below->GetNextInTree(&node)) {
         if (!below->IsElement()) continue;

@@ -33,9 +33,12 @@ RefPtr<Node> Element::CloneNode(bool deep) {
 void Element::CopyElementTo(Element& target) {
     // Through SetAttribute, so that the target's class reacts as it does to a page's own attributes.
     ForEachAttribute([&](std::string_view name, std::string_view value) {
-        if (name != "style") target.SetAttribute(name, value);
+        if (name != "style" && !name.starts_with("data-")) target.SetAttribute(name, value);
         return true;
     });
+    // Data attributes are copied as they are: what they brought about, a translation for one, is among the
+    // children already.
+    if (!GetDataset().empty()) target.EnsureRareData().dataset = GetRareData()->dataset;
     // Declarations are copied as they are: some have no text form that gives the same value back.
     if (inline_style_) target.EnsureInlineStyle() = *inline_style_;
     if (const css::StyleDeclarationSet* extra = GetExtraStyle()) target.EnsureExtraStyle() = *extra;

@@ -336,11 +336,9 @@ bool Element::ReplaceClass(std::string_view old_name, std::string_view new_name)
     if (old_atom == Atom() || !HasClass(old_atom)) return false;
     const Atom new_atom = GetDocument()->Intern(new_name);
     const std::optional<Atom> old_value = ClassValueForObservers();
-    Atom* place = classes_.find(old_atom);
-    if (old_atom != new_atom && HasClass(new_atom)) {
-        classes_.erase(place);
-    } else {
-        *place = new_atom;
+    if (old_atom != new_atom) {
+        if (!HasClass(new_atom)) *classes_.find(old_atom) = new_atom;
+        classes_.erase_if([&](Atom other) { return other == old_atom; });
     }
     OnClassesChanged();
     AnnounceClassChange(old_value);

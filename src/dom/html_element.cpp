@@ -39,7 +39,9 @@ dsp::DisplayElementPtr HTMLElement::CreateDisplayElement() {
 RefPtr<Node> HTMLElement::CloneNode(bool deep) {
     RefPtr<Element> clone = CreateElementByTag(GetTag(), GetMarkupName().view(), *GetDocument());
     CopyElementTo(*clone);
-    CopyStateTo(static_cast<HTMLElement&>(*clone));
+    auto& element = static_cast<HTMLElement&>(*clone);
+    if (FindDataAttribute(atoms::kL10nId)) GetDocument()->GetLocalizedElements().insert(&element);
+    CopyStateTo(element);
     CopyCommon(*clone, deep);
     return clone;
 }

@@ -2,6 +2,7 @@
 
 #include "core/logging/log.h"
 #include "core/memory/atoms.h"
+#include "dom/attr.h"
 #include "dom/character_data.h"
 #include "dom/document.h"
 #include "dom/element.h"
@@ -189,6 +190,10 @@ int Node::CompareDocumentPosition(const Node& other) const {
     constexpr int kDisconnected = 1, kPreceding = 2, kFollowing = 4, kContains = 8, kContainedBy = 16,
                   kImplementationSpecific = 32;
     if (this == &other) return 0;
+    if (Is(kIsAttr) && other.Is(kIsAttr)) {
+        const Element* owner = static_cast<const Attr*>(this)->GetOwnerElement();
+        if (owner && owner == static_cast<const Attr&>(other).GetOwnerElement()) return kPreceding;
+    }
     if (Contains(&other)) return kContainedBy | kFollowing;
     if (other.Contains(this)) return kContains | kPreceding;
     // The two children of the common ancestor through which the paths run.
@@ -218,7 +223,8 @@ void Node::CopyCommon(Node& target, bool deep) {
         const NodeVector children = source->children_;
         for (const RefPtr<Node>& child : children) {
             RefPtr<Node> clone = child->CloneNode(false);
-            copy->AppendChild(clone);
+            // Past AppendChild, by which a script gathers its source: a clone has the source already.
+            copy->InsertBefore(clone, nullptr);
             if (child->HasChildNodes()) work.push_back({child, std::move(clone)});
         }
     }

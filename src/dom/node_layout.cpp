@@ -23,11 +23,18 @@ uint32_t Node::FindLayoutIndex(const layout::LayoutHandle& parent) const {
     if (!parent_) return static_cast<uint32_t>(parent.data().children.size());
     const NodeVector& siblings = parent_->children_;
     const size_t own_index = GetIndexInParent();
-    // Children mostly arrive in order: behind the last one that has a handle there is nothing to search.
+    // Behind the nearest sibling that has a handle. That one comes as far from the front as among the
+    // siblings but for those without a handle, and children that arrive in order come behind the last one.
+    const layout::HandleVector& handles = parent.data().children;
     for (size_t i = own_index; i-- > 0;) {
+        ++document_->work.siblingsSearched;
         if (!siblings[i]->Is(kInLayoutTree)) continue;
-        const layout::HandleVector& handles = parent.data().children;
-        if (!handles.empty() && handles.back() == siblings[i]->layout_node_) return handles.size();
+        const layout::HandlePtr& before = siblings[i]->layout_node_;
+        if (!handles.empty() && handles.back() == before) return handles.size();
+        for (size_t place = std::min<size_t>(i + 1, handles.size()); place > 0; --place) {
+            ++document_->work.siblingsSearched;
+            if (handles[static_cast<uint32_t>(place - 1)] == before) return static_cast<uint32_t>(place);
+        }
         break;
     }
     return layout::LayoutIndexForChild(

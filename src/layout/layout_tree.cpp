@@ -65,10 +65,12 @@ void LayoutTree::Remove(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
     if (!handle.data().inTree) return;
     if (LayoutHandle* parent = handle.data().parent) {
         HandleVector& siblings = parent->data().children;
-        for (uint32_t i = siblings.size(); i-- > 0;) {
-            if (siblings[i].get() != &handle) continue;
+        // From both ends: children that go one after another do so from the first or from the last.
+        for (uint32_t front = 0, back = siblings.size(); front < back; ++front) {
+            const bool isFront = siblings[front].get() == &handle;
+            if (!isFront && siblings[--back].get() != &handle) continue;
             removed_.Insert(&handle);
-            siblings.erase(siblings.begin() + i);
+            siblings.erase(siblings.begin() + (isFront ? front : back));
             break;
         }
         changed_.Insert(parent);

@@ -144,6 +144,12 @@ TEST_F(AttributeTest, CombinatorsDirtySubtreesAndLaterSiblings) {
     style_->subtree_rules = style_->sibling_rules = 0;
     Body().AppendChild(b);
     EXPECT_EQ(dirty(), "bb1");
+    // Whoever stands behind an arrival may be selected by it.
+    Body().InsertBefore(Make("div", "n"), &Find("c"));
+    EXPECT_EQ(dirty(), "n");
+    style_->subtree_rules = style_->sibling_rules = 1;
+    Body().InsertBefore(Make("div", "m"), &Find("c"));
+    EXPECT_EQ(dirty(), "mcbb1");
 }
 
 TEST_F(AttributeTest, TheClientsProxyCutsTextsToItsBuffers) {

@@ -77,6 +77,11 @@ TEST_F(BuilderTest, ScriptEvents) {
     EXPECT_EQ(host_->journal, (std::vector<std::string>{"run x", "load"}));
     Body().AppendChild(inline_script->CloneNode(true));  // a clone of a script that ran does not run
     EXPECT_EQ(host_->journal.size(), 2u);
+    RefPtr<Element> waiting = Make("div");
+    waiting->AppendChild(Make("script"))->AppendChild(document_->CreateTextNode("y"));
+    host_->journal.clear();
+    Body().AppendChild(waiting->CloneNode(true));  // one of a script that did not has its source once
+    EXPECT_EQ(host_->journal, (std::vector<std::string>{"run y"}));
     add("module", nullptr, "x");
     EXPECT_EQ(host_->journal, (std::vector<std::string>{"load"}));
     add("text/plain", nullptr, "x");
@@ -197,6 +202,11 @@ TEST_F(BuilderTest, TranslationsReplaceParsedText) {
         "<p id=d data-l10n-id=old></p>");
     EXPECT_EQ(BodyShape(), "body(p#a('Hallo') p#b(b('x')) p#c('text') p#d('alt'))");
     EXPECT_EQ(document_->GetLocalizedElements().size(), 4u);
+    {
+        const RefPtr<Node> clone = Find("a").CloneNode(true);
+        EXPECT_EQ(Shape(*clone), "p#a('Hallo')");
+        EXPECT_EQ(document_->GetLocalizedElements().size(), 5u);
+    }
     Find("a").RemoveAttribute("data-l10n-id");
     EXPECT_EQ(document_->GetLocalizedElements().size(), 3u);
     DropDocument();

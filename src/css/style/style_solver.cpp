@@ -28,6 +28,27 @@ void SortByDepth(List& list) {
     if (!inOrder) std::sort(list.begin(), list.end(), IsShallower);
 }
 
+// Siblings behind one another in the list stand so in the tree.
+bool HasSiblingsInOrder(const Node* a, const Node* b) {
+    return a->GetParent() != b->GetParent() || a->GetIndexInParent() < b->GetIndexInParent();
+}
+
+// Parents before their children and siblings in the order of the tree, in which each finds its place in the
+// layout behind the one that came before it, and backwards each is the last of those that are left. The dirty
+// nodes of a frame come in no order.
+template <class List>
+void SortForLayout(List& list) {
+    bool inOrder = true;
+    for (uint32_t i = 1; i < list.size() && inOrder; ++i)
+        inOrder = list[i - 1]->GetDepth() <= list[i]->GetDepth() && HasSiblingsInOrder(list[i - 1], list[i]);
+    if (inOrder) return;
+    std::sort(list.begin(), list.end(), [](const Node* a, const Node* b) {
+        if (a->GetDepth() != b->GetDepth()) return a->GetDepth() < b->GetDepth();
+        if (a->GetParent() != b->GetParent()) return a->GetParent() < b->GetParent();
+        return a->GetIndexInParent() < b->GetIndexInParent();
+    });
+}
+
 bool HasDisplay(const Node& node) {
     return node.GetStyle().layout->display != CSSDisplay::None;
 }
@@ -255,7 +276,7 @@ void StyleSolver::ExpandEntered(Document& document) {
     }
     for (Node* node : entered)
         node->pendingStyleBits &= static_cast<uint16_t>(~dom::kGathered);
-    SortByDepth(entered);
+    SortForLayout(entered);
 }
 
 void StyleSolver::UpdateLayoutPresence(Document& document) {
@@ -267,6 +288,7 @@ void StyleSolver::UpdateLayoutPresence(Document& document) {
         lists.transition.push_back(node);
     };
     ExpandEntered(document);
+    SortForLayout(lists.leftLayout);
     for (uint32_t i = lists.leftLayout.size(); i-- > 0;) {
         Node* node = lists.leftLayout[i];
         document.DetachLayoutNode(*node);

@@ -87,8 +87,10 @@ class Incremental : public StyleTest {
             }
             case 5: {
                 dom::Element& parent = Pick(2) ? AnyBelowBody() : Body();
-                const auto made = Append(parent, kTags[Pick(4)], kClasses[Pick(std::size(kClasses))]);
+                const auto made = document_->CreateElement(kTags[Pick(4)]);
+                made->AddClass(kClasses[Pick(std::size(kClasses))]);
                 made->AppendChild(document_->CreateTextNode("text"));
+                parent.InsertBefore(made, Pick(2) ? parent.GetFirstChild() : nullptr);
                 break;
             }
             case 6: {

@@ -3,6 +3,7 @@
 
 #include "css/style/style_fixture.h"
 #include "dom/character_data.h"
+#include "layout/layout_handle.h"
 
 namespace qorvex::css::test {
 namespace {
@@ -127,6 +128,27 @@ TEST_F(WorkCount, HoverDeepInAPageAllocatesNothing) {
     for (int i = 0; i < 8; ++i)
         hover(i % 2 ? &Find("p") : nullptr);
     EXPECT_EQ(allocator_.Allocations(), before);
+}
+
+// New nodes are dirty in no order; each still finds its place in the layout beside the one before it.
+TEST_F(WorkCount, ManyNewSiblingsFindTheirPlacesAtOnce) {
+    constexpr size_t kCount = 1000;
+    Load("<p id='first'></p><p id='last'></p>");
+    Solve();
+    document_->UpdateLayoutStyles(false);
+    for (const char* reference : {"first", "last", "none"}) {
+        for (size_t i = 0; i < kCount; ++i)
+            Body().InsertBefore(document_->CreateElement("i"), document_->GetElementById(reference));
+        document_->work = {};
+        Solve();
+        EXPECT_LE(document_->work.siblingsSearched, 4 * kCount);
+        const auto& handles = Body().GetLayoutHandle()->data().children;
+        const auto children = Body().GetChildren();
+        ASSERT_EQ(handles.size(), children.size());
+        for (uint32_t i = 0; i < handles.size(); ++i)
+            ASSERT_EQ(handles[i].get(), children[i]->GetLayoutHandle()) << i;
+        document_->UpdateLayoutStyles(false);
+    }
 }
 
 // In whatever order a script comes to them.
