@@ -79,9 +79,9 @@ class WrapperTable final : private IHeapObserver {
         const void* packed = nullptr;
         Slot* slot = nullptr;
     };
-    // Blank objects of one class, made ahead: one call into script makes some rounds (class_installation.cpp).
-    // The watchdog reads the thread's clock at each such call, which costs more than a round, so a class that
-    // is used much gets twice as many rounds each time.
+    // Blank objects of one class, made ahead: one call into script makes some rounds
+    // (class_installation.cpp). The watchdog reads the thread's clock at each such call, which costs more
+    // than a round, so a class that is used much gets twice as many rounds each time.
     static constexpr uint32_t kBlanksInRound = 16;
     static constexpr uint32_t kMostRounds = 8;
     struct Blanks {

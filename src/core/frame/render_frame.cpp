@@ -13,8 +13,8 @@ void RenderFrame::Push(TaskPtr task) {
 void RenderFrame::PushClose(TaskPtr last) {
     TaskPtr close = MakeTask("CloseRenderFrame", [this](TaskFamilyHandle) { Close(); });
     {
-        // Both at once: who waits is woken once, when there is nothing more to wait for. Waking it earlier and
-        // letting it spin until then was several times slower where processors are virtual or few.
+        // Both at once: who waits is woken once, when there is nothing more to wait for. Waking it earlier
+        // and letting it spin until then was several times slower where processors are virtual or few.
         qsl::MutexLock lock(mutex_);
         if (last) tasks_.push_back(std::move(last));
         tasks_.push_back(std::move(close));
