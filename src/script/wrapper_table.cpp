@@ -2,6 +2,8 @@
 
 #include <JavaScriptCore/JavaScript.h>
 
+#include <algorithm>
+
 #include "script/class_installation.h"
 #include "script/native_private.h"
 #include "script/scripting_context.h"
@@ -228,9 +230,16 @@ void WrapperTable::MakeBlanks(ScriptClass script_class) {
                                        nullptr);
         }
     }
-    if (blanks.maker) JSObjectCallAsFunction(context, blanks.maker, nullptr, 0, nullptr, &exception);
+    const uint32_t rounds = blanks.rounds;
+    if (blanks.maker) {
+        const JSValueRef argument = JSValueMakeNumber(context, rounds);
+        JSObjectCallAsFunction(context, blanks.maker, nullptr, 1, &argument, &exception);
+    }
     filling_ = nullptr;
-    if (blanks.first) return ReportNativeMemory(context, kBlanksAtOnce * kNativeBytes);
+    if (blanks.first) {
+        blanks.rounds = std::min(rounds * 2, kMostRounds);
+        return ReportNativeMemory(context, rounds * kBlanksInRound * kNativeBytes);
+    }
     // The engine runs no script now: out of stack, or being stopped.
     MakeOneBlank(index);
 }

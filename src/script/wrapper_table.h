@@ -79,11 +79,15 @@ class WrapperTable final : private IHeapObserver {
         const void* packed = nullptr;
         Slot* slot = nullptr;
     };
-    // Blank objects of one class, made ahead: one call into script makes a handful (class_installation.cpp).
-    static constexpr size_t kBlanksAtOnce = 16;
+    // Blank objects of one class, made ahead: one call into script makes some rounds
+    // (class_installation.cpp). The watchdog reads the thread's clock at each such call, which costs more
+    // than a round, so a class that is used much gets twice as many rounds each time.
+    static constexpr uint32_t kBlanksInRound = 16;
+    static constexpr uint32_t kMostRounds = 8;
     struct Blanks {
         Slot* first = nullptr;
         JSObjectRef maker = nullptr;
+        uint32_t rounds = 1;  // of the next call
     };
 
     void MarkRoots(Marker& marker) override;

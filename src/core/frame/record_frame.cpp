@@ -86,7 +86,6 @@ layout::LayoutPass FrameData::MakePass() {
 }
 
 void RecordFrame(FrameData& frame) {
-    frame.render_frame->Announce();
     layout::LayoutPass pass = frame.MakePass();
     dsp::RecordRequest request{.caches = *frame.caches,
                                .scaleX = frame.scale_x,

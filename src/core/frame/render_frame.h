@@ -28,8 +28,6 @@ class RenderFrame : public MTPoolObject<RenderFrame, MemoryTag::Rendering, 4> {
 
     // Any thread.
     void Push(TaskPtr task);
-    // Tasks come soon: a Paint that waits for them wakes up now, while they are being made.
-    void Announce();
     // The last task of every frame is the one that closes it; with another one before it if there is one.
     void PushClose(TaskPtr last = TaskPtr());
     State GetState() const { return state_.load(std::memory_order_acquire); }
@@ -42,14 +40,11 @@ class RenderFrame : public MTPoolObject<RenderFrame, MemoryTag::Rendering, 4> {
 
   private:
     void Close();
-    void WaitForTask(qsl::MutexLock& lock) QSL_REQUIRES(mutex_);
 
     std::atomic<uint32_t> count_{1};
     qsl::Mutex mutex_;
     qsl::Condition task_arrived_;
     TaskQueue tasks_ QSL_GUARDED_BY(mutex_);
-    bool announced_ QSL_GUARDED_BY(mutex_) = false;
-    std::atomic<uint32_t> arrivals_{0};  // grows under the mutex
     std::atomic<State> state_{State::Recording};
     int32_t executed_count_ = 0;  // without CloseRenderFrame; render thread only
 };
