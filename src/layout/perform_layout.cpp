@@ -15,6 +15,8 @@
 
 #include <yoga/Yoga.h>
 
+#include <algorithm>
+#include <functional>
 #include <utility>
 
 namespace qorvex::layout {
@@ -52,20 +54,47 @@ void SyncAllStyles(LayoutPass& pass, FlexStyleContext& context) {
     }
 }
 
+// The changed handles in the order of memory, which is mostly that of the page: in the order of their set
+// each would lie far from the one before.
+void CollectChanged(const LayoutPass& pass, TempVector<LayoutHandle*>& changed) {
+    changed.reserve(pass.update.changed.Size());
+    pass.update.changed.ForEach([&](LayoutHandle& handle) { changed.push_back(&handle); });
+    std::sort(changed.begin(), changed.end(), std::less<>());
+}
+
+bool TakeContentChange(LayoutNode& node) {
+    return std::exchange(node.contentChanged, false) && node.flex != nullptr &&
+           YGNodeHasMeasureFunc(node.flex);
+}
+
+// For layouts that do not ask whether sizes hold.
+void MarkChangedContent(LayoutPass& pass) {
+    pass.update.changed.ForEach([](LayoutHandle& handle) {
+        LayoutNode& node = handle.node();
+        if (TakeContentChange(node)) YGNodeMarkDirty(node.flex);
+    });
+}
+
 // A changed element may still have the size that it had: a counter whose digits are all as wide. When nothing
 // else has changed no box of the page moves, and Yoga, which walks the whole page each time, is not asked.
 // True then.
-bool KeepChangedContent(LayoutPass& pass, bool mayKeep) {
-    bool all = mayKeep && !pass.update.changed.Empty();
-    pass.update.changed.ForEach([&](LayoutHandle& handle) {
-        LayoutNode& node = handle.node();
-        const bool content = std::exchange(node.contentChanged, false) && node.flex != nullptr &&
-                             YGNodeHasMeasureFunc(node.flex);
-        const bool keeps = content && mayKeep && node.display && node.display->KeepsSize(handle);
-        if (content && !keeps) YGNodeMarkDirty(node.flex);
-        all = all && keeps;
-    });
-    return all && !YGNodeIsDirty(pass.root->node().flex);
+bool SyncChangedStyles(LayoutPass& pass, FlexStyleContext& context) {
+    const TempMark mark;
+    TempVector<LayoutHandle*> changed, contents;
+    CollectChanged(pass, changed);
+    for (LayoutHandle* handle : changed) {
+        if (SyncStyleToYoga(*handle, context)) ++pass.update.counters.synced;
+        dsp::InvalidateParagraphs(*handle);
+        if (TakeContentChange(handle->node())) contents.push_back(handle);
+    }
+    bool keeps = !changed.empty() && contents.size() == changed.size();
+    for (LayoutHandle* handle : contents) {
+        LayoutNode& node = handle->node();
+        if (node.display && node.display->KeepsSize(*handle)) continue;
+        YGNodeMarkDirty(node.flex);
+        keeps = false;
+    }
+    return keeps && !YGNodeIsDirty(pass.root->node().flex);
 }
 
 void PerformFlexLayout(LayoutPass& pass, const css::LengthContext& lengths) {
@@ -74,13 +103,10 @@ void PerformFlexLayout(LayoutPass& pass, const css::LengthContext& lengths) {
     if (EnsureFlexTree(*pass.root) || stylesMissing) pass.everything = true;
     if (pass.everything) {
         SyncAllStyles(pass, context);
-    } else {
-        pass.update.changed.ForEach([&](LayoutHandle& handle) {
-            if (SyncStyleToYoga(handle, context)) ++pass.update.counters.synced;
-            dsp::InvalidateParagraphs(handle);
-        });
+        MarkChangedContent(pass);
+    } else if (SyncChangedStyles(pass, context)) {
+        return;
     }
-    if (KeepChangedContent(pass, !pass.everything)) return;
     YGNodeCalculateLayout(pass.root->node().flex, static_cast<float>(pass.viewWidth),
                           static_cast<float>(pass.viewHeight), YGDirectionLTR);
     pass.update.counters.measured += TakeMeasureCount();
@@ -103,12 +129,12 @@ void PerformLayout(LayoutPass& pass) {
     if (TakeMetrics(pass, simple ? Engine::Simple : Engine::Flex)) pass.everything = true;
     if (simple) {
         if (std::exchange(pass.root->store().flexStylesMissing, false)) pass.everything = true;
-        (void)KeepChangedContent(pass, false);
+        MarkChangedContent(pass);
         PerformSimpleLayout(pass, lengths, pass.everything);
     } else if (pass.algorithm != FlexAlgorithm::Internal) {
         PerformFlexLayout(pass, lengths);
     } else {
-        (void)KeepChangedContent(pass, false);
+        MarkChangedContent(pass);
         // The styles of this frame were not written; the next run of Yoga has to catch up.
         pass.root->store().engine = Engine::None;
     }
