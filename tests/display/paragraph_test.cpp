@@ -28,7 +28,7 @@ class ParagraphTest : public LayoutTest {
         css::LayoutStyleRefs refs = Page::Style(style);
         refs.Mutable<css::TextLayoutStyle>().typefaces.push_back(font);
         kept.push_back(page.tree.AddChild(*parent, parent->data().children.size(),
-                                          {refs, std::move(display), nullptr, {}, false}));
+                                          {page.Store(refs), std::move(display), nullptr, {}, false}));
         return kept.back().get();
     }
     LayoutHandle* Paragraph(std::string_view style) {
@@ -99,7 +99,7 @@ TEST_F(ParagraphTest, JustifyWidensGapsAcrossElements) {
     LayoutHandle* last = Text(p, " iii");
     page.Settle();
     const float left = Box(span).left;
-    const layout::TextInfo plain = static_cast<DisplayText&>(*second->node().display).Info();
+    const layout::TextInfo plain = *static_cast<DisplayText&>(*second->node().display).Info();
     ASSERT_GT(plain.lines.size(), 2u);
     const float end = Right(last);
 
