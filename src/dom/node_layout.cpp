@@ -9,9 +9,10 @@
 namespace qorvex::dom {
 
 layout::HandlePtr Node::CreateLayoutNode(layout::LayoutTree& tree, layout::LayoutHandle& parent) {
-    if (!Is(kDisplayable)) return nullptr;
+    css::LaidOutStyle* style = GetOwnLaidOutStyle();
+    if (!Is(kDisplayable) || !style) return nullptr;
     layout_node_ = tree.AddChild(parent, FindLayoutIndex(parent),
-                                 {.style = style_,
+                                 {.style = *style,
                                   .display = display_element_,
                                   .link = GetLayoutLink(),
                                   .scroll = GetStoredScroll(),
@@ -21,7 +22,7 @@ layout::HandlePtr Node::CreateLayoutNode(layout::LayoutTree& tree, layout::Layou
 
 uint32_t Node::FindLayoutIndex(const layout::LayoutHandle& parent) const {
     if (!parent_) return static_cast<uint32_t>(parent.data().children.size());
-    const NodeVector& siblings = parent_->children_;
+    const NodeChildren& siblings = parent_->children_;
     const size_t own_index = GetIndexInParent();
     // Children mostly arrive in order: behind the last one that has a handle there is nothing to search.
     for (size_t i = own_index; i-- > 0;) {

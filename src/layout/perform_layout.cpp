@@ -59,8 +59,8 @@ bool KeepChangedContent(LayoutPass& pass, bool mayKeep) {
     bool all = mayKeep && !pass.update.changed.Empty();
     pass.update.changed.ForEach([&](LayoutHandle& handle) {
         LayoutNode& node = handle.node();
-        const bool content = std::exchange(node.contentChanged, false) && node.flex != nullptr &&
-                             YGNodeHasMeasureFunc(node.flex);
+        const bool content = node.contentChanged && node.flex != nullptr && YGNodeHasMeasureFunc(node.flex);
+        node.contentChanged = false;
         const bool keeps = content && mayKeep && node.display && node.display->KeepsSize(handle);
         if (content && !keeps) YGNodeMarkDirty(node.flex);
         all = all && keeps;
