@@ -2,6 +2,7 @@
 #include <benchmark/benchmark.h>
 #include <yoga/Yoga.h>
 
+#include <deque>
 #include <vector>
 
 #include "css/values/layout_style_refs.h"
@@ -68,8 +69,10 @@ class LayoutPage {
     }
 
     LayoutHandle* Add(LayoutHandle& parent, const css::LayoutStyleRefs& style) {
+        own_styles_.push_back(style);
         return tree_
-            .AddChild(parent, parent.data().children.size(), {style, MakeRef<dsp::Box>(), nullptr, {}, false})
+            .AddChild(parent, parent.data().children.size(),
+                      {own_styles_.back(), MakeRef<dsp::Box>(), nullptr, {}, false})
             .get();
     }
     // Every box holds ten others, rows and columns in turn.
@@ -86,10 +89,11 @@ class LayoutPage {
     }
     LayoutHandle& AddAbsolute(LayoutHandle& parent) { return *Add(parent, AbsoluteStyle(0)); }
     void Change(LayoutHandle& handle, const css::LayoutStyleRefs& style) {
-        css::LayoutStyleRefs changed = style;
-        changed.written = {};
-        changed.written.Add(css::StyleGroup::Layout);
-        tree_.UpdateStyle(handle, changed);
+        auto& own = const_cast<css::LaidOutStyle&>(*handle.data().style);
+        own = style;
+        own.written = {};
+        own.written.Add(css::StyleGroup::Layout);
+        tree_.UpdateStyle(handle, own);
     }
     void Commit() {
         update_ = MakeRef<layout::LayoutUpdateData>();
@@ -123,6 +127,7 @@ class LayoutPage {
         uint32_t depth;
     };
     const DefaultStylesScope styles_;
+    std::deque<css::LayoutStyleRefs> own_styles_;  // of the handles
     layout::LayoutTree tree_;
     layout::HandlePtr root_;
     css::CSSDisplay display_;

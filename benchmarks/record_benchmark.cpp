@@ -22,10 +22,12 @@ class RecordPage {
   public:
     explicit RecordPage(int boxes) {
         css::CreateDefaultStyles();
-        css::LayoutStyleRefs wrapping = css::DefaultStyles();
+        css::LayoutStyleRefs& wrapping = containers_[0];
+        wrapping = css::DefaultStyles();
         wrapping.Mutable<css::LayoutStyle>().flexDirection = css::CSSFlexDirection::Row;
         wrapping.Mutable<css::LayoutStyle>().flexWrap = css::CSSFlexWrap::Wrap;
-        css::LayoutStyleRefs panel = wrapping;
+        css::LayoutStyleRefs& panel = containers_[1];
+        panel = wrapping;
         Size(panel, 10 * kSide);
         for (css::LayoutStyleRefs& style : colors_) {
             style = css::DefaultStyles();
@@ -52,8 +54,8 @@ class RecordPage {
         update_.reset();
         tree_.Clear(nullptr);
         root_.reset();
-        for (css::LayoutStyleRefs& style : colors_)
-            style = css::LayoutStyleRefs();
+        for (css::LayoutStyleRefs* style : {&colors_[0], &colors_[1], &containers_[0], &containers_[1]})
+            *style = css::LayoutStyleRefs();
         css::DestroyDefaultStyles();
     }
 
@@ -67,7 +69,7 @@ class RecordPage {
     size_t FrameOfOneChange() {
         layout::LayoutHandle& box = *boxes_[boxes_.size() / 2];
         on_ = !on_;
-        css::LaidOutStyle style = colors_[on_];
+        css::LaidOutStyle& style = colors_[on_];
         style.written = {};
         style.written.Add(css::StyleGroup::Visual);
         tree_.UpdateStyle(box, style);
@@ -108,6 +110,7 @@ class RecordPage {
     layout::HandlePtr root_;
     std::vector<layout::HandlePtr> boxes_;
     css::LayoutStyleRefs colors_[2];
+    css::LayoutStyleRefs containers_[2];
     dsp::DirtyRegion dirty_;
     dsp::RenderCaches caches_;
     layout::LayoutUpdatePtr update_;

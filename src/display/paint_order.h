@@ -63,9 +63,10 @@ inline bool PaintsInTreeOrder(const layout::LayoutNode& node) {
 template <typename Visit>
 void ForEachChild(const layout::LayoutNode& parent, std::span<const layout::Rect> areas, Visit&& visit) {
     const uint32_t count = parent.children.size();
-    if (parent.below && count > layout::ChildGroups::kFanout && parent.below->groups.Fit(count)) {
-        parent.below->groups.Walk([&](const layout::ChildSum& sum) { return TouchesAny(areas, sum.visual); },
-                                  [&](uint32_t i) { visit(parent.children[i]->node()); });
+    if (parent.below && count > layout::ChildGroups::kFanout && parent.below->groups &&
+        parent.below->groups->Fit(count)) {
+        parent.below->groups->Walk([&](const layout::ChildSum& sum) { return TouchesAny(areas, sum.visual); },
+                                   [&](uint32_t i) { visit(parent.children[i]->node()); });
         return;
     }
     for (const layout::HandlePtr& child : parent.children)

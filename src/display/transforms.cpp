@@ -164,10 +164,11 @@ class TransformPass {
     template <typename AddChild>
     static ChildSum SumChildren(LayoutNode& node, bool all, AddChild&& add) {
         const uint32_t count = node.children.size();
-        ChildGroups& groups = node.below->groups;
         if (count > ChildGroups::kFanout) {
-            if (!groups.Fit(count)) groups.Resize(count);
-            return groups.Update(all, add);
+            auto& groups = node.below->groups;
+            if (!groups) groups = MakeUnique<ChildGroups, MemoryTag::LayoutNodes>();
+            if (!groups->Fit(count)) groups->Resize(count);
+            return groups->Update(all, add);
         }
         ChildSum sum;
         for (uint32_t i = 0; i < count; ++i)
@@ -262,7 +263,7 @@ void MarkForTransform(LayoutHandle& handle) {
     uint32_t index = handle.node().index;
     for (LayoutHandle* parent = handle.node().parent; parent != nullptr; parent = parent->node().parent) {
         LayoutNode& node = parent->node();
-        const bool groupKnown = !node.below || !node.below->groups.MarkDirty(index);
+        const bool groupKnown = !node.below || !node.below->groups || !node.below->groups->MarkDirty(index);
         if (node.descendantNeedsTransform && groupKnown) break;
         node.descendantNeedsTransform = true;
         index = node.index;

@@ -49,6 +49,9 @@ class Text final : public CharacterData {
     qsl::RefPtr<Node> CloneNode(bool deep) override;
     void OnInsertedIntoDocument() override;
     void OnComputedStyleChanged() override;
+    // Its parent's text values, and of the others what texts are laid out and painted with.
+    css::LaidOutStyle& GetStyle() { return style_; }
+    const css::LaidOutStyle& GetStyle() const { return style_; }
     // Cuts this text at `offset` bytes; the rest becomes a new text behind it.
     qsl::RefPtr<Text> SplitText(size_t offset);
 
@@ -70,11 +73,14 @@ class Text final : public CharacterData {
 
   protected:
     void OnTextChanged() override;
+    css::LaidOutStyle* GetOwnLaidOutStyle() override { return &style_; }
+    void ResetStyle() override;
 
   private:
     void UpdateTransformedText();
     void ForgetTransformedText();
 
+    css::LaidOutStyle style_;
     qsl::RefPtr<layout::TextPositions> positions_;
     qsl::RefPtr<layout::TextFontStyle> font_style_;
 };

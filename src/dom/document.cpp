@@ -66,7 +66,7 @@ void Document::OnNodeDestroyed(Node& node) {
     ReleaseIfOrphaned();
 }
 
-void Document::ReleaseLater(NodeVector& children) {
+void Document::ReleaseLater(NodeChildren& children) {
     for (RefPtr<Node>& child : children)
         doomed_.push_back(std::move(child));
     children.clear();

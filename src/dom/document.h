@@ -208,7 +208,7 @@ class Document : public Element {
     void ForgetCollections(Node& node);
     void ForgetClassCollections(Node& node);
     // Nodes die one after the other, however deep they nest.
-    void ReleaseLater(NodeVector& children);
+    void ReleaseLater(NodeChildren& children);
     void CountNode(int change) { live_nodes_ += change; }
     void OnNodeDestroyed(Node& node);
 

@@ -16,7 +16,7 @@ using qsl::RefPtr;
 
 namespace {
 bool HasDisplay(const Node& node) {
-    return node.GetStyle().layout->display != css::CSSDisplay::None;
+    return node.GetLaidOutStyle().layout->display != css::CSSDisplay::None;
 }
 }  // namespace
 
@@ -50,15 +50,15 @@ void Document::RebuildLayoutTree() {
         AssertFailure("Missing HTML element, unable to create layout tree!");
         return;
     }
-    Node& root = *html_;
+    Element& root = *html_;
     layout::FontManager* fonts = host_->GetFontManager();
     layout_tree_.SetTextServices(
         {fonts ? &fonts->Service() : nullptr, host_->GetInternationalizationManager()});
-    root.layout_node_ = layout_tree_.CreateRoot({.style = root.style_,
+    root.layout_node_ = layout_tree_.CreateRoot({.style = root.GetStyle(),
                                                  .display = root.display_element_,
                                                  .link = root.GetLayoutLink(),
                                                  .scroll = root.GetStoredScroll()});
-    root.style_.written.Clear();
+    root.GetStyle().written.Clear();
     if (HasDisplay(root)) AppendLayoutSubtree(root, *root.layout_node_);
     layout_tree_built_ = true;
 }
@@ -80,7 +80,7 @@ void Document::AppendLayoutSubtree(Node& top, layout::LayoutHandle& handle) {
             layout::LayoutHandle* made = child.get() == html_
                                              ? child->layout_node_.get()
                                              : child->CreateLayoutNode(layout_tree_, *entry.parent).get();
-            if (made) child->style_.written.Clear();
+            if (made) child->GetOwnLaidOutStyle()->written.Clear();
             queue.push_back({child.get(), made ? made : entry.parent});
         }
     }
@@ -104,11 +104,11 @@ bool Document::AttachLayoutNode(Node& node) {
     if (node.layout_node_) {
         const uint32_t index = node.FindLayoutIndex(parent_handle);
         layout_tree_.Attach(*node.layout_node_, parent_handle, index);
-        layout_tree_.UpdateStyle(*node.layout_node_, node.style_);
+        layout_tree_.UpdateStyle(*node.layout_node_, *node.GetOwnLaidOutStyle());
     } else if (!node.CreateLayoutNode(layout_tree_, parent_handle)) {
         return false;
     }
-    node.style_.written.Clear();
+    node.GetOwnLaidOutStyle()->written.Clear();
     QueueLayoutChange(node);
     return true;
 }
@@ -122,8 +122,9 @@ void Document::DetachLayoutNode(Node& node) {
 
 bool Document::TakeChange(Node& node) {
     if (!node.layout_node_ || !node.IsInDocument()) return false;
-    layout_tree_.UpdateStyle(*node.layout_node_, node.style_);
-    node.style_.written.Clear();
+    css::LaidOutStyle& style = *node.GetOwnLaidOutStyle();
+    layout_tree_.UpdateStyle(*node.layout_node_, style);
+    style.written.Clear();
     return true;
 }
 
@@ -163,7 +164,7 @@ void Document::QueueTextCommit(Text& text) {
 
 TaskPtr Document::TakeFontPreload(fresco::IFontService& service) {
     for (Node* node : text_commits_) {
-        const css::LayoutStyleRefs& style = node->GetStyle();
+        const css::LaidOutStyle& style = node->GetLaidOutStyle();
         if (style.text) font_usage_.Add(style.text->typefaces, static_cast<Text*>(node)->GetDisplayedText());
     }
     return font_usage_.TakeTask(service);
@@ -242,6 +243,7 @@ void Document::NodeInserted(Node& node) {
 void Document::NodeRemoved(Node& node) {
     // Taking out the top of a subtree takes out the whole of it; those below have nothing left to unlink.
     DetachLayoutNode(node);
+    if (node.layout_node_) node.layout_node_->data().style = nullptr;
     node.layout_node_ = nullptr;
     for (NodeSet* set :
          {&style_dirty_nodes_, &selector_dirty_elements_, &layout_changes_, &transform_changes_,

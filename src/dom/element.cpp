@@ -15,7 +15,14 @@ namespace qorvex::dom {
 using qsl::RefPtr;
 
 Element::Element(Document& document, css::TagId tag, uint32_t extra_flags)
-    : Node(document, kIsElement | extra_flags, tag), dirty_properties_(css::PropertySet::All()) {}
+    : Node(document, kIsElement | extra_flags, tag), dirty_properties_(css::PropertySet::All()) {
+    // The document has no default style yet while it is constructed itself.
+    if (static_cast<Element*>(&document) != this) style_ = document.GetDefaultStyle();
+}
+
+void Element::ResetStyle() {
+    style_ = GetDocument()->GetDefaultStyle();
+}
 
 void Element::ToDebugString(NodeText& out) const {
     out.append("HTML");

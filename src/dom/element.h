@@ -78,7 +78,9 @@ class Element : public Node {
                                   std::optional<Atom> new_value);
     qsl::RefPtr<DOMTokenList> GetClassList();
 
-    // --- Style
+    // --- Style. What the solver reads and writes on every visit.
+    css::LayoutStyleRefs& GetStyle() { return style_; }
+    const css::LayoutStyleRefs& GetStyle() const { return style_; }
     // Null until the element was matched.
     const css::MatchState* GetMatchState() const { return match_state_.get(); }
     // Gives the one that stood there before.
@@ -160,6 +162,8 @@ class Element : public Node {
     ~Element() override = default;
     // Attributes and declared style.
     void CopyElementTo(Element& target);
+    css::LaidOutStyle* GetOwnLaidOutStyle() override { return &style_; }
+    void ResetStyle() override;
     // The document's own atoms are not there yet while the document itself is constructed.
     struct ForDocument {};
     Element(ForDocument, Document& document);
@@ -178,6 +182,7 @@ class Element : public Node {
     void QueueDependents();
     qsl::RefPtr<Node> InsertAdjacent(std::string_view position, qsl::RefPtr<Node> node);
 
+    css::LayoutStyleRefs style_;
     UniquePtr<css::StyleDeclarationSet, MemoryTag::DOM> inline_style_;
     css::PropertySet dirty_properties_;
     css::MatchStatePtr match_state_;

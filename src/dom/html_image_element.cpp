@@ -44,7 +44,7 @@ uint32_t RenderedSide(std::optional<float> laid_out, const Atom* attribute, floa
 }
 
 bool HasOpenSide(const Node& node) {
-    const css::LayoutStyle& style = *node.GetStyle().layout;
+    const css::LayoutStyle& style = *node.GetLaidOutStyle().layout;
     return !style.width.IsLength() || !style.height.IsLength();
 }
 

@@ -11,7 +11,7 @@ namespace {
 
 bool IsOnScreen(const Node& node) {
     const layout::LayoutResult* box = node.GetLayoutResult();
-    if (!box || node.GetStyle().visual->visibility != css::Visibility::Visible) return false;
+    if (!box || node.GetLaidOutStyle().visual->visibility != css::Visibility::Visible) return false;
     const HostSize view = node.GetDocument()->GetHost().GetViewSize();
     const layout::Rect& seen = box->visualAabb;
     return seen.width > 0 && seen.height > 0 && seen.x < static_cast<float>(view.width) &&

@@ -28,16 +28,21 @@ Node::Node(Document& document, uint32_t flags, css::TagId tag)
         return;
     }
     document.CountNode(1);
-    style_ = document.GetDefaultStyle();
 }
 
 Node::~Node() {
     if (link_) link_->Cut();
+    if (layout_node_) layout_node_->data().style = nullptr;
     for (const RefPtr<Node>& child : children_)
         child->parent_ = nullptr;
     if (IsItself(this, *document_)) return;
     document_->ReleaseLater(children_);
     document_->OnNodeDestroyed(*this);
+}
+
+const css::LaidOutStyle& Node::GetLaidOutStyle() const {
+    const css::LaidOutStyle* own = const_cast<Node*>(this)->GetOwnLaidOutStyle();
+    return own ? *own : document_->GetDefaultStyle();
 }
 
 Atom Node::GetNodeName() const {
@@ -67,7 +72,7 @@ Document* Node::GetOwnerDocument() const {
 
 size_t Node::GetIndexInParent() const {
     if (!parent_) return kNoIndex;
-    const NodeVector& siblings = parent_->children_;
+    const NodeChildren& siblings = parent_->children_;
     const size_t count = siblings.size();
     if (index_hint_ < count && siblings[index_hint_] == this) return index_hint_;
     if (count > 0 && siblings.front() == this) return index_hint_ = 0;
@@ -79,7 +84,7 @@ size_t Node::GetIndexInParent() const {
 // places, so that asking each of n siblings costs n.
 size_t Node::FindIndexInParent() const {
     constexpr size_t kNear = 64;
-    const NodeVector& siblings = parent_->children_;
+    const NodeChildren& siblings = parent_->children_;
     const size_t count = siblings.size();
     const size_t guess = std::min<size_t>(index_hint_, count);
     document_->work.siblingsSearched += kNear;
@@ -220,7 +225,7 @@ void Node::CopyCommon(Node& target, bool deep) {
     work.push_back({RefPtr<Node>(this), RefPtr<Node>(&target)});
     while (!work.empty()) {
         const auto [source, copy] = work.take_back();
-        const NodeVector children = source->children_;
+        const NodeChildren children = source->children_;
         for (const RefPtr<Node>& child : children) {
             RefPtr<Node> clone = child->CloneNode(false);
             // Past AppendChild, by which a script gathers its source: a clone has the source already.
@@ -242,7 +247,7 @@ RefPtr<NodeList> Node::GetChildNodes() {
 }
 
 RefPtr<NodeLink> Node::GetLayoutLink() {
-    if (!link_) link_ = qsl::AdoptRef(New<NodeLink, MemoryTag::DOM>(*this));
+    if (!link_) link_ = qsl::AdoptRef(NodeLink::Take(*this));
     return link_;
 }
 

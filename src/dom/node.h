@@ -43,6 +43,8 @@ struct ChildListChange;
 
 using NodeText = TaggedString<MemoryTag::DOM>;
 using NodeVector = Vector<qsl::RefPtr<Node>, MemoryTag::DOM>;
+// Of one node: mostly none or one.
+using NodeChildren = CompactVector<qsl::RefPtr<Node>, MemoryTag::DOM>;
 using NodeSet = qorvex::NodeSet<Node*, MemoryTag::DOM>;
 
 class Node : public EventTarget {
@@ -125,8 +127,9 @@ class Node : public EventTarget {
     void DisconnectSubtree();
 
     // --- Style. What the solver reads and writes on every visit is public.
-    css::LayoutStyleRefs& GetStyle() { return style_; }
-    const css::LayoutStyleRefs& GetStyle() const { return style_; }
+    // What layout takes of the node's style. Elements and texts have one of their own; it is the default
+    // style for all others.
+    const css::LaidOutStyle& GetLaidOutStyle() const;
     uint16_t pendingStyleBits = 0;
     uint8_t timesSolved = 0;
     uint8_t styleSolved = 1;
@@ -181,6 +184,9 @@ class Node : public EventTarget {
 
     // Listeners of this node, and clones of its children when `deep`.
     void CopyCommon(Node& target, bool deep);
+    // Null for a node without a style of its own.
+    virtual css::LaidOutStyle* GetOwnLaidOutStyle() { return nullptr; }
+    virtual void ResetStyle() {}
     void SetFlag(uint32_t flag, bool on) { flags_ = on ? flags_ | flag : flags_ & ~flag; }
     void SetScroll(layout::ScrollPosition wanted);
     layout::ScrollPosition ClampScroll(layout::ScrollPosition wanted) const;
@@ -218,13 +224,12 @@ class Node : public EventTarget {
     mutable uint32_t index_hint_ = 0;
     Node* parent_ = nullptr;
     Document* document_;
-    css::LayoutStyleRefs style_;
     layout::HandlePtr layout_node_;
-    NodeVector children_;
+    NodeChildren children_;
     UniquePtr<NodeRareData, MemoryTag::DOM> rare_;
     qsl::RefPtr<NodeLink> link_;
 };
 // Every node of a page pays for a word more.
-static_assert(sizeof(Node) == 192);
+static_assert(sizeof(Node) == 112);
 
 }  // namespace qorvex::dom

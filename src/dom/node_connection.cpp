@@ -91,7 +91,7 @@ void Node::OnInsertedIntoDocument() {
     SetFlag(kInDocument, true);
     if (parent_) depth_ = parent_->depth_ + 1;
     // What was solved in another place says nothing here.
-    style_ = document_->GetDefaultStyle();
+    ResetStyle();
 }
 
 void Node::OnSubtreeRemoved() {

@@ -9,9 +9,10 @@
 namespace qorvex::dom {
 
 layout::HandlePtr Node::CreateLayoutNode(layout::LayoutTree& tree, layout::LayoutHandle& parent) {
-    if (!Is(kDisplayable)) return nullptr;
+    css::LaidOutStyle* style = GetOwnLaidOutStyle();
+    if (!Is(kDisplayable) || !style) return nullptr;
     layout_node_ = tree.AddChild(parent, FindLayoutIndex(parent),
-                                 {.style = style_,
+                                 {.style = *style,
                                   .display = display_element_,
                                   .link = GetLayoutLink(),
                                   .scroll = GetStoredScroll(),
@@ -21,7 +22,7 @@ layout::HandlePtr Node::CreateLayoutNode(layout::LayoutTree& tree, layout::Layou
 
 uint32_t Node::FindLayoutIndex(const layout::LayoutHandle& parent) const {
     if (!parent_) return static_cast<uint32_t>(parent.data().children.size());
-    const NodeVector& siblings = parent_->children_;
+    const NodeChildren& siblings = parent_->children_;
     const size_t own_index = GetIndexInParent();
     // Behind the nearest sibling that has a handle. That one comes as far from the front as among the
     // siblings but for those without a handle, and children that arrive in order come behind the last one.

@@ -7,7 +7,7 @@
 namespace qorvex::dom {
 
 void NodeLink::Release() noexcept {
-    if (count_.fetch_sub(1, std::memory_order_acq_rel) == 1) Delete<MemoryTag::DOM>(this);
+    if (count_.fetch_sub(1, std::memory_order_acq_rel) == 1) Give(this);
 }
 
 void NodeLink::SetInLayoutTree(bool in_tree) {

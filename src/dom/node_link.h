@@ -3,7 +3,7 @@
 
 #include <atomic>
 
-#include "core/memory/containers.h"
+#include "core/memory/pool.h"
 #include "layout/node_link.h"
 #include "qsl/ref_ptr.h"
 
@@ -12,7 +12,7 @@ namespace qorvex::dom {
 class Node;
 
 // Counted from any thread; everything else on the script thread.
-class NodeLink final : public layout::INodeLink {
+class NodeLink final : public layout::INodeLink, public MTPoolObject<NodeLink, MemoryTag::DOM, 64> {
   public:
     explicit NodeLink(Node& node) : node_(&node) {}
 

@@ -112,7 +112,7 @@ bool Node::PlaceChild(RefPtr<Node>& child, Node* reference) {
 void Node::InsertFragment(Node& fragment, Node* reference, bool suppress_records) {
     const RefPtr<Node> self(this);
     const RefPtr<Node> reference_held(reference);
-    const NodeVector moved = fragment.children_;
+    const NodeChildren moved = fragment.children_;
     Node* previous =
         reference ? reference->parent_ == this ? reference->GetPreviousSibling() : nullptr : GetLastChild();
     const RefPtr<Node> previous_held(previous);
@@ -170,7 +170,7 @@ RefPtr<Node> Node::ReplaceChild(RefPtr<Node> new_child, Node* old_child) {
     if (next == new_child) next = RefPtr<Node>(new_child->GetNextSibling());
     const RefPtr<Node> previous(old_child->GetPreviousSibling());
 
-    NodeVector added;
+    NodeChildren added;
     if (new_child->Is(kIsFragment)) {
         added = new_child->children_;
     } else {
@@ -188,7 +188,7 @@ void Node::RemoveAllChildren() {
     if (children_.empty()) return;
     const RefPtr<Node> self(this);
     const bool was_in_document = IsInDocument();
-    NodeVector removed = std::move(children_);
+    NodeChildren removed = std::move(children_);
     const std::span<const RefPtr<Node>> nodes(removed.data(), removed.size());
     QueueChildListRecord({{}, nodes, nullptr, nullptr});
     for (const RefPtr<Node>& child : removed) {

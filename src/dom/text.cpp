@@ -11,7 +11,11 @@ namespace qorvex::dom {
 using qsl::RefPtr;
 
 Text::Text(Document& document, std::string_view data)
-    : CharacterData(document, kIsText | kDisplayable, data) {}
+    : CharacterData(document, kIsText | kDisplayable, data), style_(document.GetDefaultStyle()) {}
+
+void Text::ResetStyle() {
+    style_ = GetDocument()->GetDefaultStyle();
+}
 
 void Text::ToDebugString(NodeText& out) const {
     out.append("Text [");

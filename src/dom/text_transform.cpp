@@ -36,8 +36,8 @@ class Result final : public ITransformationResult {
 
 }  // namespace
 
-TextTransformResult TransformText(const css::LayoutStyleRefs& style, Document& document,
-                                  std::string_view text, NodeText& out) {
+TextTransformResult TransformText(const css::LaidOutStyle& style, Document& document, std::string_view text,
+                                  NodeText& out) {
     const std::optional<CaseOperation> operation = OperationOf(style.text->textTransform);
     if (!operation || text.empty()) return TextTransformResult::NotWanted;
     ITextTransformationManager* manager = document.GetHost().GetTextTransformationManager();

@@ -9,7 +9,7 @@ namespace qorvex::dom {
 
 enum class TextTransformResult { NotWanted, Failed, Done };
 
-TextTransformResult TransformText(const css::LayoutStyleRefs& style, Document& document,
-                                  std::string_view text, NodeText& out);
+TextTransformResult TransformText(const css::LaidOutStyle& style, Document& document, std::string_view text,
+                                  NodeText& out);
 
 }  // namespace qorvex::dom

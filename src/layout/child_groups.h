@@ -130,8 +130,8 @@ class ChildGroups {
 // What a node with children knows of them.
 struct ChildBounds {
     ChildSum sum;
-    ScrollPosition appliedScroll;  // under which their matrices were made
-    ChildGroups groups;
+    ScrollPosition appliedScroll;                           // under which their matrices were made
+    UniquePtr<ChildGroups, MemoryTag::LayoutNodes> groups;  // of many children
 };
 
 }  // namespace qorvex::layout

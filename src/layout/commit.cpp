@@ -35,21 +35,21 @@ void Sever(LayoutHandle& handle) {
 void CopyToLayoutSide(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
     LayoutData& data = handle.data();
     LayoutNode& node = handle.node();
-    data.changed = data.changed || data.style.written.Has(css::StyleGroup::Visual) ||
-                   data.style.written.Has(css::StyleGroup::TextLayout);
+    data.changed = data.changed || data.written.Has(css::StyleGroup::Visual) ||
+                   data.written.Has(css::StyleGroup::TextLayout);
     if (data.changed && data.inTree && dirty != nullptr) {
         dirty->Add(dsp::ClipToAncestors(node));
     }
-    node.style = data.style;
+    if (data.style != nullptr) node.style = *data.style;
+    node.style.written = data.written;
     node.display = data.display;
     node.scroll = data.scroll;
     node.flags = data.flags;
     node.zIndex = data.zIndex;
     node.parent = data.parent;
     // A layout or transform value may change paint order and stacking although every box stays.
-    node.visualChanged = node.visualChanged || data.changed ||
-                         data.style.written.Has(css::StyleGroup::Layout) ||
-                         data.style.written.Has(css::StyleGroup::Transform);
+    node.visualChanged = node.visualChanged || data.changed || data.written.Has(css::StyleGroup::Layout) ||
+                         data.written.Has(css::StyleGroup::Transform);
     // Text, its font or its element changed: the cached size may be wrong.
     if (data.changed && node.flex && YGNodeHasMeasureFunc(node.flex)) {
         if (dirty == nullptr)
@@ -58,11 +58,11 @@ void CopyToLayoutSide(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
             YGNodeMarkDirty(node.flex);
     }
     data.changed = false;
-    data.style.written.Clear();
+    data.written.Clear();
     if (!SameChildren(node.children, data.children)) {
         node.children = data.children;
         // The bounds by groups are made anew: any child may have moved to another one.
-        if (node.below) node.below->groups.Clear();
+        if (node.below && node.below->groups) node.below->groups->Clear();
         node.childrenChanged = true;
     }
 }

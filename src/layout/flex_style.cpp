@@ -109,7 +109,8 @@ YGAlign SelfAlignment(const LayoutNode& node) {
 // Children that stand for themselves need not have changed when their container becomes another kind.
 void SyncChildAlignment(LayoutNode& container) {
     const bool isFlex = container.style.layout->display == css::CSSDisplay::Flex;
-    if (std::exchange(container.wasFlexContainer, isFlex) == isFlex) return;
+    if (container.wasFlexContainer == isFlex) return;
+    container.wasFlexContainer = isFlex;
     for (const HandlePtr& child : container.children) {
         const LayoutNode& node = child->node();
         if (node.flags.isReplaced && node.flex != nullptr)

@@ -36,7 +36,7 @@ template <typename T>
 class ObjectPool;
 class LayoutTree;
 using HandlePtr = qsl::RefPtr<LayoutHandle>;
-using HandleVector = Vector<HandlePtr, MemoryTag::LayoutNodes>;
+using HandleVector = CompactVector<HandlePtr, MemoryTag::LayoutNodes>;
 
 // Facts that follow from a node's style alone. Computed on the layout side, mirrored to the DOM side.
 struct NodeFlags {
@@ -108,8 +108,9 @@ struct LayoutData {
     HandleVector children;  // DOM order among the siblings that have handles
     dsp::DisplayElementPtr display;
     NodeLinkPtr node;
-    // The small fields stand in the room that a style leaves at its end.
-    [[no_unique_address]] css::LaidOutStyle style;
+    // Of the node, read by the commit. Null once the node has died or left the document.
+    const css::LaidOutStyle* style = nullptr;
+    css::WrittenGroups written;  // since the last commit
     NodeFlags flags;
     bool establishesStackingContext : 1 = false;
     bool isImage : 1 = false;
@@ -119,7 +120,7 @@ struct LayoutData {
     ScrollPosition scroll;
     LayoutResult result;
 };
-static_assert(sizeof(LayoutData) == 160);
+static_assert(sizeof(LayoutData) == 128);
 
 // What a node paints by itself; found when its style, its display element or its borders change, so that the
 // recording asks for nothing that is not there.
@@ -137,15 +138,16 @@ struct LayoutNode {
     HandleVector children;
     Rect visualAabb{};  // what the node and its subtree can touch, view coordinates
     Rect box{};         // document coordinates; z and the pixel grid play no part yet
+    // Small fields stand in the room that the member before them leaves at its end.
+    [[no_unique_address]] css::LaidOutStyle style;
     NodeFlags flags;
     bool establishesStackingContext = false;
     uint8_t ownPaint = 0;  // OwnPaint
     int32_t zIndex = 0;
-    // Depth below the root, which is 0. Nodes at kMaxLayoutDepth and deeper keep zero boxes.
-    uint32_t depth = 0;
-    css::LaidOutStyle style;
     dsp::DisplayElementPtr display;
     Rect paintBounds{};  // what the node's own content can touch, view coordinates
+    // Depth below the root, which is 0. Nodes at kMaxLayoutDepth and deeper keep zero boxes.
+    uint32_t depth = 0;
     // Made by the transform pass where there are children.
     UniquePtr<ChildBounds, MemoryTag::LayoutNodes> below;
 
@@ -156,36 +158,37 @@ struct LayoutNode {
     ScrollPosition scroll;
     SharedEdges edges;
     Rect aabb{};  // snapped box and in-flow overflow, document coordinates
-    WorldMatrix world;
+    // Place among the parent's children, for the bounds that the parent keeps by groups of children.
+    uint32_t index = 0;
     // Present only where the style needs them.
     UniquePtr<Matrix, MemoryTag::LayoutNodes> local;
     UniquePtr<Matrix, MemoryTag::LayoutNodes> perspective;
     UniquePtr<dsp::ResolvedVisuals, MemoryTag::LayoutNodes> visuals;
 
-    int32_t previousZIndex = 0;  // as of the last SyncTrees, like the others of this kind
-    // Place among the parent's children, for the bounds that the parent keeps by groups of children.
-    uint32_t index = 0;
-    bool previousStacking = false;
-    bool previousPositioned = false;
-    bool previousClip = false;
+    [[no_unique_address]] WorldMatrix world;
+    // As of the last SyncTrees.
+    bool previousStacking : 1 = false;
+    bool previousPositioned : 1 = false;
+    bool previousClip : 1 = false;
 
     // One frame long; SyncTrees clears them.
-    bool visualChanged = false;
-    bool rectChanged = false;
-    bool boxMetricsChanged = false;
+    bool visualChanged : 1 = false;
+    bool rectChanged : 1 = false;
+    bool boxMetricsChanged : 1 = false;
     // What the element measures changed, and the next layout asks whether its size did.
-    bool contentChanged = false;
+    bool contentChanged : 1 = false;
 
     // Sticky and conservative: there is an absolute or fixed box below, whose containing block may lie above
     // this node. When it is set here, it is set on all ancestors.
-    bool absoluteBelow = false;
+    bool absoluteBelow : 1 = false;
     // The transform pass must look at this node, or somewhere below it.
-    bool needsTransform = true;
-    bool descendantNeedsTransform = false;
+    bool needsTransform : 1 = true;
+    bool descendantNeedsTransform : 1 = false;
     // The commit gave the node other children, so what their bounds add up to is not known.
-    bool childrenChanged = false;
+    bool childrenChanged : 1 = false;
     // What Yoga was told last about the node as a container.
-    bool wasFlexContainer = false;
+    bool wasFlexContainer : 1 = false;
+    int32_t previousZIndex = 0;  // as of the last SyncTrees
 
     const Edges& border() const { return edges.border(); }
     const Edges& padding() const { return edges.padding(); }
@@ -196,6 +199,7 @@ struct LayoutNode {
     // Beyond the depth limit a node takes no part in layout, transforms and painting.
     bool IsBeyondLimit() const { return depth >= limits::kMaxLayoutDepth; }
 };
+static_assert(sizeof(LayoutNode) == 224);
 
 class LayoutHandle {
   public:

@@ -18,9 +18,9 @@ LayoutTree::~LayoutTree() {
 HandlePtr LayoutTree::Create(NewNode&& node) {
     HandlePtr handle = store_->MakeHandle();
     LayoutData& data = handle->data();
-    data.style = node.style;
+    data.style = &node.style;
     // The first commit carries everything.
-    data.style.written.AddAll();
+    data.written.AddAll();
     data.display = std::move(node.display);
     data.node = std::move(node.link);
     data.scroll = node.scroll;
@@ -107,9 +107,8 @@ void LayoutTree::MarkChanged(LayoutHandle& handle) {
 
 void LayoutTree::UpdateStyle(LayoutHandle& handle, const css::LaidOutStyle& style) {
     LayoutData& data = handle.data();
-    const css::WrittenGroups pending = data.style.written;
-    data.style = style;
-    data.style.written |= pending;
+    data.style = &style;
+    data.written |= style.written;
     changed_.Insert(&handle);
 }
 

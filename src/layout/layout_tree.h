@@ -16,6 +16,7 @@ namespace qorvex::layout {
 
 // What a node brings along when its handle is made.
 struct NewNode {
+    // Stays where it is until the node has left the document; the commit reads it.
     const css::LaidOutStyle& style;
     dsp::DisplayElementPtr display;
     NodeLinkPtr link;
@@ -49,7 +50,8 @@ class LayoutTree {
 
     // The next commit copies the handle.
     void MarkChanged(LayoutHandle& handle);
-    // Takes over the element's groups; the caller clears the element's own written flags after it.
+    // The next commit takes over the element's groups; the caller clears the element's written flags after
+    // it.
     void UpdateStyle(LayoutHandle& handle, const css::LaidOutStyle& style);
     void SetScroll(LayoutHandle& handle, ScrollPosition scroll);
     void SetDisplayElement(LayoutHandle& handle, dsp::DisplayElementPtr display);

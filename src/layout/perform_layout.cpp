@@ -63,8 +63,9 @@ void CollectChanged(const LayoutPass& pass, TempVector<LayoutHandle*>& changed) 
 }
 
 bool TakeContentChange(LayoutNode& node) {
-    return std::exchange(node.contentChanged, false) && node.flex != nullptr &&
-           YGNodeHasMeasureFunc(node.flex);
+    const bool changed = node.contentChanged;
+    node.contentChanged = false;
+    return changed && node.flex != nullptr && YGNodeHasMeasureFunc(node.flex);
 }
 
 // For layouts that do not ask whether sizes hold.

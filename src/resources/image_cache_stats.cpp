@@ -59,7 +59,7 @@ ImagesList* CachedImagesManager::ListImages(const dom::Document& document, unsig
             for (const auto& [key, holder] : image.holders.GetAll()) {
                 const dom::Node* node = holder.document == &document ? holder.node.get() : nullptr;
                 if (!node) continue;
-                const bool hidden = node->GetStyle().layout->display == css::CSSDisplay::None;
+                const bool hidden = node->GetLaidOutStyle().layout->display == css::CSSDisplay::None;
                 if (hidden && !(flags & kHiddenToo)) continue;
                 list->Add(image.url.GetText());
                 break;

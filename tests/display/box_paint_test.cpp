@@ -11,7 +11,7 @@ constexpr const char* kBox = "position: absolute; left: 100px; top: 50px; width:
 
 TEST_F(BoxPaintTest, BackgroundsAndBorders) {
     LayoutHandle* box = page.Add(page.body, kBox);
-    const css::LaidOutStyle plain = box->data().style;
+    const css::LaidOutStyle plain = *box->data().style;
     struct Case {
         const char* style;
         const char* records;
@@ -53,7 +53,7 @@ TEST_F(BoxPaintTest, BackgroundsAndBorders) {
          "PushState 2\nMultiplyTransform 1 0 0 1 100 50\nFillPath #0000ffff\nPopState 0\n"},
     };
     for (const Case& c : cases) {
-        page.tree.UpdateStyle(*box, plain);
+        page.Restore(box, plain);
         page.Change(box, c.style);
         std::string records = Join(Frame());
         EXPECT_EQ(records, c.records) << c.style;

@@ -28,7 +28,7 @@ class ParagraphTest : public LayoutTest {
         css::LayoutStyleRefs refs = Page::Style(style);
         refs.Mutable<css::TextLayoutStyle>().typefaces.push_back(font);
         kept.push_back(page.tree.AddChild(*parent, parent->data().children.size(),
-                                          {refs, std::move(display), nullptr, {}, false}));
+                                          {page.Store(refs), std::move(display), nullptr, {}, false}));
         return kept.back().get();
     }
     LayoutHandle* Paragraph(std::string_view style) {

@@ -88,7 +88,7 @@ TEST_F(RecordTest, ClearsOnlyWhatTheCanvasDoesNotHide) {
 TEST_F(RecordTest, LayersOpenOnlyWhereAsked) {
     LayoutHandle* box = page.Add(page.body, "width: 10px; height: 10px; background-color: red");
     page.Add(box, "width: 5px; height: 5px; background-color: blue");
-    const css::LaidOutStyle plain = box->data().style;
+    const css::LaidOutStyle plain = *box->data().style;
     struct Case {
         const char* style;
         const char* layer;
@@ -112,7 +112,7 @@ TEST_F(RecordTest, LayersOpenOnlyWhereAsked) {
         {"mask-image: linear-gradient(red, transparent)", "BeginLayer", 2, 2},
     };
     for (const Case& c : cases) {
-        page.tree.UpdateStyle(*box, plain);
+        page.Restore(box, plain);
         page.Change(box, c.style);
         const auto lines = Frame();
         EXPECT_EQ(CountOf(lines, c.layer), c.count) << c.style;

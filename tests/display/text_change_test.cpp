@@ -32,7 +32,7 @@ class Labels {
             auto display = MakeRef<DisplayText>();
             display->SetText(texts[i]);
             displays.push_back(display);
-            handles.push_back(page.tree.AddChild(*box, 0, {style, display, nullptr, {}, false}));
+            handles.push_back(page.tree.AddChild(*box, 0, {page.Store(style), display, nullptr, {}, false}));
         }
         page.Settle();
     }

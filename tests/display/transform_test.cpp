@@ -164,9 +164,9 @@ TEST_F(TransformTest, StackingContexts) {
         {"overflow: hidden", false, 0},
         {"position: relative", false, 0},
     };
-    const css::LaidOutStyle plain = box->data().style;
+    const css::LaidOutStyle plain = *box->data().style;
     for (const Case& c : cases) {
-        page.tree.UpdateStyle(*box, plain);
+        page.Restore(box, plain);
         page.Change(box, c.style);
         page.Frame();
         EXPECT_EQ(box->data().establishesStackingContext, c.context) << c.style;

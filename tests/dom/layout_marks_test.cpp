@@ -9,8 +9,8 @@ using qsl::RefPtr;
 
 class LayoutMarksTest : public DomTest {
   protected:
-    static void SetDisplay(Node& node, css::CSSDisplay display) {
-        node.GetStyle().Mutable<css::LayoutStyle>().display = display;
+    static void SetDisplay(Element& element, css::CSSDisplay display) {
+        element.GetStyle().Mutable<css::LayoutStyle>().display = display;
     }
     // Ids and texts of the layout tree below a handle.
     static std::string Boxes(const layout::LayoutHandle& handle) {

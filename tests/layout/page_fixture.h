@@ -12,6 +12,7 @@
 #include "support/scoped_library_state.h"
 #include "support/style_text.h"
 
+#include <deque>
 #include <string>
 #include <vector>
 
@@ -55,7 +56,7 @@ class FakeNode final : public layout::INodeLink {
 class Page {
   public:
     explicit Page(uint32_t width = 1000, uint32_t height = 500) : viewWidth(width), viewHeight(height) {
-        root = Keep(tree.CreateRoot({Style(""), MakeRef<dsp::DisplayHTML>(), nullptr, {}, false}));
+        root = Keep(tree.CreateRoot({Store(Style("")), MakeRef<dsp::DisplayHTML>(), nullptr, {}, false}));
         body = Add(root, "");
     }
     Page(const Page&) = delete;
@@ -67,25 +68,32 @@ class Page {
         return style;
     }
 
+    // For a handle: the commit reads the style where it stands.
+    css::LayoutStyleRefs& Store(const css::LayoutStyleRefs& style) { return styles_.emplace_back(style); }
+
     layout::LayoutHandle* Add(layout::LayoutHandle* parent, std::string_view style) {
         return Insert(parent, parent->data().children.size(), style);
     }
     layout::LayoutHandle* Insert(layout::LayoutHandle* parent, uint32_t index, std::string_view style,
                                  layout::NodeLinkPtr link = nullptr) {
-        return Keep(tree.AddChild(*parent, index, {Style(style), MakeRef<dsp::Box>(), link, {}, false}));
+        return Keep(
+            tree.AddChild(*parent, index, {Store(Style(style)), MakeRef<dsp::Box>(), link, {}, false}));
     }
     layout::LayoutHandle* AddText(layout::LayoutHandle* parent, RefPtr<FakeText> text,
                                   std::string_view style = "") {
-        return Keep(
-            tree.AddChild(*parent, parent->data().children.size(), {Style(style), text, nullptr, {}, false}));
+        return Keep(tree.AddChild(*parent, parent->data().children.size(),
+                                  {Store(Style(style)), text, nullptr, {}, false}));
     }
     // Adds declarations to the style that the handle has.
     void Change(layout::LayoutHandle* handle, std::string_view style) {
-        css::LayoutStyleRefs changed = css::DefaultStyles();
-        static_cast<css::LaidOutStyle&>(changed) = handle->data().style;
-        changed.written.Clear();
-        EXPECT_TRUE(ApplyDeclarations(changed, style)) << style;
-        tree.UpdateStyle(*handle, changed);
+        css::LayoutStyleRefs& own = OwnStyle(handle);
+        own.written.Clear();
+        EXPECT_TRUE(ApplyDeclarations(own, style)) << style;
+        tree.UpdateStyle(*handle, own);
+    }
+    void Restore(layout::LayoutHandle* handle, const css::LaidOutStyle& style) {
+        static_cast<css::LaidOutStyle&>(OwnStyle(handle)) = style;
+        tree.UpdateStyle(*handle, OwnStyle(handle));
     }
 
     layout::LayoutPass MakePass() {
@@ -95,7 +103,7 @@ class Page {
     // A frame up to the recording.
     void Frame(layout::LayoutWork work = layout::LayoutWork::Layout) {
         update = MakeRef<layout::LayoutUpdateData>();
-        update->bodyDisplay = body->data().style.layout->display;
+        update->bodyDisplay = body->data().style->layout->display;
         tree.Commit(*update, work == layout::LayoutWork::Layout ? nullptr : &dirty, nullptr);
         layout::LayoutPass pass = MakePass();
         pass.everything = everything;
@@ -130,6 +138,12 @@ class Page {
         kept_.push_back(handle);
         return handle.get();
     }
+    // All styles of this page come from Store.
+    static css::LayoutStyleRefs& OwnStyle(layout::LayoutHandle* handle) {
+        return const_cast<css::LayoutStyleRefs&>(
+            static_cast<const css::LayoutStyleRefs&>(*handle->data().style));
+    }
+    std::deque<css::LayoutStyleRefs> styles_;
     std::vector<layout::HandlePtr> kept_;
 };
 

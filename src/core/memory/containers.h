@@ -4,6 +4,7 @@
 #include "core/memory/allocator.h"
 #include "core/memory/ref_counted.h"
 #include "core/memory/temp_vector.h"
+#include "qsl/compact_vector.h"
 #include "qsl/function.h"
 #include "qsl/hash_map.h"
 #include "qsl/hash_set.h"
@@ -20,6 +21,8 @@ using String = TaggedString<MemoryTag::General>;
 
 template <class T, MemoryTag Tag = MemoryTag::General>
 using Vector = qsl::Vector<T, TaggedStdAllocator<T, Tag>>;
+template <class T, MemoryTag Tag = MemoryTag::General>
+using CompactVector = qsl::CompactVector<T, TaggedStdAllocator<T, Tag>>;
 template <class T, uint32_t N, MemoryTag Tag = MemoryTag::General>
 using SmallVector = qsl::SmallVector<T, N, TaggedStdAllocator<T, Tag>>;
 

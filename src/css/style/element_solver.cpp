@@ -42,7 +42,7 @@ class ElementSolver {
     ElementSolver(Element& element, StyleRun& run)
         : element_(element),
           run_(run),
-          parentNode_(*element.GetParent()),
+          parentNode_(static_cast<Element&>(*element.GetParent())),
           style_(element.GetStyle()),
           parent_(parentNode_.GetStyle()),
           match_(element.GetMatchState() ? *element.GetMatchState() : run.nothingMatched),
@@ -97,7 +97,7 @@ class ElementSolver {
         PropertySet added;
         // Above the root stand the initial values, which do not change.
         if (!parentNode_.Is(dom::kIsDocument)) {
-            const PropertySet& parentDirty = static_cast<Element&>(parentNode_).GetDirtyProperties();
+            const PropertySet& parentDirty = parentNode_.GetDirtyProperties();
             if (!parentDirty.Empty()) {
                 added = (parentDirty & kInheritedProperties) | (parentDirty & match_.inheriting());
                 // A variable may hold the word inherit; inside calc(), an em is the parent's.
@@ -314,7 +314,7 @@ class ElementSolver {
 
     Element& element_;
     StyleRun& run_;
-    dom::Node& parentNode_;
+    Element& parentNode_;  // the document counts as one
     LayoutStyleRefs& style_;
     const LayoutStyleRefs& parent_;
     const MatchState& match_;

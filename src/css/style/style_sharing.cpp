@@ -34,7 +34,7 @@ const StyleSharingTable::Entry* StyleSharingTable::Find(const Key& key, const do
         const Entry& entry = entries_[i];
         if (entry.run != run_ || !(entry.key == key)) continue;
         if (entry.element->GetMatchState() != element.GetMatchState()) continue;
-        const dom::Node* otherParent = entry.element->GetParent();
+        const auto* otherParent = static_cast<const dom::Element*>(entry.element->GetParent());
         if (otherParent && otherParent->GetStyle().SameGroups(parent)) return &entry;
     }
     return nullptr;

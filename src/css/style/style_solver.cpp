@@ -50,7 +50,7 @@ void SortForLayout(List& list) {
 }
 
 bool HasDisplay(const Node& node) {
-    return node.GetStyle().layout->display != CSSDisplay::None;
+    return node.GetLaidOutStyle().layout->display != CSSDisplay::None;
 }
 
 }  // namespace
@@ -246,7 +246,7 @@ bool StyleSolver::SolveNode(Node& node, StyleRun& run) {
 
 void StyleSolver::SolveText(Node& text, StyleRun& run) {
     if (text.timesSolved < 2) ++text.timesSolved;
-    uint32_t mask = SolveTextNode(text, run);
+    uint32_t mask = SolveTextNode(static_cast<dom::Text&>(text), run);
     if (!text.styleSolved) {
         text.styleSolved = 1;
         mask |= dom::kChangeLayout;

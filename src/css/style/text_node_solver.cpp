@@ -30,16 +30,16 @@ bool DiffersInLayout(const TextLayoutStyle& a, const TextLayoutStyle& b) {
 }
 
 template <class Group>
-bool Take(LayoutStyleRefs& style, const StyleHandle<Group>& group) {
-    if (style.Handle<Group>() == group) return false;
-    style.Handle<Group>() = group;
+bool Take(LaidOutStyle& style, StyleHandle<Group>& own, const StyleHandle<Group>& group) {
+    if (own == group) return false;
+    own = group;
     style.written.Add(kGroupOf<Group>);
     return true;
 }
 
-uint32_t TakeParentText(LayoutStyleRefs& style, const LayoutStyleRefs& parent) {
+uint32_t TakeParentText(LaidOutStyle& style, const LaidOutStyle& parent) {
     const StyleHandle<TextLayoutStyle> old = style.text;
-    if (!Take(style, parent.text)) return 0;
+    if (!Take(style, style.text, parent.text)) return 0;
     uint32_t mask = dom::kChangeVisual;
     if (DiffersInLayout(*old, *parent.text)) mask |= dom::kChangeLayout;
     if (old->textTransform != parent.text->textTransform) mask |= dom::kChangeTextTransform;
@@ -48,18 +48,18 @@ uint32_t TakeParentText(LayoutStyleRefs& style, const LayoutStyleRefs& parent) {
 
 }  // namespace
 
-uint32_t SolveTextNode(dom::Node& text, StyleRun& run) {
+uint32_t SolveTextNode(dom::Text& text, StyleRun& run) {
     ++run.counters.textNodesSolved;
-    const LayoutStyleRefs& parent = text.GetParent()->GetStyle();
-    LayoutStyleRefs& style = text.GetStyle();
+    const LaidOutStyle& parent = text.GetParent()->GetLaidOutStyle();
+    LaidOutStyle& style = text.GetStyle();
     uint32_t mask = dom::kChangeSolved;
     const CSSDisplay display = parent.layout->display;
     // Below a parent without display the kind stays what it was: nothing is laid out, and nothing changes.
     const uint8_t kind =
         display == CSSDisplay::None ? style.layout->textKind : TextKindOf(parent.text->whiteSpace);
-    if (Take(style, run.textStyles.LayoutFor(display, kind))) mask |= dom::kChangeLayout;
+    if (Take(style, style.layout, run.textStyles.LayoutFor(display, kind))) mask |= dom::kChangeLayout;
     mask |= TakeParentText(style, parent);
-    if (Take(style, run.textStyles.VisualFor(*parent.visual))) mask |= dom::kChangeVisual;
+    if (Take(style, style.visual, run.textStyles.VisualFor(*parent.visual))) mask |= dom::kChangeVisual;
     if (style.written.Has(StyleGroup::Transform)) mask |= dom::kChangeTransform;
 
     const bool inLayout = text.Is(dom::kInLayoutTree);

@@ -2,10 +2,11 @@
 #pragma once
 
 #include "css/style/style_run.h"
+#include "dom/character_data.h"
 
 namespace qorvex::css {
 
 // dom::ChangeMask bits of what changed.
-[[nodiscard]] uint32_t SolveTextNode(dom::Node& text, StyleRun& run);
+[[nodiscard]] uint32_t SolveTextNode(dom::Text& text, StyleRun& run);
 
 }  // namespace qorvex::css

@@ -56,8 +56,9 @@ struct LinePlacement {
 };
 
 struct TextInfo {
-    TextArray<TextLineInfo> lines;
-    TextArray<TextRun> runs;
+    // Most texts are one run on one line.
+    SmallVector<TextLineInfo, 1, MemoryTag::LayoutData> lines;
+    SmallVector<TextRun, 1, MemoryTag::LayoutData> runs;
     TextArray<fresco::Glyph> glyphs;  // one for each character, spaces included, in the plain path
     // For each glyph the character that its cluster begins with; empty where glyph i of a run is its
     // character i.

@@ -231,7 +231,7 @@ TEST_F(Engine, FamiliesAreResolvedWhereTheyAreDeclared) {
          ".f { font-family: A, B } .b { font-weight: bold } @font-face { font-family: A; src: url(a.ttf) }");
     EXPECT_EQ(fonts.faces, 1);
     Solve();
-    const auto& faces = Find("p").GetFirstChild()->GetStyle().text->typefaces;
+    const auto& faces = Find("p").GetFirstChild()->GetLaidOutStyle().text->typefaces;
     ASSERT_EQ(faces.size(), 3u);
     EXPECT_EQ(faces[0], 4u);
     EXPECT_EQ(faces[2], 100u);
@@ -241,7 +241,7 @@ TEST_F(Engine, FamiliesAreResolvedWhereTheyAreDeclared) {
     EXPECT_EQ(fonts.calls, calls);
     Find("p").SetAttribute("style", "font-weight: bold");
     Solve();
-    EXPECT_EQ(Find("p").GetFirstChild()->GetStyle().text->typefaces[0], 7u);
+    EXPECT_EQ(Find("p").GetFirstChild()->GetLaidOutStyle().text->typefaces[0], 7u);
     Drop();
 }
 
@@ -254,13 +254,13 @@ TEST_F(Engine, AFontThatArrivesReachesAllWhoShareTheStyle) {
     Load("<div class='f'>a</div><div class='f'>b<i id='i'>c</i></div>", ".f { font-family: A }");
     Solve();
     const dom::Node& text = *Find("i").GetFirstChild();
-    EXPECT_EQ(text.GetStyle().text->typefaces[0], kNoTypeface);
+    EXPECT_EQ(text.GetLaidOutStyle().text->typefaces[0], kNoTypeface);
     fonts.ready = true;
     for (const layout::NodeLinkPtr& waiter : fonts.waiters)
         waiter->Receive(layout::DOMTaskKind::FontArrived, Arrived());
     Solve();
     for (const dom::Node* node = &Body(); node; node = node->GetNextInTree(&Body())) {
-        if (node->IsText()) EXPECT_EQ(node->GetStyle().text->typefaces[0], 4u);
+        if (node->IsText()) EXPECT_EQ(node->GetLaidOutStyle().text->typefaces[0], 4u);
     }
     fonts.waiters.clear();
     Drop();

@@ -64,18 +64,21 @@ std::string StyleTest::DumpAll() {
     for (dom::Node* node = document_->GetNextInTree(document_.get()); node;
          node = node->GetNextInTree(document_.get())) {
         if (!node->IsElement() && !node->IsText()) continue;
+        LayoutStyleRefs style = DefaultStyles();
+        if (node->IsElement()) style = static_cast<dom::Element*>(node)->GetStyle();
+        static_cast<LaidOutStyle&>(style) = node->GetLaidOutStyle();
         out.append(node->GetNodeName().view());
         out.append("\n");
         for (size_t i = 0; i < kLonghandCount; ++i) {
             const auto id = static_cast<PropertyId>(i);
-            SerialiseValue(id, node->GetStyle().Field(id), out);
+            SerialiseValue(id, style.Field(id), out);
             out.append("\n");
         }
-        const TextLayoutDerived& text = *node->GetStyle().text;
+        const TextLayoutDerived& text = *style.text;
         char line[128];
         std::snprintf(line, sizeof line, "%g %g %g %g %d %d\n", text.computedFontSize,
                       text.computedStrokeWidth, text.computedLetterSpacing, text.computedLineHeight,
-                      text.computedFontWeight, node->GetStyle().layout->textKind);
+                      text.computedFontWeight, style.layout->textKind);
         out.append(line);
     }
     return std::string(std::string_view(out));

@@ -26,7 +26,7 @@ TEST_F(WorkCount, EqualElementsShareTheirGroups) {
     EXPECT_GE(first.stylesShared, 990u);
     std::set<const void*> layouts, visuals, texts, textNodeVisuals;
     for (dom::Node* node = &Body(); node; node = node->GetNextInTree(&Body())) {
-        const LayoutStyleRefs& style = node->GetStyle();
+        const LaidOutStyle& style = node->GetLaidOutStyle();
         layouts.insert(style.layout.get());
         texts.insert(style.text.get());
         (node->IsText() ? textNodeVisuals : visuals).insert(style.visual.get());
