@@ -1,6 +1,7 @@
 // Loops over rows of pixels, each written three ways: plain (one pixel after the other, the reference), SSE2
-// and AVX2. FRESCO_ROW_LOOPS is the one table of them; a new loop is a row here and a function of its name in
-// rows_plain.cpp and rows_wide.inc. All ways give the same pixels, bit for bit.
+// and AVX2; the plainest blends of long rows for AVX-512 too. FRESCO_ROW_LOOPS is the one table of them; a
+// new loop is a row here and a function of its name in rows_plain.cpp and rows_wide.inc. All ways give the
+// same pixels, bit for bit.
 //
 // Pixels are premultiplied RGBA8. No row may overlap another one but where it says so.
 #pragma once
@@ -91,7 +92,7 @@ struct RowLoops {
 #undef FRESCO_ROW_LOOP
 };
 
-enum class RowWay : uint8_t { Plain, Sse2, Avx2 };
+enum class RowWay : uint8_t { Plain, Sse2, Avx2, Avx512 };
 
 // Null for a way that this processor does not know.
 const RowLoops* GetRowLoops(RowWay way);

@@ -49,11 +49,32 @@ inline Wide Ascending() {
     return _mm256_set_epi32(7, 6, 5, 4, 3, 2, 1, 0);
 }
 
-inline Wide LoadPart(const uint32_t* p, Wide inside) {
+// The alphas of pixels in both 16-bit lanes of each.
+inline Wide AlphaWords(Wide pixels) {
+    return _mm256_shuffle_epi8(
+        pixels, _mm256_set_epi8(-1, 15, -1, 15, -1, 11, -1, 11, -1, 7, -1, 7, -1, 3, -1, 3, -1, 15, -1, 15,
+                                -1, 11, -1, 11, -1, 7, -1, 7, -1, 3, -1, 3));
+}
+
+inline bool AllOpaque(Wide pixels) {
+    return _mm256_testc_si256(pixels, _mm256_set1_epi32(int(0xFF000000u)));
+}
+
+inline bool AllBlank(Wide pixels) {
+    return _mm256_testz_si256(pixels, pixels);
+}
+
+using Inside = Wide;
+
+inline Inside FirstPixels(int count) {
+    return _mm256_cmpgt_epi32(_mm256_set1_epi32(count), Ascending());
+}
+
+inline Wide LoadPart(const uint32_t* p, Inside inside) {
     return _mm256_maskload_epi32(reinterpret_cast<const int*>(p), inside);
 }
 
-inline void StorePart(uint32_t* p, Wide inside, Wide v) {
+inline void StorePart(uint32_t* p, Inside inside, Wide v) {
     _mm256_maskstore_epi32(reinterpret_cast<int*>(p), inside, v);
 }
 

@@ -37,6 +37,20 @@ inline Wide SpreadAlpha(Wide unpacked) {
     return _mm_shufflehi_epi16(_mm_shufflelo_epi16(unpacked, 0xFF), 0xFF);
 }
 
+// The alphas of pixels in both 16-bit lanes of each.
+inline Wide AlphaWords(Wide pixels) {
+    const Wide alphas = _mm_srli_epi32(pixels, 24);
+    return _mm_or_si128(alphas, _mm_slli_epi32(alphas, 16));
+}
+
+inline bool AllOpaque(Wide pixels) {
+    return (_mm_movemask_epi8(_mm_cmpeq_epi8(pixels, _mm_set1_epi32(-1))) & 0x8888) == 0x8888;
+}
+
+inline bool AllBlank(Wide pixels) {
+    return _mm_movemask_epi8(_mm_cmpeq_epi8(pixels, _mm_setzero_si128())) == 0xFFFF;
+}
+
 inline Wide Lookup(const uint32_t* table, Wide index) {
     alignas(16) int32_t at[4];
     _mm_store_si128(reinterpret_cast<Wide*>(at), index);

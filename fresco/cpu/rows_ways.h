@@ -7,6 +7,8 @@ namespace fresco::cpu {
 extern const RowLoops kPlainRows;
 extern const RowLoops* const kSse2Rows;
 extern const RowLoops* const kAvx2Rows;
+// Puts the loops that are written for AVX-512 in place of others.
+void TakeAvx512Rows(RowLoops* rows);
 
 // For the body of a way: the table of the functions that it has defined.
 #define FRESCO_ROW_ENTRY(name, parameters) name,

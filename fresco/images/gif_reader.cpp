@@ -8,6 +8,7 @@ namespace {
 
 // What a walk over the blocks tells without unpacking any.
 struct GifExtent {
+    bool begins = false;  // the first frame does, at least
     uint32_t frames = 0;  // that are wholly there
     uint64_t pixels = 0;  // of all; a frame may be larger than the canvas, which cuts it
 };
@@ -27,6 +28,7 @@ GifExtent MeasureGif(const uint8_t* data, size_t size) {
     while (at < size && data[at] != 0x3B) {
         if (data[at] == 0x2C) {
             if (size - at < 11) break;
+            extent.begins = true;
             extent.pixels += word(at + 5) * word(at + 7);
             at += 10 + tableSize(data[at + 9]) + 1;
             if (!skipBlocks()) break;
@@ -79,6 +81,7 @@ bool GifAnimation::Open() {
     file_ = DGifOpen(this, ReadBytes, &error);
     if (!file_) return false;
     const GifExtent extent = MeasureGif(data_, size_);
+    if (!extent.begins) return false;  // a few bytes shall not cost a large canvas
     // A file that is cut within its first frame shows what there is of it.
     const uint32_t frames = std::max(1u, extent.frames);
     if (!SetExtent(uint64_t(std::max(0, file_->SWidth)), uint64_t(std::max(0, file_->SHeight)), frames,
@@ -102,6 +105,9 @@ void GifAnimation::Dispose() {
 
 bool GifAnimation::PaintFrame(const GraphicsControlBlock& control) {
     if (DGifGetImageDesc(file_) == GIF_ERROR) return false;
+    // The library's list of all frames so far, which it copies for each one.
+    GifFreeSavedImages(file_);
+    file_->ImageCount = 0;
     const GifImageDesc& image = file_->Image;
     const ColorMapObject* map = image.ColorMap ? image.ColorMap : file_->SColorMap;
     if (image.Width <= 0 || image.Height <= 0 || image.Width > int(kMaxImageSide) ||

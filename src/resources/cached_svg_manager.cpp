@@ -4,6 +4,7 @@
 
 #include "core/logging/log.h"
 #include "resources/document_loader.h"
+#include "resources/reload.h"
 
 namespace qorvex {
 
@@ -161,29 +162,21 @@ void CachedSVGManager::PruneAllOrphans() {
 
 void CachedSVGManager::ReloadAll() {
     LogDebug("Force reloading all svg resources.");
-    struct Reload {
-        uint32_t id;
-        URL url;
-        script::WeakHandle<dom::Node> node;
-    };
-    Vector<Reload, MemoryTag::Resources> reloads;
+    Reloads reloads;
     {
         qsl::MutexLock lock(mutex_);
         PruneOrphans(CacheLimits());
-        for (auto& [id, entry] : svgs_) {
-            if (entry.state == State::Loading) continue;
-            for (const auto& [key, holder] : entry.holders.GetAll()) {
-                if (!holder.node) continue;
-                entry.state = State::Loading;
-                entry.svg = nullptr;
-                entry.answered = false;
-                reloads.push_back({id, entry.url, holder.node});
-                break;
-            }
-        }
+        reloads = CollectReloads(svgs_, [](CachedSVG& entry) {
+            if (entry.state == State::Loading) return false;
+            entry.state = State::Loading;
+            entry.svg = nullptr;
+            entry.answered = false;
+            return true;
+        });
     }
-    for (const Reload& reload : reloads)
-        if (dom::Node* node = reload.node.get()) StartLoad(reload.id, reload.url, *node->GetDocument());
+    StartReloads(reloads, [this](uint32_t id, const URL& url, dom::Document& document) {
+        StartLoad(id, url, document);
+    });
 }
 
 }  // namespace qorvex

@@ -5,6 +5,7 @@
 #include "dom/document.h"
 #include "resources/cached_images_manager.h"
 #include "resources/document_loader.h"
+#include "resources/reload.h"
 
 #define IMAGE_LOG "CachedImagesManager: "
 
@@ -168,35 +169,25 @@ void CachedImagesManager::ForgetGPUResources() {
 void CachedImagesManager::ReloadAll() {
     if (!lost_resources_.exchange(false, std::memory_order_acq_rel)) return;
     LogDebug(IMAGE_LOG "Force reloading all image resources.");
-    struct Reload {
-        uint32_t id;
-        URL url;
-        script::WeakHandle<dom::Node> node;
-    };
-    Vector<Reload, MemoryTag::Resources> reloads;
+    Reloads reloads;
     {
         qsl::MutexLock lock(mutex_);
         uploads_.Forget();
         for (const auto& [id, orphan] : orphans_.GetAll())
             image_ids_by_url_.erase(MakeUrlKey(orphan.url));
         orphans_.Clear();
-        // Entries keep their ids, so that nodes need not learn new ones, and what is on its way goes on: it
-        // has nothing to lose yet.
-        for (auto& [id, image] : images_) {
-            if (image.state < ImageState::Decoded) continue;
-            for (const auto& [node, holder] : image.holders.GetAll()) {
-                if (!holder.node) continue;
-                image.state = ImageState::Loading;
-                image.kind = ImageKind::Unknown;
-                image.info = no_info_;
-                reloads.push_back({id, image.url, holder.node});
-                break;
-            }
-        }
+        reloads = CollectReloads(images_, [&](CachedImage& image) {
+            // What is on its way goes on: it has nothing to lose yet.
+            if (image.state < ImageState::Decoded) return false;
+            image.state = ImageState::Loading;
+            image.kind = ImageKind::Unknown;
+            image.info = no_info_;
+            return true;
+        });
     }
-    for (const Reload& reload : reloads)
-        if (dom::Node* node = reload.node.get())
-            StartLoad(reload.id, reload.url, GetLoaderOf(*node->GetDocument()));
+    StartReloads(reloads, [this](uint32_t id, const URL& url, dom::Document& document) {
+        StartLoad(id, url, GetLoaderOf(document));
+    });
 }
 
 // --- News

@@ -25,6 +25,12 @@ class NodeHolders {
 
     bool IsEmpty() const { return holders_.empty(); }
     const Table& GetAll() const { return holders_; }
+    // Any whose node lives, or null.
+    const script::WeakHandle<dom::Node>* FindLiving() const {
+        for (const auto& [key, holder] : holders_)
+            if (holder.node) return &holder.node;
+        return nullptr;
+    }
     uint32_t CountUses() const {
         uint32_t uses = 0;
         for (const auto& [node, holder] : holders_)

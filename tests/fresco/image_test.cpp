@@ -141,9 +141,9 @@ TEST(Image, AnimationsBeyondTheLimitsAreRefused) {
     const GifFrame dot = {1, 1, 0, 0};
     const auto many = MakeGif(1, 1, std::vector<GifFrame>(kMaxAnimationFrames, dot));
     uint32_t shown = 0;
-    for (uint32_t i = 0; i < kMaxAnimationFrames; i += 10)
+    for (uint32_t i = 0; i < kMaxAnimationFrames; ++i)
         shown += Decode(many, i).bytes.size() == 4;
-    EXPECT_EQ(shown, kMaxAnimationFrames / 10);
+    EXPECT_EQ(shown, kMaxAnimationFrames);
     EXPECT_TRUE(canvas.log.lines.empty());
 
     EXPECT_EQ(Decode(MakeGif(1, 1, std::vector<GifFrame>(kMaxAnimationFrames + 1, dot))).result,

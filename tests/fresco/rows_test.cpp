@@ -11,7 +11,7 @@
 namespace fresco::cpu {
 namespace {
 
-constexpr int kMax = 70;
+constexpr int kMax = 150;
 
 // Inputs of one round: rows with blank, opaque and ordinary pixels, masks with runs of 0 and 255.
 struct Sample {
@@ -43,7 +43,7 @@ struct Sample {
 using Run = std::function<void(const RowLoops&, Sample&)>;
 
 void ExpectEqualWays(const char* name, const Run& run) {
-    for (const RowWay way : {RowWay::Sse2, RowWay::Avx2}) {
+    for (const RowWay way : {RowWay::Sse2, RowWay::Avx2, RowWay::Avx512}) {
         const RowLoops* loops = GetRowLoops(way);
         if (!loops) continue;
         for (unsigned seed = 0; seed < 300; ++seed) {
