@@ -3,6 +3,7 @@
 #include <optional>
 
 #include "core/memory/atoms.h"
+#include "core/memory/temp_vector.h"
 #include "dom/element.h"
 
 namespace qorvex::css {
@@ -21,9 +22,37 @@ bool SameText(std::string_view a, std::string_view b, bool ignoreCase) {
     return true;
 }
 
-size_t Find(std::string_view text, std::string_view part, size_t from, bool ignoreCase) {
-    if (!ignoreCase) return text.find(part, from);
-    for (size_t i = from; i + part.size() <= text.size(); ++i) {
+// Knuth, Morris and Pratt: linear in both lengths.
+size_t FindInLong(std::string_view text, std::string_view part, bool ignoreCase) {
+    const auto same = [ignoreCase](char a, char b) { return ignoreCase ? ToLower(a) == ToLower(b) : a == b; };
+    const TempMark mark;
+    TempVector<uint32_t> borders;  // of each beginning of the part: how much of it is its own end
+    borders.resize(static_cast<uint32_t>(part.size()));
+    uint32_t matched = 0;
+    const auto step = [&](char c) {
+        while (matched > 0 && !same(part[matched], c))
+            matched = borders[matched - 1];
+        if (same(part[matched], c)) ++matched;
+    };
+    for (uint32_t i = 1; i < part.size(); ++i) {
+        step(part[i]);
+        borders[i] = matched;
+    }
+    matched = 0;
+    for (size_t i = 0; i < text.size(); ++i) {
+        step(text[i]);
+        if (matched == part.size()) return i + 1 - matched;
+    }
+    return std::string_view::npos;
+}
+
+size_t Find(std::string_view text, std::string_view part, bool ignoreCase) {
+    if (part.size() > text.size()) return std::string_view::npos;
+    // The page decides on both lengths, so their product is no bound on the work.
+    constexpr size_t kLong = 64;
+    if (part.size() > kLong) return FindInLong(text, part, ignoreCase);
+    if (!ignoreCase) return text.find(part);
+    for (size_t i = 0; i + part.size() <= text.size(); ++i) {
         if (SameText(text.substr(i, part.size()), part, true)) return i;
     }
     return std::string_view::npos;
@@ -31,7 +60,7 @@ size_t Find(std::string_view text, std::string_view part, size_t from, bool igno
 
 // Only the first occurrence is examined.
 bool IncludesWord(std::string_view text, std::string_view word, bool ignoreCase) {
-    const size_t at = Find(text, word, 0, ignoreCase);
+    const size_t at = Find(text, word, ignoreCase);
     if (at == std::string_view::npos) return false;
     const size_t end = at + word.size();
     return (at == 0 || text[at - 1] == ' ') && (end == text.size() || text[end] == ' ');
@@ -39,7 +68,7 @@ bool IncludesWord(std::string_view text, std::string_view word, bool ignoreCase)
 
 // Looser than Selectors Level 4, 6.1: the part may begin anywhere. Only the first occurrence is examined.
 bool EndsBeforeDash(std::string_view text, std::string_view part, bool ignoreCase) {
-    const size_t at = Find(text, part, 0, ignoreCase);
+    const size_t at = Find(text, part, ignoreCase);
     if (at == std::string_view::npos) return false;
     const size_t end = at + part.size();
     return end == text.size() || text[end] == '-';
@@ -63,7 +92,7 @@ bool Compare(const SimpleSelector& simple, std::string_view text) {
             return !value.empty() && text.size() >= value.size() &&
                    SameText(text.substr(text.size() - value.size()), value, simple.ignoreCase);
         case AttributeOperator::Substring:
-            return !value.empty() && Find(text, value, 0, simple.ignoreCase) != std::string_view::npos;
+            return !value.empty() && Find(text, value, simple.ignoreCase) != std::string_view::npos;
     }
     return false;
 }
