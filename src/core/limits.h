@@ -38,6 +38,10 @@ inline constexpr size_t kObjectPools = 32;
 /// usual thread; web browsers cut documents at the same depth.
 inline constexpr uint32_t kMaxLayoutDepth = 512;
 
+/// Pixels, or percent, that a length of a style has at most: a hundred thousand screens. What layout adds up
+/// from such lengths may be a hundred times that.
+inline constexpr float kMaxLength = 1e7f;
+
 /// Levels of a document that the HTML builder makes and layout shows; browsers stop near here too, and layout
 /// walks recurse.
 inline constexpr size_t kMaxDocumentDepth = 512;

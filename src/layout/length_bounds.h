@@ -2,22 +2,21 @@
 // numbers add up to, is kept where neither breaks.
 #pragma once
 
+#include "core/limits.h"
+
 #include <cmath>
 
 namespace qorvex::layout {
 
-// A hundred thousand screens.
-inline constexpr float kMaxLength = 1e7f;
-
 // Of a style: pixels or percent. NaN stays.
 inline float BoundLength(float value) {
-    if (value > kMaxLength) return kMaxLength;
-    return value < -kMaxLength ? -kMaxLength : value;
+    if (value > limits::kMaxLength) return limits::kMaxLength;
+    return value < -limits::kMaxLength ? -limits::kMaxLength : value;
 }
 
 // Of a computed box. NaN, the outcome of infinite differences, becomes 0.
 inline float BoundResult(float value) {
-    constexpr float kLargest = kMaxLength * 100;
+    constexpr float kLargest = limits::kMaxLength * 100;
     if (value > kLargest) return kLargest;
     if (value < -kLargest) return -kLargest;
     return std::isnan(value) ? 0 : value;
