@@ -99,6 +99,7 @@ TEST_F(ParagraphTest, JustifyWidensGapsAcrossElements) {
     LayoutHandle* last = Text(p, " iii");
     page.Settle();
     const float left = Box(span).left;
+    ASSERT_NE(static_cast<DisplayText&>(*second->node().display).Info(), nullptr);
     const layout::TextInfo plain = *static_cast<DisplayText&>(*second->node().display).Info();
     ASSERT_GT(plain.lines.size(), 2u);
     const float end = Right(last);
