@@ -7,23 +7,12 @@
 #include <random>
 
 #include "core/frame/client.h"
-
-#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
-#define QORVEX_SLOW_BUILD
-#elif defined(__has_feature)
-#if __has_feature(address_sanitizer) || __has_feature(thread_sanitizer)
-#define QORVEX_SLOW_BUILD
-#endif
-#endif
+#include "support/slow_build.h"
 
 namespace qorvex::pages {
 namespace {
 
-#ifdef QORVEX_SLOW_BUILD
-constexpr size_t kShrink = 10;
-#else
-constexpr size_t kShrink = 1;
-#endif
+constexpr size_t kShrink = test::kSlowBuild ? 10 : 1;
 
 std::string Repeat(std::string_view piece, size_t count) {
     std::string text;

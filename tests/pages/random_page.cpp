@@ -1,6 +1,6 @@
 #include "pages/random_page.h"
 
-#include <vector>
+#include "support/image_files.h"
 
 namespace qorvex::pages {
 
@@ -79,6 +79,11 @@ const std::vector<Choices>& VisualStyles() {
     return kStyles;
 }
 
+// Numbered pictures, then what loads in other ways; the animations come last.
+constexpr uint32_t kPictures = 12;
+const char* const kOtherPictures[] = {"missing.png", "broken.png", "slow.gif", "fast.gif"};
+constexpr uint32_t kAnimations = 2;
+
 const char* const kClasses[] = {"card", "glow", "glass", "tilt", "clip", "ink"};
 const char* const kTexts[] = {"Ag", "wide words wrap in narrow boxes", "", "fi \xC3\xA9\xC3\x9F",
                               "1\\n2\\n3"};
@@ -107,7 +112,8 @@ class="b card tilt" style="left: 5px; top: 5px"></div></div><div id="b5" class="
 ><p id="b6" qor-inline>in <span id="b7" class="ink">line</span> text</p></div><script>
 function $(id) { return document.getElementById(id) }
 function make(id) {
-  const box = document.createElement(id % 5 ? 'div' : 'p')
+  const box = document.createElement(id % 7 == 3 ? 'img' : id % 5 ? 'div' : 'p')
+  if (id % 7 == 3) box.setAttribute('src', 'p' + id % 12 + '.png')
   if (id % 10 == 0) box.setAttribute('qor-inline', '')
   box.id = 'b' + id
   box.className = id % 3 ? 'b' : ''
@@ -124,16 +130,17 @@ function dump(node) {
   for (let i = 0; i < node.childNodes.length; ++i)
     if (node.childNodes[i].localName != 'script') below.push(dump(node.childNodes[i]))
   return [node.localName, node.id, node.className, node.getAttribute('style'), node.getAttribute('qor-inline'),
-          node.scrollLeft, node.scrollTop, below]
+          node.getAttribute('src'), node.scrollLeft, node.scrollTop, below]
 }
 const scrolled = []
 function build(record, parent) {
   if (typeof record == 'string') return parent.appendChild(document.createTextNode(record))
-  const [tag, id, name, style, inline, left, top, below] = record
+  const [tag, id, name, style, inline, source, left, top, below] = record
   const node = parent ? parent.appendChild(document.createElement(tag)) : document.body
   if (!parent) node.textContent = ''
   node.id = id
   if (inline != null) node.setAttribute('qor-inline', inline)
+  if (source != null) node.setAttribute('src', source)
   if (name) node.className = name
   if (style) node.setAttribute('style', style)
   for (const child of below) build(child, node)
@@ -143,6 +150,49 @@ function scroll() {
   for (const [node, left, top] of scrolled) node.scrollLeft = left, node.scrollTop = top
 }
 </script></body></html>)";
+}
+
+std::vector<std::pair<std::string, std::string>> RandomPage::Pictures() {
+    std::vector<std::pair<std::string, std::string>> files;
+    for (uint32_t i = 0; i < kPictures; ++i) {
+        test::Picture picture = test::Plain(1 + i * 5 % 37, 1 + i * 7 % 23, 0);
+        for (size_t at = 0; at < picture.pixels.size(); ++at) {
+            const auto value = static_cast<uint32_t>(at) * (i * 2654435761u + 77777u);
+            picture.pixels[at] = i % 3 ? value : value | 0xFF000000u;
+        }
+        files.emplace_back("p" + std::to_string(i) + ".png", test::Png(picture));
+    }
+    files.emplace_back("broken.png", files[5].second.substr(0, 50));
+    files.emplace_back("slow.gif", test::Gif(20, 14, {5, 7, 30}));
+    files.emplace_back("fast.gif", test::Gif(9, 9, {2, 2, 3, 2}));
+    return files;
+}
+
+std::string RandomPage::PictureUrl() {
+    const auto others = static_cast<uint32_t>(std::size(kOtherPictures)) - (animations_ ? 0 : kAnimations);
+    const uint32_t chosen = Below(kPictures + others);
+    return chosen < kPictures ? "p" + std::to_string(chosen) + ".png" : kOtherPictures[chosen - kPictures];
+}
+
+std::string RandomPage::PictureChange() {
+    const std::string picture = "url(" + PictureUrl() + ")";
+    const auto style = [](const std::string& property, const std::string& value) {
+        return "s.setProperty('" + property + "', '" + value + "')";
+    };
+    switch (Below(5)) {
+        case 0:
+            return style("background-image", "url(" + PictureUrl() + "), " + picture);
+        case 1: {
+            constexpr const char* kRepeats[] = {"stretch", "repeat", "round"};
+            return style("border-image", picture + " 3 fill / 4px / 2px " + kRepeats[Below(3)]);
+        }
+        case 2:
+            return style("mask-image", picture);
+        case 3:
+            return "if (e.localName == 'img') e.setAttribute('src', '" + PictureUrl() + "')";
+        default:
+            return style("background-image", picture);
+    }
 }
 
 std::string RandomPage::Place() {
@@ -187,7 +237,7 @@ std::string RandomPage::TextChange() {
 }
 
 std::string RandomPage::Change() {
-    switch (Below(10)) {
+    switch (Below(12)) {
         case 0:
         case 1:
             return TreeChange();
@@ -203,6 +253,9 @@ std::string RandomPage::Change() {
         case 5:
             return "{ const e = " + Box() + "; if (e && e.id != 'b0') { const s = e.style; " + Place() +
                    " } }";
+        case 6:
+        case 7:
+            return "{ const e = " + Box() + "; if (e) { const s = e.style; " + PictureChange() + " } }";
         default:
             return "{ const e = " + Box() + "; if (e) { const s = e.style; " + Style() + " } }";
     }

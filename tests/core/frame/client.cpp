@@ -86,13 +86,17 @@ void Client::ServeResources() {
 }
 
 void Client::Frame(double dt) {
+    Advance(dt);
+    Paint();
+}
+
+void Client::Advance(double dt) {
     if (options.on_frame) options.on_frame();
     ServeResources();
     time += dt;
     system->Advance(time);
     view->Advance(time);
     ++last_frame;
-    Paint();
 }
 
 void Client::Paint() {

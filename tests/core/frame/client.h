@@ -244,10 +244,12 @@ class Client {
 
     // One frame; serves the engine's work on this thread when there are no workers.
     void Frame(double dt = 16);
+    // A frame in two parts.
+    void Advance(double dt = 16);
+    void Paint();
     // Frames until the page has loaded and nothing is open; gives up after many.
     void RunUntilLoaded();
     void Load(const std::string& html, const std::string& url = "coui://page/index.html");
-    void Paint();
     void ServeResources();
     // RGBA of a pixel over white.
     uint32_t Pixel(unsigned x, unsigned y) const;
