@@ -128,7 +128,8 @@ struct Joint {
         if (token.Is('+')) return IsDigit(next) || next == '.';
         const bool afterName = before == TokenKind::Ident || before == TokenKind::CustomIdent ||
                                before == TokenKind::Hash || before == TokenKind::Numeric;
-        return token.Is('-') && (afterName || std::string_view("(#+'\"").find(next) == std::string_view::npos);
+        return token.Is('-') &&
+               (afterName || std::string_view("(#+'\"").find(next) == std::string_view::npos);
     }
 };
 

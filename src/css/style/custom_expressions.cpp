@@ -91,7 +91,8 @@ bool FillTemplate(const CustomExpression& expression, const CustomPropertyMap* m
     return true;
 }
 
-// Values have their operators without spaces. Expressions keep some, because they are printed to be read again.
+// Values have their operators without spaces. Expressions keep some, because they are printed to be read
+// again.
 void CloseOperators(CssString& text) {
     char quote = '\0';
     size_t size = 0;
