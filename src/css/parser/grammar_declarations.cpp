@@ -2,6 +2,7 @@
 #include "core/limits.h"
 #include "css/parser/grammar.h"
 #include "css/values/custom_property.h"
+#include "css/values/text_reader.h"
 
 namespace qorvex::css {
 
@@ -112,6 +113,26 @@ bool IsOperator(const Token& token) {
     return token.Is('/') || token.Is(',') || token.Is('+') || token.Is('-') || token.Is('*');
 }
 
+// An operator, or a sign of its own, whose place in the text waits for the token after it.
+struct Joint {
+    Token token;
+    bool isSign = false;
+    bool spaceBefore = false;
+
+    bool IsWaiting() const { return token.size != 0; }
+    // Would they be other tokens without space? A value is printed as it is kept, and has to read back (CSS
+    // Syntax Module Level 3, 9).
+    bool NeedsSpace(TokenKind before, const Token& after) const {
+        const char next = *after.begin;
+        if (isSign) return token.Is('-') && (next == '-' || after.kind == TokenKind::Uri);
+        if (token.Is('+')) return IsDigit(next) || next == '.';
+        const bool afterName = before == TokenKind::Ident || before == TokenKind::CustomIdent ||
+                               before == TokenKind::Hash || before == TokenKind::Numeric;
+        return token.Is('-') &&
+               (afterName || std::string_view("(#+'\"").find(next) == std::string_view::npos);
+    }
+};
+
 }  // namespace
 
 // Terms and operators in turn. Parentheses and functions only raise a counter: whatever they hold has the
@@ -121,6 +142,19 @@ Grammar::Outcome Grammar::ParseValue(std::string_view& text, uint8_t& flags) {
     ValueText value(arena_);
     size_t depth = 0;
     bool signPending = false;
+    Joint joint;
+    TokenKind before = TokenKind::End;
+    // True when the token after it needs a space before itself.
+    const auto placeJoint = [&] {
+        if (!joint.IsWaiting()) return false;
+        const bool spaced = joint.NeedsSpace(before, token_);
+        if (joint.spaceBefore || (spaced && !joint.isSign))
+            value.AppendTerm(joint.token.text());
+        else
+            value.Append(joint.token.text());
+        joint = {};
+        return spaced;
+    };
     // Space matters behind a sign alone.
     for (;; signPending ? Advance() : AdvanceBeyondSpace()) {
         if (token_.kind == TokenKind::Space) {
@@ -128,10 +162,11 @@ Grammar::Outcome Grammar::ParseValue(std::string_view& text, uint8_t& flags) {
             continue;
         }
         if (StartsTerm()) {
-            if (state == State::AfterTerm)
+            if (placeJoint() || state == State::AfterTerm)
                 value.AppendTerm(token_.text());
             else
                 value.Append(token_.text());
+            before = token_.kind;
             signPending = false;
             state = State::AfterTerm;
             if (token_.kind == TokenKind::Function) {
@@ -145,14 +180,16 @@ Grammar::Outcome Grammar::ParseValue(std::string_view& text, uint8_t& flags) {
         } else if (token_.Is(')') && depth > 0) {
             if (state == State::NeedsTerm) return Outcome::Bad;
             value.Append(token_.text());
+            before = TokenKind::Delimiter;
             --depth;
             state = State::AfterTerm;
         } else if (IsOperator(token_) && state == State::AfterTerm) {
-            value.Append(token_.text());
+            joint = {token_};
             state = State::NeedsTerm;
         } else if ((token_.Is('+') || token_.Is('-')) && state != State::AfterTerm && !signPending) {
             // A sign of its own before a term.
-            value.Append(token_.text());
+            const bool spaced = placeJoint();
+            joint = {token_, true, spaced};
             signPending = true;
             state = State::NeedsTerm;
         } else {

@@ -91,6 +91,29 @@ bool FillTemplate(const CustomExpression& expression, const CustomPropertyMap* m
     return true;
 }
 
+// Values have their operators without spaces. Expressions keep some, because they are printed to be read
+// again.
+void CloseOperators(CssString& text) {
+    char quote = '\0';
+    size_t size = 0;
+    for (size_t i = 0; i < text.size(); ++i) {
+        const char c = text[i];
+        if (quote != '\0') {
+            if (c == quote) quote = '\0';
+            if (c == '\\' && i + 1 < text.size()) text[size++] = text[i++];
+        } else if (c == '"' || c == '\'') {
+            quote = c;
+        } else if (c == ' ' && i + 2 < text.size() && (text[i + 1] == '+' || text[i + 1] == '-') &&
+                   text[i + 2] == ' ') {
+            text[size++] = text[i + 1];
+            i += 2;
+            continue;
+        }
+        text[size++] = text[i];
+    }
+    text.resize(size);
+}
+
 bool ReplaceCalc(CssString& text, const ExpressionContext& context) {
     CssString computed;
     bool done = false;
@@ -117,6 +140,7 @@ bool EvaluateCustomExpression(const Declaration& declaration, const LayoutStyleR
     uint8_t flags = declaration.flags();
     const CustomPropertyMap* map = style.customProperties ? &style.customProperties->map : nullptr;
     if (!FillTemplate(declaration.expression(), map, text, flags)) return false;
+    CloseOperators(text);
     if ((flags & kHasCalc) && !ReplaceCalc(text, context)) return false;
     if (!ParseLonghand(declaration.property(), text, out)) {
         LogWarning("Unable to parse declaration: ", std::string_view(text));

@@ -4,12 +4,35 @@
 
 namespace qorvex::css {
 
+namespace {
+
+bool EndsInBackslash(std::string_view text) {
+    const size_t last = text.find_last_not_of('\\');
+    return (text.size() - (last == std::string_view::npos ? 0 : last + 1)) % 2 != 0;
+}
+
+// Where the escape ends that starts at `backslash`; a number takes the space behind it.
+size_t EndOfEscape(std::string_view text, size_t backslash) {
+    const auto isHex = [](char c) { return IsDigit(c) || (ToLower(c) >= 'a' && ToLower(c) <= 'f'); };
+    size_t end = backslash + 1;
+    if (end == text.size()) return end;
+    if (!isHex(text[end])) return end + 1;
+    while (end < text.size() && end <= backslash + 6 && isHex(text[end]))
+        ++end;
+    return end < text.size() && IsSpace(text[end]) ? end + 1 : end;
+}
+
+}  // namespace
+
 std::string_view Trim(std::string_view text) {
     while (!text.empty() && IsSpace(text.front()))
         text.remove_prefix(1);
-    while (!text.empty() && IsSpace(text.back()))
-        text.remove_suffix(1);
-    return text;
+    size_t size = text.size();
+    while (size > 0 && IsSpace(text[size - 1]))
+        --size;
+    // An escaped space is a letter of what it ends.
+    if (size < text.size() && EndsInBackslash(text.substr(0, size))) ++size;
+    return text.substr(0, size);
 }
 
 bool EqualsIgnoreCase(std::string_view a, std::string_view b) {
@@ -70,6 +93,10 @@ class Nesting {
         }
         if (c == '"' || c == '\'') {
             quote_ = c;
+            return false;
+        }
+        if (c == '\\') {
+            i = EndOfEscape(text, i) - 1;
             return false;
         }
         if (c == '(') ++depth_;
