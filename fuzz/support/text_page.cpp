@@ -90,14 +90,14 @@ layout::LayoutHandle* TextPage::Keep(layout::HandlePtr handle) {
 }
 
 layout::LayoutHandle& TextPage::AddBox(dsp::DisplayElementPtr display) {
-    css::LayoutStyleRefs style = css::DefaultStyles();
+    css::LayoutStyleRefs& style = kept_styles_.emplace_back(css::DefaultStyles());
     Require(test::ApplyDeclarations(style, "width: 60px; max-height: 40px"), "a style of the target's own");
     const auto index = static_cast<uint32_t>(body_->data().children.size());
     return *Keep(tree_.AddChild(*body_, index, {style, std::move(display), nullptr, {}, false}));
 }
 
 void TextPage::Fill(layout::LayoutHandle& box, std::string_view text, std::string_view declarations) {
-    css::LayoutStyleRefs style = css::DefaultStyles();
+    css::LayoutStyleRefs& style = kept_styles_.emplace_back(css::DefaultStyles());
     Require(test::ApplyDeclarations(style, declarations), "a style of the target's own");
     css::TextLayoutStyle& group = style.Mutable<css::TextLayoutStyle>();
     group.typefaces = typefaces_[handles_.size() % 2];
@@ -120,7 +120,7 @@ void TextPage::AddParagraph(std::string_view text) {
 }
 
 void TextPage::LayOut(layout::LayoutUpdateData& update) {
-    update.bodyDisplay = body_->data().style.layout->display;
+    update.bodyDisplay = body_->data().style->layout->display;
     tree_.Commit(update, nullptr, nullptr);
     layout::LayoutPass pass{update, tree_.Root(), kSide, kSide, dirty_};
     layout::PerformLayout(pass);
@@ -133,7 +133,7 @@ void TextPage::LayOut(layout::LayoutUpdateData& update) {
                 "a box whose sides are no numbers");
         const dsp::IDisplayElement* display = handle->data().display.get();
         if (display->Has(dsp::IDisplayElement::kIsText))
-            CheckText(static_cast<const dsp::DisplayText&>(*display), handle->data().style.text->whiteSpace);
+            CheckText(static_cast<const dsp::DisplayText&>(*display), handle->data().style->text->whiteSpace);
     }
 }
 

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <cstdint>
+#include <deque>
 #include <memory>
 #include <string_view>
 #include <vector>
@@ -64,6 +65,7 @@ class TextPage {
     std::unique_ptr<layout::FontManager> fonts_;
     // What the face list of a text begins with: the page's own family, or every face of the file.
     std::vector<layout::TypefaceList> typefaces_;
+    std::deque<css::LayoutStyleRefs> kept_styles_;  // handles look at them
     layout::LayoutTree tree_;
     dsp::DirtyRegion dirty_;
     dsp::RenderCaches caches_;
