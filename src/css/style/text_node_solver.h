@@ -5,7 +5,8 @@
 
 namespace qorvex::css {
 
-// dom::ChangeMask bits of what changed.
-[[nodiscard]] uint32_t SolveTextNode(dom::Node& text, StyleRun& run);
+// dom::ChangeMask bits of what changed;
+// `parentDirty` tells what may be different on the parent.
+[[nodiscard]] uint32_t SolveTextNode(dom::Node& text, const PropertySet& parentDirty, StyleRun& run);
 
 }  // namespace qorvex::css
