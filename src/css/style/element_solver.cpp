@@ -99,7 +99,8 @@ class ElementSolver {
         if (!parentNode_.Is(dom::kIsDocument)) {
             const PropertySet& parentDirty = parentNode_.GetDirtyProperties();
             if (!parentDirty.Empty()) {
-                added = (parentDirty & kInheritedProperties) | (parentDirty & match_.inheriting());
+                added = (parentDirty & kInheritedProperties & ~SetByItself()) |
+                        (parentDirty & match_.inheriting());
                 // A variable may hold the word inherit; inside calc(), an em is the parent's.
                 const bool newEm = parentDirty.Contains(PropertyId::FontSize);
                 added |= newEm ? match_.expressions() : parentDirty & match_.expressions();
@@ -111,6 +112,9 @@ class ElementSolver {
         dirty_ |= added;
         return !added.Empty();
     }
+
+    // Declared, and the same whatever the parent has.
+    PropertySet SetByItself() const { return match_.properties() & ~kDerivedTextInputs; }
 
     bool IsAnimated() const { return element_.animatedProperties || element_.transitionProperties; }
 
@@ -161,7 +165,7 @@ class ElementSolver {
         if (isHtml_ || isBody_) properties &= ~kPropagatedProperties;
         const bool adopts = AdoptParentText();
         if (adopts) properties &= ~kTextGroup;
-        if (!IsAnimated()) LeaveOutInitialGroups(properties);
+        if (!properties.Empty() && !IsAnimated()) LeaveOutInitialGroups(properties);
         // Transitions first: they decide how the others may change.
         ApplyAll(properties & kTransitionGroup);
         ApplyAll(properties & ~kTransitionGroup);
@@ -231,52 +235,15 @@ class ElementSolver {
     bool AdoptParentText() {
         if (isHtml_ || !dirty_.Intersects(kTextGroup) || IsAnimated()) return false;
         if (match_.properties().Intersects(kTextGroup)) return false;
-        const TextLayoutStyle& parent = *parent_.text;
-        const TextLayoutStyle& initial = *DefaultStyles().text;
-        if (parent.fontFitMode != initial.fontFitMode || parent.textOverflow != initial.textOverflow ||
-            parent.fontSdf != initial.fontSdf)
-            return false;
-        if (!HoldsAbsoluteValues(parent)) return false;
+        if (!run_.textStep.IsInheritable(parent_.text)) return false;
         if (style_.text == parent_.text) return true;
-        const StyleHandle<TextLayoutStyle> old = style_.text;
+        const PropertySet looked = dirty_ & kTextGroup;
+        const TextStep::Change change = run_.textStep.OfElement(style_.text, parent_.text, looked);
         Take(parent_.text);
-        NoteTextChanges(*old, *style_.text);
+        run_.counters.propertiesApplied += static_cast<uint64_t>(looked.Count());
+        run_.counters.propertiesChanged += change.properties;
+        mask_ |= change.mask;
         return true;
-    }
-
-    // What the element would inherit must be what the group says: not where the parent declared something
-    // relative to a font size or a weight, which its heirs take as an absolute value.
-    static bool HoldsAbsoluteValues(const TextLayoutStyle& text) {
-        const auto isPixels = [](Length length) { return length.unit == LengthUnit::Px; };
-        return isPixels(text.fontSize) && text.fontSize.value == text.computedFontSize &&
-               isPixels(text.textStrokeWidth) &&
-               (text.letterSpacing.kind != SpacingKind::Length || isPixels(text.letterSpacing.length)) &&
-               (text.lineHeight.kind != SpacingKind::Length || isPixels(text.lineHeight.length) ||
-                text.lineHeight.length.unit == LengthUnit::Em) &&
-               static_cast<uint16_t>(text.fontWeight) * 100 == text.computedFontWeight;
-    }
-
-    void NoteTextChanges(const TextLayoutStyle& old, const TextLayoutStyle& next) {
-        (dirty_ & kTextGroup).ForEach([&](PropertyId id) {
-            ++run_.counters.propertiesApplied;
-            if (FieldsEqual(old, next, id)) return;
-            ++run_.counters.propertiesChanged;
-            mask_ |= kPropertyAppliers[IndexOf(id)].changeMask;
-        });
-        if (!(static_cast<const TextLayoutDerived&>(old) == static_cast<const TextLayoutDerived&>(next)))
-            mask_ |= dom::kChangeLayout;
-    }
-
-    static bool FieldsEqual(const TextLayoutStyle& a, const TextLayoutStyle& b, PropertyId id) {
-        switch (id) {
-#define QORVEX_ROW(id, name, type, parser, field, ...) \
-    case PropertyId::id:                               \
-        return a.field == b.field;
-            QORVEX_CSS_TEXT_PROPERTIES(QORVEX_ROW)
-#undef QORVEX_ROW
-            default:
-                return true;
-        }
     }
 
     void UpdateText() {

@@ -5,6 +5,7 @@
 #include "css/style/animation_side.h"
 #include "css/style/root_propagation.h"
 #include "css/style/style_sharing.h"
+#include "css/style/text_step.h"
 #include "css/style/text_style_cache.h"
 #include "css/values/length_context.h"
 #include "css/values/match_state.h"
@@ -21,6 +22,7 @@ struct StyleRun {
     StyleCounters& counters;
     StyleSharingTable& sharing;
     TextStyleCache& textStyles;
+    TextStep& textStep;
     RootStyles& rootStyles;
     const MatchState& nothingMatched;  // of an element that was never matched
     layout::IFontResolver* fonts;      // null without fonts

@@ -1,5 +1,7 @@
 #include "css/style/style_sharing.h"
 
+#include <algorithm>
+
 #include "dom/element.h"
 
 namespace qorvex::css {
@@ -54,7 +56,11 @@ void StyleSharingTable::Insert(const Key& key, dom::Element& element, uint32_t c
 
 void StyleSharingTable::Place(const Entry& entry) {
     Entry* set = &entries_[FirstOfSet(entry.key.hash)];
-    if (set[0].run == run_) set[1] = set[0];
+    // The one that has stood there longest goes, one of an earlier run before all others.
+    uint32_t place = 0;
+    while (place < kWays - 1 && set[place].run == run_)
+        ++place;
+    std::move_backward(set, set + place, set + place + 1);
     set[0] = entry;
 }
 

@@ -52,7 +52,7 @@ class StyleSharingTable {
     // A style stands in one of the places of its set; the last comer takes the first. Pages have a few
     // hundred distinct styles, and a lost entry costs one more cascade. The table grows with what it is asked
     // for, so that a small page has a small one.
-    static constexpr uint32_t kWays = 2, kFirstEntries = 32, kLastEntries = 1024;
+    static constexpr uint32_t kWays = 4, kFirstEntries = 32, kLastEntries = 1024;
     uint32_t FirstOfSet(uint64_t hash) const {
         return static_cast<uint32_t>(hash) & (entries_.size() - 1) & ~(kWays - 1);
     }

@@ -196,6 +196,7 @@ void StyleSolver::SolveBelow(Document& document, Extent extent) {
                  counters_,
                  sharing_,
                  textStyles_,
+                 textStep_,
                  rootStyles_,
                  matcher_.GetNothing(),
                  document.GetHost().GetFontResolver(),
@@ -205,13 +206,16 @@ void StyleSolver::SolveBelow(Document& document, Extent extent) {
     level_.clear();
     const auto visitFrom = [&](uint32_t first) {
         for (uint32_t i = first; i < level_.size(); ++i) {
+            Prefetch(i);
             Node& node = *level_[i];
+            const bool isRoot = (node.pendingStyleBits & dom::kGathered) != 0;
             node.pendingStyleBits &= static_cast<uint16_t>(~dom::kGathered);
             if (extent == Extent::All) {
                 node.styleSolved = 0;
                 if (node.IsElement()) MatchAfresh(static_cast<Element&>(node), matching);
             }
-            if (SolveNode(node, run) || extent == Extent::All) AddChildren(node);
+            const bool anew = isRoot || extent == Extent::All || run.rootFontSizeChanged;
+            if (SolveNode(node, anew, run) || extent == Extent::All) AddChildren(node);
         }
     };
     for (int32_t depth = roots_[0]->GetDepth();; ++depth) {
@@ -225,14 +229,26 @@ void StyleSolver::SolveBelow(Document& document, Extent extent) {
         depth = roots_[rootsTaken_]->GetDepth() - 1;
     }
     FinishLevel();
+    textStep_.Forget();
     pseudo_.Forget();
     rootFontSizeChanged_ |= run.rootFontSizeChanged;
 }
 
+// The walk waits for memory more than for anything else, and knows where it goes next.
+void StyleSolver::Prefetch(uint32_t from) const {
+    constexpr uint32_t kFar = 8, kNear = 4, kLine = 64;
+    if (from + kFar < level_.size()) {
+        const char* node = reinterpret_cast<const char*>(level_[from + kFar]);
+        for (size_t line = 0; line < sizeof(Element); line += kLine)
+            __builtin_prefetch(node + line, 1);
+    }
+    if (from + kNear < level_.size()) __builtin_prefetch(level_[from + kNear]->GetChildren().data());
+}
+
 // Must the children be looked at?
-bool StyleSolver::SolveNode(Node& node, StyleRun& run) {
+bool StyleSolver::SolveNode(Node& node, bool anew, StyleRun& run) {
     if (!node.IsElement()) {
-        if (node.IsText()) SolveText(node, run);
+        if (node.IsText()) SolveText(node, anew, run);
         return false;
     }
     auto& element = static_cast<Element&>(node);
@@ -244,9 +260,11 @@ bool StyleSolver::SolveNode(Node& node, StyleRun& run) {
     return solved.reachesChildren || run.rootFontSizeChanged;
 }
 
-void StyleSolver::SolveText(Node& text, StyleRun& run) {
+void StyleSolver::SolveText(Node& text, bool anew, StyleRun& run) {
+    anew |= text.timesSolved == 0;
     if (text.timesSolved < 2) ++text.timesSolved;
-    uint32_t mask = SolveTextNode(static_cast<dom::Text&>(text), run);
+    const PropertySet& parentDirty = static_cast<Element&>(*text.GetParent()).GetDirtyProperties();
+    uint32_t mask = SolveTextNode(static_cast<dom::Text&>(text), anew ? PropertySet::All() : parentDirty, run);
     if (!text.styleSolved) {
         text.styleSolved = 1;
         mask |= dom::kChangeLayout;

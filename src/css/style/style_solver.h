@@ -42,8 +42,10 @@ class StyleSolver {
     void FinishLevel();
     void GiveBackRoom();
     void MatchAfresh(dom::Element& element, MatchContext& context);
-    bool SolveNode(dom::Node& node, StyleRun& run);
-    void SolveText(dom::Node& text, StyleRun& run);
+    void Prefetch(uint32_t from) const;
+    // `anew` when more may be different for the node than what is dirty on its parent.
+    bool SolveNode(dom::Node& node, bool anew, StyleRun& run);
+    void SolveText(dom::Node& text, bool anew, StyleRun& run);
     void UpdateLayoutPresence(dom::Document& document);
     void ExpandEntered(dom::Document& document);
     void RunAnimations(dom::Document& document, IAnimationSide* animations);
@@ -54,6 +56,7 @@ class StyleSolver {
     PseudoState pseudo_;  // empty outside of a batch
     StyleSharingTable sharing_;
     TextStyleCache textStyles_;
+    TextStep textStep_;
     RootStyles rootStyles_;
     bool rootFontSizeChanged_ = false;
 

@@ -16,19 +16,6 @@ uint8_t TextKindOf(WhiteSpaceMode mode) {
     }
 }
 
-// Colours change what is painted and no glyph's place, so a text that only changes colour is not laid out
-// again.
-bool DiffersInLayout(const TextLayoutStyle& a, const TextLayoutStyle& b) {
-    bool same = static_cast<const TextLayoutDerived&>(a) == static_cast<const TextLayoutDerived&>(b);
-#define QORVEX_ROW(id, name, type, parser, field, ...)                                          \
-    if (PropertyId::id != PropertyId::Color && PropertyId::id != PropertyId::TextStrokeColor && \
-        PropertyId::id != PropertyId::SelectionColor)                                           \
-        same = same && a.field == b.field;
-    QORVEX_CSS_TEXT_PROPERTIES(QORVEX_ROW)
-#undef QORVEX_ROW
-    return !same;
-}
-
 template <class Group>
 bool Take(LaidOutStyle& style, StyleHandle<Group>& own, const StyleHandle<Group>& group) {
     if (own == group) return false;
@@ -37,29 +24,40 @@ bool Take(LaidOutStyle& style, StyleHandle<Group>& own, const StyleHandle<Group>
     return true;
 }
 
-uint32_t TakeParentText(LaidOutStyle& style, const LaidOutStyle& parent) {
-    const StyleHandle<TextLayoutStyle> old = style.text;
-    if (!Take(style, style.text, parent.text)) return 0;
-    uint32_t mask = dom::kChangeVisual;
-    if (DiffersInLayout(*old, *parent.text)) mask |= dom::kChangeLayout;
-    if (old->textTransform != parent.text->textTransform) mask |= dom::kChangeTextTransform;
+uint32_t TakeParentText(LaidOutStyle& style, const LaidOutStyle& parent, TextStep& step) {
+    if (style.text == parent.text) return 0;
+    const uint32_t mask = step.MaskOfText(style.text, parent.text);
+    Take(style, style.text, parent.text);
     return mask;
 }
 
+// What a text takes from its parent in groups other than the text group.
+constexpr PropertySet kOutsideTextGroup = [] {
+    PropertySet set;
+    for (const PropertyId id : {PropertyId::Display, PropertyId::WhiteSpace, PropertyId::Visibility,
+                                PropertyId::TextShadow, PropertyId::UserSelect, PropertyId::PointerEvents,
+                                PropertyId::Cursor, PropertyId::SelectionBackgroundColor})
+        set.Add(id);
+    return set;
+}();
+
 }  // namespace
 
-uint32_t SolveTextNode(dom::Text& text, StyleRun& run) {
+uint32_t SolveTextNode(dom::Text& text, const PropertySet& parentDirty, StyleRun& run) {
     ++run.counters.textNodesSolved;
     const LaidOutStyle& parent = text.GetParent()->GetLaidOutStyle();
     LaidOutStyle& style = text.GetStyle();
     uint32_t mask = dom::kChangeSolved;
     const CSSDisplay display = parent.layout->display;
-    // Below a parent without display the kind stays what it was: nothing is laid out, and nothing changes.
-    const uint8_t kind =
-        display == CSSDisplay::None ? style.layout->textKind : TextKindOf(parent.text->whiteSpace);
-    if (Take(style, style.layout, run.textStyles.LayoutFor(display, kind))) mask |= dom::kChangeLayout;
-    mask |= TakeParentText(style, parent);
-    if (Take(style, style.visual, run.textStyles.VisualFor(*parent.visual))) mask |= dom::kChangeVisual;
+    if (parentDirty.Intersects(kOutsideTextGroup)) {
+        // Below a parent without display the kind stays what it was: nothing is laid out, and nothing
+        // changes.
+        const uint8_t kind =
+            display == CSSDisplay::None ? style.layout->textKind : TextKindOf(parent.text->whiteSpace);
+        if (Take(style, style.layout, run.textStyles.LayoutFor(display, kind))) mask |= dom::kChangeLayout;
+        if (Take(style, style.visual, run.textStyles.VisualFor(*parent.visual))) mask |= dom::kChangeVisual;
+    }
+    mask |= TakeParentText(style, parent, run.textStep);
     if (style.written.Has(StyleGroup::Transform)) mask |= dom::kChangeTransform;
 
     const bool inLayout = text.Is(dom::kInLayoutTree);

@@ -6,7 +6,8 @@
 
 namespace qorvex::css {
 
-// dom::ChangeMask bits of what changed.
-[[nodiscard]] uint32_t SolveTextNode(dom::Text& text, StyleRun& run);
+// dom::ChangeMask bits of what changed;
+// `parentDirty` tells what may be different on the parent.
+[[nodiscard]] uint32_t SolveTextNode(dom::Text& text, const PropertySet& parentDirty, StyleRun& run);
 
 }  // namespace qorvex::css
