@@ -6,6 +6,7 @@
 #include "core/limits.h"
 #include "css/values/html_tags.h"
 #include "dom/ascii.h"
+#include "dom/open_formatting.h"
 
 namespace qorvex::dom {
 
@@ -15,8 +16,9 @@ namespace {
 
 struct Tag {
     size_t start = 0;
-    size_t end = 0;      // behind the ">"
-    size_t surplus = 0;  // where the attributes begin that are too many; 0 without
+    size_t attributes = 0;  // behind the name
+    size_t end = 0;         // behind the ">"
+    size_t surplus = 0;     // where the attributes begin that are too many; 0 without
     TagId id = TagId::Unknown;
     bool closing = false;
     bool self_closing = false;
@@ -115,6 +117,7 @@ class TagScanner {
             ++end;
         }
         tag.id = css::TagLookup({upper, length});
+        tag.attributes = end;
         char quote = 0;
         bool between = false;
         size_t attributes = 0;
@@ -151,22 +154,36 @@ class TagScanner {
     size_t position_ = 0;
 };
 
+// Every limit is further away than the tags that fit in this.
+constexpr size_t kHarmlessSize = 256;
+static_assert((kHarmlessSize / 3) * (kHarmlessSize / 3) / 4 < limits::kReopenedAtLeast);
+
 }  // namespace
 
 TamedSource TameSource(std::string_view source, TaggedString<MemoryTag::DOM>& rewritten) {
     TamedSource done;
-    // So many tags or attributes do not fit in less.
-    if (source.size() < std::min(limits::kMaxSourceNesting * 3, limits::kMaxSourceAttributes * 2))
-        return done;
+    // In less no tags fit that ask for so much.
+    if (source.size() < kHarmlessSize) return done;
     const auto blank = [&](size_t start, size_t end) {
         if (rewritten.empty()) rewritten = source;
         std::fill(rewritten.data() + start, rewritten.data() + end, ' ');
     };
     TagScanner scanner(source);
+    OpenFormatting formatting;
     Tag tag;
     size_t open = 0;
     size_t blanked = 0;  // start tags whose end tags have to go too
     while (scanner.Next(tag)) {
+        if (!done.formatting) {
+            const std::string_view attributes = source.substr(tag.attributes, tag.end - tag.attributes);
+            done.formatting =
+                !(tag.closing ? formatting.TakeEnd(tag.id) : formatting.TakeStart(tag.id, attributes));
+        }
+        // No tag is left that could open them again.
+        if (done.formatting && !HoldsRawText(tag.id)) {
+            blank(tag.start, tag.end);
+            continue;
+        }
         if (tag.surplus) {
             done.attributes = true;
             // All but the sign that ends the tag.

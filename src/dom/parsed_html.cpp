@@ -45,11 +45,13 @@ RefPtr<ParsedHTML> ParseHTML(std::string_view bytes, ParsedHTML::ReleaseSource r
     std::string_view text = bytes;
     if (text.starts_with("\xEF\xBB\xBF")) text.remove_prefix(3);
     const TamedSource tamed = TameSource(text, parsed->rewritten_);
-    if (tamed.nesting || tamed.attributes) text = parsed->rewritten_;
+    if (tamed.IsRewritten()) text = parsed->rewritten_;
     parsed->nesting_cut_ = tamed.nesting;
     if (tamed.attributes)
         LogWarning("HTML has a tag of more than ", limits::kMaxSourceAttributes,
                    " attributes; the others are left out");
+    if (tamed.formatting)
+        LogWarning("HTML leaves too much formatting unclosed; the tags behind it are left out");
 
     GumboOptions options = kGumboDefaultOptions;
     options.allocator = AllocateInArena;

@@ -2,6 +2,7 @@
 
 #include "dom/dom_fixture.h"
 #include "dom/html_script_element.h"
+#include "dom/node_list.h"
 
 namespace qorvex::dom::test {
 
@@ -240,6 +241,25 @@ TEST_F(BuilderTest, NestingIsCutAtTheBound) {
     for (int i = 0; i < 6000; ++i)
         page += "<p>a<li>b";  // closes itself: does not nest
     Load(page);
+}
+
+TEST_F(BuilderTest, UnclosedFormattingIsBounded) {
+    const auto count = [&] { return document_->GetElementsByTagName("b")->GetLength(); };
+    std::string page;
+    for (int i = 0; i < 1000; ++i)
+        page += "<table><tr><td><b class=c" + std::to_string(i) + ">x</table><p>t<ul><li><i>y<li>z</ul>";
+    Load(page);
+    EXPECT_EQ(log_.Count("HTML leaves too much formatting unclosed"), 0u);
+    EXPECT_EQ(count(), 1000u);
+    page = "<p>";
+    for (int i = 0; i < 1000; ++i)
+        page += "<b class=c" + std::to_string(i) + ">";
+    for (int i = 0; i < 10000; ++i)
+        page += "</p><p>t";
+    Load(page + "<script>still runs</script>");
+    EXPECT_EQ(log_.Count("HTML leaves too much formatting unclosed"), 1u);
+    EXPECT_LT(count(), 200000u);
+    EXPECT_EQ(document_->GetTextContent().view().size(), 10000 + std::string("still runs").size());
 }
 
 TEST_F(BuilderTest, OddBytes) {
