@@ -259,7 +259,9 @@ TEST_F(BuilderTest, UnclosedFormattingIsBounded) {
     Load(page + "<script>still runs</script>");
     EXPECT_EQ(log_.Count("HTML leaves too much formatting unclosed"), 1u);
     EXPECT_LT(count(), 200000u);
-    EXPECT_EQ(document_->GetTextContent().view().size(), 10000 + std::string("still runs").size());
+    std::string text(document_->GetTextContent().view());
+    std::erase(text, ' ');
+    EXPECT_EQ(text.size(), 10000 + std::string("stillruns").size());
 }
 
 TEST_F(BuilderTest, OddBytes) {

@@ -149,34 +149,6 @@ TEST(FrameCycle, FreedRenderingResourcesRedrawTheWholeView) {
     EXPECT_EQ(client.Pixel(12, 12), kBlue);
 }
 
-// With the first renderer the whole page shows, though nothing changes any more.
-TEST(FrameCycle, WhatWasNotRecordedShowsWhenThereIsARenderer) {
-    fresco::CpuRenderTarget target{};
-    Client client;
-    client.renderer->Destroy();
-    client.renderer = nullptr;
-    client.view->Destroy();
-    qorvex::ViewSettings settings;
-    settings.Width = client.options.width;
-    settings.Height = client.options.height;
-    settings.WaitForViewRendererToRecord = true;
-    client.view = client.system->CreateView(settings);
-    client.files.Put("coui://page/index.html", kPage);
-    client.view->LoadURL("coui://page/index.html");
-    unsigned frame = 0;
-    for (; frame < 12; ++frame) {
-        client.ServeResources();
-        client.view->Advance(client.time += 16);
-    }
-    target = {client.pixels.data(), settings.Width, settings.Height, settings.Width * 4};
-    client.renderer = client.system_renderer->CreateViewRenderer(client.view);
-    client.renderer->SetRenderTargetSimple(&target, nullptr, settings.Width, settings.Height, 1);
-    client.view->Advance(client.time += 16);
-    client.renderer->Paint(frame, true);
-    EXPECT_EQ(client.Pixel(40, 40), kRed);
-    EXPECT_EQ(client.Pixel(12, 12), kBlue);
-}
-
 // Frames wait for a client that paints nothing for a while, but not for ever.
 TEST(FrameCycle, AClientThatPaintsAgainSeesWhatItMissed) {
     Client client;
