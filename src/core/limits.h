@@ -54,9 +54,9 @@ inline constexpr size_t kMaxSourceNesting = 4096;
 /// 100,000 take 25 s).
 inline constexpr size_t kMaxSourceAttributes = 8192;
 
-/// Elements that the parser may open again for formatting that was never closed: so many at least, and so many
-/// for each tag of the source. Without a bound 4 KB ask for 25,000 of them, and four times that for twice the
-/// source.
+/// Elements that the parser may open again for formatting that was never closed: so many at least, and so
+/// many for each tag of the source. Without a bound 4 KB ask for 25,000 of them, and four times that for
+/// twice the source.
 inline constexpr size_t kReopenedAtLeast = 4096;
 inline constexpr size_t kReopenedPerTag = 16;
 

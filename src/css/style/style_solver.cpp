@@ -264,7 +264,8 @@ void StyleSolver::SolveText(Node& text, bool anew, StyleRun& run) {
     anew |= text.timesSolved == 0;
     if (text.timesSolved < 2) ++text.timesSolved;
     const PropertySet& parentDirty = static_cast<Element&>(*text.GetParent()).GetDirtyProperties();
-    uint32_t mask = SolveTextNode(static_cast<dom::Text&>(text), anew ? PropertySet::All() : parentDirty, run);
+    uint32_t mask =
+        SolveTextNode(static_cast<dom::Text&>(text), anew ? PropertySet::All() : parentDirty, run);
     if (!text.styleSolved) {
         text.styleSolved = 1;
         mask |= dom::kChangeLayout;
