@@ -9,16 +9,14 @@ namespace fresco {
 
 bool AnimationReader::SetExtent(uint64_t width, uint64_t height, uint64_t frames, uint64_t work) {
     if (width == 0 || height == 0 || frames == 0) return false;
-    if (width > kMaxImageSide || height > kMaxImageSide || width * height * 4 > kMaxImageBytes) {
-        FreePixels(AllocatePixels(width, height));  // says why
-        return false;
-    }
+    if (!MayDecode(width, height, size_)) return false;
     // All frames of an animation are decoded before it shows.
     const uint64_t pixels = std::max(work, width * height * frames);
-    if (frames > kMaxAnimationFrames || pixels * 4 > kMaxImageBytes) {
-        FRESCO_WARN("Refusing to decode an animation of %llu frames of %llu x %llu pixels",
+    if (frames > kMaxAnimationFrames || pixels * 4 > kMaxImageBytes ||
+        pixels > kFreeAnimationPixels + size_ * kMaxPixelsPerFileByte) {
+        FRESCO_WARN("Refusing to decode an animation of %llu frames of %llu x %llu pixels from %llu bytes",
                     static_cast<unsigned long long>(frames), static_cast<unsigned long long>(width),
-                    static_cast<unsigned long long>(height));
+                    static_cast<unsigned long long>(height), static_cast<unsigned long long>(size_));
         return false;
     }
     width_ = uint32_t(width), height_ = uint32_t(height), frames_ = uint32_t(frames);

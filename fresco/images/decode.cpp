@@ -60,13 +60,19 @@ bool Finish(DecodedFrame& frame, bool premultiply, PixelFormat format) {
 
 }  // namespace
 
-uint8_t* AllocatePixels(uint64_t width, uint64_t height) {
-    if (width == 0 || height == 0 || width > kMaxImageSide || height > kMaxImageSide ||
-        width * height * 4 > kMaxImageBytes) {
-        FRESCO_WARN("Refusing to decode an image of %llu x %llu pixels",
-                    static_cast<unsigned long long>(width), static_cast<unsigned long long>(height));
-        return nullptr;
-    }
+bool MayDecode(uint64_t width, uint64_t height, uint64_t fileSize, uint64_t shrink) {
+    if (width > 0 && height > 0 && width <= kMaxImageSide && height <= kMaxImageSide &&
+        width * height * 4 <= kMaxImageBytes * shrink * shrink &&
+        width * height <= kFreeImagePixels + fileSize * kMaxPixelsPerFileByte)
+        return true;
+    FRESCO_WARN("Refusing to decode an image of %llu x %llu pixels from %llu bytes",
+                static_cast<unsigned long long>(width), static_cast<unsigned long long>(height),
+                static_cast<unsigned long long>(fileSize));
+    return false;
+}
+
+uint8_t* AllocatePixels(uint64_t width, uint64_t height, uint64_t fileSize) {
+    if (!MayDecode(width, height, fileSize)) return nullptr;
     return static_cast<uint8_t*>(HeapAllocate(size_t(width * height * 4), kPixelAlignment));
 }
 

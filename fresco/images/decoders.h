@@ -19,8 +19,11 @@ struct DecodeHints {
     uint32_t width = 0, height = 0;
 };
 
-// Null, with a Warning, beyond the limits or without memory.
-uint8_t* AllocatePixels(uint64_t width, uint64_t height);
+// False, with a Warning, when it is beyond the limits of a file with so many bytes. `shrink` is by how much a
+// decoder makes the sides shorter on its way.
+bool MayDecode(uint64_t width, uint64_t height, uint64_t fileSize, uint64_t shrink = 1);
+// Null, with a Warning, when it is beyond the limits of a file with so many bytes, or without memory.
+uint8_t* AllocatePixels(uint64_t width, uint64_t height, uint64_t fileSize);
 void FreePixels(void* pixels);
 
 bool DecodePng(const uint8_t* data, size_t size, DecodedFrame* frame);

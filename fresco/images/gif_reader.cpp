@@ -140,7 +140,7 @@ bool GifAnimation::PaintFrame(const GraphicsControlBlock& control) {
 }
 
 bool GifAnimation::GiveFrame(DecodedFrame* frame) const {
-    frame->pixels = AllocatePixels(Width(), Height());
+    frame->pixels = AllocatePixels(Width(), Height(), size_);
     if (!frame->pixels) return false;
     std::memcpy(frame->pixels, canvas_.data(), canvas_.size() * 4);
     return true;

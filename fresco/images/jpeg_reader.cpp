@@ -43,6 +43,7 @@ bool Read(Reader* reader, const uint8_t* data, size_t size, const DecodeHints& h
     jpeg_decompress_struct& d = reader->decoder;
     if (setjmp(reader->escape)) return false;
     jpeg_create_decompress(&d);
+    d.mem->max_memory_to_use = long(2 * kMaxImageBytes);  // a progressive file's coefficients
     d.progress = &reader->progress;
     jpeg_mem_src(&d, data, static_cast<unsigned long>(size));
     jpeg_read_header(&d, TRUE);
@@ -53,10 +54,11 @@ bool Read(Reader* reader, const uint8_t* data, size_t size, const DecodeHints& h
            d.image_height / (d.scale_denom * 2) >= hints.height) {
         d.scale_denom *= 2;
     }
+    if (!MayDecode(d.image_width, d.image_height, size, d.scale_denom)) return false;
     jpeg_calc_output_dimensions(&d);
     frame->width = d.output_width, frame->height = d.output_height;
     frame->hasAlpha = false;
-    frame->pixels = AllocatePixels(frame->width, frame->height);
+    frame->pixels = AllocatePixels(frame->width, frame->height, size);
     if (!frame->pixels) return false;
     jpeg_start_decompress(&d);
     while (d.output_scanline < d.output_height) {

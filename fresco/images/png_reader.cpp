@@ -11,7 +11,7 @@ bool DecodePng(const uint8_t* data, size_t size, DecodedFrame* frame) {
     frame->hasAlpha = image.format & PNG_FORMAT_FLAG_ALPHA;
     frame->width = image.width, frame->height = image.height;
     image.format = PNG_FORMAT_RGBA;
-    frame->pixels = AllocatePixels(image.width, image.height);
+    frame->pixels = AllocatePixels(image.width, image.height, size);
     const bool read = frame->pixels && png_image_finish_read(&image, nullptr, frame->pixels, 0, nullptr);
     png_image_free(&image);
     return read;

@@ -35,7 +35,7 @@ class WebpAnimation final : public AnimationReader {
         timestamp_ = end;
         if (!frame) return true;
         frame->delay = uint32_t(duration + 5) / 10;
-        frame->pixels = AllocatePixels(Width(), Height());
+        frame->pixels = AllocatePixels(Width(), Height(), size_);
         if (!frame->pixels) return false;
         std::memcpy(frame->pixels, canvas, size_t(Width()) * Height() * 4);
         return true;
@@ -63,7 +63,7 @@ bool DecodeWebp(const uint8_t* data, size_t size, uint32_t index, DecodedFrame* 
     frame->width = uint32_t(width), frame->height = uint32_t(height);
     frame->hasAlpha = features.has_alpha;
     if (index > 0) return true;
-    frame->pixels = AllocatePixels(width, height);
+    frame->pixels = AllocatePixels(width, height, size);
     if (!frame->pixels) return false;
     return WebPDecodeRGBAInto(data, size, frame->pixels, size_t(width * height * 4), int(width) * 4) !=
            nullptr;

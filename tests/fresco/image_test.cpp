@@ -40,6 +40,39 @@ std::vector<uint8_t> Webp() {
     return file;
 }
 
+std::vector<uint8_t> SolidWebp(int width, int height) {
+    const std::vector<uint8_t> pixels(size_t(width) * size_t(height) * 4, 255);
+    uint8_t* out = nullptr;
+    const size_t size = WebPEncodeLosslessRGBA(pixels.data(), width, height, width * 4, &out);
+    std::vector<uint8_t> file(out, out + size);
+    WebPFree(out);
+    return file;
+}
+
+// Two frames of 2 x 2 pixels on a canvas of any size.
+std::vector<uint8_t> WebpAnimation(uint32_t width, uint32_t height) {
+    std::vector<uint8_t> file = {'R', 'I', 'F', 'F', 0, 0, 0, 0, 'W', 'E', 'B', 'P'};
+    const auto number = [&](uint32_t value, int bytes) {
+        for (int i = 0; i < bytes; ++i)
+            file.push_back(uint8_t(value >> (8 * i)));
+    };
+    const auto chunk = [&](std::string_view name, uint32_t size) {
+        file.insert(file.end(), name.begin(), name.end());
+        number(size, 4);
+    };
+    chunk("VP8X", 10), number(0x12, 4), number(width - 1, 3), number(height - 1, 3);
+    chunk("ANIM", 6), number(0, 6);
+    const std::vector<uint8_t> still = Webp();
+    for (int i = 0; i < 2; ++i) {
+        chunk("ANMF", 16 + uint32_t(still.size()) - 12);
+        number(0, 6), number(1, 3), number(1, 3), number(50, 4);
+        file.insert(file.end(), still.begin() + 12, still.end());
+    }
+    const uint32_t size = uint32_t(file.size()) - 8;
+    std::memcpy(file.data() + 4, &size, 4);
+    return file;
+}
+
 struct GifFrame {
     int width, height;
     int delay;
@@ -148,12 +181,38 @@ TEST(Image, AnimationsBeyondTheLimitsAreRefused) {
 
     EXPECT_EQ(Decode(MakeGif(1, 1, std::vector<GifFrame>(kMaxAnimationFrames + 1, dot))).result,
               ImageDecodeResult::Failed);
-    EXPECT_EQ(Decode(MakeGif(8192, 4096, {dot, dot, dot})).result, ImageDecodeResult::Failed);
+    auto large = MakeGif(8192, 4096, {dot, dot, dot});
+    large.resize(1 << 20);  // so that its few bytes are not what is wrong
+    EXPECT_EQ(Decode(large).result, ImageDecodeResult::Failed);
     // Frames that unpack to far more than the canvas which cuts them.
     const auto wide = MakeGif(1, 1, std::vector<GifFrame>(5, {16000, 1000, 0, 0}));
     EXPECT_EQ(Decode(wide).result, ImageDecodeResult::Failed);
     ASSERT_EQ(canvas.log.lines.size(), 3u);
-    EXPECT_EQ(canvas.log.lines[1], "Refusing to decode an animation of 3 frames of 8192 x 4096 pixels");
+    EXPECT_EQ(canvas.log.lines[1],
+              "Refusing to decode an animation of 3 frames of 8192 x 4096 pixels from 1048576 bytes");
+}
+
+// Within the limits of size, from too few bytes to be worth the work.
+TEST(Image, FewBytesGiveFewPixels) {
+    Canvas canvas;
+    const GifFrame dot = {1, 1, 0, 0};
+    EXPECT_EQ(Decode(MakeGif(2048, 1024, {dot, dot})).result, ImageDecodeResult::MoreFrames);
+    EXPECT_EQ(Decode(SolidWebp(3840, 2160)).bytes.size(), 3840u * 2160 * 4);
+    EXPECT_TRUE(canvas.log.lines.empty());
+
+    const std::vector<std::pair<std::vector<uint8_t>, std::string>> refused = {
+        {MakeGif(520, 12040, {dot, dot}), "an animation of 2 frames of 520 x 12040"},
+        {WebpAnimation(520, 12040), "an animation of 2 frames of 520 x 12040"},
+        {SolidWebp(4096, 4096), "an image of 4096 x 4096"},
+    };
+    for (const auto& [file, what] : refused) {
+        const long before = canvas.allocator.live;
+        EXPECT_EQ(Decode(file).result, ImageDecodeResult::Failed);
+        EXPECT_EQ(canvas.allocator.live, before);
+        EXPECT_EQ(canvas.log.lines.back(),
+                  "Refusing to decode " + what + " pixels from " + std::to_string(file.size()) + " bytes");
+    }
+    EXPECT_EQ(canvas.log.lines.size(), refused.size());
 }
 
 TEST(Image, DamagedFilesFailWithoutHarm) {

@@ -58,5 +58,11 @@ struct FrameResult {
 constexpr uint32_t kMaxImageSide = 16384;
 constexpr uint64_t kMaxImageBytes = 256ull << 20;
 constexpr uint32_t kMaxAnimationFrames = 10000;
+// A few bytes shall not cost a second: what a file may unpack to grows with its size. What is free holds a
+// screen of 3840 x 2160 in one colour, and the frames of a small spinner; the rate is several times what
+// real pictures reach.
+constexpr uint64_t kFreeImagePixels = 8ull << 20;
+constexpr uint64_t kFreeAnimationPixels = 4ull << 20;  // each is drawn, kept and copied
+constexpr uint64_t kMaxPixelsPerFileByte = 2048;
 
 }  // namespace fresco
