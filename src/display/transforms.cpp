@@ -47,6 +47,12 @@ bool Same(const layout::ScrollPosition& a, const layout::ScrollPosition& b) {
     return a.x == b.x && a.y == b.y;
 }
 
+// Such as an image: layout gives what stands inside of it no boxes, so none of it shows.
+bool HidesChildren(const LayoutNode& node) {
+    const bool leaf = node.flags.isReplaced || node.flags.measuredByDisplayElement;
+    return leaf && !(node.display && node.display->Has(IDisplayElement::kFlowsChildren));
+}
+
 // What a parent hands down.
 struct Above {
     const Matrix& children;
@@ -143,6 +149,10 @@ class TransformPass {
         if (!node.below) node.below = MakeUnique<layout::ChildBounds, MemoryTag::LayoutNodes>();
         const bool scrolled = !Same(node.scroll, node.below->appliedScroll);
         node.below->appliedScroll = node.scroll;
+        if (HidesChildren(node)) {
+            childrenVisual_ = {};
+            return false;
+        }
         const Matrix children = ChildrenMatrix(node);
         Above below{children, HandsDownWorld(node) ? &node.world : nullptr, node.scroll, above.clip,
                     above.moved || matricesChanged || scrolled};

@@ -186,6 +186,8 @@ uint32_t FirstSeed() {
 }
 
 INSTANTIATE_TEST_SUITE_P(Seeds, RandomRedraw, testing::Range(FirstSeed(), FirstSeed() + 8));
+// Shadows and outlines of text that script had put inside of an image.
+INSTANTIATE_TEST_SUITE_P(FoundFaults, RandomRedraw, testing::Values(10u, 17u));
 
 }  // namespace
 }  // namespace qorvex::pages
