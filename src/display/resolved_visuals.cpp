@@ -1,6 +1,7 @@
 #include "display/resolved_visuals.h"
 
 #include <algorithm>
+#include <cmath>
 
 namespace qorvex::dsp {
 
@@ -40,9 +41,13 @@ void Grow(Edges& edges, float left, float right, float top, float bottom) {
     edges.bottom = std::max(edges.bottom, bottom);
 }
 
-void GrowByShadow(Edges& edges, const ResolvedShadow& shadow) {
-    const float reach = shadow.spread + shadow.blur;
+void GrowByShadow(Edges& edges, const ResolvedShadow& shadow, float blurred) {
+    const float reach = shadow.spread + blurred;
     Grow(edges, reach - shadow.x, reach + shadow.x, reach - shadow.y, reach + shadow.y);
+}
+
+float TextShadowReach(float blur) {
+    return std::ceil(blur / 2 * kBlurExtent);
 }
 
 }  // namespace
@@ -67,10 +72,11 @@ bool HasRadii(const fresco::CornerRadii& r) {
 Edges PaintOutset(const ResolvedVisuals& visuals) {
     Edges edges = visuals.borderImageOutset;
     for (const ResolvedShadow& shadow : visuals.boxShadows) {
-        if (!shadow.inset) GrowByShadow(edges, shadow);
+        if (!shadow.inset) GrowByShadow(edges, shadow, shadow.blur);
     }
+    // Blurred glyphs are not cut off at the blur radius as boxes are: they show as far as the tail does.
     for (const ResolvedShadow& shadow : visuals.textShadows)
-        GrowByShadow(edges, shadow);
+        GrowByShadow(edges, shadow, TextShadowReach(shadow.blur));
     return edges;
 }
 
