@@ -26,14 +26,17 @@ struct TexelSample {
 enum class BlendFactor : uint8_t { Zero, One, Alpha, Inverse };
 
 // Positions along a gradient: u + du * x in entries of the table; for a radial one the distance of (u, v)
-// from 0 is. Entry i holds for positions from i on; the last one is for the very end.
+// from 0 is. Entry i + 1 holds for positions from i on; the first and the last one are what lies before 0 and
+// beyond the end.
 struct GradientWalk {
     // A position on the edge of two entries belongs to the second, whatever its arithmetic lost: stripes of
     // hard stops that are laid edge to edge must fit.
     static constexpr float kOnEdge = 1.0f / 512;
+    // From a position to an entry.
+    static constexpr float kShift = 1 + kOnEdge;
 
     const uint32_t* colors;
-    float last;       // index of the table's last entry, one period
+    float last;       // the end of the line, one period; the table has two entries more
     uint32_t spread;  // GradientSpread
     float u, du;      // at x = 0, a pixel
     float v, dv;      // radial only

@@ -194,7 +194,7 @@ float TableIndex(float t, const GradientWalk& walk) {
         t = t - Floor(t / twice + 0.5f) * twice;
         t = AtLeast(t, 0 - t);
     }
-    return AtMost(AtLeast(t, 0), walk.last) + GradientWalk::kOnEdge;
+    return AtMost(AtLeast(t, -1), walk.last) + GradientWalk::kShift;
 }
 
 void LinearGradient(uint32_t* dst, int x, int count, const GradientWalk& walk) {

@@ -43,7 +43,7 @@ inline uint32_t Mix(uint32_t a, uint32_t b, uint32_t weight) {
 void GradientTable::Build(const GradientStop* stops, uint32_t count, float opacity, double length) {
     const double wanted = std::clamp(length * 2, double(kMinSize), double(kMaxSize));
     const int size = int(std::bit_ceil(uint32_t(wanted)));
-    colors.resize(size_t(size) + 1);
+    colors.resize(size_t(size) + 2);
     if (count == 0) return std::fill(colors.begin(), colors.end(), 0u);
     const float unit = 1.0f / float(size);
     const auto channels = [opacity](const Color& c, float out[4]) {
@@ -59,7 +59,7 @@ void GradientTable::Build(const GradientStop* stops, uint32_t count, float opaci
     channels(stops[0].color, from);
     const auto fillUntil = [&](int end) {
         if (end <= entry) return;
-        Rows().Ramp(colors.data() + entry, end - entry, from, step);
+        Rows().Ramp(colors.data() + 1 + entry, end - entry, from, step);
         entry = end;
     };
     const auto entriesBelow = [&](float offset) {
@@ -85,7 +85,10 @@ void GradientTable::Build(const GradientStop* stops, uint32_t count, float opaci
     channels(stops[count - 1].color, from);
     std::fill(step, step + 4, 0.0f);
     fillUntil(size);
-    colors[size_t(size)] = colors[size_t(size) - 1];
+    // Beyond the ends stand their very colours: a short ramp's outermost entry is not there yet.
+    Rows().Ramp(&colors.back(), 1, from, step);
+    channels(stops[0].color, from);
+    Rows().Ramp(&colors.front(), 1, from, step);
 }
 
 GradientSource::GradientSource(const LinearGradient& geometry, const Homography& toPlane,
@@ -119,7 +122,7 @@ void GradientSource::SetStops(const GradientStop* stops, uint32_t count, float o
 }
 
 GradientWalk GradientSource::WalkOf(int y) const {
-    const double last = double(table_.colors.size() - 1), py = y + 0.5;
+    const double last = double(table_.colors.size() - 2), py = y + 0.5;
     const auto start = [&](double xx, double xy, double x0) {
         // Far off, single floats lose the fraction, but there is one colour or noise.
         return float(std::clamp((xx * 0.5 + xy * py + x0) * last, -1e9, 1e9));
@@ -139,8 +142,8 @@ uint32_t GradientSource::Lookup(double t) const {
     } else if (spread_ == kSpreadReflect) {
         t = std::abs(t - 2 * std::floor(t / 2 + 0.5));
     }
-    const double index = std::clamp(t, 0.0, 1.0) * double(table_.colors.size() - 1) + GradientWalk::kOnEdge;
-    return table_.colors[size_t(index)];
+    const double size = double(table_.colors.size() - 2);
+    return table_.colors[size_t(std::clamp(t * size, -1.0, size) + GradientWalk::kShift)];
 }
 
 void GradientSource::FetchProjected(int x, int y, int count, uint32_t* out) const {

@@ -18,7 +18,7 @@ class PixelSource {
     ~PixelSource() = default;
 };
 
-// Colours along the gradient line, about two a device pixel.
+// Colours along the gradient line, about two a device pixel, and those before and beyond it.
 struct GradientTable {
     static constexpr int kMinSize = 64, kMaxSize = 2048;
     Vector<uint32_t> colors;

@@ -126,6 +126,26 @@ TEST(Effects, HardStopsThatMeetShareNoPixel) {
     }
 }
 
+// However short the last ramp: what lies beyond the ends has their very colours.
+TEST(Effects, GradientsEndInTheirLastColour) {
+    const Color solid{0.8f, 0.4f, 0.2f, 1}, none{0, 0, 0, 0};
+    const GradientStop out[] = {{0, solid}, {0.95f, solid}, {1, none}};
+    const GradientStop in[] = {{0, none}, {0.05f, solid}, {1, solid}};
+    const Rect rect{0, 0, 0, 64, 64};
+    Canvas canvas;
+    CommandBuffer* b = Buffer();
+    b->FillRadialGradient(rect, Paint{}, out, 3, {{0.5f, 0.5f}, {0.25f, 0.25f}});
+    canvas.Draw(b);
+    EXPECT_EQ(canvas.At(0, 32), (Pixel{0, 0, 0, 0}));
+    EXPECT_EQ(canvas.At(32, 32), (Pixel{204, 102, 51, 255}));
+    b = Buffer();
+    b->ClearRect(rect, 1);
+    b->FillLinearGradient(rect, Paint{}, in, 3, {{0.5f, 0}, {0.75f, 0.25f}});
+    canvas.Draw(b);
+    EXPECT_EQ(canvas.At(8, 8), (Pixel{0, 0, 0, 0}));
+    EXPECT_EQ(canvas.At(60, 60), (Pixel{204, 102, 51, 255}));
+}
+
 TEST(Effects, PicturesGoThroughAnyTransform) {
     // A ramp: what is seen tells where it comes from.
     std::vector<uint32_t> ramp;
