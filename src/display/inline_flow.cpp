@@ -142,10 +142,10 @@ void InlineFlow::Walk(LayoutHandle& parent, Cursor& cursor, uint32_t depth) {
 }
 
 void InlineFlow::NewLine(Cursor& cursor, bool wraps) {
-    lines_.back().width = cursor.x;
+    lines_.back().width = cursor.x - cursor.opened;
     lines_.back().wraps = wraps;
     lines_.push_back({});
-    cursor.x = 0;
+    cursor.x = cursor.opened;
 }
 
 void InlineFlow::AddPiece(Item& item, Cursor& cursor, const Piece& piece) {
@@ -155,23 +155,33 @@ void InlineFlow::AddPiece(Item& item, Cursor& cursor, const Piece& piece) {
     pieces_.push_back(piece);
     item.endPiece = static_cast<uint32_t>(pieces_.size());
     cursor.x = piece.x + piece.width;
+    cursor.opened = 0;
 }
 
 void InlineFlow::AddText(LayoutHandle& handle, Cursor& cursor) {
     auto& text = static_cast<DisplayText&>(*handle.node().display);
     const auto first = static_cast<uint32_t>(pieces_.size());
     items_.push_back({&handle, Kind::Text, first, first});
+    const auto lay = [&] {
+        return text.LayoutInline(handle, {cursor.width, cursor.x, cursor.scale, cursor.base});
+    };
+    // The first word did not fit behind what is there: the text begins on the next line.
+    const auto skips = [&](const layout::TextInfo* info) {
+        return info != nullptr && info->lines.size() > 1 && info->lines[0].runCount == 0 &&
+               !info->lines[0].endsParagraph && cursor.x > 0;
+    };
+    const layout::TextInfo* info = lay();
+    if (cursor.opened > 0 && cursor.x > cursor.opened && skips(info)) {
+        NewLine(cursor, true);
+        info = lay();
+    }
     const float offset = cursor.x;
-    const layout::TextInfo* info =
-        text.LayoutInline(handle, {cursor.width, offset, cursor.scale, cursor.base});
+    const bool skipsFirst = skips(info);
     if (info == nullptr) return;
     for (uint32_t i = 0; i < info->lines.size(); ++i) {
         const layout::TextLineInfo& line = info->lines[i];
-        // The first word did not fit behind what is there: the text begins on the next line.
-        const bool skipped =
-            i == 0 && line.runCount == 0 && info->lines.size() > 1 && offset > 0 && !line.endsParagraph;
         if (i > 0) NewLine(cursor, !info->lines[i - 1].endsParagraph);
-        if (skipped) continue;
+        if (i == 0 && skipsFirst) continue;
         const float start = i == 0 ? offset : 0;
         AddPiece(items_.back(), cursor,
                  {static_cast<uint32_t>(lines_.size() - 1), i, static_cast<uint32_t>(items_.size() - 1),
@@ -200,8 +210,10 @@ void InlineFlow::AddInline(LayoutHandle& handle, Cursor& cursor, uint32_t depth)
     const auto first = static_cast<uint32_t>(pieces_.size());
     items_.push_back({&handle, Kind::Inline, first, first});
     cursor.x += edges.Left();
+    cursor.opened += edges.Left();
     Walk(handle, cursor, depth + 1);
     cursor.x += edges.Right();
+    if (first == pieces_.size()) cursor.opened += edges.Right();
     items_[open].endPiece = static_cast<uint32_t>(pieces_.size());
 }
 
@@ -220,7 +232,8 @@ void InlineFlow::AlignLines(css::TextAlignType align, float width) {
             pieces_[end].moved = pieces_[end].gap = 0;
         if (align == css::TextAlignType::Justify)
             JustifyLine(lines_[line], &pieces_[first], pieces_.data() + end, width);
-        if (base_ != BaseDirection::OfText) OrderLine(lines_[line], &pieces_[first], pieces_.data() + end);
+        if (base_ != BaseDirection::OfText)
+            OrderLine(lines_[line], &pieces_[first], pieces_.data() + end, 1 - part);
         first = end;
     }
 }
@@ -280,7 +293,7 @@ void InlineFlow::JustifyLine(const Line& line, Piece* first, Piece* end, float w
 
 // From the order of reading to that on the line (Unicode Annex 9, rule L2, for whole pieces): what goes
 // against the paragraph turns around within its own stretch.
-void InlineFlow::OrderLine(const Line& line, Piece* first, Piece* end) const {
+void InlineFlow::OrderLine(const Line& line, Piece* first, Piece* end, float hung) const {
     const auto mirror = [](Piece* from, Piece* to, float left, float right) {
         for (Piece* piece = from; piece != to; ++piece)
             piece->moved =
@@ -288,7 +301,7 @@ void InlineFlow::OrderLine(const Line& line, Piece* first, Piece* end) const {
     };
     const bool backward = base_ == BaseDirection::RightToLeft;
     const float right = std::max(end[-1].x + end[-1].moved + end[-1].width + end[-1].Spread(), line.width);
-    if (backward) mirror(first, end, 0, right - SpaceBehind(end[-1]));
+    if (backward) mirror(first, end, 0, right - SpaceBehind(end[-1]) * hung);
     const BaseDirection against = backward ? BaseDirection::LeftToRight : BaseDirection::RightToLeft;
     for (Piece* from = first; from != end;) {
         Piece* to = from;

@@ -68,6 +68,9 @@ class InlineFlow {
         float scale;
         layout::BaseDirection base;
         float x = 0;
+        // Of inline boxes that were opened behind the last piece: they go to the next line with their
+        // content.
+        float opened = 0;
     };
 
     void Walk(layout::LayoutHandle& parent, Cursor& cursor, uint32_t depth);
@@ -79,7 +82,7 @@ class InlineFlow {
 
     void AlignLines(css::TextAlignType align, float width);
     void JustifyLine(const Line& line, Piece* first, Piece* end, float width);
-    void OrderLine(const Line& line, Piece* first, Piece* end) const;
+    void OrderLine(const Line& line, Piece* first, Piece* end, float hung) const;
     void FindGaps(Piece& piece, bool startsLine, bool endsLine) const;
     const layout::TextInfo* TextOf(const Piece& piece) const;
     float SpaceBehind(const Piece& piece) const;

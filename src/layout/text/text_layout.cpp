@@ -36,9 +36,10 @@ bool LayOut(const TextRequest& request, Path path, TextInfo& out) {
     else
         MapGlyphs(characters, typefaces, request.style, map);
     TempVector<LineSpan> spans;
-    BreakLines({characters, map.advances.data(), request.style, request.availableWidth,
-                request.firstLineOffset, request.iterator, complex ? shaped.clusterStarts.data() : nullptr},
-               spans);
+    BreakLines(
+        {characters, map.advances.data(), request.style, request.availableWidth, request.firstLineOffset,
+         request.iterator, complex ? shaped.clusterStarts.data() : nullptr, map.hyphen},
+        spans);
     BuildLines({request, characters, typefaces, map, complex ? &shaped : nullptr}, spans, out);
     if (characters.endedInSpace && !out.lines.empty()) {
         const float space = request.style.fontSize * kTrailingSpace + request.style.letterSpacing;
