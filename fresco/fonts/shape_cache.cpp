@@ -12,6 +12,8 @@ namespace {
 constexpr size_t kContext = 5;
 constexpr size_t kKeyHead = 5;
 constexpr size_t kMaxKey = kKeyHead + ShapeCache::kMaxCachedRun + 2 * kContext;
+// Marks that are shaped together: HarfBuzz looks for the letter below each of them, past all those before it.
+constexpr size_t kMaxMarks = 256;
 // Scratch memory that waits for the next run; one for each thread that shapes at once.
 constexpr size_t kKeptScratch = 4;
 
@@ -127,6 +129,25 @@ size_t ScriptItemEnd(const uint32_t* codes, size_t first, size_t end, hb_script_
     return end;
 }
 
+bool IsMark(uint32_t code) {
+    if (code < 0x300 || (code >= 0x4E00 && code <= 0x9FFF)) return false;
+    const auto category = hb_unicode_general_category(hb_unicode_funcs_get_default(), code);
+    return category == HB_UNICODE_GENERAL_CATEGORY_NON_SPACING_MARK ||
+           category == HB_UNICODE_GENERAL_CATEGORY_ENCLOSING_MARK ||
+           category == HB_UNICODE_GENERAL_CATEGORY_SPACING_MARK;
+}
+
+// Where the first row of too many marks is cut, else `end`.
+size_t EndOfMarks(const uint32_t* codes, size_t first, size_t end) {
+    if (end - first <= kMaxMarks) return end;
+    size_t marks = 0;
+    for (size_t i = first; i < end; ++i) {
+        marks = IsMark(codes[i]) ? marks + 1 : 0;
+        if (marks > kMaxMarks) return i;
+    }
+    return end;
+}
+
 void ShapeItem(hb_font_t* font, const Text& text, size_t first, size_t end, hb_script_t script,
                hb_direction_t direction, hb_language_t language, hb_buffer_t* buffer,
                Vector<UnitGlyph>* out) {
@@ -212,21 +233,20 @@ void ShapeCache::Shape(hb_font_t* font, const ShapeRequest& request, Scratch& sc
     const hb_direction_t direction = backward ? HB_DIRECTION_RTL : HB_DIRECTION_LTR;
     const hb_language_t language = LanguageOf(request, settings_);
     const size_t end = text.offset + text.count;
-    const auto shape = [&](size_t first, size_t last, hb_script_t script) {
-        ShapeItem(font, text, first, last, script, direction, language, scratch.buffer, &scratch.glyphs);
-    };
-    if (request.script) return shape(text.offset, end, hb_script_from_iso15924_tag(request.script));
     Vector<Scratch::Item>& items = scratch.items;
     items.clear();
-    for (size_t first = text.offset; first < end; first = items.back().end) {
-        hb_script_t script = HB_SCRIPT_INVALID;
-        const size_t itemEnd = ScriptItemEnd(text.codes, first, end, &script);
-        items.push_back({first, itemEnd, script});
+    for (size_t first = text.offset; first < end;) {
+        hb_script_t script = hb_script_from_iso15924_tag(request.script);
+        const size_t itemEnd = request.script ? end : ScriptItemEnd(text.codes, first, end, &script);
+        for (; first < itemEnd; first = items.back().end)
+            items.push_back({first, EndOfMarks(text.codes, first, itemEnd), script});
     }
     // In visual order, which for a backward run begins with its last item.
     if (backward) std::reverse(items.begin(), items.end());
-    for (const Scratch::Item& item : items)
-        shape(item.first, item.end, item.script);
+    for (const Scratch::Item& item : items) {
+        ShapeItem(font, text, item.first, item.end, item.script, direction, language, scratch.buffer,
+                  &scratch.glyphs);
+    }
 }
 
 ShapedRunPtr ShapeCache::Find(uint64_t hash, const uint32_t* key, size_t length) {

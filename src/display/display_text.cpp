@@ -63,7 +63,8 @@ layout::TextStyle DisplayText::MakeStyle(const Parameters& parameters) {
 bool DisplayText::Holds(const Parameters& wanted) const {
     if (!lines_ || !lines_->valid) return false;
     const Parameters& laid = lines_->parameters;
-    if (wanted.inFlow != laid.inFlow || wanted.complexText != laid.complexText) return false;
+    if (wanted.inFlow != laid.inFlow || wanted.complexText != laid.complexText || wanted.base != laid.base)
+        return false;
     if (!(wanted.style == laid.style) && !SameTextStyle(MakeStyle(wanted), MakeStyle(laid))) return false;
     if (!Near(wanted.firstLineOffset, laid.firstLineOffset)) return false;
     const css::TextLayoutStyle& style = *wanted.style;
@@ -84,9 +85,10 @@ bool DisplayText::EnsureLayout(const layout::TextServices& services, const Param
     if (!lines_) lines_ = MakeUnique<Lines, MemoryTag::LayoutData>();
     layout::TextInfo& info = lines_->info;
     const layout::TextStyle style = MakeStyle(wanted);
-    lines_->valid = LayoutText({text_.view(), style, wanted.width, wanted.height, *services.fonts,
-                                iterator_.get(), services.i18n, wanted.firstLineOffset, true, wanted.inFlow},
-                               info);
+    lines_->valid =
+        LayoutText({text_.view(), style, wanted.width, wanted.height, *services.fonts, iterator_.get(),
+                    services.i18n, wanted.firstLineOffset, true, wanted.inFlow, wanted.base},
+                   info);
     if (!lines_->valid) {
         LogDebug("Measuring text without typeface");
         info.Clear();
@@ -152,8 +154,9 @@ const layout::TextInfo* DisplayText::LayoutInline(layout::LayoutHandle& handle,
     const auto& style = handle.node().style.text;
     if (!style) return nullptr;
     const layout::TextServices& services = handle.store().text;
-    const bool done = EnsureLayout(services, {style, style->computedFontSize * request.scale, request.width,
-                                              NAN, request.firstLineOffset, true, services.complexText});
+    const bool done =
+        EnsureLayout(services, {style, style->computedFontSize * request.scale, request.width, NAN,
+                                request.firstLineOffset, true, services.complexText, request.base});
     return done ? &lines_->info : nullptr;
 }
 

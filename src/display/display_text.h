@@ -27,6 +27,7 @@ struct InlineTextRequest {
     float width = 0;  // NaN: not known
     float firstLineOffset = 0;
     float scale = 1;
+    layout::BaseDirection base = layout::BaseDirection::OfText;
 };
 
 class DisplayText final : public IDisplayElement {
@@ -65,6 +66,7 @@ class DisplayText final : public IDisplayElement {
         float firstLineOffset = 0;
         bool inFlow = false;  // what belongs to a paragraph is left to it
         bool complexText = true;
+        layout::BaseDirection base = layout::BaseDirection::OfText;
     };
     // One question of the layout and its answer. The available size is NaN where it is not known.
     struct Answer {

@@ -2,8 +2,12 @@
 
 #include <yoga/Yoga.h>
 
+#include <qorvex/text_services.h>
+
 #include <algorithm>
 #include <cmath>
+
+#include "core/memory/temp_vector.h"
 
 #include "display/display_text.h"
 #include "layout/flex_results.h"
@@ -11,6 +15,7 @@
 
 namespace qorvex::dsp {
 
+using layout::BaseDirection;
 using layout::LayoutHandle;
 using layout::LayoutNode;
 using layout::LayoutPass;
@@ -53,6 +58,46 @@ struct OuterEdges {
     float Right() const { return margin.right + border.right + padding.right; }
 };
 
+// Lead bytes below this one begin no letter that runs from right to left.
+constexpr uint8_t kFirstBackwardLead = 0xD6;
+
+// Of all text below. OfText where no letter can run from right to left, so that nothing has to be ordered.
+BaseDirection BaseOf(const LayoutHandle& paragraph) {
+    const layout::TextServices& services = paragraph.store().text;
+    if (services.i18n == nullptr || !services.complexText) return BaseDirection::OfText;
+    const TempMark mark;
+    TempVector<const LayoutHandle*> stack;
+    TempVector<char> text;
+    bool backward = false;
+    stack.push_back(&paragraph);
+    while (!stack.empty()) {
+        const LayoutNode& node = stack.back()->node();
+        stack.pop_back();
+        if (IsText(node)) {
+            const std::string_view part = static_cast<const DisplayText&>(*node.display).Text();
+            text.append(part.begin(), part.end());
+            backward = backward || std::any_of(part.begin(), part.end(), [](char byte) {
+                           return static_cast<uint8_t>(byte) >= kFirstBackwardLead;
+                       });
+        }
+        for (auto i = static_cast<uint32_t>(node.children.size()); i-- > 0;)
+            stack.push_back(node.children[i].get());
+    }
+    if (!backward) return BaseDirection::OfText;
+    const TextDirection direction =
+        services.i18n->ComputeBaseDirection(text.data(), static_cast<unsigned>(text.size()));
+    return direction == TextDirection::RightToLeft ? BaseDirection::RightToLeft : BaseDirection::LeftToRight;
+}
+
+// Of a line whose runs all go one way, else OfText.
+BaseDirection DirectionOf(const layout::TextInfo& info, const layout::TextLineInfo& line) {
+    bool forward = false, backward = false;
+    for (uint32_t i = line.firstRun; i < line.firstRun + line.runCount; ++i)
+        (info.runs[i].rightToLeft ? backward : forward) = true;
+    if (forward == backward) return BaseDirection::OfText;
+    return forward ? BaseDirection::LeftToRight : BaseDirection::RightToLeft;
+}
+
 }  // namespace
 
 void InlineFlow::Clear() {
@@ -64,7 +109,8 @@ void InlineFlow::Clear() {
 
 Size InlineFlow::Flow(LayoutHandle& paragraph, float width, float scale) {
     Clear();
-    Cursor cursor{width, scale};
+    base_ = BaseOf(paragraph);
+    Cursor cursor{width, scale, base_};
     lines_.push_back({});
     Walk(paragraph, cursor, 0);
     lines_.back().width = cursor.x;
@@ -96,10 +142,10 @@ void InlineFlow::Walk(LayoutHandle& parent, Cursor& cursor, uint32_t depth) {
 }
 
 void InlineFlow::NewLine(Cursor& cursor, bool wraps) {
-    lines_.back().width = cursor.x;
+    lines_.back().width = cursor.x - cursor.opened;
     lines_.back().wraps = wraps;
     lines_.push_back({});
-    cursor.x = 0;
+    cursor.x = cursor.opened;
 }
 
 void InlineFlow::AddPiece(Item& item, Cursor& cursor, const Piece& piece) {
@@ -109,26 +155,38 @@ void InlineFlow::AddPiece(Item& item, Cursor& cursor, const Piece& piece) {
     pieces_.push_back(piece);
     item.endPiece = static_cast<uint32_t>(pieces_.size());
     cursor.x = piece.x + piece.width;
+    cursor.opened = 0;
 }
 
 void InlineFlow::AddText(LayoutHandle& handle, Cursor& cursor) {
     auto& text = static_cast<DisplayText&>(*handle.node().display);
     const auto first = static_cast<uint32_t>(pieces_.size());
     items_.push_back({&handle, Kind::Text, first, first});
+    const auto lay = [&] {
+        return text.LayoutInline(handle, {cursor.width, cursor.x, cursor.scale, cursor.base});
+    };
+    // The first word did not fit behind what is there: the text begins on the next line.
+    const auto skips = [&](const layout::TextInfo* info) {
+        return info != nullptr && info->lines.size() > 1 && info->lines[0].runCount == 0 &&
+               !info->lines[0].endsParagraph && cursor.x > 0;
+    };
+    const layout::TextInfo* info = lay();
+    if (cursor.opened > 0 && cursor.x > cursor.opened && skips(info)) {
+        NewLine(cursor, true);
+        info = lay();
+    }
     const float offset = cursor.x;
-    const layout::TextInfo* info = text.LayoutInline(handle, {cursor.width, offset, cursor.scale});
+    const bool skipsFirst = skips(info);
     if (info == nullptr) return;
     for (uint32_t i = 0; i < info->lines.size(); ++i) {
         const layout::TextLineInfo& line = info->lines[i];
-        // The first word did not fit behind what is there: the text begins on the next line.
-        const bool skipped =
-            i == 0 && line.runCount == 0 && info->lines.size() > 1 && offset > 0 && !line.endsParagraph;
         if (i > 0) NewLine(cursor, !info->lines[i - 1].endsParagraph);
-        if (skipped) continue;
+        if (i == 0 && skipsFirst) continue;
         const float start = i == 0 ? offset : 0;
         AddPiece(items_.back(), cursor,
                  {static_cast<uint32_t>(lines_.size() - 1), i, static_cast<uint32_t>(items_.size() - 1),
                   start, std::max(line.extent - start, 0.0f), line.baseline, line.height - line.baseline});
+        pieces_.back().direction = DirectionOf(*info, line);
     }
 }
 
@@ -152,8 +210,10 @@ void InlineFlow::AddInline(LayoutHandle& handle, Cursor& cursor, uint32_t depth)
     const auto first = static_cast<uint32_t>(pieces_.size());
     items_.push_back({&handle, Kind::Inline, first, first});
     cursor.x += edges.Left();
+    cursor.opened += edges.Left();
     Walk(handle, cursor, depth + 1);
     cursor.x += edges.Right();
+    if (first == pieces_.size()) cursor.opened += edges.Right();
     items_[open].endPiece = static_cast<uint32_t>(pieces_.size());
 }
 
@@ -172,6 +232,8 @@ void InlineFlow::AlignLines(css::TextAlignType align, float width) {
             pieces_[end].moved = pieces_[end].gap = 0;
         if (align == css::TextAlignType::Justify)
             JustifyLine(lines_[line], &pieces_[first], pieces_.data() + end, width);
+        if (base_ != BaseDirection::OfText)
+            OrderLine(lines_[line], &pieces_[first], pieces_.data() + end, 1 - part);
         first = end;
     }
 }
@@ -190,7 +252,9 @@ float InlineFlow::SpaceBehind(const Piece& piece) const {
     const layout::TextLineInfo& line = info->lines[piece.textLine];
     if (line.runCount == 0) return 0;
     const layout::TextRun& last = info->runs[line.firstRun + line.runCount - 1];
-    const float space = line.extent - (last.x + last.width);
+    // Read from right to left it stands on the left.
+    const float space = base_ == BaseDirection::RightToLeft ? info->runs[line.firstRun].x - piece.x
+                                                            : line.extent - (last.x + last.width);
     return space > layout::kLengthTolerance ? space : 0;
 }
 
@@ -224,6 +288,32 @@ void InlineFlow::JustifyLine(const Line& line, Piece* first, Piece* end, float w
         piece->gap = gap;
         piece->moved = moved;
         moved += piece->Spread() + (piece->gapBehind ? gap : 0);
+    }
+}
+
+// From the order of reading to that on the line (Unicode Annex 9, rule L2, for whole pieces): what goes
+// against the paragraph turns around within its own stretch.
+void InlineFlow::OrderLine(const Line& line, Piece* first, Piece* end, float hung) const {
+    const auto mirror = [](Piece* from, Piece* to, float left, float right) {
+        for (Piece* piece = from; piece != to; ++piece)
+            piece->moved =
+                left + right - (piece->x + piece->moved + piece->width + piece->Spread()) - piece->x;
+    };
+    const bool backward = base_ == BaseDirection::RightToLeft;
+    const float right = std::max(end[-1].x + end[-1].moved + end[-1].width + end[-1].Spread(), line.width);
+    if (backward) mirror(first, end, 0, right - SpaceBehind(end[-1]) * hung);
+    const BaseDirection against = backward ? BaseDirection::LeftToRight : BaseDirection::RightToLeft;
+    for (Piece* from = first; from != end;) {
+        Piece* to = from;
+        while (to != end && to->direction == against)
+            ++to;
+        if (to - from > 1) {
+            const Piece& leftmost = backward ? to[-1] : *from;
+            const Piece& rightmost = backward ? *from : to[-1];
+            mirror(from, to, leftmost.x + leftmost.moved,
+                   rightmost.x + rightmost.moved + rightmost.width + rightmost.Spread());
+        }
+        from = to == from ? from + 1 : to;
     }
 }
 

@@ -8,6 +8,9 @@
 // An inline box that goes over several lines has one box around all of its lines. `justify` widens the gaps
 // between words of lines that went on for want of room, whichever texts these gaps belong to; the boxes
 // behind them move along.
+//
+// A paragraph whose first letter runs from right to left has its lines ordered from the right. A piece moves
+// as a whole: where one text mixes directions, its parts do not change places with those of the next text.
 #pragma once
 
 #include "css/values/length_context.h"
@@ -48,7 +51,8 @@ class InlineFlow {
         float gap = 0;
         uint32_t firstGap = 0;
         uint32_t endGap = 0;
-        bool gapBehind = false;  // the space that ends the text
+        bool gapBehind = false;                                           // the space that ends the text
+        layout::BaseDirection direction = layout::BaseDirection::OfText;  // OfText: that of the paragraph
         float Spread() const { return gap * static_cast<float>(endGap - firstGap); }
     };
     struct Line {
@@ -62,7 +66,11 @@ class InlineFlow {
     struct Cursor {
         float width;
         float scale;
+        layout::BaseDirection base;
         float x = 0;
+        // Of inline boxes that were opened behind the last piece: they go to the next line with their
+        // content.
+        float opened = 0;
     };
 
     void Walk(layout::LayoutHandle& parent, Cursor& cursor, uint32_t depth);
@@ -74,6 +82,7 @@ class InlineFlow {
 
     void AlignLines(css::TextAlignType align, float width);
     void JustifyLine(const Line& line, Piece* first, Piece* end, float width);
+    void OrderLine(const Line& line, Piece* first, Piece* end, float hung) const;
     void FindGaps(Piece& piece, bool startsLine, bool endsLine) const;
     const layout::TextInfo* TextOf(const Piece& piece) const;
     float SpaceBehind(const Piece& piece) const;
@@ -88,6 +97,7 @@ class InlineFlow {
     List<Piece> pieces_;
     List<Line> lines_;
     List<layout::LayoutHandle*> outOfFlow_;
+    layout::BaseDirection base_ = layout::BaseDirection::OfText;
 };
 
 }  // namespace qorvex::dsp

@@ -2,6 +2,9 @@
 #include "display/display_paragraph.h"
 
 #include <fresco/rendering_library.h>
+#include <qorvex/text_services.h>
+
+#include <cctype>
 
 #include "display/display_text.h"
 #include "layout/fonts/fallback_font_data.h"
@@ -10,6 +13,30 @@
 
 namespace qorvex::test {
 namespace {
+
+// Hebrew runs from right to left, Latin letters from left to right, all else as the first letter or mark.
+class Directions final : public IInternationalizationManager {
+  public:
+    TextDirection ComputeBaseDirection(const char* utf8, unsigned length) override {
+        for (unsigned i = 0; i < length; ++i) {
+            if (IsHebrew(utf8[i])) return TextDirection::RightToLeft;
+            if (std::isalpha(static_cast<unsigned char>(utf8[i]))) break;
+            if (utf8[i] != '\xE2' || i + 2 >= length) continue;
+            return utf8[i + 2] == '\x8F' ? TextDirection::RightToLeft : TextDirection::LeftToRight;
+        }
+        return TextDirection::LeftToRight;
+    }
+    void ComputeTextDirection(const char* utf8, unsigned length, i18n::TextDirectionResult* result) override {
+        const unsigned base = ComputeBaseDirection(utf8, length) == TextDirection::RightToLeft ? 1 : 0;
+        for (unsigned i = 0; i < length; ++i) {
+            const bool isLatin = std::isalpha(static_cast<unsigned char>(utf8[i])) != 0;
+            result->AddRun(i, 1, isLatin ? base * 2 : IsHebrew(utf8[i]) || (utf8[i] & 0x40) == 0 ? 1 : base);
+        }
+    }
+
+  private:
+    static bool IsHebrew(char byte) { return byte == '\xD7'; }
+};
 
 using dsp::DisplayParagraph;
 using dsp::DisplayText;
@@ -102,6 +129,7 @@ TEST_F(ParagraphTest, JustifyWidensGapsAcrossElements) {
     ASSERT_NE(static_cast<DisplayText&>(*second->node().display).Info(), nullptr);
     const layout::TextInfo plain = *static_cast<DisplayText&>(*second->node().display).Info();
     ASSERT_GT(plain.lines.size(), 2u);
+    EXPECT_GT(plain.gaps.size(), 10u);
     const float end = Right(last);
 
     for (const char* align : {"text-align:justify", "text-align:left", "text-align:justify"}) {
@@ -116,6 +144,44 @@ TEST_F(ParagraphTest, JustifyWidensGapsAcrossElements) {
         EXPECT_LE(Right(second), 200.01f);
         EXPECT_FLOAT_EQ(Right(last), end);
     }
+}
+
+// The first letter of a paragraph decides from which side its lines are read, and with them its punctuation.
+TEST_F(ParagraphTest, LinesAreReadFromTheSideOfTheFirstLetter) {
+    Directions directions;
+    page.tree.SetTextServices({fonts->GetFontService(), &directions});
+    const auto texts = [&](std::initializer_list<const char*> parts) {
+        LayoutHandle* p = Paragraph("width:600px");
+        std::vector<LayoutHandle*> made;
+        for (const char* part : parts)
+            made.push_back(Text(p, part));
+        return made;
+    };
+    const auto right = texts({"אבג ", "one ", "two", " ד!"});
+    const auto left = texts({"one ", "אב", "גד", " two"});
+    const auto plain = texts({"one ", "two"});
+    page.Settle();
+    // Latin words keep their own order; what is read last stands at the left edge.
+    EXPECT_FLOAT_EQ(Box(right[3]).left, 0);
+    EXPECT_GT(Box(right[1]).left, Right(right[3]) - 0.01f);
+    EXPECT_GT(Box(right[2]).left, Right(right[1]) - 0.01f);
+    EXPECT_GT(Box(right[0]).left, Right(right[2]) - 0.01f);
+    const layout::TextInfo& last = *static_cast<DisplayText&>(*right[3]->node().display).Info();
+    EXPECT_TRUE(last.runs[0].rightToLeft);
+    EXPECT_LT(Box(left[2]).left, Box(left[1]).left);
+    EXPECT_LT(Box(left[1]).left, Box(left[3]).left);
+    EXPECT_LT(Box(plain[0]).left, Box(plain[1]).left);
+    page.tree.SetTextServices({fonts->GetFontService()});
+}
+
+TEST_F(ParagraphTest, EdgesGoToTheNextLineWithTheirContent) {
+    LayoutHandle* p = Paragraph("width:100px");
+    Text(p, "some words ");
+    LayoutHandle* chip = Inline(p, "padding-left:9px;padding-right:9px");
+    Text(chip, "button");
+    page.Settle();
+    EXPECT_GT(Box(chip).top, Box(p).top);
+    EXPECT_FLOAT_EQ(Box(chip).left, Box(p).left);
 }
 
 TEST_F(ParagraphTest, BlocksStandAsPiecesAndAlignmentMovesLines) {

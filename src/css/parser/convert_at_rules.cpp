@@ -80,7 +80,11 @@ std::optional<FontFace> ConvertFontFace(const FontFaceSyntax& syntax, Conversion
     for (const DeclarationSyntax& descriptor : syntax.declarations) {
         if (!IsPlainDescriptor(descriptor)) continue;
         if (descriptor.name == "font-family") {
-            face.family = WithoutQuotes(descriptor.value);
+            // A face has one name; a list of them names none.
+            ListReader names(descriptor.value);
+            std::string_view name, other;
+            face.family.clear();
+            if (names.Next(name) && !names.Next(other)) face.family = WithoutQuotes(name);
         } else if (descriptor.name == "font-weight") {
             ConvertFontWeight(descriptor.value, face.weight);
         } else if (descriptor.name == "font-style") {

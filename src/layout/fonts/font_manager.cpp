@@ -210,8 +210,14 @@ void FontManager::AddFontFace(const css::FontFace& face) {
         LogWarning("@font-face src url must be a valid URI");
         return;
     }
-    const auto weight =
-        static_cast<uint8_t>(std::clamp<int32_t>((face.weight + 50) / 100, kLightestWeight, kHeaviestWeight));
+    uint8_t weight = kNormalWeight;
+    if (face.weight >= kLightestWeight * 100 && face.weight <= kHeaviestWeight * 100) {
+        weight = static_cast<uint8_t>((face.weight + 50) / 100);
+    } else {
+        LogWarning(
+            "font-weight descriptor in @font-face declaration was not parsed properly. Font-weight accepts "
+            "only specific weight values: [0-1000], normal, bold. Using the initial value");
+    }
     // Pages get outlines at their true shape: distance fields pay only for text that a GPU scales.
     AddFontDescription({strings_.Intern(face.family.view()), StyleCode(face.style), weight}, url, 0);
 }

@@ -19,7 +19,7 @@ void DecodeCharacters(std::string_view utf8, css::WhiteSpaceMode whiteSpace, Cha
     for (size_t at = 0; at < utf8.size();) {
         const auto offset = static_cast<uint32_t>(at);
         uint32_t code = qsl::NextCodePoint(utf8, at);
-        // A line feed that belongs to a carriage return before it is one line end; a lone return is a blank.
+        // A carriage return and the line feed behind it are one line end; a lone return is one too.
         if (code == 0x0D) code = at < utf8.size() && utf8[at] == '\n' ? 0x20 : 0x0A;
         if (code <= 0x85) {
             const CharacterClass kind = ClassOf(code);

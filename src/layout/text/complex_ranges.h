@@ -16,6 +16,9 @@ inline constexpr uint32_t kFirstComplexCode = 0x02E5;
 // letters has them too.
 [[nodiscard]] bool ExtendsCharacter(uint32_t code);
 
+inline constexpr uint32_t kSoftHyphen = 0x00AD;
+// No code before it is invisible.
+inline constexpr uint32_t kFirstInvisible = kSoftHyphen;
 // Shows nothing by itself, so that a font need not have it.
 [[nodiscard]] bool IsInvisible(uint32_t code);
 

@@ -14,12 +14,15 @@ constexpr unsigned kMaxLevel = 126;
 // Runs may come in any order, overlap or reach beyond the text: what the client says last holds.
 class Levels final : public i18n::TextDirectionResult {
   public:
-    Levels(const Characters& characters, size_t bytes, TempVector<uint8_t>& out)
-        : offsets_(characters.offsets), bytes_(bytes), out_(out) {}
+    // `prefix`: bytes in front of the text that the client was given too.
+    Levels(const Characters& characters, size_t bytes, size_t prefix, TempVector<uint8_t>& out)
+        : offsets_(characters.offsets), bytes_(bytes), prefix_(prefix), out_(out) {}
 
-    void AddRun(unsigned start, unsigned length, unsigned level) override {
-        if (start >= bytes_ || length == 0) return;
-        const size_t end = start + std::min<size_t>(length, bytes_ - start);
+    void AddRun(unsigned from, unsigned length, unsigned level) override {
+        const size_t given = size_t{from} + length;
+        if (from >= prefix_ + bytes_ || given <= prefix_ || length == 0) return;
+        const size_t start = std::max<size_t>(from, prefix_) - prefix_;
+        const size_t end = std::min(given - prefix_, bytes_);
         const size_t first = CharacterAt(start);
         const size_t last = CharacterAt(end);
         std::fill(out_.begin() + first, out_.begin() + last,
@@ -34,17 +37,29 @@ class Levels final : public i18n::TextDirectionResult {
 
     const TempVector<uint32_t>& offsets_;
     const size_t bytes_;
+    const size_t prefix_;
     TempVector<uint8_t>& out_;
 };
 
 }  // namespace
 
-void ResolveLevels(std::string_view utf8, const Characters& characters, IInternationalizationManager* i18n,
-                   TempVector<uint8_t>& levels) {
+void ResolveLevels(const TextRequest& request, const Characters& characters, TempVector<uint8_t>& levels) {
     levels.resize(characters.codes.size(), uint8_t{0});
-    if (i18n == nullptr) return;
-    Levels result(characters, utf8.size(), levels);
-    i18n->ComputeTextDirection(utf8.data(), static_cast<unsigned>(utf8.size()), &result);
+    if (request.i18n == nullptr) return;
+    const std::string_view utf8 = request.text;
+    if (request.base == BaseDirection::OfText) {
+        Levels result(characters, utf8.size(), 0, levels);
+        request.i18n->ComputeTextDirection(utf8.data(), static_cast<unsigned>(utf8.size()), &result);
+        return;
+    }
+    // The client takes the direction from the first letter: a mark in front stands for that letter.
+    const std::string_view mark = request.base == BaseDirection::RightToLeft ? "\u200F" : "\u200E";
+    TempVector<char> marked;
+    marked.reserve(mark.size() + utf8.size());
+    marked.append(mark.begin(), mark.end());
+    marked.append(utf8.begin(), utf8.end());
+    Levels result(characters, utf8.size(), mark.size(), levels);
+    request.i18n->ComputeTextDirection(marked.data(), static_cast<unsigned>(marked.size()), &result);
 }
 
 }  // namespace qorvex::layout

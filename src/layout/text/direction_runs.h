@@ -1,19 +1,13 @@
 // The direction of each character, from the client's international text services.
 #pragma once
 
-#include <string_view>
-
 #include "layout/text/characters.h"
-
-namespace qorvex {
-class IInternationalizationManager;
-}
+#include "layout/text/text_layout.h"
 
 namespace qorvex::layout {
 
 // Levels as in Unicode Annex 9: an odd one runs from right to left. Without a manager all are 0.
-void ResolveLevels(std::string_view utf8, const Characters& characters, IInternationalizationManager* i18n,
-                   TempVector<uint8_t>& levels);
+void ResolveLevels(const TextRequest& request, const Characters& characters, TempVector<uint8_t>& levels);
 
 // From the order of reading to the order on the line, left to right (Unicode Annex 9, rule L2). `Item` has
 // a member `level`.

@@ -16,7 +16,8 @@ bool FitsAt(const TextRequest& request, TextStyle& style, float size, TextInfo& 
     style.usedSize = size;
     const TextRequest sized = {
         request.text,     style,        request.availableWidth,  request.availableHeight, request.fonts,
-        request.iterator, request.i18n, request.firstLineOffset, request.applyLineHeight};
+        request.iterator, request.i18n, request.firstLineOffset, request.applyLineHeight, request.notesGaps,
+        request.base};
     return CalculateTextRunsAndGlyphs(sized, out) && Fits(request, out);
 }
 

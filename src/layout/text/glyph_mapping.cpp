@@ -4,6 +4,8 @@
 
 #include <algorithm>
 
+#include "layout/text/complex_ranges.h"
+
 namespace qorvex::layout {
 
 namespace {
@@ -50,6 +52,20 @@ void JoinSpaces(const Characters& characters, const LoadedTypefaces& typefaces, 
         if (glyph == 0) continue;
         map.glyphs[i] = glyph;
         map.fonts[i] = font;
+    }
+}
+
+// Joiners, marks of direction and places for a hyphen show nothing, whether a font has a sign for them or
+// not.
+void HideInvisible(const Characters& characters, const LoadedTypefaces& typefaces, const TextStyle& style,
+                   GlyphMap& map) {
+    for (size_t i = 0; i < map.glyphs.size(); ++i) {
+        if (!IsInvisible(characters.codes[i])) continue;
+        if (characters.codes[i] == kSoftHyphen)
+            map.hyphen = std::max(map.hyphen, HyphenOf(*typefaces.fonts[map.fonts[i]], style).x);
+        const uint32_t space = 0x20;
+        typefaces.fonts[map.fonts[i]]->GetGlyphIndices(&space, 1, &map.glyphs[i]);
+        map.advances[i] = 0;
     }
 }
 
@@ -114,10 +130,19 @@ void MapFonts(const Characters& characters, const LoadedTypefaces& typefaces, Gl
     if (out.mixed) JoinSpaces(characters, typefaces, out);
 }
 
+fresco::Glyph HyphenOf(const fresco::IFont& font, const TextStyle& style) {
+    const uint32_t code = '-';
+    fresco::Glyph hyphen{};
+    font.GetGlyphIndices(&code, 1, &hyphen.index);
+    font.GetAdvances(&hyphen.index, 1, style.usedSize, &hyphen.x);
+    return hyphen;
+}
+
 void MapGlyphs(const Characters& characters, const LoadedTypefaces& typefaces, const TextStyle& style,
                GlyphMap& out) {
     MapFonts(characters, typefaces, out);
     MeasureAdvances(characters, typefaces, style, out);
+    if (characters.highest >= kFirstInvisible) HideInvisible(characters, typefaces, style, out);
 }
 
 }  // namespace qorvex::layout

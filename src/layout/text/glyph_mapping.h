@@ -4,6 +4,8 @@
 #include "layout/text/characters.h"
 #include "layout/text/text_style.h"
 
+#include <fresco/paint.h>
+
 namespace fresco {
 class IFont;
 class IFontService;
@@ -29,6 +31,7 @@ struct GlyphMap {
     TempVector<uint8_t> fonts;   // index into LoadedTypefaces
     TempVector<float> advances;  // letter spacing included
     bool mixed = false;          // not all characters have the same font
+    float hyphen = 0;            // advance of what a soft hyphen becomes; 0 without one in the text
 };
 
 // Empty when nothing is loaded.
@@ -37,6 +40,9 @@ void LoadTypefaces(const TextStyle& style, fresco::IFontService& service, bool a
 
 // Every character gets the first font that has it, else the box of the first font. Advances stay 0.
 void MapFonts(const Characters& characters, const LoadedTypefaces& typefaces, GlyphMap& out);
+// The glyph and the advance that a soft hyphen has where a line ends behind it.
+fresco::Glyph HyphenOf(const fresco::IFont& font, const TextStyle& style);
+
 // The same with advances.
 void MapGlyphs(const Characters& characters, const LoadedTypefaces& typefaces, const TextStyle& style,
                GlyphMap& out);

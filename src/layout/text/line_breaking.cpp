@@ -4,6 +4,8 @@
 
 #include <limits>
 
+#include "layout/text/complex_ranges.h"
+
 namespace qorvex::layout {
 
 namespace {
@@ -101,7 +103,8 @@ class LineBreaker {
     void FinishWord(uint32_t end) {
         if (end == wordStart_) return;
         const bool first = lineEnd_ == lineStart_ && lineWidth_ <= 0;
-        if (wraps_ && !first && lineWidth_ + pendingSpace_ + wordWidth_ > available_) {
+        const float hyphen = request_.characters.codes[end - 1] == kSoftHyphen ? request_.hyphen : 0;
+        if (wraps_ && !first && lineWidth_ + pendingSpace_ + wordWidth_ + hyphen > available_) {
             EndLine(lineEnd_, wordStart_, false);
         }
         lineWidth_ += pendingSpace_ + wordWidth_;

@@ -28,6 +28,7 @@ struct BreakRequest {
     float firstLineOffset;                   // taken on the first line by content before this text
     i18n::IBreakIterator* iterator;          // null: lines break at spaces alone; holds the text already
     const uint8_t* clusterStarts = nullptr;  // null: a line may break before each character
+    float hyphen = 0;                        // that a soft hyphen at the end of a line becomes
 };
 
 void BreakLines(const BreakRequest& request, TempVector<LineSpan>& out);

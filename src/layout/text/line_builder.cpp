@@ -4,6 +4,7 @@
 
 #include <algorithm>
 
+#include "layout/text/complex_ranges.h"
 #include "layout/text/direction_runs.h"
 
 namespace qorvex::layout {
@@ -48,6 +49,7 @@ class LineBuilder {
             LineSpan span = spans[i];
             TextLineInfo line;
             if (ellipsis_.font != css::kNoTypeface && span.width > request_.availableWidth) Cut(span, line);
+            if (map_.hyphen > 0 && !span.endsParagraph) ShowHyphen(span);
             if (Justifies() && !span.endsParagraph) Spread(span);
             AddLine(span, line);
             out_.wrapped |= !span.endsParagraph;
@@ -88,6 +90,16 @@ class LineBuilder {
         line.ellipsis = ellipsis_;
         line.ellipsis.x = ellipsisInFront_ ? 0 : span.width;
         span.width += ellipsis_.advance;
+    }
+
+    // A word that was parted at a soft hyphen shows it.
+    void ShowHyphen(LineSpan& span) {
+        if (span.end == span.first || characters_.codes[span.end - 1] != kSoftHyphen) return;
+        const uint32_t last = span.end - 1;
+        const fresco::Glyph hyphen = HyphenOf(*typefaces_.fonts[map_.fonts[last]], request_.style);
+        map_.glyphs[last] = hyphen.index;
+        map_.advances[last] = hyphen.x;
+        span.width += hyphen.x;
     }
 
     bool IsGap(uint32_t character) const {

@@ -126,19 +126,19 @@ void TakeAdvances(const TextStyle& style, GlyphMap& map, ShapedText& out) {
 
 }  // namespace
 
-void ShapeText(std::string_view utf8, const Characters& characters, const LoadedTypefaces& typefaces,
-               const TextStyle& style, IInternationalizationManager* i18n, GlyphMap& map, ShapedText& out) {
+void ShapeText(const TextRequest& request, const Characters& characters, const LoadedTypefaces& typefaces,
+               GlyphMap& map, ShapedText& out) {
     const size_t count = characters.codes.size();
     MapFonts(characters, typefaces, map);
     if (map.mixed) KeepUnitsTogether(characters, typefaces, map);
     TempVector<uint8_t> levels;
-    ResolveLevels(utf8, characters, i18n, levels);
+    ResolveLevels(request, characters, levels);
     SplitSpans(characters, map, levels, out.spans);
     out.clusterStarts.resize(count, uint8_t{0});
     out.glyphs.reserve(count);
     for (ShapedSpan& span : out.spans)
-        ShapeSpan(span, characters.codes, typefaces, style, out);
-    TakeAdvances(style, map, out);
+        ShapeSpan(span, characters.codes, typefaces, request.style, out);
+    TakeAdvances(request.style, map, out);
 }
 
 }  // namespace qorvex::layout

@@ -3,13 +3,8 @@
 
 #include <fresco/font.h>
 
-#include <string_view>
-
 #include "layout/text/glyph_mapping.h"
-
-namespace qorvex {
-class IInternationalizationManager;
-}
+#include "layout/text/text_layout.h"
 
 namespace qorvex::layout {
 
@@ -34,7 +29,7 @@ struct ShapedText {
 
 // Fills the map's fonts and advances, where the first character of a cluster has all of its width, and the
 // shaped glyphs.
-void ShapeText(std::string_view utf8, const Characters& characters, const LoadedTypefaces& typefaces,
-               const TextStyle& style, IInternationalizationManager* i18n, GlyphMap& map, ShapedText& out);
+void ShapeText(const TextRequest& request, const Characters& characters, const LoadedTypefaces& typefaces,
+               GlyphMap& map, ShapedText& out);
 
 }  // namespace qorvex::layout

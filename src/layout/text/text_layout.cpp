@@ -24,24 +24,30 @@ bool LayOut(const TextRequest& request, Path path, TextInfo& out) {
 
     Characters characters;
     DecodeCharacters(request.text, request.style.whiteSpace, characters);
-    const bool complex =
-        path == Path::Complex || (request.style.complexText && characters.highest >= kFirstComplexCode &&
-                                  NeedsComplexText(characters.codes.data(), characters.codes.size()));
+    // In a line that runs from right to left even plain text has parts that do: its punctuation.
+    const bool backward = request.base == BaseDirection::RightToLeft;
+    const bool needed = backward || (characters.highest >= kFirstComplexCode &&
+                                     NeedsComplexText(characters.codes.data(), characters.codes.size()));
+    const bool complex = path == Path::Complex || (request.style.complexText && needed);
     GlyphMap map;
     ShapedText shaped;
     if (complex)
-        ShapeText(request.text, characters, typefaces, request.style, request.i18n, map, shaped);
+        ShapeText(request, characters, typefaces, map, shaped);
     else
         MapGlyphs(characters, typefaces, request.style, map);
     TempVector<LineSpan> spans;
-    BreakLines({characters, map.advances.data(), request.style, request.availableWidth,
-                request.firstLineOffset, request.iterator, complex ? shaped.clusterStarts.data() : nullptr},
-               spans);
+    BreakLines(
+        {characters, map.advances.data(), request.style, request.availableWidth, request.firstLineOffset,
+         request.iterator, complex ? shaped.clusterStarts.data() : nullptr, map.hyphen},
+        spans);
     BuildLines({request, characters, typefaces, map, complex ? &shaped : nullptr}, spans, out);
     if (characters.endedInSpace && !out.lines.empty()) {
         const float space = request.style.fontSize * kTrailingSpace + request.style.letterSpacing;
-        out.lines.back().width += space;
-        out.lines.back().extent += space;
+        TextLineInfo& last = out.lines.back();
+        last.width += space;
+        last.extent += space;
+        for (uint32_t i = 0; i < last.runCount && backward; ++i)
+            out.runs[last.firstRun + i].x += space;
     }
     AlignLines(request.style, request.availableWidth, out);
     return true;

@@ -28,6 +28,7 @@ struct TextRequest {
     float firstLineOffset = 0;
     bool applyLineHeight = true;
     bool notesGaps = false;  // fill TextInfo::gaps
+    BaseDirection base = BaseDirection::OfText;
 };
 
 // One layout at style.usedSize, by the path that the text needs. False, with an empty result, when no

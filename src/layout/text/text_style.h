@@ -10,6 +10,9 @@ namespace qorvex::layout {
 // Below zero: the fonts decide.
 inline constexpr float kNormalLineHeight = -1;
 
+// What punctuation, digits and the order of runs go by. A text alone has that of its first letter.
+enum class BaseDirection : uint8_t { OfText, LeftToRight, RightToLeft };
+
 struct TextStyle {
     css::CssSmallVector<uint32_t, 4>
         typefaces;  // font ids in priority order; css::kNoTypeface while one loads

@@ -197,6 +197,7 @@ TEST_F(ComplexTextTest, HostileTextIsBounded) {
     std::string marks, controls, scripts, mixed, lines, word;
     for (int i = 0; i < 100000; ++i)
         marks += "\u0301";
+    const std::string onLetter = "a" + marks;
     for (int i = 0; i < 200; ++i)
         controls += "\u202E\u2067a";
     for (uint32_t code = 0x80; code < 0x30000; code += 7) {
@@ -218,7 +219,7 @@ TEST_F(ComplexTextTest, HostileTextIsBounded) {
     // Long enough without a place to break that a square of it would show.
     for (int i = 0; i < 500000; ++i)
         word += "ب";
-    for (const std::string& text : {marks, controls, scripts, mixed, word,
+    for (const std::string& text : {marks, onLetter, controls, scripts, mixed, word,
                                     std::string("\xED\xA0\x80\xED\xBF\xBF\u0301"), std::string("\u0301")}) {
         const TextInfo info = Lay(text, 200);
         EXPECT_TRUE(std::isfinite(info.width) && std::isfinite(info.height));

@@ -3,6 +3,7 @@
 
 #include <fresco/rendering_library.h>
 #include <gtest/gtest.h>
+#include <qorvex/text_services.h>
 
 #include <cmath>
 #include <string>
@@ -85,6 +86,35 @@ TEST_F(TextLayoutTest, WhiteSpaceCollapsesOrStays) {
     EXPECT_EQ(Lines("a\n\nb", NAN), (Texts{"a", "", "b"}));
     style_.whiteSpace = WhiteSpaceMode::PreWrap;
     EXPECT_EQ(Lines("aa  bb\nc", WidthOf("aa  b")), (Texts{"aa", "bb", "c"}));
+}
+
+// What a font has no sign for, and need not have, neither shows nor takes room; a soft hyphen shows where a
+// line ends behind it, and fits there.
+TEST_F(TextLayoutTest, InvisibleCharactersShowNothing) {
+    EXPECT_FLOAT_EQ(WidthOf("in\u00ADter\u200Bna\u2060tio\uFEFFnal"), WidthOf("international"));
+    struct BreakBehindHyphen final : i18n::IBreakIterator {
+        void Destroy() override {}
+        void SetText(const char*, unsigned) override {}
+        void Restart(const char*, unsigned) override {}
+        void ClearText() override {}
+        void ResetToBeginning() override {}
+        void ResetToEnd() override {}
+        int MoveToNext() override { return 0; }
+        int MoveToCandidateAfter(int) override { return 0; }
+        int MoveToPrevious() override { return 0; }
+        int GetCurrentPosition() override { return 0; }
+        int GetBoundaryAfter(int position) override { return position < 4 ? 4 : -1; }
+    } iterator;
+    for (const char* fitting : {"in-", "in"}) {
+        TextInfo info;
+        const float width = WidthOf(fitting);
+        ASSERT_TRUE(
+            LayoutText({"in\u00ADter", style_, width, NAN, *library_->GetFontService(), &iterator}, info));
+        const bool fits = std::string_view(fitting) == "in-";
+        ASSERT_EQ(info.lines.size(), 2u);
+        EXPECT_FLOAT_EQ(info.runs[0].width, WidthOf("in-"));
+        EXPECT_EQ(info.runs[0].width <= width, fits);
+    }
 }
 
 TEST_F(TextLayoutTest, EllipsisCutsOnlyLinesThatDoNotWrap) {
