@@ -123,7 +123,7 @@ CaptureData CpuScene::SerializeBuffers(CommandBuffer* const* buffers, uint32_t c
     for (const FontId id : uses.fonts) {
         const FontFace* face = shared_.fonts.GetFace(id);
         if (!face) continue;
-        const Vector<uint8_t>& bytes = face->GetData().bytes;
+        const std::span<const uint8_t> bytes = face->GetBytes();
         const Vector<BitmapFontImage> pages = face->GetPages();
         if (!pages.empty()) {
             const std::string_view table(reinterpret_cast<const char*>(bytes.data()), bytes.size());

@@ -113,14 +113,14 @@ Texture* GlyphCache::GetPicture(const FontFace& face, uint32_t glyph, const Colo
 }
 
 uint8_t* GlyphCache::TakeBytes(size_t count) {
-    if (blocks_.empty() || blockUsed_ + count > blocks_.back().size()) {
-        blocks_.emplace_back(std::max(count, kBlockSize), uint8_t(0));
-        blockUsed_ = 0;
-        bytes_ += blocks_.back().size();
+    if (blocks_.empty() || blocks_.back().size() + count > blocks_.back().capacity()) {
+        blocks_.emplace_back().reserve(std::max(count, kBlockSize));
+        bytes_ += blocks_.back().capacity();
     }
-    uint8_t* bytes = blocks_.back().data() + blockUsed_;
-    blockUsed_ += count;
-    return bytes;
+    // Zeroed piece by piece: a few glyphs touch a few pages of the block, not all.
+    Vector<uint8_t>& block = blocks_.back();
+    block.resize(block.size() + count);
+    return block.data() + block.size() - count;
 }
 
 void GlyphCache::Trim(size_t maxBytes) {
@@ -131,7 +131,7 @@ void GlyphCache::Clear() {
     bitmaps_.clear();
     pictures_.clear();
     blocks_.clear();
-    blockUsed_ = bytes_ = 0;
+    bytes_ = 0;
 }
 
 }  // namespace fresco::cpu

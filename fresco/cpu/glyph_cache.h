@@ -75,10 +75,10 @@ class GlyphCache {
     std::mutex mutex_;
     HashMap<Key, GlyphBitmap, KeyHash> bitmaps_;
     HashMap<uint64_t, Texture> pictures_;
-    // Blocks that never move; the last one is filled up to blockUsed_.
+    // Never grown beyond what was reserved, so that glyphs stay in their place.
     static constexpr size_t kBlockSize = 64 << 10;
     Vector<Vector<uint8_t>> blocks_;
-    size_t blockUsed_ = 0, bytes_ = 0;
+    size_t bytes_ = 0;
     Rasterizer rasterizer_;
     OutlineBuilder builder_;
 };

@@ -46,9 +46,8 @@ bool StartsWith(std::string_view line, std::string_view word) {
 }  // namespace
 
 bool BitmapFace::Load(std::string_view table, const BitmapFontDescription& description, FontId id) {
-    data_ = std::allocate_shared<FontData>(StdAllocator<FontData>());
     // Captures write it out again.
-    data_->bytes.assign(table.begin(), table.end());
+    data_ = MakeFontData(Vector<uint8_t>(table.begin(), table.end()));
     id_ = id;
     family_ = description.family ? description.family : "";
     flags_ = description.flags;

@@ -8,6 +8,7 @@
 #include <string>
 
 #include <fresco/font.h>
+#include "fresco/fonts/font_data.h"
 #include "fresco/paths/path_data.h"
 
 namespace fresco {
@@ -19,11 +20,6 @@ inline constexpr float kMaxFontSize = 16384;
 inline bool IsValidFontSize(float size) {
     return size > 0 && size <= kMaxFontSize;
 }
-
-// The bytes of a font file, shared by its faces, or the glyph table of a font of pictures.
-struct FontData {
-    Vector<uint8_t> bytes;
-};
 
 // In font units, y downward. Empty for blanks and for glyphs that are not there.
 struct GlyphOutline {
@@ -65,8 +61,8 @@ class FontFace : public IFont {
     float GetUnitsPerEm() const { return unitsPerEm_; }
     SdfMode GetSdfMode() const { return sdf_; }
     uint32_t GetFaceIndex() const { return faceIndex_; }
-    const FontData& GetData() const { return *data_; }
-    std::shared_ptr<FontData> ShareData() const { return data_; }
+    std::span<const uint8_t> GetBytes() const { return data_->bytes(); }
+    FontDataPtr ShareData() const { return data_; }
     // Of a font of pictures, valid as long as the face; none otherwise.
     virtual Vector<BitmapFontImage> GetPages() const { return {}; }
     // Whether a glyph may be a picture at all.
@@ -81,7 +77,7 @@ class FontFace : public IFont {
   protected:
     FontFace() = default;
 
-    std::shared_ptr<FontData> data_;
+    FontDataPtr data_;
     FontId id_ = kNoId;
     uint32_t faceIndex_ = 0;
     uint32_t flags_ = 0;

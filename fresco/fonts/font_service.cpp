@@ -10,14 +10,11 @@
 #include <cstring>
 
 #include "fresco/core/log.h"
-#include "fresco/core/prefault.h"
 #include "fresco/fonts/bitmap_face.h"
 
 namespace fresco {
 namespace {
 
-// The largest fonts there are (all of CJK in one collection) stay below this, packed or not.
-constexpr size_t kMaxFontBytes = size_t(128) << 20;
 // A glyph table has a line of some hundred bytes for a character.
 constexpr size_t kMaxTableBytes = size_t(16) << 20;
 // Instances of a variable font that names find; usual ones have 9 weights, upright and slanted.
@@ -53,21 +50,6 @@ void* FtReallocate(FT_Memory memory, long, long newSize, void* block) {
     std::memcpy(moved, block, std::min(oldSize, size_t(newSize)));
     FtFree(memory, block);
     return moved;
-}
-
-bool ReadAll(IStreamReader* stream, Vector<uint8_t>* bytes, size_t most = kMaxFontBytes) {
-    const size_t size = stream ? stream->GetSize() : 0;
-    if (size == 0 || size > most) return false;
-    bytes->reserve(size);
-    Prefault(bytes->data(), size);
-    bytes->resize(size);
-    size_t done = 0;
-    while (done < size) {
-        const size_t read = stream->Read(done, bytes->data() + done, size - done);
-        if (read == 0 || read > size - done) return false;
-        done += read;
-    }
-    return true;
 }
 
 bool EqualFamily(const char* a, const char* b) {
@@ -128,8 +110,12 @@ bool FontService::AddBitmapFace(FontId id, std::string_view table, const BitmapF
 }
 
 uint32_t FontService::GetFaceCount(IStreamReader* stream) {
-    Vector<uint8_t> bytes;
-    if (!ReadAll(stream, &bytes)) return 0;
+    Vector<uint8_t> copy;
+    std::span<const uint8_t> bytes = InPlace(stream);
+    if (bytes.empty()) {
+        if (!ReadAll(stream, &copy)) return 0;
+        bytes = copy;
+    }
     std::lock_guard lock(mutex_);
     FT_Face face = nullptr;
     if (!library_ || FT_New_Memory_Face(library_, bytes.data(), FT_Long(bytes.size()), -1, &face)) return 0;
@@ -139,21 +125,15 @@ uint32_t FontService::GetFaceCount(IStreamReader* stream) {
 }
 
 // The faces of a collection come as one file each time; keep its bytes once.
-std::shared_ptr<FontData> FontService::ShareData(Vector<uint8_t> bytes) {
-    for (const auto& [id, face] : faces_) {
-        const FontData& data = face->GetData();
-        if (data.bytes.size() == bytes.size() &&
-            std::memcmp(data.bytes.data(), bytes.data(), bytes.size()) == 0) {
-            return face->ShareData();
-        }
-    }
-    auto data = std::allocate_shared<FontData>(StdAllocator<FontData>());
-    data->bytes = std::move(bytes);
-    return data;
+FontDataPtr FontService::ShareData(FontDataPtr data) const {
+    const auto same = [&](const auto& entry) {
+        return std::ranges::equal(entry.second->GetBytes(), data->bytes());
+    };
+    const auto found = std::find_if(faces_.begin(), faces_.end(), same);
+    return found == faces_.end() ? data : found->second->ShareData();
 }
 
-FontService::ScalablePtr FontService::MakeFace(std::shared_ptr<FontData> data, uint32_t faceIndex,
-                                               SdfMode sdf, FontId id) {
+FontService::ScalablePtr FontService::MakeFace(FontDataPtr data, uint32_t faceIndex, SdfMode sdf, FontId id) {
     ScalablePtr face(library_ ? HeapNew<ScalableFace>(settings_) : nullptr);
     return face && face->Load(library_, std::move(data), faceIndex, sdf, id) ? std::move(face) : nullptr;
 }
@@ -166,7 +146,7 @@ void FontService::Keep(std::unique_ptr<Face, HeapDeleter<Face>> face) {
     nextId_ = std::max(nextId_, id + 1);
 }
 
-bool FontService::AddFace(std::shared_ptr<FontData> data, uint32_t faceIndex, SdfMode sdf, FontId id,
+bool FontService::AddFace(FontDataPtr data, uint32_t faceIndex, SdfMode sdf, FontId id,
                           uint32_t wantedFlags) {
     ScalablePtr face = MakeFace(data, faceIndex, sdf, id);
     if (!face) return false;
@@ -180,7 +160,7 @@ bool FontService::AddFace(std::shared_ptr<FontData> data, uint32_t faceIndex, Sd
     return true;
 }
 
-void FontService::AddInstances(const std::shared_ptr<FontData>& data, uint32_t faceIndex, SdfMode sdf) {
+void FontService::AddInstances(const FontDataPtr& data, uint32_t faceIndex, SdfMode sdf) {
     const auto& face = static_cast<const ScalableFace&>(*faces_.find(order_.back())->second);
     const uint32_t count = std::min(face.GetInstanceCount(), kMaxInstances);
     for (uint32_t instance = 1; instance <= count; ++instance)
@@ -192,14 +172,15 @@ FontId FontService::LoadFace(IStreamReader* stream, uint32_t faceIndex, SdfMode 
     if (!ReadAll(stream, &bytes)) return kNoId;
     std::lock_guard lock(mutex_);
     const FontId id = nextId_;
-    return AddFace(ShareData(std::move(bytes)), faceIndex, sdf, id, wantedFlags) ? id : kNoId;
+    return AddFace(ShareData(MakeFontData(std::move(bytes))), faceIndex, sdf, id, wantedFlags) ? id : kNoId;
 }
 
 bool FontService::LoadFaceAs(FontId id, const void* data, size_t size, uint32_t faceIndex, SdfMode sdf) {
     const auto* begin = static_cast<const uint8_t*>(data);
     std::lock_guard lock(mutex_);
     if (!IsFree(id)) return false;
-    return AddFace(ShareData(Vector<uint8_t>(begin, begin + size)), faceIndex, sdf, id, kAnyStyle);
+    return AddFace(ShareData(MakeFontData(Vector<uint8_t>(begin, begin + size))), faceIndex, sdf, id,
+                   kAnyStyle);
 }
 
 bool FontService::RegisterBitmapFontAs(FontId id, std::string_view table,
@@ -219,10 +200,10 @@ bool FontService::LoadSystemFonts() {
     std::lock_guard lock(mutex_);
     const Vector<FontId> loaded = std::move(order_);
     order_.clear();
-    const bool opened = system_.Open([this](IStreamReader* reader) {
-        Vector<uint8_t> bytes;
-        if (!ReadAll(reader, &bytes)) return;
-        const std::shared_ptr<FontData> data = ShareData(std::move(bytes));
+    const bool opened = system_.Open([this](StreamPtr reader) {
+        FontDataPtr data = MakeFontData(std::move(reader));
+        if (!data) return;
+        data = ShareData(std::move(data));
         for (uint32_t face = 0; AddFace(data, face, SdfMode::WhenLarge, nextId_, kAnyStyle); ++face)
             AddInstances(data, face, SdfMode::WhenLarge);
     });

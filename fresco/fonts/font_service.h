@@ -39,14 +39,13 @@ class FontService final : public IFontService {
     bool AddBitmapFace(FontId id, std::string_view table, const BitmapFontDescription& description);
     FontId FindLoaded(const char* family, uint32_t flags) const;
     bool LoadSystemFonts();
-    std::shared_ptr<FontData> ShareData(Vector<uint8_t> bytes);
+    FontDataPtr ShareData(FontDataPtr data) const;
     using ScalablePtr = std::unique_ptr<ScalableFace, HeapDeleter<ScalableFace>>;
-    ScalablePtr MakeFace(std::shared_ptr<FontData> data, uint32_t faceIndex, SdfMode sdf, FontId id);
+    ScalablePtr MakeFace(FontDataPtr data, uint32_t faceIndex, SdfMode sdf, FontId id);
     template <class Face>
     void Keep(std::unique_ptr<Face, HeapDeleter<Face>> face);
-    bool AddFace(std::shared_ptr<FontData> data, uint32_t faceIndex, SdfMode sdf, FontId id,
-                 uint32_t wantedFlags);
-    void AddInstances(const std::shared_ptr<FontData>& data, uint32_t faceIndex, SdfMode sdf);
+    bool AddFace(FontDataPtr data, uint32_t faceIndex, SdfMode sdf, FontId id, uint32_t wantedFlags);
+    void AddInstances(const FontDataPtr& data, uint32_t faceIndex, SdfMode sdf);
 
     mutable std::shared_mutex mutex_;
     FT_MemoryRec_* memory_ = nullptr;

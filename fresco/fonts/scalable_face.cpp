@@ -51,11 +51,11 @@ ScalableFace::~ScalableFace() {
     if (face_) FT_Done_Face(face_);
 }
 
-bool ScalableFace::Load(FT_LibraryRec_* library, std::shared_ptr<FontData> data, uint32_t faceIndex,
-                        SdfMode sdf, FontId id) {
+bool ScalableFace::Load(FT_LibraryRec_* library, FontDataPtr data, uint32_t faceIndex, SdfMode sdf,
+                        FontId id) {
     data_ = std::move(data);
-    if (FT_New_Memory_Face(library, data_->bytes.data(), FT_Long(data_->bytes.size()), FT_Long(faceIndex),
-                           &face_)) {
+    const std::span<const uint8_t> bytes = data_->bytes();
+    if (FT_New_Memory_Face(library, bytes.data(), FT_Long(bytes.size()), FT_Long(faceIndex), &face_)) {
         face_ = nullptr;
         return false;
     }

@@ -26,8 +26,7 @@ class ScalableFace final : public FontFace {
 
     // `library` is used under the lock of the service. The high half of the index names an instance of a
     // variable font, from 1.
-    bool Load(FT_LibraryRec_* library, std::shared_ptr<FontData> data, uint32_t faceIndex, SdfMode sdf,
-              FontId id);
+    bool Load(FT_LibraryRec_* library, FontDataPtr data, uint32_t faceIndex, SdfMode sdf, FontId id);
     // The index, with an instance in its high half, whose style comes nearest to a flag word.
     uint32_t FindInstance(uint32_t flags) const;
     uint32_t GetInstanceCount() const;

@@ -4,7 +4,7 @@
 #pragma once
 #include <fresco/file_manipulator.h>
 #include <string>
-#include "fresco/core/heap.h"
+#include "fresco/fonts/font_data.h"
 
 namespace fresco {
 
@@ -13,21 +13,15 @@ class SystemFonts {
     void SetOptions(const char* options);
     void SetFiles(IFileManipulator* files) { files_ = files; }
 
-    // Opens every file that was not opened yet and hands it to `use`, which does not keep it. False when
-    // there was none left.
+    // Opens every file that was not opened yet and hands it to `use`. False when there was none left.
     template <class Use>
     bool Open(Use&& use) {
         if (!files_ || paths_.empty()) return false;
         const Vector<String> paths = std::move(paths_);
         paths_.clear();
         for (const String& path : paths) {
-            IStreamReader* reader = files_->OpenFile(path.c_str());
-            if (!reader) {
-                ReportMissing(path.c_str());
-                continue;
-            }
-            use(reader);
-            reader->Close();
+            StreamPtr reader(files_->OpenFile(path.c_str()));
+            reader ? use(std::move(reader)) : ReportMissing(path.c_str());
         }
         return true;
     }

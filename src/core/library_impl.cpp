@@ -176,7 +176,7 @@ void LibraryImpl::Free() {
 
 System* LibraryImpl::CreateSystem(const SystemSettings& settings) {
     ThreadScope scope;
-    if (!CheckMainThread("Library::CreateSystem")) return nullptr;
+    if (!CheckMainThread("Library", "CreateSystem")) return nullptr;
     systems_.push_back(New<SystemImpl, MemoryTag::General>(*this, settings, TakeFamily()));
     return systems_[systems_.size() - 1];
 }
@@ -203,7 +203,7 @@ void LibraryImpl::StopWorkers() {
 }
 
 void LibraryImpl::Uninitialize(bool shutdown_script_engine) {
-    if (!CheckMainThread("Library::Uninitialize")) return;
+    if (!CheckMainThread("Library", "Uninitialize")) return;
     for (const SystemImpl* system : systems_) {
         if (!system->IsInsideOperation()) continue;
         LogError("Library::Uninitialize must not be called from inside an operation of a view");

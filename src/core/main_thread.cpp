@@ -18,9 +18,9 @@ bool IsMainThread() {
     return std::this_thread::get_id() == g_main_thread;
 }
 
-bool CheckMainThread(const char* operation) {
+bool CheckMainThread(const char* object, const char* operation) {
     if (IsMainThread()) return true;
-    LogError(operation, " must be called on the main thread");
+    LogError(object, "::", operation, " must be called on the main thread");
     return false;
 }
 

@@ -5,7 +5,7 @@ namespace qorvex {
 
 void SetMainThread();
 bool IsMainThread();
-// For entries that only the main thread may use: an assert line and false otherwise.
-bool CheckMainThread(const char* operation);
+// For entries that only the main thread may use: an Error line and false otherwise.
+bool CheckMainThread(const char* object, const char* operation);
 
 }  // namespace qorvex

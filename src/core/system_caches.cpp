@@ -1,7 +1,6 @@
 // Caches of a system as the client manages them.
+#include "core/api_call.h"
 #include "core/logging/log.h"
-#include "core/main_thread.h"
-#include "core/memory/thread_scope.h"
 #include "core/system_impl.h"
 #include "resources/image_cache_stats.h"
 
@@ -23,52 +22,60 @@ URL ParseCacheURL(const char* text, Need need, const char* error) {
 }  // namespace
 
 void SystemImpl::PreloadAndCacheHTML(const char* url) {
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return;
     const URL parsed =
         ParseCacheURL(url, Need::ValidAndAbsolute, "PreloadAndCacheHTML expects a valid and absolute URL: ");
     if (!parsed.IsEmpty()) html_cache_.Preload(parsed);
 }
 
 bool SystemImpl::RemoveHTMLCacheEntry(const char* url) {
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return false;
     const URL parsed =
         ParseCacheURL(url, Need::ValidAndAbsolute, "RemoveHTMLCacheEntry expects a valid and absolute URL: ");
     return !parsed.IsEmpty() && html_cache_.Remove(parsed);
 }
 
 void SystemImpl::ClearHTMLCache() {
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return;
     html_cache_.Clear();
 }
 
 void SystemImpl::PreloadAndCacheStylesheet(const char* url) {
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return;
     const URL parsed =
         ParseCacheURL(url, Need::Valid, "PreloadAndCacheStylesheet invoked with invalid URL: ");
     if (!parsed.IsEmpty()) stylesheet_cache_.Load(parsed);
 }
 
 bool SystemImpl::RemoveStylesheetCacheEntry(const char* url) {
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return false;
     URL parsed;
     parsed.Parse(url ? url : "");
     return !parsed.IsEmpty() && stylesheet_cache_.Remove(parsed);
 }
 
 void SystemImpl::ClearStylesheetCache() {
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return;
     stylesheet_cache_.Clear();
 }
 
 SystemCacheStats* SystemImpl::CreateCacheStats() {
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return nullptr;
     auto* stats = New<SystemCacheStatsImpl, MemoryTag::General>();
     images_->FillStats(*stats);
     return stats;
 }
 
 void SystemImpl::PruneOrphanedResources() {
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return;
     LogDebug("Force prunning all orphaned images.");
     images_->PruneAllOrphans();
     LogDebug("Force prunning all orphaned svgs.");
@@ -76,8 +83,8 @@ void SystemImpl::PruneOrphanedResources() {
 }
 
 void SystemImpl::UserImagesChanged(const unsigned* ids, unsigned count) {
-    ThreadScope scope;
-    if (!CheckMainThread("System::UserImagesChanged")) return;
+    const MainThreadCall call("System");
+    if (!call) return;
     images_->UserImagesChanged(ids, ids ? count : 0);
 }
 

@@ -1,16 +1,17 @@
 // Fonts that the client registers with a system.
 #include <cstring>
 
+#include "core/api_call.h"
 #include "core/library_impl.h"
 #include "core/limits.h"
 #include "core/logging/log.h"
-#include "core/memory/thread_scope.h"
 #include "core/system_impl.h"
 
 namespace qorvex {
 
 void SystemImpl::ConfigureFontService(void* argument) {
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return;
     if (fresco::IFontService* fonts = library_.GetRendering().GetFontService()) fonts->Configure(argument);
 }
 
@@ -23,7 +24,8 @@ layout::FontDescription SystemImpl::MakeFontDescription(const FontDescription& d
 }
 
 void SystemImpl::AddUserFont(const char* url, const FontDescription& description, FontSDF::Mode use_sdf) {
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return;
     URL parsed;
     parsed.Parse(url ? url : "");
     if (description.Weight > layout::kHeaviestWeight) {
@@ -91,7 +93,8 @@ void SystemImpl::AddBitmapFont(const UserFontDescription& description, layout::B
 
 void SystemImpl::AddUserFontFromImages(const UserFontImage* images, unsigned count,
                                        const UserFontDescription& description) {
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return;
     layout::BitmapFontSourcePtr source = StartBitmapFont(description);
     for (unsigned i = 0; images && i < count; ++i)
         source->pages.push_back(CopyPixels(images[i]));
@@ -100,7 +103,8 @@ void SystemImpl::AddUserFontFromImages(const UserFontImage* images, unsigned cou
 
 void SystemImpl::AddUserFontFromEncodedImages(const void** data, const uint32_t* sizes, unsigned count,
                                               const UserFontDescription& description) {
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return;
     layout::BitmapFontSourcePtr source = StartBitmapFont(description);
     for (unsigned i = 0; data && sizes && i < count; ++i) {
         source->pages.push_back(CopyPage(data[i], sizes[i]));
@@ -110,7 +114,8 @@ void SystemImpl::AddUserFontFromEncodedImages(const void** data, const uint32_t*
 }
 
 void SystemImpl::RemoveUserFont(const FontDescription& description) {
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return;
     if (fonts_) fonts_->RemoveFontDescription(MakeFontDescription(description));
 }
 

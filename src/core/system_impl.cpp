@@ -7,9 +7,9 @@
 
 #include <algorithm>
 
+#include "core/api_call.h"
 #include "core/library_impl.h"
 #include "core/logging/log.h"
-#include "core/main_thread.h"
 #include "core/memory/thread_scope.h"
 #include "core/render/system_renderer_impl.h"
 #include "core/unavailable.h"
@@ -93,8 +93,8 @@ void SystemImpl::SetId(unsigned id) {
 }
 
 View* SystemImpl::CreateView(const ViewSettings& settings) {
-    ThreadScope scope;
-    if (!CheckMainThread("System::CreateView")) return nullptr;
+    const MainThreadCall call("System");
+    if (!call) return nullptr;
     ViewServices services;
     services.tasks = &library_.GetTasks();
     services.library_timers = &library_.GetTimers();
@@ -159,15 +159,15 @@ SystemRenderer* SystemImpl::CreateSystemRendererWithExternalRenderingLibrary() {
 }
 
 void SystemImpl::Advance(double) {
-    if (!CheckMainThread("System::Advance")) return;
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return;
     family_.system->Run(TaskChannels::Main, false, nullptr, family_.family);
     if (fonts_) fonts_->RunMainTasks();
 }
 
 void SystemImpl::Destroy() {
-    ThreadScope scope;
-    if (!CheckMainThread("System::Destroy")) return;
+    const MainThreadCall call("System");
+    if (!call) return;
     if (IsInsideOperation()) {
         LogError("System::Destroy must not be called from inside an operation of one of its views");
         return;

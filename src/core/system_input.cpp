@@ -1,27 +1,31 @@
 // Gamepads of a system; they come with input routing.
-#include "core/memory/thread_scope.h"
+#include "core/api_call.h"
 #include "core/system_impl.h"
 #include "core/unavailable.h"
 
 namespace qorvex {
 
 void SystemImpl::AddGamepad(unsigned, const char*, unsigned, unsigned, unsigned) {
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return;
     LogUnavailable("System::AddGamepad");
 }
 
 void SystemImpl::RemoveGamepad(unsigned) {
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return;
     LogUnavailable("System::RemoveGamepad");
 }
 
 void SystemImpl::UpdateGamepadState(const GamepadState&) {
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return;
     LogUnavailable("System::UpdateGamepadState");
 }
 
 void SystemImpl::UpdateGamepadStateExtended(const GamepadStateExtended&) {
-    ThreadScope scope;
+    const MainThreadCall call("System");
+    if (!call) return;
     LogUnavailable("System::UpdateGamepadStateExtended");
 }
 

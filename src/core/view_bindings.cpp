@@ -29,7 +29,8 @@ bool ViewImpl::RequireDocument() const {
 }
 
 IEventHandler* ViewImpl::RegisterForEvent(const char*, IEventHandler* handler) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return nullptr;
     LogUnavailable("View::RegisterForEvent");
     RequireBinder();
     delete handler;
@@ -37,13 +38,15 @@ IEventHandler* ViewImpl::RegisterForEvent(const char*, IEventHandler* handler) {
 }
 
 void ViewImpl::UnregisterFromEvent(IEventHandler*) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     LogUnavailable("View::UnregisterFromEvent");
     RequireBinder();
 }
 
 IEventHandler* ViewImpl::BindCall(const char*, IEventHandler* handler) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return nullptr;
     LogUnavailable("View::BindCall");
     RequireBinder();
     delete handler;
@@ -51,39 +54,46 @@ IEventHandler* ViewImpl::BindCall(const char*, IEventHandler* handler) {
 }
 
 void ViewImpl::UnbindCall(const char*) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     LogUnavailable("View::UnbindCall");
     RequireBinder();
 }
 
 void ViewImpl::UnregisterAll(void*) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     LogUnavailable("View::UnregisterAll");
     RequireBinder();
 }
 
 void ViewImpl::SynchronizeModels() {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     if (RequireDocument()) LogUnavailable("View::SynchronizeModels");
 }
 
 void ViewImpl::RegisterTypeBinding(const char*, void (*)(Binder*, void*)) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     LogUnavailable("View::RegisterTypeBinding");
 }
 
 void ViewImpl::UpdateWholeModel(void*, const char*) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     if (RequireDocument()) LogUnavailable("View::UpdateWholeModel");
 }
 
 void ViewImpl::UnregisterModel(void*, const char*) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     if (RequireDocument()) LogUnavailable("View::UnregisterModel");
 }
 
 void ViewImpl::CreateModel(const char* name, void* model, const char*, void (*)(Binder*, void*)) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     if (!RequireDocument()) return;
     // The lowest bit of a model's address is a mark of the data binding.
     if (reinterpret_cast<uintptr_t>(model) & 1) {
@@ -99,7 +109,8 @@ void ViewImpl::CreateModel(const char* name, void* model, const char*, void (*)(
 }
 
 void ViewImpl::RaiseBoundEvent(const char*) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     LogUnavailable("View::RaiseBoundEvent");
 }
 

@@ -53,7 +53,8 @@ bool IsViewSide(const CacheRow& row) {
 }  // namespace
 
 void ViewImpl::SetCacheCountSize(CacheType type, unsigned count) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     const CacheRow* row = FindRow(type);
     if (!row) {
         LogError("Trying to set the count size of unknown type of cache!");
@@ -73,7 +74,8 @@ void ViewImpl::SetCacheCountSize(CacheType type, unsigned count) {
 }
 
 void ViewImpl::SetCacheBytesSize(CacheType type, unsigned bytes) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     const CacheRow* row = FindRow(type);
     if (!row) {
         LogError("Trying to set the bytes size of unknown type of cache!");
@@ -88,7 +90,8 @@ void ViewImpl::SetCacheBytesSize(CacheType type, unsigned bytes) {
 }
 
 void ViewImpl::GetCacheCountStats(CacheType type, unsigned* current, unsigned* capacity) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     const CacheRow* row = FindRow(type);
     if (!row) {
         LogError("Trying to get cache count stats for unknown type of cache!");
@@ -101,7 +104,8 @@ void ViewImpl::GetCacheCountStats(CacheType type, unsigned* current, unsigned* c
 }
 
 void ViewImpl::GetCacheBytesStats(CacheType type, size_t* current, size_t* capacity) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     const CacheRow* row = FindRow(type);
     if (!row || IsViewSide(*row)) {
         LogError("The specified cache doesn't have the bytes statistic!");
@@ -131,7 +135,8 @@ void ViewImpl::ApplyViewSideCacheRequests() {
 }
 
 void ViewImpl::ClearCaches(uint32_t mask) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     cache_requests_.Clear(mask);
 }
 

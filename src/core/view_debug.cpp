@@ -10,13 +10,15 @@
 namespace qorvex {
 
 DebugDump* ViewImpl::DumpDOM(unsigned) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return nullptr;
     if (!document_) return nullptr;
     return New<DebugDumpImpl, MemoryTag::DebugDump>(document_->DumpDOM());
 }
 
 DebugDump* ViewImpl::DumpStackingContexts() {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return nullptr;
     if (!document_) return nullptr;
     layout::LayoutHandle* root = document_->GetLayoutTree().Root();
     if (!root) return New<DebugDumpImpl, MemoryTag::DebugDump>(std::string_view());
@@ -25,25 +27,29 @@ DebugDump* ViewImpl::DumpStackingContexts() {
 }
 
 ImagesList* ViewImpl::GetImagesList(unsigned flags) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return nullptr;
     return document_ ? services_.images->ListImages(*document_, flags) : nullptr;
 }
 
 void ViewImpl::BeginCaptureFrames(FrameCaptureCallback callback, void* user_data) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     capture_callback_ = callback;
     capture_user_data_ = user_data;
     capture_all_ = callback != nullptr;
 }
 
 void ViewImpl::EndCaptureFrames() {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     capture_callback_ = nullptr;
     capture_all_ = false;
 }
 
 void ViewImpl::CaptureNextFrame(FrameCaptureCallback callback, void* user_data) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     capture_callback_ = callback;
     capture_user_data_ = user_data;
     capture_all_ = false;
@@ -52,7 +58,8 @@ void ViewImpl::CaptureNextFrame(FrameCaptureCallback callback, void* user_data) 
 }
 
 void ViewImpl::SetCustomCompositor(fresco::ICustomCompositor* compositor) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     if (!scene_) {
         AssertFailure("Cannot set custom compostior without an internal scene object!");
         return;
@@ -61,7 +68,8 @@ void ViewImpl::SetCustomCompositor(fresco::ICustomCompositor* compositor) {
 }
 
 void ViewImpl::SetCustomEffectRenderer(fresco::ICustomEffectRenderer* renderer) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     if (!scene_) {
         AssertFailure("Cannot set custom effect renderer without an internal scene object!");
         return;
@@ -84,7 +92,8 @@ bool ViewImpl::OnConsoleLine(Logging::Severity severity, std::string_view line) 
 
 // The history object comes with the window's globals.
 void ViewImpl::ClearHistory() {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     LogUnavailable("View::ClearHistory");
 }
 

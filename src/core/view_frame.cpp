@@ -7,7 +7,6 @@
 #include "core/debug/thread_counting_allocator.h"
 #include "core/frame/frame_graph.h"
 #include "core/logging/log.h"
-#include "core/main_thread.h"
 #include "core/view_impl.h"
 #include "layout/fonts/font_manager.h"
 #include "resources/cached_images_manager.h"
@@ -18,7 +17,8 @@
 namespace qorvex {
 
 void ViewImpl::Advance(double time) {
-    if (!CheckMainThread("View::Advance")) return;
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     if (!services_.tasks->IsRunning()) {
         LogError("View::Advance called after StopWorkers");
         return;
@@ -27,7 +27,6 @@ void ViewImpl::Advance(double time) {
         LogError("View::Advance called from inside Advance");
         return;
     }
-    APICall call(family_, api_depth_);
     TempMark mark;
     advancing_ = true;
     pushed_frame_ = false;

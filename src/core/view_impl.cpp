@@ -8,7 +8,6 @@
 
 #include "core/api_call.h"
 #include "core/logging/log.h"
-#include "core/main_thread.h"
 #include "layout/fonts/font_manager.h"
 #include "resources/cached_images_manager.h"
 #include "resources/cached_svg_manager.h"
@@ -80,8 +79,8 @@ ViewImpl::ViewImpl(const ViewSettings& settings, const ViewServices& services, u
 ViewImpl::~ViewImpl() = default;
 
 void ViewImpl::Destroy() {
-    ThreadScope scope;
-    if (!CheckMainThread("View::Destroy")) return;
+    const MainThreadCall call("View");
+    if (!call) return;
     if (IsInsideOperation()) {
         LogError("View::Destroy must not be called from inside an operation of the view");
         return;
@@ -109,7 +108,8 @@ void ViewImpl::MarkWholeViewDirty() {
 }
 
 void ViewImpl::Resize(unsigned width, unsigned height) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     width_ = width;
     height_ = height;
     if (document_) document_->SetViewSize(width, height);
@@ -118,7 +118,8 @@ void ViewImpl::Resize(unsigned width, unsigned height) {
 }
 
 void ViewImpl::SetVirtualResolution(unsigned width, unsigned height) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     if (width_ == 0 || height_ == 0) {
         AssertFailure("Unable to set virtual resolution for view of size 0!");
         return;
@@ -133,32 +134,37 @@ void ViewImpl::SetVirtualResolution(unsigned width, unsigned height) {
 }
 
 void ViewImpl::ClearListeners() {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     listener_ = nullptr;
     text_input_handler_ = nullptr;
 }
 
 void ViewImpl::EnableRendering(bool enabled) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     if (enabled && !rendering_enabled_) MarkWholeViewDirty();
     rendering_enabled_ = enabled;
 }
 
 void ViewImpl::ShowPaintRectangles(bool enabled) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     if (!enabled && show_paint_rectangles_) MarkWholeViewDirty();
     show_paint_rectangles_ = enabled;
 }
 
 void ViewImpl::EnableGPUMetadataEmission(bool enabled) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     if (enabled == gpu_metadata_) return;
     LogWarning(enabled ? "Enabling GPU metadata emission!" : "Disabling GPU metadata emission!");
     gpu_metadata_ = enabled;
 }
 
 void ViewImpl::SetUserAgent(const char* user_agent) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     user_agent_ = std::string_view(user_agent ? user_agent : "");
 }
 

@@ -18,43 +18,50 @@ void WarnAboutHandled(const bool* handled) {
 }  // namespace
 
 void ViewImpl::TouchEvent(const TouchEventData*, unsigned, bool* handled, void*) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     WarnAboutHandled(handled);
     LogUnavailable("View::TouchEvent");
 }
 
 void ViewImpl::GestureEvent(const GestureEventData&, bool* handled) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     WarnAboutHandled(handled);
     LogUnavailable("View::GestureEvent");
 }
 
 void ViewImpl::MouseEvent(const MouseEventData&, bool* handled, void*) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     WarnAboutHandled(handled);
     LogUnavailable("View::MouseEvent");
 }
 
 void ViewImpl::KeyEvent(const KeyEventData&, bool* handled, void*) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     WarnAboutHandled(handled);
     LogUnavailable("View::KeyEvent");
 }
 
 bool ViewImpl::IMESetComposition(const char*) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return false;
     LogUnavailable("View::IMESetComposition");
     return false;
 }
 
 bool ViewImpl::IMEConfirmComposition(const char*) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return false;
     LogUnavailable("View::IMEConfirmComposition");
     return false;
 }
 
 bool ViewImpl::IMECancelComposition() {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return false;
     LogUnavailable("View::IMECancelComposition");
     return false;
 }

@@ -14,12 +14,14 @@
 namespace qorvex {
 
 void ViewImpl::LoadURL(const char* url) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     NavigateToURL(url ? url : "");
 }
 
 void ViewImpl::Reload() {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     LogDebug("Reload requested on View ", id_);
     const String current(url_.GetText().view());
     NavigateToURL(current);
@@ -133,7 +135,8 @@ void ViewImpl::RunInitialScripts() {
 }
 
 void ViewImpl::UnloadDocument() {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     if (api_depth_ == 1) {
         UnloadDocumentNow();
         return;
@@ -173,18 +176,21 @@ void ViewImpl::OnFinishLoad(dom::Document& document) {
 }
 
 void ViewImpl::ExecuteScript(const char* source) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     if (source && script_context_ && script_context_->window)
         script::EvaluateScript(*script_context_, source, "");
 }
 
 void ViewImpl::AddInitialScript(const char* source) {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     if (source) initial_scripts_.emplace_back(source);
 }
 
 void ViewImpl::ClearInitialScripts() {
-    APICall call(family_, api_depth_);
+    const APICall call(family_, api_depth_);
+    if (!call) return;
     initial_scripts_.clear();
 }
 

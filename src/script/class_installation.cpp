@@ -83,8 +83,35 @@ class Installer {
   public:
     explicit Installer(ScriptingContext& page) : page_(page), context_(page.context) {}
 
-    void Install() {
+    // Install and PrototypeOf as functions of the script engine, to be called from outside of it: all that
+    // they call is nested then and spares the way in, which takes the clock twice for the time limit of
+    // scripts.
+    static JSValueRef InstallInside(JSContextRef context, JSObjectRef, JSObjectRef, size_t,
+                                    const JSValueRef[], JSValueRef*) {
+        if (ScriptingContext* page = GetScriptingContext(context)) Installer(*page).Install();
+        return JSValueMakeUndefined(context);
+    }
+    static JSValueRef PrototypeInside(JSContextRef context, JSObjectRef, JSObjectRef, size_t count,
+                                      const JSValueRef arguments[], JSValueRef* exception) {
+        const JSValueRef undefined = JSValueMakeUndefined(context);
+        ScriptingContext* page = GetScriptingContext(context);
+        const double number = count > 0 ? JSValueToNumber(context, arguments[0], nullptr) : -1;
+        if (!page || !(number >= 0 && number < kScriptClassCount)) return undefined;
+        Installer installer(*page);
+        const JSObjectRef made = installer.PrototypeOf(static_cast<ScriptClass>(number));
+        if (installer.exception_) *exception = installer.exception_;
+        return made ? made : undefined;
+    }
+
+    // From outside: calls PrototypeInside.
+    JSObjectRef EnterForPrototype(ScriptClass script_class) {
+        if (!page_.class_keeper) return nullptr;
         const ScriptEngineLock lock(context_);
+        const JSValueRef number = JSValueMakeNumber(context_, static_cast<double>(script_class));
+        return AsObject(context_, Call(AsObject(context_, Tool(ClassTool::MakePrototype)), {&number, 1}));
+    }
+
+    void Install() {
         // Without a prototype: a page can change what an array does with its entries.
         page_.class_keeper = MakeBare();
         JSValueProtect(context_, page_.class_keeper);
@@ -103,7 +130,6 @@ class Installer {
         const auto index = static_cast<size_t>(script_class);
         if (script_class == ScriptClass::None || !page_.class_keeper) return nullptr;
         if (page_.prototypes[index]) return page_.prototypes[index];
-        const ScriptEngineLock lock(context_);
         const ScriptClass parent = GetScriptClassRow(script_class).parent;
         const JSObjectRef parent_prototype = PrototypeOf(parent);
         if (parent != ScriptClass::None && !parent_prototype) return nullptr;
@@ -114,7 +140,7 @@ class Installer {
         JSObjectSetPrototype(context_, prototype, JSValueMakeNull(context_));
         Label(prototype, script_class);
         // Its constructor costs more than the rest of it, and a page asks for few.
-        DefineAccessor(prototype, "constructor", Tool(ClassTool::HiddenAccessor),
+        DefineAccessor(prototype, ScriptName("constructor"), Tool(ClassTool::HiddenAccessor),
                        Tool(ClassTool::ConstructorGetter), Tool(ClassTool::ConstructorSetter));
         const ClassDescription* description = GetClassDescription(script_class);
         if (description && description->properties.indexed) DefineIterator(prototype);
@@ -134,7 +160,6 @@ class Installer {
         const JSValueRef kept =
             JSObjectGetPropertyAtIndex(context_, page_.class_keeper, static_cast<unsigned>(at), nullptr);
         if (const JSObjectRef made = AsObject(context_, kept)) return made;
-        const ScriptEngineLock lock(context_);
         const JSObjectRef constructor = MakeConstructor(script_class, prototype);
         if (constructor) Keep(at, constructor);
         return constructor;
@@ -249,6 +274,8 @@ class Installer {
                  JSObjectMakeFunctionWithCallback(context_, name, GetConstructor));
         KeepTool(ClassTool::ConstructorSetter,
                  JSObjectMakeFunctionWithCallback(context_, name, SetConstructor));
+        KeepTool(ClassTool::MakePrototype,
+                 JSObjectMakeFunctionWithCallback(context_, nullptr, PrototypeInside));
     }
 
     void InstallNames() {
@@ -264,9 +291,10 @@ class Installer {
 
     void InstallName(const char* name, ScriptClass script_class) {
         // One function for both ways: a setter has an argument.
-        const JSObjectRef access = JSObjectMakeFunctionWithCallback(context_, ScriptName(name), AccessName);
+        const ScriptName text(name);
+        const JSObjectRef access = JSObjectMakeFunctionWithCallback(context_, text, AccessName);
         page_.class_names.push_back({access, name, script_class});
-        DefineAccessor(page_.global_object, name, Tool(ClassTool::HiddenAccessor), access, access);
+        DefineAccessor(page_.global_object, text, Tool(ClassTool::HiddenAccessor), access, access);
     }
 
     void Keep(size_t index, JSValueRef value) {
@@ -312,12 +340,12 @@ class Installer {
     }
 
     // The descriptors are there for all: only what differs is set. Null stands for no function.
-    void DefineAccessor(JSObjectRef target, const char* name, JSValueRef descriptor, JSValueRef getter,
+    void DefineAccessor(JSObjectRef target, JSStringRef name, JSValueRef descriptor, JSValueRef getter,
                         JSValueRef setter) {
         const JSValueRef undefined = JSValueMakeUndefined(context_);
         SetOf(descriptor, get_, getter ? getter : undefined);
         SetOf(descriptor, set_, setter ? setter : undefined);
-        DefineProperty(target, ScriptName(name), descriptor);
+        DefineProperty(target, name, descriptor);
     }
 
     void DefineValue(JSObjectRef target, const char* name, ClassTool descriptor, JSValueRef value) {
@@ -355,8 +383,8 @@ class Installer {
         }
         for (const AttributeDescription& attribute : description.attributes) {
             const ScriptName name(attribute.name);
-            DefineAccessor(target, attribute.name, Tool(ClassTool::Accessor),
-                           MakeFunction(name, attribute.getter), MakeFunction(name, attribute.setter));
+            DefineAccessor(target, name, Tool(ClassTool::Accessor), MakeFunction(name, attribute.getter),
+                           MakeFunction(name, attribute.setter));
         }
         for (const ConstantDescription& constant : description.constants) {
             JSObjectSetProperty(context_, target, ScriptName(constant.name),
@@ -398,13 +426,15 @@ class Installer {
 }  // namespace
 
 void InstallClasses(ScriptingContext& page) {
-    // On the stack, where the collector sees the objects it holds.
-    Installer(page).Install();
+    const ScriptEngineLock lock(page.context);
+    const JSObjectRef install =
+        JSObjectMakeFunctionWithCallback(page.context, nullptr, Installer::InstallInside);
+    JSObjectCallAsFunction(page.context, install, nullptr, 0, nullptr, nullptr);
 }
 
 JSObjectRef GetPrototype(ScriptingContext& page, ScriptClass script_class) {
     if (const JSObjectRef made = page.prototypes[static_cast<size_t>(script_class)]) return made;
-    return Installer(page).PrototypeOf(script_class);
+    return Installer(page).EnterForPrototype(script_class);
 }
 
 JSObjectRef MakeBlankMaker(ScriptingContext& page, JSObjectRef prototype, JSObjectRef take) {

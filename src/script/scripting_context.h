@@ -40,6 +40,7 @@ enum class ClassTool : uint8_t {
     Method,
     ConstructorGetter,
     ConstructorSetter,
+    MakePrototype,
     ConstructorOf,
     BlanksOf,
 };

@@ -65,6 +65,72 @@ TEST(Font, RefusesWhatIsNoFont) {
     if (!bytes.empty()) EXPECT_EQ(service->GetFaceCount(&whole), 1u);
 }
 
+namespace {
+
+// Files of a client that has them in memory: handed out in place, or to be read.
+class Files final : public IFileManipulator {
+  public:
+    Files(std::vector<uint8_t> bytes, bool in_place) : bytes_(std::move(bytes)), in_place_(in_place) {}
+    IStreamReader* OpenFile(const char*) override {
+        ++open;
+        return new Reader(*this);
+    }
+    int open = 0, reads = 0;
+
+  private:
+    class Reader final : public IStreamReader {
+      public:
+        explicit Reader(Files& files) : files_(files) {}
+        size_t GetSize() override { return files_.bytes_.size(); }
+        size_t Read(size_t offset, void* destination, size_t size) override {
+            ++files_.reads;
+            return MemoryReader(files_.bytes_).Read(offset, destination, size);
+        }
+        void Close() override {
+            --files_.open;
+            delete this;
+        }
+        const void* GetData() override { return files_.in_place_ ? files_.bytes_.data() : nullptr; }
+
+      private:
+        Files& files_;
+    };
+    std::vector<uint8_t> bytes_;
+    bool in_place_;
+};
+
+}  // namespace
+
+TEST(Font, SystemFontsStayInPlaceWhereTheClientHasThem) {
+    const std::vector<uint8_t> bytes = ReadFile(kSans);
+    if (bytes.empty()) GTEST_SKIP() << "no DejaVu on this machine";
+    std::vector<float> advances;
+    for (const bool in_place : {false, true}) {
+        CountingAllocator allocator;
+        Files files(bytes, in_place);
+        RenderingLibraryParams params;
+        params.allocator = &allocator;
+        params.additionalOptions = "--system-fonts=sans.ttf:again.ttf";
+        IRenderingLibrary* library = IRenderingLibrary::Initialize(params);
+        library->SetFileManipulator(&files);
+        IFont* font =
+            library->GetFontService()->GetFont(library->GetFontService()->FindFont("DejaVu Sans", 0));
+        ASSERT_NE(font, nullptr);
+        const uint32_t text = 'W';
+        uint32_t glyph = 0;
+        font->GetGlyphIndices(&text, 1, &glyph);
+        EXPECT_TRUE(font->GetAdvances(&glyph, 1, 100, &advances.emplace_back()));
+        // Two names of the same bytes are one font file.
+        EXPECT_EQ(files.open, in_place ? 1 : 0);
+        EXPECT_EQ(files.reads > 0, !in_place);
+        EXPECT_EQ(allocator.peak > long(bytes.size()), !in_place);
+        library->Destroy();
+        EXPECT_EQ(files.open, 0);
+        EXPECT_EQ(allocator.live, 0);
+    }
+    EXPECT_EQ(advances[0], advances[1]);
+}
+
 TEST(Font, TheNullLibraryMeasuresAndDrawsNothing) {
     IRenderingLibrary* library = CreateNullRenderingLibrary({});
     EXPECT_STREQ(library->GetBuildIdentifier(), kBuildIdentifier.text);

@@ -1,5 +1,8 @@
 // The objects that a client's resource handler sees.
+#include <map>
+#include <mutex>
 #include <set>
+#include <thread>
 
 #include "core/limits.h"
 #include "resources/resource_test_support.h"
@@ -48,6 +51,41 @@ TEST_F(ResourceRequestTest, MappingChangesTheURLAndOffersAlternatives) {
     auto plain = Request("coui://ui/a.txt");
     EXPECT_EQ(plain.request->GetAlternativeURLs().Count, 0u);
     plain.response->Finish(Status::Success);
+}
+
+// As on a client with requests on workers, while pages come and go on the main thread.
+TEST_F(ResourceRequestTest, WorkersFinishMappedRequestsWhileTheBaseURLChanges) {
+    constexpr int kRequests = 400;
+    const char* targets[] = {"dds", "png"};
+    ResourceMapping mapping;
+    mapping.Name = "PNG";
+    mapping.Targets = targets;
+    mapping.TargetCount = 2;
+    files.SetDeferred(false);
+    context = MakeRef<ResourceContext>(&files, *responses, true);
+    context->GetMappings().Add(mapping);
+    std::mutex mutex;
+    std::map<std::string, int> answered;
+    std::vector<std::thread> workers;
+    for (int i = 0; i < 2; ++i)
+        workers.emplace_back([&] { tasks->Run(TaskChannels::Resources, true, nullptr, 1); });
+    for (int i = 0; i < kRequests; ++i) {
+        context->SetBaseURL(MakeURL(("coui://page" + std::to_string(i) + "/index.html").c_str()));
+        auto count = [&](ResourceRequestJob& job) {
+            std::lock_guard<std::mutex> lock(mutex);
+            ++answered[job.GetAbsoluteURL()];
+        };
+        family.Push(TaskChannels::Resources, context->MakeResourceRequest(
+                                                 DescribeGet(MakeURL("images/hero.png")), count,
+                                                 [](ResourceRequestJob&) {}, true, nullptr));
+    }
+    while (context->GetOpenRequests() > 0)
+        std::this_thread::yield();
+    tasks->Stop();
+    for (std::thread& worker : workers)
+        worker.join();
+    EXPECT_EQ(answered.size(), size_t(kRequests)) << "each by the page that asked for it";
+    EXPECT_EQ(answered["coui://page7/images/hero.dds"], 1);
 }
 
 TEST_F(ResourceRequestTest, SpaceGrowsShrinksAndEndsWithAZeroForText) {

@@ -7,7 +7,8 @@ namespace fresco {
 class IFileManipulator {
   public:
     virtual ~IFileManipulator() = default;
-    // Null when the file cannot be read. The reader is given back with `Close`.
+    // Null when the file cannot be read. The reader is given back with `Close`: after reading, or, of a font
+    // that it has in place, when the rendering library ends.
     virtual IStreamReader* OpenFile(const char* /*path*/) { return nullptr; }
 };
 

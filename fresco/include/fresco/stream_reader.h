@@ -14,6 +14,9 @@ class IStreamReader {
     virtual size_t Read(size_t offset, void* destination, size_t size) = 0;
     // The last call on the reader; it may delete itself.
     virtual void Close() = 0;
+    // All of it in place (a mapped file, an archive in memory), unchanged until Close: whoever needs the
+    // whole copies nothing then, and what nobody looks at is never fetched. Null: it is to be read.
+    virtual const void* GetData() { return nullptr; }
 };
 
 }  // namespace fresco

@@ -1,6 +1,5 @@
 #include "core/render/view_renderer_impl.h"
 
-#include <fresco/library.h>
 #include <fresco/scene.h>
 
 #include "core/logging/log.h"
@@ -92,18 +91,7 @@ void ViewRendererImpl::FreeRenderingResources() {
     frame_queue_.CountReset();
     images_->ForgetGPUResources();
     frame_queue_.DiscardAll();
-    ReleaseTextures();
     scene_.FreeResources();
-}
-
-void ViewRendererImpl::ReleaseTextures() {
-    if (textures_to_release_.empty()) return;
-    fresco::CommandBuffer* buffer = fresco::Library::CreateBuffer(16, 0);
-    for (fresco::ImageId id : textures_to_release_)
-        buffer->DestroyImage(id);
-    scene_.ExecuteBuffers(&buffer, 1, nullptr, nullptr);
-    buffer->Release();
-    textures_to_release_.clear();
 }
 
 void ViewRendererImpl::Destroy() {
@@ -111,7 +99,6 @@ void ViewRendererImpl::Destroy() {
     registry_.Remove(this);
     link_->CountRenderer(-1);
     frame_queue_.ClearFrames();
-    ReleaseTextures();
     scene_.SetRenderTarget(nullptr, nullptr, fresco::RenderTargetDescription());
     scene_.Finish();
     Delete<MemoryTag::General>(this);

@@ -28,16 +28,12 @@ class ViewRendererImpl final : public ViewRenderer {
     void FreeRenderingResources() override;
 
   private:
-    void ReleaseTextures();
-
     RendererRegistry& registry_;
     RefPtr<RenderLink> link_;
     FrameQueue& frame_queue_;
     RefPtr<CachedImagesManager> images_;
     fresco::IScene& scene_;
     TaskFamilyHandle family_;
-    // Images that went while their frame was being drawn.
-    Vector<fresco::ImageId, MemoryTag::Rendering> textures_to_release_;
 };
 
 }  // namespace qorvex

@@ -20,6 +20,7 @@ class MemoryStream final : public fresco::IStreamReader {
         return count;
     }
     void Close() override {}
+    const void* GetData() override { return data_; }
 
   private:
     const unsigned char* data_;

@@ -2,7 +2,6 @@
 
 #include <JavaScriptCore/JavaScript.h>
 
-#include "core/limits.h"
 #include "dom/document.h"
 #include "script/bindings/window.h"
 #include "script/class_installation.h"
@@ -69,11 +68,11 @@ void DefineGlobals(ScriptingContext& page) {
 
 }  // namespace
 
-ScriptingContextPtr CreateScriptingContext(dom::IWindowHost& host, dom::Document& document) {
+ScriptingContextPtr CreateScriptingContext(dom::IWindowHost& host, dom::Document& document,
+                                           double time_limit) {
     ScriptingContextPtr page = MakeUnique<ScriptingContext>();
     JSContextGroupRef group = JSContextGroupCreate();
     page->context = JSGlobalContextCreateInGroup(group, nullptr);
-    SetScriptTimeLimit(group, limits::kScriptTimeLimitSeconds);
     RegisterScriptingContext(*page);
 
     // The context owns the window by the reference that it was made with.
@@ -84,6 +83,8 @@ ScriptingContextPtr CreateScriptingContext(dom::IWindowHost& host, dom::Document
 
     InstallClasses(*page);
     DefineGlobals(*page);
+    // Not before: each entry into the script engine takes the clock twice for it.
+    SetScriptTimeLimit(group, time_limit);
     return page;
 }
 

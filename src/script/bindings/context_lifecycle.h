@@ -1,6 +1,7 @@
 // How a page's script context comes and goes.
 #pragma once
 
+#include "core/limits.h"
 #include "core/memory/containers.h"
 #include "script/scripting_context.h"
 
@@ -14,8 +15,9 @@ namespace qorvex::script {
 using ScriptingContextPtr = UniquePtr<ScriptingContext, MemoryTag::General>;
 
 // A context of its own for one document: group, global object, window, constructors. The document then leads
-// to it. `host` and `document` outlive it.
-[[nodiscard]] ScriptingContextPtr CreateScriptingContext(dom::IWindowHost& host, dom::Document& document);
+// to it. `host` and `document` outlive it. A script that runs for more than `time_limit` seconds is stopped.
+[[nodiscard]] ScriptingContextPtr CreateScriptingContext(dom::IWindowHost& host, dom::Document& document,
+                                                         double time_limit = limits::kScriptTimeLimitSeconds);
 
 // What the engine itself changes in the language of a page, before the client's own scripts.
 void RunPreludeScripts(ScriptingContext& context);

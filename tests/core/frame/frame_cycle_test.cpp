@@ -64,6 +64,21 @@ TEST(FrameCycle, IdleFramesCostNothing) {
     client.last_frame += 2;
 }
 
+// What a large page needed to load is given back by the frames that follow, not by idle ones.
+TEST(FrameCycle, IdleFramesCostNothingAfterALargePage) {
+    Options options;
+    options.severity = qorvex::Logging::Info;
+    Client client(options);
+    std::string page = kPage;
+    for (int i = 0; i < 1000; ++i)
+        page += "<div></div>";
+    client.Load(page);
+    const uint64_t requests = client.allocator.requests();
+    for (int i = 0; i < 20; ++i)
+        client.Frame();
+    EXPECT_EQ(client.allocator.requests(), requests);
+}
+
 TEST(FrameCycle, AdvanceWithoutDocumentCountsFrames) {
     Client client;
     client.Frame();
@@ -184,6 +199,60 @@ TEST(FrameCycle, NewRenderersGetTheWholeView) {
         client.Frame();
         EXPECT_EQ(client.pixels, first) << "wait " << wait;
     }
+}
+
+// A shadow that goes frees its surface in the next frame, which a new renderer drops.
+TEST(FrameCycle, DroppedFramesFreeTheirSurfacesAllTheSame) {
+    Client client;
+    client.Load(kShadowPage);
+    const auto shadow = [&](int blur) {
+        client.view->ExecuteScript(("document.getElementById('box').style.boxShadow = '0 0 " +
+                                    std::to_string(blur) + "px 4px #0000ff'")
+                                       .c_str());
+    };
+    const auto rounds = [&](int count) {
+        for (int i = 0; i < count; ++i) {
+            shadow(4);
+            client.Frame();
+            client.view->ClearCaches(static_cast<uint32_t>(qorvex::CacheType::Shadows));
+            shadow(8);
+            client.Advance();
+            client.MakeRenderer();
+            client.Frame();
+        }
+        client.Frame();
+        return client.allocator.blocks();
+    };
+    const int64_t few = rounds(5);
+    EXPECT_LE(rounds(40), few + 10);
+    EXPECT_NE(client.Pixel(18, 15), kRed) << "the shadow";
+}
+
+TEST(FrameCycle, AClientMaySkipFrameIds) {
+    Client client;
+    client.Load(kPage);
+    const auto move = [&](int left) {
+        client.view->ExecuteScript(
+            ("document.getElementById('box').style.left = '" + std::to_string(left) + "px'").c_str());
+    };
+    for (int i = 0; i < 600; ++i) {
+        move(8 + i % 30);
+        client.Advance();
+        if (i % 7 == 0) client.Paint();
+    }
+    // The newest first; an older one still waits for its turn, and has one.
+    const uint32_t newest = client.last_frame - 1;
+    EXPECT_EQ(client.renderer->Paint(newest, false), qorvex::PaintStatus::Complete);
+    EXPECT_EQ(client.renderer->Paint(newest - 3, false), qorvex::PaintStatus::Complete);
+    EXPECT_EQ(client.renderer->Paint(newest - 3, false), qorvex::PaintStatus::FrameMissing);
+    // Those that were never painted have gone long ago, and what they would have drawn is drawn again.
+    EXPECT_EQ(client.renderer->Paint(newest - 500, false), qorvex::PaintStatus::FrameMissing);
+    move(8);
+    client.Frame();
+    client.Frame();
+    EXPECT_EQ(client.Pixel(12, 12), kBlue);
+    EXPECT_EQ(client.Pixel(30, 12), kRed);
+    EXPECT_EQ(client.Pixel(44, 12), kRed);
 }
 
 TEST(FrameCycle, PaintOptionDrawsTheWholeViewOnEveryChange) {

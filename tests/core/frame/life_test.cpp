@@ -160,6 +160,47 @@ TEST(Life, EndsFromInsideAnOperationAreRefused) {
     listener.view->Destroy();
 }
 
+TEST(Life, OtherThreadsThanTheMainOneAreRefused) {
+    Client client;
+    client.Load(kPage);
+    const std::function<void()> calls[] = {
+        [&] { client.view->Advance(client.time + 16); },
+        [&] { client.view->LoadURL(kUrl); },
+        [&] { client.view->Resize(1, 1); },
+        [&] { EXPECT_EQ(client.view->GetImagesList(0), nullptr); },
+        [&] { client.view->Destroy(); },
+        [&] { EXPECT_EQ(client.system->CreateView({}), nullptr); },
+        [&] { client.system->ClearStylesheetCache(); },
+        [&] { EXPECT_FALSE(client.system->RemoveHTMLCacheEntry(kUrl)); },
+        [&] { client.system->Destroy(); },
+        [&] { EXPECT_EQ(client.library->CreateSystem({}), nullptr); },
+    };
+    const std::vector<std::string> lines = {"View::Advance",
+                                            "View::LoadURL",
+                                            "View::Resize",
+                                            "View::GetImagesList",
+                                            "View::Destroy",
+                                            "System::CreateView",
+                                            "System::ClearStylesheetCache",
+                                            "System::RemoveHTMLCacheEntry",
+                                            "System::Destroy",
+                                            "Library::CreateSystem"};
+    client.log.Clear();
+    const size_t requests = client.files.requests.size();
+    const auto pixels = client.pixels;
+    std::thread([&] {
+        for (const auto& call : calls)
+            call();
+    }).join();
+    std::vector<std::string> wanted;
+    for (const std::string& line : lines)
+        wanted.push_back(line + " must be called on the main thread");
+    EXPECT_EQ(client.log.Lines(qorvex::Logging::Error), wanted);
+    client.Frame();
+    EXPECT_EQ(client.files.requests.size(), requests);
+    EXPECT_EQ(client.pixels, pixels);
+}
+
 TEST(Life, TimesThatAreNoneAreReportedAndIgnored) {
     Client client;
     client.Load(kPage);

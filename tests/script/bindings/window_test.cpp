@@ -27,6 +27,16 @@ TEST_F(WindowTest, RunsDueTimersInOrderThenFramesOnce) {
     EXPECT_EQ(page_->window->timer_count(), 0u);
 }
 
+TEST_F(WindowTest, AScriptWithoutEndIsStoppedAndThePageGoesOn) {
+    ClosePage();
+    page_ = CreateScriptingContext(window_host_, *document_, 0.05);
+    RunPreludeScripts(*page_);
+    Run("setTimeout(() => { for (;;) ; }); setTimeout(() => { after = document.nodeName; }, 5)");
+    Advance(10);
+    EXPECT_EQ(Count(Logging::Error, "A script ran longer than its time limit and was stopped."), 1u);
+    EXPECT_EQ(Run("after"), "#document");
+}
+
 TEST_F(WindowTest, RepeatsUntilCleared) {
     Run("let id = setInterval(() => { seen.push('i'); if (seen.length == 3) clearInterval(id); }, 10);"
         "setInterval(note('z'), 0)");
