@@ -5,9 +5,12 @@
 #include "dom/character_data.h"
 #include "layout/dom_tasks.h"
 #include "layout/fonts/font_resolver.h"
+#include "support/repeat.h"
 
 namespace qorvex::css::test {
 namespace {
+
+using qorvex::test::Repeat;
 
 class Engine : public StyleTest {
   protected:
@@ -15,14 +18,8 @@ class Engine : public StyleTest {
 };
 
 TEST_F(Engine, LongSelectorsStayCheap) {
-    std::string body, tildes, depth;
-    for (int i = 0; i < 300; ++i)
-        body += "<b></b>";
-    for (int i = 0; i < 200; ++i)
-        tildes += "b ~ ";
-    for (int i = 0; i < 200; ++i)
-        depth += "div ";
-    Load(body + "<i id='i'></i>");
+    const std::string tildes = Repeat("b ~ ", 200), depth = Repeat("div ", 200);
+    Load(Repeat("<b></b>", 300) + "<i id='i'></i>");
     EXPECT_TRUE(engine_->Matches(Find("i"), tildes + "i"));
     EXPECT_FALSE(engine_->Matches(Find("i"), "u ~ " + tildes + "i"));
     EXPECT_FALSE(engine_->Matches(Find("i"), "u + " + tildes + "i"));
