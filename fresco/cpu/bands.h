@@ -25,7 +25,6 @@ class BandJob final : public IPaintWork {
     void AddRef() { references_.fetch_add(1, std::memory_order_relaxed); }
     // Until every band that somebody has begun is finished. After this thread's own Run.
     void Wait();
-    uint32_t PainterCount() const { return std::min(nextPainter_.load(), bands_); }
 
   private:
     IRect BandAt(uint32_t band) const;

@@ -152,7 +152,6 @@ class ViewImpl final : public View,
     // --- For the debug interfaces and the script globals. Main thread.
     dom::Document* GetDocument() const { return document_.get(); }
     const ViewServices& GetServices() const { return services_; }
-    IViewListener* GetListener() const { return listener_; }
     TimerQueue& GetTimers() { return timers_; }
     std::mt19937_64& GetRandom() { return random_; }
     // The last Advance gave the layout side something to do.

@@ -21,8 +21,6 @@ class DisplayParagraph final : public Box {
     void PlaceContent(layout::LayoutHandle& handle, layout::LayoutPass& pass);
     // Something below has changed.
     void Invalidate() { stale_ = true; }
-    // Whether the flow stands for a text or a style that is there no more.
-    bool IsStale() const { return stale_; }
 
   private:
     void FlowFor(layout::LayoutHandle& handle, float width, float height);

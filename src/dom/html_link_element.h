@@ -11,11 +11,6 @@ class HTMLLinkElement final : public HTMLElement {
   public:
     HTMLLinkElement(Document& document, css::TagId tag) : HTMLElement(document, tag) {}
 
-    std::string_view GetRel() const { return rel_; }
-    std::string_view GetType() const { return type_; }
-    std::string_view GetMedia() const { return media_; }
-    const URL& GetHref() const { return href_; }
-
     void ToDebugString(NodeText& out) const override;
     void AttributeChanged(AttributeName name, std::optional<Atom> old_value,
                           std::optional<Atom> new_value) override;

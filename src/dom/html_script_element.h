@@ -17,7 +17,6 @@ class HTMLScriptElement final : public HTMLElement {
     // Where the text of the element starts in the page's source.
     void SetSourcePosition(uint32_t line, uint32_t column) { line_ = line, column_ = column; }
     State GetState() const { return state_; }
-    bool IsDeferred() const { return defer_; }
     // Runs what is ready and reports with "load" or "error"; a script that still loads is left alone.
     void RunScript();
 

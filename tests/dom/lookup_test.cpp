@@ -86,22 +86,6 @@ TEST_F(LookupTest, CachesNeverShow) {
     }
 }
 
-TEST_F(LookupTest, CollectionsAreSnapshots) {
-    Load("<div></div><div></div>");
-    RefPtr<HTMLCollection> first = document_->Element::GetElementsByTagName("div");
-    EXPECT_EQ(document_->Element::GetElementsByTagName("DIV").get(), first.get());
-    Body().GetFirstElementChild()->AppendChild(Make("div"));
-    RefPtr<HTMLCollection> second = document_->Element::GetElementsByTagName("div");
-    EXPECT_NE(second.get(), first.get());
-    EXPECT_EQ(first->GetLength(), 2u);
-    EXPECT_EQ(second->GetLength(), 3u);
-    EXPECT_EQ(document_->Element::GetElementsByTagName("nonsense")->GetLength(), 0u);
-    EXPECT_TRUE(log_.Contains("Invalid tag name in getElementsByTagName -> nonsense"));
-    EXPECT_EQ(Body().GetChildNodes()->GetLength(), 2u);
-    Body().AppendChild(document_->CreateTextNode("live"));
-    EXPECT_EQ(Body().GetChildNodes()->GetLength(), 3u);
-}
-
 // Siblings have no links: walking them must still not search.
 TEST_F(LookupTest, SiblingWalksAndIdLookupsDoNotWalkTheTree) {
     LoadEmpty();

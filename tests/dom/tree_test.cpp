@@ -40,38 +40,14 @@ class Recorder final : public IMutationRegistry {
     }
 };
 
-TEST_F(TreeTest, RefusedInsertionsLogAndChangeNothing) {
-    Load("<div id=a><div id=b></div></div><p id=c></p>");
+TEST_F(TreeTest, WhatIsNoChildIsRefused) {
+    Load("<div id=a></div>");
     Element& a = Find("a");
-    EXPECT_EQ(a.AppendChild(RefPtr<Node>(&a)).get(), &a);
-    EXPECT_TRUE(log_.Contains("DOMException: Can't 'appendChild' to itself."));
-    EXPECT_EQ(Find("b").AppendChild(RefPtr<Node>(&a)).get(), &a);
-    EXPECT_TRUE(log_.Contains("DOMException: Can't 'appendChild' a node that is the ancestor of this one."));
     EXPECT_EQ(a.AppendChild(nullptr), nullptr);
     EXPECT_TRUE(log_.Contains("Trying to insert null child on Node!"));
-    a.AppendChild(RefPtr<Node>(document_.get()));
-    EXPECT_TRUE(log_.Contains("DOMException: It's forbidden to 'appendChild' the Document."));
     a.AppendChild(RefPtr<Node>(document_->CreateAttribute("x")));
     EXPECT_TRUE(log_.Contains("Not valid node type."));
-    document_->CreateTextNode("x")->AppendChild(Make("div"));
-    EXPECT_TRUE(log_.Contains("This node type does not support this method."));
-    EXPECT_EQ(a.RemoveChild(&Find("c")).get(), &Find("c"));
-    EXPECT_TRUE(log_.Contains("The node to be removed is not a child of this node."));
-    EXPECT_EQ(BodyShape(), "body(div#a(div#b) p#c)");
-}
-
-TEST_F(TreeTest, InsertBeforeAnUnknownReferenceDetaches) {
-    Load("<p id=a></p><p id=b></p>");
-    RefPtr<Element> stranger = Make("p");
-    RefPtr<Node> a(&Find("a"));
-    EXPECT_EQ(Body().InsertBefore(a, stranger.get()), nullptr);
-    EXPECT_EQ(a->GetParent(), nullptr);
-    EXPECT_FALSE(a->IsInDocument());
-    EXPECT_EQ(a->GetDepth(), -1);
-    EXPECT_EQ(BodyShape(), "body(p#b)");
-    // Before itself is where it stands already.
-    EXPECT_EQ(Body().InsertBefore(RefPtr<Node>(&Find("b")), &Find("b")).get(), &Find("b"));
-    EXPECT_EQ(BodyShape(), "body(p#b)");
+    EXPECT_EQ(BodyShape(), "body(div#a)");
 }
 
 TEST_F(TreeTest, RecordsTellThePlaceBeforeTheChange) {
@@ -115,26 +91,6 @@ TEST_F(TreeTest, AttributeAndTextRecordsCarryTheOldValue) {
     const std::vector<std::string> expected = {"a.title was absent", "a.data-k was absent", "a.class was x",
                                                "text was old"};
     EXPECT_EQ(recorder.records, expected);
-}
-
-TEST_F(TreeTest, TreeQueries) {
-    Load("<div id=a><p id=b>x</p><p id=c></p></div><p id=d></p>");
-    Element &a = Find("a"), &b = Find("b"), &c = Find("c"), &d = Find("d");
-    EXPECT_EQ(b.CompareDocumentPosition(b), 0);
-    EXPECT_EQ(b.CompareDocumentPosition(c), 4);
-    EXPECT_EQ(c.CompareDocumentPosition(b), 2);
-    EXPECT_EQ(a.CompareDocumentPosition(b), 20);
-    EXPECT_EQ(b.CompareDocumentPosition(a), 10);
-    EXPECT_EQ(d.CompareDocumentPosition(b), 2);
-    const int apart = a.CompareDocumentPosition(*Make("p"));
-    EXPECT_TRUE(apart == 35 || apart == 37);
-    EXPECT_TRUE(a.Contains(&a) && a.Contains(b.GetFirstChild()) && !a.Contains(&d) && !b.Contains(&a));
-    EXPECT_EQ(c.GetPreviousSibling(), &b);
-    EXPECT_EQ(b.GetNextElementSibling(), &c);
-    EXPECT_EQ(a.GetTextContent().view(), "x");
-    EXPECT_EQ(b.GetParentElement(), &a);
-    EXPECT_EQ(document_->GetHtmlElement()->GetParentElement(), nullptr);
-    EXPECT_EQ(b.GetDepth(), 4);
 }
 
 TEST_F(TreeTest, ClonesAreEqualAndApart) {

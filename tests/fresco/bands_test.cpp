@@ -11,7 +11,6 @@
 namespace fresco::test {
 namespace {
 
-constexpr char kSans[] = "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf";
 constexpr int kWidth = 640, kHeight = 480;
 
 // One thread for each posted work: they come early, late, or after the frame.
@@ -189,10 +188,8 @@ class BandCanvas : public Canvas {
 
 TEST(Bands, PicturesDoNotDependOnHelpers) {
     BandCanvas alone, helped;
-    alone.Save("bands");
     for (uint32_t seed = 1; seed <= 12; ++seed) {
         alone.Draw(Record(seed, alone.ids));
-        if (seed == 3) alone.Save("bands");
         Threads helpers(1 + seed % 4);
         helped.library->SetPaintHelpers(&helpers);
         helped.Draw(Record(seed, helped.ids));

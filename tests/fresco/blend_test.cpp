@@ -1,11 +1,10 @@
-// Vector loops against scalar ones, and blend modes against the formulas in double.
+// Blend modes and blurs against the formulas in double.
 #include <gtest/gtest.h>
 
 #include <cmath>
 #include <random>
 
 #include <fresco/paint.h>
-#include "fresco/cpu/blend.h"
 #include "fresco/cpu/blend_modes.h"
 #include "fresco/cpu/filters.h"
 #include "fresco/cpu/pixels.h"
@@ -22,42 +21,6 @@ uint32_t RandomPixel() {
 }
 
 }  // namespace
-
-TEST(Blend, VectorRowsEqualSinglePixels) {
-    for (int round = 0; round < 200; ++round) {
-        const int count = int(g_random() % 40);
-        std::vector<uint32_t> dst(40), src(40), expected;
-        std::vector<uint8_t> mask(40);
-        for (int i = 0; i < 40; ++i) {
-            dst[size_t(i)] = RandomPixel(), src[size_t(i)] = RandomPixel();
-            mask[size_t(i)] = uint8_t(g_random() % 3 == 0 ? (g_random() % 2) * 255 : g_random());
-        }
-        const uint32_t color = RandomPixel();
-        const uint8_t coverage = uint8_t(g_random());
-        const auto check = [&](auto wide, auto single) {
-            std::vector<uint32_t> fast = dst;
-            expected = dst;
-            wide(fast.data(), count, 0);
-            for (int i = 0; i < count; ++i)
-                single(expected.data() + i, 1, i);
-            ASSERT_EQ(fast, expected);
-        };
-        const auto solid = [&](uint32_t* d, int n, int) { BlendSolid(d, n, color, coverage); };
-        const auto solidMask = [&](uint32_t* d, int n, int at) {
-            BlendSolidMask(d, n, color, mask.data() + at);
-        };
-        const auto row = [&](uint32_t* d, int n, int at) {
-            BlendRow(d, src.data() + at, n, nullptr, coverage);
-        };
-        const auto rowMask = [&](uint32_t* d, int n, int at) {
-            BlendRow(d, src.data() + at, n, mask.data() + at, 255);
-        };
-        check(solid, solid);
-        check(solidMask, solidMask);
-        check(row, row);
-        check(rowMask, rowMask);
-    }
-}
 
 TEST(Blend, NormalIsExactToOneStep) {
     for (int i = 0; i < 20000; ++i) {

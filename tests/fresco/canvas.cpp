@@ -1,10 +1,8 @@
 #include "canvas.h"
 
 #include <cstdio>
-#include <cstdlib>
 
 #include <gtest/gtest.h>
-#include "fresco/images/png_writer.h"
 
 namespace fresco::test {
 
@@ -50,15 +48,11 @@ FontId Canvas::LoadFont(const std::string& path) {
     return library->GetFontService()->LoadFace(&reader, 0, SdfMode::Never);
 }
 
-void Canvas::Save(const char* name) const {
-    const char* folder = std::getenv("FRESCO_TEST_PNG");
-    if (!folder) return;
-    const Vector<uint8_t> png =
-        EncodePng(pixels.data(), uint32_t(width), uint32_t(height), size_t(width) * 4);
-    if (FILE* file = std::fopen((std::string(folder) + "/" + name + ".png").c_str(), "wb")) {
-        std::fwrite(png.data(), 1, png.size(), file);
-        std::fclose(file);
-    }
+long Canvas::Ink() const {
+    long ink = 0;
+    for (const uint32_t pixel : pixels)
+        ink += long(pixel >> 24);
+    return ink;
 }
 
 }  // namespace fresco::test

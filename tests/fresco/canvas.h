@@ -56,7 +56,14 @@ class MemoryReader final : public IStreamReader {
     std::vector<uint8_t> bytes_;
 };
 
+inline constexpr char kSans[] = "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf";
+
 std::vector<uint8_t> ReadFile(const std::string& path);
+
+struct GlyphSink final : IShapeSink {
+    void OnGlyphs(const ShapedGlyph* list, size_t count) override { glyphs.assign(list, list + count); }
+    std::vector<ShapedGlyph> glyphs;
+};
 
 struct Pixel {
     int r, g, b, a;
@@ -73,8 +80,8 @@ class Canvas {
     void Draw(CommandBuffer* buffer);
     Pixel At(int x, int y) const;
     FontId LoadFont(const std::string& path);
-    // Written when FRESCO_TEST_PNG names a folder: for eyes.
-    void Save(const char* name) const;
+    // The sum of all pixels' alpha.
+    long Ink() const;
 
     CountingAllocator allocator;
     LogLines log;
@@ -84,6 +91,10 @@ class Canvas {
     std::vector<uint32_t> pixels;
     CpuRenderTarget target;
 };
+
+inline CommandBuffer* Buffer() {
+    return Library::CreateBuffer(0, 0);
+}
 
 inline Paint Solid(float r, float g, float b, float a = 1) {
     Paint paint;

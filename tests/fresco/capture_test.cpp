@@ -11,8 +11,6 @@
 namespace fresco::test {
 namespace {
 
-constexpr char kSans[] = "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf";
-
 // A frame that needs everything a capture carries: old content, a font, a font of pictures, an image, a
 // surface, uploads of its own.
 struct Frame {
@@ -95,7 +93,6 @@ TEST(Capture, ReplaysBitForBit) {
     size_t size = 0;
     const std::vector<uint64_t> file = frame.Capture(&size);
     frame.canvas.scene->ExecuteBackEnd(frame.buffers, 2);
-    frame.canvas.Save("capture");
     cpu::PixelBuffer picture;
     const char* error = nullptr;
     ASSERT_TRUE(cpu::ReplayCapture(file.data(), size, &picture, &error)) << error;

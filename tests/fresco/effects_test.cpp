@@ -13,12 +13,6 @@
 namespace fresco::test {
 namespace {
 
-constexpr char kSans[] = "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf";
-
-CommandBuffer* Buffer() {
-    return Library::CreateBuffer(0, 0);
-}
-
 void ExpectNear(Pixel a, std::array<double, 4> b, double tolerance, const std::string& where) {
     EXPECT_NEAR(a.r, b[0], tolerance) << where;
     EXPECT_NEAR(a.g, b[1], tolerance) << where;
@@ -418,14 +412,6 @@ TEST(Effects, ClipsOfEveryShapeCoverTheirArea) {
          1200 - 400 + 100 * 3.14159265},
         {[](CommandBuffer* b, uint32_t mode) { b->ClipEllipse(32, 32, 20, 12, mode); }, 240 * 3.14159265},
         {[&](CommandBuffer* b, uint32_t mode) { b->ClipPath(*path, mode); }, 1152}};
-    const auto covered = [](const Canvas& canvas) {
-        double sum = 0;
-        for (int y = 0; y < 64; ++y) {
-            for (int x = 0; x < 64; ++x)
-                sum += canvas.At(x, y).a / 255.0;
-        }
-        return sum;
-    };
     int round = 0;
     for (const Case& c : cases) {
         for (const bool turned : {false, true}) {
@@ -449,7 +435,7 @@ TEST(Effects, ClipsOfEveryShapeCoverTheirArea) {
                 const double expected = mode == kClipExclude ? 4096 - area
                                         : mode == kClipAdd   ? area + 4
                                                              : area;
-                EXPECT_NEAR(covered(canvas), expected, 4)
+                EXPECT_NEAR(double(canvas.Ink()) / 255, expected, 4)
                     << "case " << round << " mode " << mode << " turned " << turned;
             }
         }
@@ -494,18 +480,10 @@ TEST(Effects, BlurredTextShadowsKeepTheInkOfTheirText) {
     if (font == kNoId) GTEST_SKIP() << "no DejaVu on this machine";
     TextPaint text;
     text.font = font, text.size = 24, text.x = 20, text.y = 40, text.paint = Solid(0, 0, 0);
-    const auto ink = [&] {
-        double sum = 0;
-        for (int y = 0; y < 64; ++y) {
-            for (int x = 0; x < 256; ++x)
-                sum += canvas.At(x, y).a;
-        }
-        return sum;
-    };
     CommandBuffer* b = Buffer();
     b->FillString("Shadow", 6, text);
     canvas.Draw(b);
-    const double plain = ink();
+    const double plain = double(canvas.Ink());
     const SurfaceId surface = Library::GetSurfaceName();
     b = Library::CreateBufferForSurface(surface, 256, 0);
     b->CreateSurface(surface, {256, 64, PixelFormat::RGBA8}, 0);
@@ -516,7 +494,7 @@ TEST(Effects, BlurredTextShadowsKeepTheInkOfTheirText) {
     b->ClearRect({}, 1);
     b->DrawSurface(surface, {}, {0, 0, 0, 256, 64}, Paint{});
     canvas.Draw(b);
-    EXPECT_NEAR(ink() / plain, 1, 0.02);
+    EXPECT_NEAR(double(canvas.Ink()) / plain, 1, 0.02);
     for (int x = 0; x < 256; x += 3)
         EXPECT_LT(canvas.At(x, 30).a, 200) << "nothing sharp is left";
     // The outline of a glyph: ink around its edge, none in the middle of a thick stem.

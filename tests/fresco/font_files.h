@@ -6,8 +6,6 @@
 
 namespace fresco::test {
 
-inline constexpr char kSans[] = "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf";
-
 using Bytes = std::vector<uint8_t>;
 
 inline uint32_t Read32(const Bytes& bytes, size_t at) {

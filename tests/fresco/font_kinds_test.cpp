@@ -24,14 +24,6 @@ void AddColor(std::vector<Table>& tables, uint32_t base, uint32_t red, uint32_t 
     tables.push_back(cpal);
 }
 
-long Ink(const Canvas& canvas) {
-    long ink = 0;
-    for (int y = 0; y < canvas.height; ++y)
-        for (int x = 0; x < canvas.width; ++x)
-            ink += canvas.At(x, y).a;
-    return ink;
-}
-
 class FontKinds : public testing::Test {
   protected:
     void SetUp() override {
@@ -82,9 +74,9 @@ TEST_F(FontKinds, FieldsCoverWhatOutlinesCover) {
         const FontId b = Load(*field.library->GetFontService(), sans, SdfMode::Always);
         DrawText(outline, a, "Rg", size, 48);
         DrawText(field, b, "Rg", size, 48);
-        const long expected = Ink(outline);
+        const long expected = outline.Ink();
         EXPECT_GT(expected, 1000);
-        EXPECT_NEAR(double(Ink(field)), double(expected), double(expected) * 0.08) << size;
+        EXPECT_NEAR(double(field.Ink()), double(expected), double(expected) * 0.08) << size;
     }
 }
 
@@ -136,15 +128,12 @@ TEST_F(FontKinds, BrokenFilesAnswerOrAreRefused) {
         const FontId id = Load(*service, bytes);
         const IFont* font = service->GetFont(id);
         if (!font) continue;
-        struct Sink : IShapeSink {
-            void OnGlyphs(const ShapedGlyph* glyphs, size_t count) override {
-                for (size_t i = 0; i < count; ++i)
-                    EXPECT_TRUE(std::isfinite(glyphs[i].advance) && glyphs[i].cluster < 7);
-            }
-        } sink;
+        GlyphSink sink;
         ShapeRequest request;
         request.codePoints = text, request.count = 7;
         font->Shape(request, sink);
+        for (const ShapedGlyph& glyph : sink.glyphs)
+            EXPECT_TRUE(std::isfinite(glyph.advance) && glyph.cluster < 7);
         font->PreloadGlyphs(text, 7);
         EXPECT_TRUE(std::isfinite(font->GetMetrics(20).ascent));
         DrawText(canvas, id, "afi", 20, 30);
@@ -153,12 +142,8 @@ TEST_F(FontKinds, BrokenFilesAnswerOrAreRefused) {
 
 TEST_F(FontKinds, ShapingRemembersByTextAndContext) {
     const IFont& font = *service->GetFont(Load(*service, sans));
-    struct Sink : IShapeSink {
-        void OnGlyphs(const ShapedGlyph* list, size_t count) override { glyphs.assign(list, list + count); }
-        std::vector<ShapedGlyph> glyphs;
-    };
     const auto shape = [&](const std::vector<uint32_t>& text, size_t first, size_t count, float size) {
-        Sink sink;
+        GlyphSink sink;
         ShapeRequest request;
         request.codePoints = text.data() + first, request.count = count, request.size = size;
         request.direction = TextDirection::RightToLeft;

@@ -6,13 +6,7 @@
 namespace fresco::test {
 namespace {
 
-constexpr char kSans[] = "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf";
 constexpr char kBold[] = "/usr/share/fonts/truetype/dejavu/DejaVuSans-Bold.ttf";
-
-struct Collect : IShapeSink {
-    std::vector<ShapedGlyph> glyphs;
-    void OnGlyphs(const ShapedGlyph* list, size_t count) override { glyphs.assign(list, list + count); }
-};
 
 }  // namespace
 
@@ -38,7 +32,7 @@ TEST(Font, LoadsFindsAndMeasures) {
     EXPECT_TRUE(font->GetAdvances(glyphs, 3, 100, advances));
     EXPECT_NEAR(advances[0], 68.4f, 0.1f);
     EXPECT_FALSE(font->GetAdvances(glyphs, 3, -1, advances));
-    Collect shaped;
+    GlyphSink shaped;
     ShapeRequest request;
     request.codePoints = text, request.count = 2, request.size = 100;
     ASSERT_TRUE(font->Shape(request, shaped));

@@ -9,13 +9,8 @@
 namespace fresco::test {
 namespace {
 
-constexpr char kSans[] = "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf";
 constexpr long kMegabyte = 1 << 20;
 const CornerRadii kRound{{9, 9}, {9, 9}, {9, 9}, {9, 9}};
-
-CommandBuffer* Buffer() {
-    return Library::CreateBuffer(0, 0);
-}
 
 // One draw of each kind around the origin.
 void DrawEachKind(CommandBuffer* b, FontId font, ImageId image, float size) {
@@ -31,6 +26,7 @@ void DrawEachKind(CommandBuffer* b, FontId font, ImageId image, float size) {
     b->FillPath(*path, paint), b->StrokePath(*path, paint, 0);
     b->FillLinearGradient(rect, paint, stops, 2, {{0, 0}, {1, 1}, kSpreadRepeat});
     b->FillRadialGradient(rect, paint, stops, 2, {{0, 0}, {0, 0}, kSpreadReflect});
+    b->FillLinearGradient(rect, paint, nullptr, 0, {});
     b->DrawImage(image, rect, {}, paint);
     b->DrawImageTiled(image, rect, {{}, {0, 0, 0, 0.001f, 0.001f}, -5, 0}, paint);
     b->ClearRect({0, 0, 0, 1, 1}, 0);
@@ -44,13 +40,13 @@ void DrawEachKind(CommandBuffer* b, FontId font, ImageId image, float size) {
     b->ClipPath(*path, kClipAdd);
     const FilterRecord shadow{uint32_t(FilterKind::DropShadow), {size, -size, size, 0, 0, 0, 1}};
     Effect* filter = GetEffectFactory()->CreateFilter(&shadow, 1);
-    b->BeginLayerWithEffects(kLayerContent, MakeLayerPaint(0.5f), &filter, 1);
+    b->BeginLayerWithEffects(kLayerContent, MakeLayerPaint(0.5f), &filter, filter != nullptr);
     b->FillRect(rect, paint);
     b->SetMaskImage(image, rect, {}, 0);
     b->SetMaskImageTiled(image, rect, {{}, rect, 1e9f, 1e9f}, 0);
     b->EndLayer();
     b->PopState();
-    filter->Release();
+    if (filter) filter->Release();
     path->Release();
 }
 
@@ -85,7 +81,7 @@ TEST(Hostile, MatricesOfEveryDegenerateKind) {
     Matrix4 skewed = AffineMatrix(1, 1, 1, 1.0000001f, 0, 0);
     for (const Matrix4& matrix : {zero, flat, edgeOn, behind, through, vast, minute, skewed}) {
         HostileCanvas canvas;
-        for (const float size : {0.0f, 1e-20f, 10.0f, 1e20f}) {
+        for (const float size : {0.0f, 1e-20f, 10.0f, 1e20f, NAN, INFINITY}) {
             CommandBuffer* b = Buffer();
             b->PushState(kStateAll);
             b->MultiplyTransform(matrix);
@@ -240,8 +236,9 @@ TEST(Hostile, TargetsWithoutRoomAreRefused) {
     }
     EXPECT_EQ(pixel, 0u);
     EXPECT_EQ(canvas.scene->GetStats().paintedPixels, 0u);
-    // Images and surfaces that make no sense.
+    // Images and surfaces that make no sense, or were never made.
     CommandBuffer* b = Buffer();
+    b->DrawSurface(12345, {}, {0, 0, 0, 10, 10}, Paint{});
     for (const uint32_t side : {0u, 1u, 16385u, 0xFFFFFFFFu}) {
         const ImageId id = Library::GetImageName();
         b->CreateImage(

@@ -26,6 +26,15 @@ struct Coverage : CoverageSink {
     }
 };
 
+struct Sum : CoverageSink {
+    double total = 0;
+    void Span(int, int x0, int x1, uint8_t c) override { total += double(c) * (x1 - x0); }
+    void Mask(int, int, const uint8_t* c, int count) override {
+        for (int i = 0; i < count; ++i)
+            total += c[i];
+    }
+};
+
 using Polygon = std::vector<Vec2>;
 
 int WindingAt(const Polygon& polygon, double x, double y) {
@@ -135,14 +144,7 @@ TEST(Rasterizer, SurvivesTheEdgesOfItsWords) {
     // Runs of touched cells that begin, end and continue at multiples of 64.
     for (const int width : {1, 62, 63, 64, 65, 127, 128, 129, 200}) {
         for (const double inset : {0.0, 0.25, 1.0}) {
-            struct Sum : CoverageSink {
-                double total = 0;
-                void Span(int, int x0, int x1, uint8_t c) override { total += double(c) * (x1 - x0); }
-                void Mask(int, int, const uint8_t* c, int count) override {
-                    for (int i = 0; i < count; ++i)
-                        total += c[i];
-                }
-            } sum;
+            Sum sum;
             Rasterizer rasterizer;
             for (int pass = 0; pass < 2; ++pass) {  // the second finds what the first left behind
                 sum.total = 0;
@@ -163,14 +165,7 @@ TEST(Rasterizer, SurvivesTheEdgesOfItsWords) {
 
 TEST(Outline, CurvesAndStrokesHaveTheirArea) {
     const auto area = [](auto add) {
-        struct Sum : CoverageSink {
-            double total = 0;
-            void Span(int, int x0, int x1, uint8_t c) override { total += double(c) * (x1 - x0); }
-            void Mask(int, int, const uint8_t* c, int count) override {
-                for (int i = 0; i < count; ++i)
-                    total += c[i];
-            }
-        } sum;
+        Sum sum;
         Rasterizer rasterizer;
         OutlineBuilder builder;
         rasterizer.Begin({0, 0, 200, 200});

@@ -105,26 +105,6 @@ TEST_F(LayoutTreeTest, HandlesOutliveTheTree) {
     EXPECT_FALSE(kept->data().inTree);
 }
 
-TEST_F(LayoutTreeTest, DeepTreesAreCutWithOneWarning) {
-    Page page;
-    LayoutHandle* at = page.body;
-    LayoutHandle* within = nullptr;
-    for (int i = 0; i < 5000; ++i) {
-        at = page.Add(at, "height: 3px; padding-left: 1px; position: relative; z-index: 1");
-        if (i == 100) within = at;
-    }
-    LayoutHandle* deepest = page.Add(at, "width: 10px; height: 10px");
-    page.Frame();
-    EXPECT_EQ(log_.Count("nested deeper"), 1u);
-    EXPECT_EQ(BoxOf(deepest), "0 0 0 0");
-    EXPECT_EQ(within->data().result.left, 100);
-    // A subtree that comes up again is laid out.
-    page.tree.Remove(*deepest, nullptr);
-    page.tree.Attach(*deepest, *page.body, 0);
-    page.Frame();
-    EXPECT_EQ(BoxOf(deepest), "0 0 10 10");
-}
-
 TEST_F(LayoutTreeTest, DiagnosticNamesFollowTheTree) {
     FakeNode node;
     Page page;

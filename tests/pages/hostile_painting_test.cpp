@@ -2,16 +2,12 @@
 #include <gtest/gtest.h>
 
 #include "core/frame/client.h"
+#include "support/repeat.h"
 
 namespace qorvex::pages {
 namespace {
 
-std::string Repeat(std::string_view piece, size_t count) {
-    std::string text;
-    for (size_t i = 0; i < count; ++i)
-        text += piece;
-    return text;
-}
+using test::Repeat;
 
 class HostilePainting : public testing::Test {
   protected:

@@ -5,22 +5,18 @@
 
 #include <map>
 #include <random>
+#include <sstream>
 
 #include "core/frame/client.h"
+#include "support/repeat.h"
 #include "support/slow_build.h"
 
 namespace qorvex::pages {
 namespace {
 
-constexpr size_t kShrink = test::kSlowBuild ? 10 : 1;
+using test::Repeat;
 
-std::string Repeat(std::string_view piece, size_t count) {
-    std::string text;
-    text.reserve(piece.size() * count);
-    for (size_t i = 0; i < count; ++i)
-        text += piece;
-    return text;
-}
+constexpr size_t kShrink = test::kSlowBuild ? 10 : 1;
 
 std::string PageWith(const std::string& sheet, const std::string& body) {
     return "<html><head><style>" + sheet + "</style></head><body>" + body + "</body></html>";
@@ -295,75 +291,16 @@ TEST_F(HostilePages, PagesCutAnywhere) {
 
 // Pieces of pages in any order: nothing is asked of them but that the game goes on.
 TEST_F(HostilePages, PiecesInAnyOrder) {
-    const std::vector<std::string> pieces = {"{",
-                                             "}",
-                                             "(",
-                                             ")",
-                                             "[",
-                                             "]",
-                                             ";",
-                                             ":",
-                                             ",",
-                                             "\"",
-                                             "'",
-                                             "/*",
-                                             "*/",
-                                             "<!--",
-                                             "-->",
-                                             "@media",
-                                             "@keyframes k",
-                                             "@font-face",
-                                             "from",
-                                             "50%",
-                                             "#a",
-                                             ".b",
-                                             "*",
-                                             "p",
-                                             ">",
-                                             "+",
-                                             "~",
-                                             "::selection",
-                                             ":hover",
-                                             "[x=y]",
-                                             "width",
-                                             "color",
-                                             "margin",
-                                             "flex",
-                                             "transform",
-                                             "background",
-                                             "font",
-                                             "animation",
-                                             "mask",
-                                             "border-image",
-                                             "--x",
-                                             "var(--x)",
-                                             "calc(",
-                                             "1px",
-                                             "2em",
-                                             "3%",
-                                             "-4",
-                                             ".5",
-                                             "red",
-                                             "rgb(1,2,3)",
-                                             "url(a.png)",
-                                             "linear-gradient(red,blue)",
-                                             "!important",
-                                             "inherit",
-                                             "initial",
-                                             "auto",
-                                             "none",
-                                             "and",
-                                             "(min-width:1px)",
-                                             " ",
-                                             "\n",
-                                             "//",
-                                             "\\",
-                                             "\xC3\xA9",
-                                             "translate(1px)",
-                                             "blur(1px)",
-                                             "polygon(0 0,1px 1px)",
-                                             "ease",
-                                             "1s"};
+    std::istringstream list(
+        "{|}|(|)|[|]|;|:|,|\"|'|/*|*/|<!--|-->|@media|@keyframes k|@font-face|from|50%|#a|.b|"
+        "*|p|>|+|~|::selection|:hover|[x=y]|width|color|margin|flex|transform|background|font|"
+        "animation|mask|border-image|--x|var(--x)|calc(|1px|2em|3%|-4|.5|red|rgb(1,2,3)|"
+        "url(a.png)|linear-gradient(red,blue)|!important|inherit|initial|auto|none|and|"
+        "(min-width:1px)| |\n|//|\\|\xC3\xA9|translate(1px)|blur(1px)|polygon(0 0,1px 1px)|"
+        "ease|1s");
+    std::vector<std::string> pieces;
+    for (std::string piece; std::getline(list, piece, '|');)
+        pieces.push_back(piece);
     std::mt19937 random(7);
     for (size_t round = 0; round < 300 / kShrink; ++round) {
         SCOPED_TRACE("round " + std::to_string(round));

@@ -40,7 +40,6 @@ class FontManager final : public IFontResolver {
     FontManager& operator=(const FontManager&) = delete;
 
     fresco::IFontService& Service() { return service_; }
-    TaskFamilyHandle Family() const { return family_; }
     // Results of loads. Part of the system's and the views' Advance.
     void RunMainTasks();
 

@@ -1,25 +1,19 @@
 // Large and broken texts: work stays in proportion to the text, and nothing nests without bound.
 #include "core/limits.h"
 #include "css/parser/sheet_dump.h"
+#include "support/repeat.h"
 #include "support/scoped_library_state.h"
 
 namespace qorvex::css {
 namespace {
 
 using test::QorvexTest;
+using test::Repeat;
 
 class HostileSheetTest : public QorvexTest {
   protected:
     std::unique_ptr<StringPool> strings_ = std::make_unique<StringPool>();
 };
-
-std::string Repeat(std::string_view piece, size_t count) {
-    std::string text;
-    text.reserve(piece.size() * count);
-    for (size_t i = 0; i < count; ++i)
-        text += piece;
-    return text;
-}
 
 TEST_F(HostileSheetTest, NestingEndsAtTheLimit) {
     const size_t limit = limits::kMaxCssNesting;

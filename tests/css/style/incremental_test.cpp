@@ -160,17 +160,6 @@ TEST_F(Incremental, HistoryLeavesNoTrace) {
     EXPECT_EQ(FirstDifference(changed, DumpAll()), "");
 }
 
-TEST_F(Incremental, RootFontSizeReachesRemAndMedia) {
-    Load("<div id='d' class='e m'><p id='p'></p></div>", kSheet);
-    EXPECT_EQ(Computed("d", "font-size"), "32px");
-    EXPECT_EQ(Computed("d", "height"), "auto");
-    document_->GetHtmlElement()->SetAttribute("style", "font-size: 30px");
-    EXPECT_EQ(Computed("d", "height"), "35px");  // 35em are now 1050 px
-    document_->GetHtmlElement()->SetAttribute("style", "font-size: 10px");
-    EXPECT_EQ(Computed("p", "font-size"), "20px");
-    EXPECT_EQ(Computed("d", "height"), "auto");
-}
-
 TEST_F(Incremental, HoverMatchesAgainWhoDependsOnIt) {
     Load("<div id='h' class='h'><p id='a' class='a'></p></div><p id='q'></p>", kSheet);
     EXPECT_EQ(Computed("a", "width"), "10px");

@@ -4,17 +4,17 @@
 #include "css/style/style_fixture.h"
 #include "dom/character_data.h"
 #include "layout/layout_handle.h"
+#include "support/repeat.h"
 
 namespace qorvex::css::test {
 namespace {
 
+using qorvex::test::Repeat;
+
 class WorkCount : public StyleTest {};
 
 std::string Rows(int count) {
-    std::string body;
-    for (int i = 0; i < count; ++i)
-        body += "<div class='row'><span class='cell'>text</span></div>";
-    return body;
+    return Repeat("<div class='row'><span class='cell'>text</span></div>", size_t(count));
 }
 constexpr std::string_view kSheet =
     ".row { width: 50px; background-color: red } .cell { padding-left: 2px; color: blue } .on { width: 60px }"
@@ -110,10 +110,8 @@ TEST_F(WorkCount, OnlyWhatIsWonByAnotherDeclarationIsLookedAt) {
 }
 
 TEST_F(WorkCount, HoverDeepInAPageAllocatesNothing) {
-    std::string body;
-    for (int i = 0; i < 30; ++i)
-        body += "<div class='row'>";
-    Load(body + "<p id='p'></p>", ".row:hover { width: 60px } .row .row:hover { height: 3px }");
+    Load(Repeat("<div class='row'>", 30) + "<p id='p'></p>",
+         ".row:hover { width: 60px } .row .row:hover { height: 3px }");
     Solve();
     const auto hover = [&](dom::Element* element) {
         dom::Element& deepest = Find("p");

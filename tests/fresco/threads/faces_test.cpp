@@ -10,11 +10,6 @@
 namespace fresco::test {
 namespace {
 
-struct Collect final : IShapeSink {
-    void OnGlyphs(const ShapedGlyph* list, size_t count) override { glyphs.assign(list, list + count); }
-    std::vector<ShapedGlyph> glyphs;
-};
-
 // A code of many pages of a glyph table.
 uint32_t CodeOf(uint32_t i) {
     constexpr uint32_t kStarts[] = {'A', 0xC0, 0x391, 0x410, 0x5D0, 0x620, 0x2190, 0x2588, 0x4E00, 0x1F600};
@@ -31,7 +26,7 @@ float Measure(const IFont& font, uint32_t turn) {
     font.GetAdvances(glyphs, 8, 20, advances);
     for (const float advance : advances)
         sum += advance;
-    Collect sink;
+    GlyphSink sink;
     ShapeRequest request;
     request.codePoints = codes, request.count = 8, request.size = 20;
     request.direction = turn % 2 ? TextDirection::RightToLeft : TextDirection::LeftToRight;
