@@ -1,5 +1,6 @@
 #include "fresco/commands/stream_recorder.h"
 
+#include <algorithm>
 #include <mutex>
 
 #include <fresco/library.h>
@@ -100,6 +101,7 @@ void StreamRecorder::AppendGradient(Record record, const GradientStop* stops, ui
 // The record has been appended with an empty tail; the effects follow it and its size grows.
 void StreamRecorder::AppendEffects(size_t recordStart, const Effect* const* effects, uint32_t count) {
     for (uint32_t i = 0; i < count; ++i) {
+        if (!effects[i]) continue;
         const EffectHeader header{uint32_t(effects[i]->GetKind()), Padded(effects[i]->GetDataSize())};
         const size_t size = effects[i]->GetDataSize();
         uint8_t* out = stream_.Extend(sizeof(header) + header.size);
@@ -280,7 +282,8 @@ CommandBuffer* StreamRecorder::BeginLayerWithEffects(uint32_t flags, const Layer
     LayerPaint safe = paint;
     if (!IsFinite(paint)) safe = MakeLayerPaint(1);
     const size_t start = stream_.size();
-    Append(BeginLayerWithEffectsRecord{flags, safe, count});
+    const auto made = count - uint32_t(std::count(effects, effects + count, nullptr));
+    Append(BeginLayerWithEffectsRecord{flags, safe, made});
     AppendEffects(start, effects, count);
     return BeginLayerState();
 }

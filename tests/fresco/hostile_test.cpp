@@ -40,7 +40,7 @@ void DrawEachKind(CommandBuffer* b, FontId font, ImageId image, float size) {
     b->ClipPath(*path, kClipAdd);
     const FilterRecord shadow{uint32_t(FilterKind::DropShadow), {size, -size, size, 0, 0, 0, 1}};
     Effect* filter = GetEffectFactory()->CreateFilter(&shadow, 1);
-    b->BeginLayerWithEffects(kLayerContent, MakeLayerPaint(0.5f), &filter, filter != nullptr);
+    b->BeginLayerWithEffects(kLayerContent, MakeLayerPaint(0.5f), &filter, 1);
     b->FillRect(rect, paint);
     b->SetMaskImage(image, rect, {}, 0);
     b->SetMaskImageTiled(image, rect, {{}, rect, 1e9f, 1e9f}, 0);

@@ -69,6 +69,7 @@ class IEffectFactory {
     virtual Effect* CreateRadialGradient(const RadialGradient& geometry, const GradientStop* stops,
                                          uint32_t count) = 0;
     virtual Effect* CreatePattern(const PatternGeometry& geometry) = 0;
+    // Null when a number is not finite; layers leave null effects out.
     virtual Effect* CreateFilter(const FilterRecord* filters, uint32_t count) = 0;
     virtual Effect* CreateBlend(uint32_t blend) = 0;
     virtual Effect* CreateCustom(const char* name, const float params[4], const char* text1,
