@@ -18,6 +18,18 @@ namespace {
 bool HasDisplay(const Node& node) {
     return node.GetLaidOutStyle().layout->display != css::CSSDisplay::None;
 }
+
+// Clearing makes a roomy set smaller step by step, and each step takes a block. Frames without changes take none:
+// what is left of a large change goes in the first of them at once.
+void ClearChanges(NodeSet& changes) {
+    constexpr uint32_t kKeptSlots = 199;
+    if (!changes.empty()) {
+        changes.clear();
+    } else if (changes.capacity() > kKeptSlots) {
+        NodeSet gone;
+        gone.swap(changes);
+    }
+}
 }  // namespace
 
 void Document::SetViewSize(uint32_t width, uint32_t height) {
@@ -153,9 +165,8 @@ layout::LayoutWork Document::UpdateLayoutStyles(bool force_full_layout) {
     if (!restyle_changes_.empty()) host_->RequestFrames(2);
     for (Node* node : restyle_changes_)
         if (TakeChange(*node) && work == LayoutWork::None) work = LayoutWork::Transforms;
-    // Clearing gives memory back step by step, which takes a smaller block: not in frames without changes.
     for (NodeSet* set : {&layout_changes_, &transform_changes_, &visual_changes_, &restyle_changes_})
-        if (!set->empty()) set->clear();
+        ClearChanges(*set);
     return work;
 }
 

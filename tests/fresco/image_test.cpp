@@ -54,7 +54,7 @@ std::vector<uint8_t> WebpAnimation(uint32_t width, uint32_t height) {
     std::vector<uint8_t> file = {'R', 'I', 'F', 'F', 0, 0, 0, 0, 'W', 'E', 'B', 'P'};
     const auto number = [&](uint32_t value, int bytes) {
         for (int i = 0; i < bytes; ++i)
-            file.push_back(uint8_t(value >> (8 * i)));
+            file.push_back(uint8_t(uint64_t{value} >> (8 * i)));
     };
     const auto chunk = [&](std::string_view name, uint32_t size) {
         file.insert(file.end(), name.begin(), name.end());
