@@ -19,8 +19,8 @@ bool HasDisplay(const Node& node) {
     return node.GetLaidOutStyle().layout->display != css::CSSDisplay::None;
 }
 
-// Clearing makes a roomy set smaller step by step, and each step takes a block. Frames without changes take none:
-// what is left of a large change goes in the first of them at once.
+// Clearing makes a roomy set smaller step by step, and each step takes a block. Frames without changes take
+// none: what is left of a large change goes in the first of them at once.
 void ClearChanges(NodeSet& changes) {
     constexpr uint32_t kKeptSlots = 199;
     if (!changes.empty()) {
