@@ -94,7 +94,8 @@ class ValueText {
         arena_.AppendText(" ");
         arena_.AppendText(piece);
     }
-    std::string_view Finish() { return copied_ ? arena_.FinishText() : slice_; }
+    // An escape that ends the text needs its space no more, and what is read again comes without.
+    std::string_view Finish() { return Trim(copied_ ? arena_.FinishText() : slice_); }
 
   private:
     void StartCopy() {
