@@ -83,6 +83,7 @@ dom::Document& Page::Load(std::string_view html, std::string_view url,
     if (!document_->BuildRoot(dom::ParseHTML(html))) return *document_;
     do {
         (void)document_->IterateDOMBuilding();
+        host_.RunTasks();
     } while (answers.Answer(*document_));
     Require(document_->IsUnloaded() || document_->GetBuildState() == dom::BuildState::Built,
             "a page whose loads are all answered is built");

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "core/memory/containers.h"
+#include "core/tasks/task_system.h"
 #include "dom/document.h"
 #include "dom/element.h"
 #include "dom/resource_loader.h"
@@ -15,12 +16,21 @@ using OnScript = void (*)(dom::Document& document, std::string_view source, void
 
 class PageHost final : public qorvex::test::IdleHost {
   public:
+    PageHost() { tasks_.OpenChannel(TaskChannels::Main, kFamily); }
+    TaskFamilyHandle GetTaskFamily() override { return {kFamily, &tasks_}; }
     void EvaluateScript(dom::Document& document, std::string_view source, std::string_view) override {
         if (on_script) on_script(document, source, user);
     }
 
+    /// What elements have put off, such as the events of images.
+    void RunTasks() { tasks_.Run(TaskChannels::Main, false, nullptr, kFamily); }
+
     OnScript on_script = nullptr;
     void* user = nullptr;
+
+  private:
+    static constexpr uint32_t kFamily = 1;
+    TaskSystem tasks_{TaskSystemSettings{}};
 };
 
 /// Gathers requests; Answer gives each one what its own address says, or a failure to every third.
