@@ -88,7 +88,14 @@ void SystemImpl::CreateFontManager(const SystemSettings& settings) {
     fonts_ = MakeUnique<layout::FontManager>(fonts);
 }
 
+unsigned SystemImpl::GetId() const {
+    const MainThreadCall call("System");
+    return call ? id_ : 0;
+}
+
 void SystemImpl::SetId(unsigned id) {
+    const MainThreadCall call("System");
+    if (!call) return;
     id_ = id < kSystemIds ? id : 0;
 }
 

@@ -27,7 +27,7 @@ class SystemImpl final : public System, public IViewLifetimeTracker {
     SystemImpl(LibraryImpl& library, const SystemSettings& settings, uint32_t family);
     ~SystemImpl() override;
 
-    unsigned GetId() const override { return id_; }
+    unsigned GetId() const override;
     void SetId(unsigned id) override;
     View* CreateView(const ViewSettings& settings) override;
     SystemCacheStats* CreateCacheStats() override;

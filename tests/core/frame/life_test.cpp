@@ -168,7 +168,11 @@ TEST(Life, OtherThreadsThanTheMainOneAreRefused) {
         [&] { client.view->LoadURL(kUrl); },
         [&] { client.view->Resize(1, 1); },
         [&] { EXPECT_EQ(client.view->GetImagesList(0), nullptr); },
+        [&] { EXPECT_EQ(client.view->GetWidth(), 0u); },
+        [&] { client.view->ContinuousRepaint(true); },
+        [&] { client.view->SetGestureScrollThreshold(99); },
         [&] { client.view->Destroy(); },
+        [&] { client.system->SetId(9); },
         [&] { EXPECT_EQ(client.system->CreateView({}), nullptr); },
         [&] { client.system->ClearStylesheetCache(); },
         [&] { EXPECT_FALSE(client.system->RemoveHTMLCacheEntry(kUrl)); },
@@ -179,7 +183,11 @@ TEST(Life, OtherThreadsThanTheMainOneAreRefused) {
                                             "View::LoadURL",
                                             "View::Resize",
                                             "View::GetImagesList",
+                                            "View::GetWidth",
+                                            "View::ContinuousRepaint",
+                                            "View::SetGestureScrollThreshold",
                                             "View::Destroy",
+                                            "System::SetId",
                                             "System::CreateView",
                                             "System::ClearStylesheetCache",
                                             "System::RemoveHTMLCacheEntry",
@@ -188,6 +196,7 @@ TEST(Life, OtherThreadsThanTheMainOneAreRefused) {
     client.log.Clear();
     const size_t requests = client.files.requests.size();
     const auto pixels = client.pixels;
+    const float threshold = client.view->GetGestureScrollThreshold();
     std::thread([&] {
         for (const auto& call : calls)
             call();
@@ -199,6 +208,8 @@ TEST(Life, OtherThreadsThanTheMainOneAreRefused) {
     client.Frame();
     EXPECT_EQ(client.files.requests.size(), requests);
     EXPECT_EQ(client.pixels, pixels);
+    EXPECT_EQ(client.view->GetGestureScrollThreshold(), threshold);
+    EXPECT_NE(client.system->GetId(), 9u);
 }
 
 TEST(Life, TimesThatAreNoneAreReportedAndIgnored) {
