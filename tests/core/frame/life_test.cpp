@@ -123,6 +123,36 @@ TEST(Life, WhatIsForgottenGoesWithTheLibrary) {
     EXPECT_EQ(allocator.wrong_tags(), 0u);
 }
 
+// The strings of its pages go with the last view; sheets in the cache keep theirs.
+TEST(Life, AViewThatGoesLeavesNoStringsBehind) {
+    Client client;
+    client.files.Put("coui://page/kept.css", ".kept { width: 77px }");
+    client.system->PreloadAndCacheStylesheet("coui://page/kept.css");
+    client.ServeResources();
+    client.system->Advance(1);
+    client.DestroyView();
+    int64_t blocks = 0;
+    for (const char* letter : {"a", "b", "c"}) {
+        qorvex::ViewSettings settings;
+        settings.Width = settings.Height = 8;
+        client.view = client.system->CreateView(settings);
+        client.MakeRenderer();
+        client.Load(
+            "<html><head><link rel=\"stylesheet\" href=\"kept.css\"></head><body><p class=\"kept\"></p>"
+            "</body></html>");
+        client.view->ExecuteScript((std::string("var p = document.querySelector('p');"
+                                                "for (var i = 0; i < 4000; ++i) p.setAttribute('title', '") +
+                                    letter +
+                                    "' + i);"
+                                    "console.log(getComputedStyle(p).width)")
+                                       .c_str());
+        client.DestroyView();
+        if (*letter > 'b') EXPECT_LT(client.allocator.blocks() - blocks, 40);
+        blocks = client.allocator.blocks();
+    }
+    EXPECT_EQ(client.log.Count("77px"), 3u);
+}
+
 // A listener that ends what is calling it.
 class Destroyer final : public qorvex::IViewListener {
   public:
