@@ -127,6 +127,7 @@ void InlineFlow::AddPiece(Item& item, Cursor& cursor, const Piece& piece) {
     line.ascent = std::max(line.ascent, piece.ascent);
     line.descent = std::max(line.descent, piece.descent);
     pieces_.push_back(piece);
+    pieces_.back().opened = cursor.opened;
     item.endPiece = static_cast<uint32_t>(pieces_.size());
     cursor.x = piece.x + piece.width;
     cursor.opened = 0;
@@ -190,7 +191,10 @@ void InlineFlow::AddInline(LayoutHandle& handle, Cursor& cursor, uint32_t depth)
     cursor.opened += edges.Left();
     Walk(handle, cursor, depth + 1);
     cursor.x += edges.Right();
-    if (first == pieces_.size()) cursor.opened += edges.Right();
+    if (first == pieces_.size())
+        cursor.opened += edges.Right();
+    else
+        pieces_.back().closed += edges.Right();
     items_[open].endPiece = static_cast<uint32_t>(pieces_.size());
 }
 

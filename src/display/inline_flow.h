@@ -58,6 +58,9 @@ class InlineFlow {
         uint32_t firstGap = 0;
         uint32_t endGap = 0;
         bool gapBehind = false;  // the space that ends the text
+        // Edges of the inline boxes that open in front of it and close behind it.
+        float opened = 0;
+        float closed = 0;
         // Where it shows on the line, when all has its place.
         float left = 0;
         float shown = 0;
@@ -82,10 +85,17 @@ class InlineFlow {
         float opened = 0;
         uint32_t text = 0;  // in levels_
     };
-    // A part of a line that keeps its place in itself: a run of a text, the space behind it, a box.
+    // A part of a line that stays whole: a run of a text, the space behind it, a box; with the edges around
+    // it.
     struct Unit {
         float x;
         float width;
+        float opened;
+        float closed;
+        // Edges keep their sides where they belong to one unit; else those that opened stand where reading
+        // began.
+        float Left() const { return x + (level & 1 && !(opened > 0 && closed > 0) ? closed : opened); }
+        float Width() const { return width - opened - closed; }
         uint32_t run;  // in TextInfo::runs; kNoPlace: none
         uint8_t level;
     };

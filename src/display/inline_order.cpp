@@ -73,7 +73,7 @@ void InlineFlow::AddUnits(const Piece& piece, bool endsLine, TempVector<Unit>& o
     const layout::TextInfo* info = TextOf(piece);
     const layout::TextLineInfo* line = info != nullptr ? &info->lines[piece.textLine] : nullptr;
     if (line == nullptr || line->runCount == 0 || line->ellipsis.font != css::kNoTypeface) {
-        out.push_back({piece.left, piece.shown, kNoPlace, LevelAt(item.text)});
+        out.push_back({piece.left, piece.shown, 0, 0, kNoPlace, LevelAt(item.text)});
         return;
     }
     const size_t start = out.size();
@@ -84,7 +84,8 @@ void InlineFlow::AddUnits(const Piece& piece, bool endsLine, TempVector<Unit>& o
     for (uint32_t i = line->firstRun; i < line->firstRun + line->runCount; ++i) {
         const layout::TextRun& run = info->runs[i];
         const auto gaps = static_cast<float>(gapsBefore(run.endCharacter) - gapsBefore(run.firstCharacter));
-        out.push_back({0, run.width + piece.gap * gaps, i, std::max(run.level, LevelAt(levels_.size()))});
+        out.push_back(
+            {0, run.width + piece.gap * gaps, 0, 0, i, std::max(run.level, LevelAt(levels_.size()))});
     }
     std::sort(out.begin() + start, out.end(), [&](const Unit& a, const Unit& b) {
         return info->runs[a.run].firstCharacter < info->runs[b.run].firstCharacter;
@@ -98,7 +99,7 @@ void InlineFlow::AddUnits(const Piece& piece, bool endsLine, TempVector<Unit>& o
     if (space <= 0) return;
     // At the end of a line it goes with the paragraph (rule L1).
     const size_t last = static_cast<const DisplayText&>(*item.handle->node().display).TextLength() - 1;
-    out.push_back({x, space, kNoPlace, LevelAt(endsLine ? levels_.size() : item.text + last)});
+    out.push_back({x, space, 0, 0, kNoPlace, LevelAt(endsLine ? levels_.size() : item.text + last)});
 }
 
 // Rule L2, with what stands between two parts going along: a stretch of a level is mirrored in its own
@@ -109,8 +110,14 @@ void InlineFlow::OrderLine(const Line& line, Piece* first, Piece* end, float hun
     TempVector<Unit> units;
     TempVector<size_t> ends;  // of the units of each piece
     for (const Piece* piece = first; piece != end; ++piece) {
+        const size_t opening = units.size();
         AddUnits(*piece, piece + 1 == end, units);
         ends.push_back(units.size());
+        units[opening].opened = piece->opened;
+        units[opening].x -= piece->opened;
+        units[opening].width += piece->opened;
+        units.back().closed = piece->closed;
+        units.back().width += piece->closed;
     }
     uint8_t highest = 0;
     for (const Unit& unit : units)
@@ -143,10 +150,10 @@ void InlineFlow::OrderLine(const Line& line, Piece* first, Piece* end, float hun
 }
 
 void InlineFlow::TakeUnits(Piece& piece, const Unit* first, const Unit* end) {
-    float left = first->x, right = first->x + first->width;
+    float left = first->Left(), right = left;
     for (const Unit* unit = first; unit != end; ++unit) {
-        left = std::min(left, unit->x);
-        right = std::max(right, unit->x + unit->width);
+        left = std::min(left, unit->Left());
+        right = std::max(right, unit->Left() + unit->Width());
     }
     piece.moved = left - piece.x;
     piece.left = left;
@@ -155,16 +162,16 @@ void InlineFlow::TakeUnits(Piece& piece, const Unit* first, const Unit* end) {
     // A text whose runs keep their distances moves as it was laid.
     const layout::TextInfo& info = *TextOf(piece);
     const layout::TextLineInfo& line = info.lines[piece.textLine];
-    piece.moved = first->x - info.runs[first->run].x;
+    piece.moved = first->Left() - info.runs[first->run].x;
     bool alike = piece.gap == 0;
     for (const Unit* unit = first; unit != end && unit->run != kNoPlace; ++unit)
-        alike = alike && layout::Near(unit->x - info.runs[unit->run].x, piece.moved);
+        alike = alike && layout::Near(unit->Left() - info.runs[unit->run].x, piece.moved);
     if (alike) return;
     piece.moved = 0;
     piece.firstPlace = static_cast<uint32_t>(runPlaces_.size());
     runPlaces_.resize(runPlaces_.size() + line.runCount);
     for (const Unit* unit = first; unit != end && unit->run != kNoPlace; ++unit)
-        runPlaces_[piece.firstPlace + (unit->run - line.firstRun)] = unit->x;
+        runPlaces_[piece.firstPlace + (unit->run - line.firstRun)] = unit->Left();
 }
 
 }  // namespace qorvex::dsp
