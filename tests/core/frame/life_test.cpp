@@ -136,6 +136,7 @@ TEST(Life, AViewThatGoesLeavesNoStringsBehind) {
         qorvex::ViewSettings settings;
         settings.Width = settings.Height = 8;
         client.view = client.system->CreateView(settings);
+        client.last_frame = 0;
         client.MakeRenderer();
         client.Load(
             "<html><head><link rel=\"stylesheet\" href=\"kept.css\"></head><body><p class=\"kept\"></p>"
