@@ -158,14 +158,42 @@ void ScalableFace::LoadDistances(uint32_t glyph, DistanceField& out) const {
                     out.values.data() + size_t(y) * bitmap.width);
 }
 
+void ScalableFace::LoadShape(uint32_t glyph) const {
+    if (!GetColorGlyph(glyph)) GetOutline(glyph);
+    if (sdf_ == SdfMode::Always) GetDistanceField(glyph);
+}
+
 void ScalableFace::PreloadGlyphs(const uint32_t* codePoints, size_t count) const {
     for (size_t i = 0; i < count; ++i) {
         uint32_t glyph = 0;
         GetGlyphIndices(codePoints + i, 1, &glyph);
-        if (glyph == 0) continue;
-        if (!GetColorGlyph(glyph)) GetOutline(glyph);
-        if (sdf_ == SdfMode::Always) GetDistanceField(glyph);
+        if (glyph != 0) LoadShape(glyph);
     }
+}
+
+void ScalableFace::PreloadText(const char* utf8, size_t length) const {
+    class Loader final : public IShapeSink {
+      public:
+        explicit Loader(const ScalableFace& face) : face_(face) {}
+        void OnGlyphs(const ShapedGlyph* glyphs, size_t count) override {
+            for (size_t i = 0; i < count; ++i)
+                if (glyphs[i].index != 0) face_.LoadShape(glyphs[i].index);
+        }
+
+      private:
+        const ScalableFace& face_;
+    };
+    Vector<uint32_t> codePoints;
+    DecodeUtf8(utf8, length, &codePoints);
+    ShapeRequest request;
+    request.codePoints = codePoints.data(), request.count = codePoints.size();
+    // Letters join as they are read: with one that runs from right to left the whole text may.
+    hb_unicode_funcs_t* unicode = hb_unicode_funcs_get_default();
+    for (const uint32_t code : codePoints)
+        if (hb_script_get_horizontal_direction(hb_unicode_script(unicode, code)) == HB_DIRECTION_RTL)
+            request.direction = TextDirection::RightToLeft;
+    Loader loader(*this);
+    Shape(request, loader);
 }
 
 }  // namespace fresco

@@ -36,6 +36,7 @@ class ScalableFace final : public FontFace {
     bool GetAdvances(const uint32_t* glyphs, size_t count, float size, float* advances) const override;
     bool Shape(const ShapeRequest& request, IShapeSink& sink) const override;
     void PreloadGlyphs(const uint32_t* codePoints, size_t count) const override;
+    void PreloadText(const char* utf8, size_t length) const override;
 
     const GlyphOutline& GetOutline(uint32_t glyph) const override;
     const ColorGlyph* GetColorGlyph(uint32_t glyph) const override;
@@ -54,6 +55,7 @@ class ScalableFace final : public FontFace {
     uint32_t StyleOfInstance(uint32_t instance) const;
     uint32_t Advance(uint32_t glyph) const;
     bool LoadGraph(uint32_t glyph, ColorGlyph& out) const;
+    void LoadShape(uint32_t glyph) const;
     void LoadPicture(uint32_t glyph, ColorGlyph& out) const;
     void LoadDistances(uint32_t glyph, DistanceField& out) const;
 

@@ -103,6 +103,10 @@ inline constexpr float kLargestFitSize = 8192;
 
 /// Characters of one font whose shapes are made ahead; more than a page of Chinese shows at once.
 inline constexpr size_t kPreloadedCharacters = 4096;
+/// Of texts that have to be shaped, and bytes of the longest of them: a longer one is a paragraph, whose
+/// letters come in other texts too.
+inline constexpr size_t kPreloadedTexts = 4096;
+inline constexpr size_t kPreloadedTextBytes = 1024;
 
 /// Bytes of a glyph table and of all pages of a bitmap font that a client gives.
 inline constexpr size_t kBitmapFontBytes = 256 * 1024 * 1024;

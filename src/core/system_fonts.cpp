@@ -17,7 +17,7 @@ void SystemImpl::ConfigureFontService(void* argument) {
 
 layout::FontDescription SystemImpl::MakeFontDescription(const FontDescription& description) {
     layout::FontDescription made;
-    if (description.FamilyName) made.family = strings_.Intern(description.FamilyName);
+    if (description.FamilyName) made.family = font_names_.Intern(description.FamilyName);
     made.style = description.Style;
     made.weight = description.Weight;
     return made;
@@ -82,7 +82,7 @@ void SystemImpl::AddBitmapFont(const UserFontDescription& description, layout::B
     }
     if (!fonts_) return;
     layout::FontDescription made;
-    made.family = strings_.Intern(source->family.view());
+    made.family = font_names_.Intern(source->family.view());
     made.style = description.Italic ? layout::kItalicStyle : layout::kNormalStyle;
     constexpr uint8_t kBoldWeight = 7;
     made.weight = description.Weight ? description.Weight

@@ -52,6 +52,7 @@ SystemImpl::SystemImpl(LibraryImpl& library, const SystemSettings& settings, uin
     for (uint32_t i = 0; i < settings.ResourceMappingCount; ++i)
         resources_->GetMappings().Add(settings.ResourceMappings[i]);
     CreateFontManager(settings);
+    strings_.KeepSoFar();
     for (TaskChannels channel : kSystemChannels) {
         LogChannel("Opening task channel ", channel, family_.family);
         family_.system->OpenChannel(channel, family_.family);
@@ -82,13 +83,20 @@ void SystemImpl::CreateFontManager(const SystemSettings& settings) {
     layout::FontManagerSettings fonts{*service,
                                       TaskFamilyHandle{library_.TakeFamily(), family_.system},
                                       font_loader_,
-                                      strings_,
+                                      font_names_,
                                       {settings.DefaultFontFamily, library_.GetDefaultFontFamily()},
                                       settings.EmbeddedFallbackFont};
     fonts_ = MakeUnique<layout::FontManager>(fonts);
 }
 
+unsigned SystemImpl::GetId() const {
+    const MainThreadCall call("System");
+    return call ? id_ : 0;
+}
+
 void SystemImpl::SetId(unsigned id) {
+    const MainThreadCall call("System");
+    if (!call) return;
     id_ = id < kSystemIds ? id : 0;
 }
 
@@ -121,6 +129,12 @@ View* SystemImpl::CreateView(const ViewSettings& settings) {
 
 void SystemImpl::OnViewDestroyed(View* view) {
     views_.erase_if([&](ViewImpl* other) { return other == view; });
+    ReleaseStrings();
+}
+
+// Without views only the cached sheets hold atoms, which have kept theirs, and those that are being parsed.
+void SystemImpl::ReleaseStrings() {
+    if (views_.empty() && !stylesheet_cache_.IsLoading()) strings_.ReleaseOthers();
 }
 
 void SystemImpl::OnWorkersStopped() {

@@ -27,7 +27,7 @@ class SystemImpl final : public System, public IViewLifetimeTracker {
     SystemImpl(LibraryImpl& library, const SystemSettings& settings, uint32_t family);
     ~SystemImpl() override;
 
-    unsigned GetId() const override { return id_; }
+    unsigned GetId() const override;
     void SetId(unsigned id) override;
     View* CreateView(const ViewSettings& settings) override;
     SystemCacheStats* CreateCacheStats() override;
@@ -66,6 +66,7 @@ class SystemImpl final : public System, public IViewLifetimeTracker {
     void CheckParts(const SystemSettings& settings) const;
     void StartInspector(const SystemSettings& settings);
     void CreateFontManager(const SystemSettings& settings);
+    void ReleaseStrings();
     void AddBitmapFont(const UserFontDescription& description, layout::BitmapFontSourcePtr source);
     layout::FontDescription MakeFontDescription(const FontDescription& description);
 
@@ -73,6 +74,8 @@ class SystemImpl final : public System, public IViewLifetimeTracker {
     TaskFamilyHandle family_;
     unsigned id_ = 0;
     StringPool strings_;
+    // Of font families, which outlive the views that name them.
+    StringPool font_names_;
     css::DefaultRulesPtr default_rules_;
     RefPtr<ResourceContext> resources_;
     HTMLCache html_cache_;

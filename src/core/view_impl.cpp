@@ -117,6 +117,16 @@ void ViewImpl::Resize(unsigned width, unsigned height) {
     MarkWholeViewDirty();
 }
 
+unsigned ViewImpl::GetWidth() const {
+    const MainThreadCall call("View");
+    return call ? width_ : 0;
+}
+
+unsigned ViewImpl::GetHeight() const {
+    const MainThreadCall call("View");
+    return call ? height_ : 0;
+}
+
 void ViewImpl::SetVirtualResolution(unsigned width, unsigned height) {
     const APICall call(family_, api_depth_);
     if (!call) return;
@@ -147,6 +157,16 @@ void ViewImpl::EnableRendering(bool enabled) {
     rendering_enabled_ = enabled;
 }
 
+void ViewImpl::ContinuousRepaint(bool enabled) {
+    const APICall call(family_, api_depth_);
+    if (call) continuous_repaint_ = enabled;
+}
+
+void ViewImpl::SetPaintOption(bool enabled) {
+    const APICall call(family_, api_depth_);
+    if (call) paint_option_ = enabled;
+}
+
 void ViewImpl::ShowPaintRectangles(bool enabled) {
     const APICall call(family_, api_depth_);
     if (!call) return;
@@ -160,6 +180,16 @@ void ViewImpl::EnableGPUMetadataEmission(bool enabled) {
     if (enabled == gpu_metadata_) return;
     LogWarning(enabled ? "Enabling GPU metadata emission!" : "Disabling GPU metadata emission!");
     gpu_metadata_ = enabled;
+}
+
+float ViewImpl::GetGestureScrollThreshold() const {
+    const MainThreadCall call("View");
+    return call ? gesture_scroll_threshold_ : 0;
+}
+
+void ViewImpl::SetGestureScrollThreshold(float pixels) {
+    const APICall call(family_, api_depth_);
+    if (call) gesture_scroll_threshold_ = pixels;
 }
 
 void ViewImpl::SetUserAgent(const char* user_agent) {

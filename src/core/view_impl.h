@@ -52,13 +52,13 @@ class ViewImpl final : public View,
     unsigned GetTaskFamilyId() const override { return family_.family; }
     void Resize(unsigned width, unsigned height) override;
     void SetVirtualResolution(unsigned width, unsigned height) override;
-    unsigned GetWidth() const override { return width_; }
-    unsigned GetHeight() const override { return height_; }
+    unsigned GetWidth() const override;
+    unsigned GetHeight() const override;
     void ClearListeners() override;
     void EnableRendering(bool enabled) override;
-    void ContinuousRepaint(bool enabled) override { continuous_repaint_ = enabled; }
+    void ContinuousRepaint(bool enabled) override;
     void ShowPaintRectangles(bool enabled) override;
-    void SetPaintOption(bool enabled) override { paint_option_ = enabled; }
+    void SetPaintOption(bool enabled) override;
     void EnableGPUMetadataEmission(bool enabled) override;
     DebugDump* DumpDOM(unsigned flags) override;
     DebugDump* DumpStackingContexts() override;
@@ -69,8 +69,8 @@ class ViewImpl final : public View,
     bool IMESetComposition(const char* text) override;
     bool IMEConfirmComposition(const char* text) override;
     bool IMECancelComposition() override;
-    float GetGestureScrollThreshold() const override { return gesture_scroll_threshold_; }
-    void SetGestureScrollThreshold(float pixels) override { gesture_scroll_threshold_ = pixels; }
+    float GetGestureScrollThreshold() const override;
+    void SetGestureScrollThreshold(float pixels) override;
     void SetUserAgent(const char* user_agent) override;
     ImagesList* GetImagesList(unsigned flags) override;
     void BeginCaptureFrames(FrameCaptureCallback callback, void* user_data) override;

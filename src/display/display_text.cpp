@@ -2,6 +2,7 @@
 
 #include <qorvex/text_services.h>
 
+#include <algorithm>
 #include <cmath>
 
 #include "core/logging/log.h"
@@ -9,6 +10,7 @@
 #include "layout/layout_store.h"
 #include "layout/text/text_alignment.h"
 #include "layout/text/text_layout.h"
+#include "qsl/city_hash.h"
 
 namespace qorvex::dsp {
 
@@ -63,7 +65,8 @@ layout::TextStyle DisplayText::MakeStyle(const Parameters& parameters) {
 bool DisplayText::Holds(const Parameters& wanted) const {
     if (!lines_ || !lines_->valid) return false;
     const Parameters& laid = lines_->parameters;
-    if (wanted.inFlow != laid.inFlow || wanted.complexText != laid.complexText || wanted.base != laid.base)
+    if (wanted.inFlow != laid.inFlow || wanted.complexText != laid.complexText || wanted.base != laid.base ||
+        wanted.levels != laid.levels)
         return false;
     if (!(wanted.style == laid.style) && !SameTextStyle(MakeStyle(wanted), MakeStyle(laid))) return false;
     if (!Near(wanted.firstLineOffset, laid.firstLineOffset)) return false;
@@ -79,7 +82,8 @@ bool DisplayText::Holds(const Parameters& wanted) const {
     return !followsWidth && !lines_->info.wrapped && !(wanted.width < lines_->info.width);
 }
 
-bool DisplayText::EnsureLayout(const layout::TextServices& services, const Parameters& wanted) {
+bool DisplayText::EnsureLayout(const layout::TextServices& services, const Parameters& wanted,
+                               const uint8_t* levels) {
     if (services.fonts == nullptr) return false;
     if (Holds(wanted)) return true;
     if (!lines_) lines_ = MakeUnique<Lines, MemoryTag::LayoutData>();
@@ -87,7 +91,7 @@ bool DisplayText::EnsureLayout(const layout::TextServices& services, const Param
     const layout::TextStyle style = MakeStyle(wanted);
     lines_->valid =
         LayoutText({text_.view(), style, wanted.width, wanted.height, *services.fonts, iterator_.get(),
-                    services.i18n, wanted.firstLineOffset, true, wanted.inFlow, wanted.base},
+                    services.i18n, wanted.firstLineOffset, true, wanted.inFlow, wanted.base, levels},
                    info);
     if (!lines_->valid) {
         LogDebug("Measuring text without typeface");
@@ -112,7 +116,7 @@ layout::Size DisplayText::MeasureFor(layout::LayoutHandle& handle, float availab
                                      float availableHeight) {
     if (lines_) {
         lines_->placed.clear();
-        lines_->justified.reset();
+        lines_->arranged.reset();
     }
     const auto& style = handle.node().style.text;
     if (!style) return {};
@@ -154,22 +158,34 @@ const layout::TextInfo* DisplayText::LayoutInline(layout::LayoutHandle& handle,
     const auto& style = handle.node().style.text;
     if (!style) return nullptr;
     const layout::TextServices& services = handle.store().text;
-    const bool done =
-        EnsureLayout(services, {style, style->computedFontSize * request.scale, request.width, NAN,
-                                request.firstLineOffset, true, services.complexText, request.base});
+    const std::span<const uint8_t> levels = request.levels;
+    const uint64_t hash =
+        levels.empty() ? 0 : qsl::CityHash64({reinterpret_cast<const char*>(levels.data()), levels.size()});
+    const bool done = EnsureLayout(services,
+                                   {style, style->computedFontSize * request.scale, request.width, NAN,
+                                    request.firstLineOffset, true, services.complexText, request.base, hash},
+                                   levels.empty() ? nullptr : levels.data());
     return done ? &lines_->info : nullptr;
 }
 
-void DisplayText::PlaceLines(const layout::LinePlacement* lines, size_t count) {
+void DisplayText::PlaceLines(const layout::LinePlacement* lines, size_t count, const float* runs) {
     if (!lines_) return;
     lines_->placed.assign(lines, lines + count);
     lines_->unpublished = true;
-    UniquePtr<layout::TextInfo, MemoryTag::LayoutData>& justified = lines_->justified;
-    justified.reset();
+    lines_->arranged.reset();
+    const bool spreads = std::any_of(lines, lines + count, [](const auto& line) { return line.gap > 0; });
+    if (!spreads && runs == nullptr) return;
+    lines_->arranged = MakeUnique<layout::TextInfo, MemoryTag::LayoutData>(lines_->info);
+    layout::TextInfo& arranged = *lines_->arranged;
     for (size_t i = 0; i < count; ++i) {
-        if (lines[i].gap <= 0) continue;
-        if (!justified) justified = MakeUnique<layout::TextInfo, MemoryTag::LayoutData>(lines_->info);
-        SpreadLine(*justified, justified->lines[i], lines[i]);
+        layout::TextLineInfo& line = arranged.lines[i];
+        if (lines[i].gap > 0) SpreadLine(arranged, line, lines[i]);
+        if (runs == nullptr || line.runCount == 0 || std::isnan(runs[line.firstRun])) continue;
+        line.extent = 0;
+        for (uint32_t run = line.firstRun; run < line.firstRun + line.runCount; ++run) {
+            arranged.runs[run].x = runs[run];
+            line.extent = std::max(line.extent, runs[run] + arranged.runs[run].width);
+        }
     }
 }
 

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <memory>
+#include <span>
 #include <string_view>
 
 #include "core/memory/containers.h"
@@ -28,6 +29,7 @@ struct InlineTextRequest {
     float firstLineOffset = 0;
     float scale = 1;
     layout::BaseDirection base = layout::BaseDirection::OfText;
+    std::span<const uint8_t> levels;  // of each byte of the text; empty: nothing in the flow runs backward
 };
 
 class DisplayText final : public IDisplayElement {
@@ -41,6 +43,8 @@ class DisplayText final : public IDisplayElement {
     std::string_view Text() const { return text_.view(); }
     // Of the last layout; null before the first one.
     const layout::TextInfo* Info() const { return lines_ ? &lines_->info : nullptr; }
+    // The same as it is painted, after PlaceLines.
+    const layout::TextInfo* ShownInfo() const { return lines_ ? &lines_->Shown() : nullptr; }
 
     void Paint(PaintContext& context, bool dirty, const layout::LayoutNode& node,
                fresco::CommandBuffer& buffer) override;
@@ -53,8 +57,9 @@ class DisplayText final : public IDisplayElement {
 
     // For a paragraph: null without a loaded typeface. Lines stand at their left edges until they are placed.
     const layout::TextInfo* LayoutInline(layout::LayoutHandle& handle, const InlineTextRequest& request);
-    // Where each line of that layout stands.
-    void PlaceLines(const layout::LinePlacement* lines, size_t count);
+    // Where each line of that layout stands. `runs` (may be null): where in their lines its runs do, NaN for
+    // those that stand where they were laid.
+    void PlaceLines(const layout::LinePlacement* lines, size_t count, const float* runs);
 
   private:
     // What lines depend on besides the text. The group stands for all of its text values.
@@ -67,6 +72,7 @@ class DisplayText final : public IDisplayElement {
         bool inFlow = false;  // what belongs to a paragraph is left to it
         bool complexText = true;
         layout::BaseDirection base = layout::BaseDirection::OfText;
+        uint64_t levels = 0;  // hash of those that a flow brings
     };
     // One question of the layout and its answer. The available size is NaN where it is not known.
     struct Answer {
@@ -86,12 +92,12 @@ class DisplayText final : public IDisplayElement {
         SmallVector<Answer, 2, MemoryTag::LayoutData> answers;
         // In an inline flow; empty elsewhere.
         Vector<layout::LinePlacement, MemoryTag::LayoutData> placed;
-        // info with wider gaps, where the flow justifies some of these lines.
-        UniquePtr<layout::TextInfo, MemoryTag::LayoutData> justified;
+        // info with wider gaps or runs in other places, where the flow justifies lines or orders their parts.
+        UniquePtr<layout::TextInfo, MemoryTag::LayoutData> arranged;
         qsl::RefPtr<layout::TextFontStyle> publishedStyle;
 
         // The lines as they are painted.
-        const layout::TextInfo& Shown() const { return justified ? *justified : info; }
+        const layout::TextInfo& Shown() const { return arranged ? *arranged : info; }
         const layout::LinePlacement* Placements() const { return placed.empty() ? nullptr : placed.data(); }
     };
     struct DestroyIterator {
@@ -101,7 +107,8 @@ class DisplayText final : public IDisplayElement {
     static layout::TextStyle MakeStyle(const Parameters& parameters);
     // Lays out when the style, the text or the available box differ from those of the stored lines. False
     // without a loaded typeface.
-    bool EnsureLayout(const layout::TextServices& services, const Parameters& wanted);
+    bool EnsureLayout(const layout::TextServices& services, const Parameters& wanted,
+                      const uint8_t* levels = nullptr);
     [[nodiscard]] bool Holds(const Parameters& wanted) const;
     layout::Size MeasureFor(layout::LayoutHandle& handle, float availableWidth, float availableHeight);
     void Remember(const Answer& answer);

@@ -2,8 +2,6 @@
 
 #include <yoga/Yoga.h>
 
-#include <qorvex/text_services.h>
-
 #include <algorithm>
 #include <cmath>
 
@@ -58,58 +56,30 @@ struct OuterEdges {
     float Right() const { return margin.right + border.right + padding.right; }
 };
 
-// Lead bytes below this one begin no letter that runs from right to left.
-constexpr uint8_t kFirstBackwardLead = 0xD6;
-
-// Of all text below. OfText where no letter can run from right to left, so that nothing has to be ordered.
-BaseDirection BaseOf(const LayoutHandle& paragraph) {
-    const layout::TextServices& services = paragraph.store().text;
-    if (services.i18n == nullptr || !services.complexText) return BaseDirection::OfText;
-    const TempMark mark;
-    TempVector<const LayoutHandle*> stack;
-    TempVector<char> text;
-    bool backward = false;
-    stack.push_back(&paragraph);
-    while (!stack.empty()) {
-        const LayoutNode& node = stack.back()->node();
-        stack.pop_back();
-        if (IsText(node)) {
-            const std::string_view part = static_cast<const DisplayText&>(*node.display).Text();
-            text.append(part.begin(), part.end());
-            backward = backward || std::any_of(part.begin(), part.end(), [](char byte) {
-                           return static_cast<uint8_t>(byte) >= kFirstBackwardLead;
-                       });
-        }
-        for (auto i = static_cast<uint32_t>(node.children.size()); i-- > 0;)
-            stack.push_back(node.children[i].get());
-    }
-    if (!backward) return BaseDirection::OfText;
-    const TextDirection direction =
-        services.i18n->ComputeBaseDirection(text.data(), static_cast<unsigned>(text.size()));
-    return direction == TextDirection::RightToLeft ? BaseDirection::RightToLeft : BaseDirection::LeftToRight;
-}
-
-// Of a line whose runs all go one way, else OfText.
-BaseDirection DirectionOf(const layout::TextInfo& info, const layout::TextLineInfo& line) {
-    bool forward = false, backward = false;
-    for (uint32_t i = line.firstRun; i < line.firstRun + line.runCount; ++i)
-        (info.runs[i].rightToLeft ? backward : forward) = true;
-    if (forward == backward) return BaseDirection::OfText;
-    return forward ? BaseDirection::LeftToRight : BaseDirection::RightToLeft;
-}
-
 }  // namespace
+
+InlineContent ContentOf(const LayoutNode& node) {
+    if (node.style.layout->display == css::CSSDisplay::None) return InlineContent::None;
+    const bool hasBox = node.flex != nullptr;  // none beyond the depth limit
+    if (node.flags.isAbsolute || node.flags.isFixed)
+        return hasBox ? InlineContent::OutOfFlow : InlineContent::None;
+    if (IsText(node)) return InlineContent::Text;
+    if (!hasBox) return InlineContent::None;
+    return IsInline(node) ? InlineContent::Inline : InlineContent::Box;
+}
 
 void InlineFlow::Clear() {
     items_.clear();
     pieces_.clear();
     lines_.clear();
     outOfFlow_.clear();
+    levels_.clear();
+    runPlaces_.clear();
 }
 
 Size InlineFlow::Flow(LayoutHandle& paragraph, float width, float scale) {
     Clear();
-    base_ = BaseOf(paragraph);
+    FindDirections(paragraph);
     Cursor cursor{width, scale, base_};
     lines_.push_back({});
     Walk(paragraph, cursor, 0);
@@ -126,18 +96,22 @@ Size InlineFlow::Flow(LayoutHandle& paragraph, float width, float scale) {
 void InlineFlow::Walk(LayoutHandle& parent, Cursor& cursor, uint32_t depth) {
     if (depth >= limits::kMaxLayoutDepth) return;
     for (const layout::HandlePtr& child : parent.node().children) {
-        const LayoutNode& node = child->node();
-        if (node.style.layout->display == css::CSSDisplay::None) continue;
-        if (node.flags.isAbsolute || node.flags.isFixed) {
-            if (node.flex != nullptr) outOfFlow_.push_back(child.get());
-        } else if (IsText(node))
-            AddText(*child, cursor);
-        else if (node.flex == nullptr)
-            continue;  // beyond the depth limit
-        else if (IsInline(node))
-            AddInline(*child, cursor, depth);
-        else
-            AddBox(*child, cursor);
+        switch (ContentOf(child->node())) {
+            case InlineContent::None:
+                break;
+            case InlineContent::OutOfFlow:
+                outOfFlow_.push_back(child.get());
+                break;
+            case InlineContent::Text:
+                AddText(*child, cursor);
+                break;
+            case InlineContent::Inline:
+                AddInline(*child, cursor, depth);
+                break;
+            case InlineContent::Box:
+                AddBox(*child, cursor);
+                break;
+        }
     }
 }
 
@@ -153,6 +127,7 @@ void InlineFlow::AddPiece(Item& item, Cursor& cursor, const Piece& piece) {
     line.ascent = std::max(line.ascent, piece.ascent);
     line.descent = std::max(line.descent, piece.descent);
     pieces_.push_back(piece);
+    pieces_.back().opened = cursor.opened;
     item.endPiece = static_cast<uint32_t>(pieces_.size());
     cursor.x = piece.x + piece.width;
     cursor.opened = 0;
@@ -161,9 +136,12 @@ void InlineFlow::AddPiece(Item& item, Cursor& cursor, const Piece& piece) {
 void InlineFlow::AddText(LayoutHandle& handle, Cursor& cursor) {
     auto& text = static_cast<DisplayText&>(*handle.node().display);
     const auto first = static_cast<uint32_t>(pieces_.size());
-    items_.push_back({&handle, Kind::Text, first, first});
+    items_.push_back({&handle, Kind::Text, first, first, cursor.text});
+    std::span<const uint8_t> levels;
+    if (!levels_.empty()) levels = {levels_.data() + cursor.text, text.TextLength()};
+    cursor.text += text.TextLength();
     const auto lay = [&] {
-        return text.LayoutInline(handle, {cursor.width, cursor.x, cursor.scale, cursor.base});
+        return text.LayoutInline(handle, {cursor.width, cursor.x, cursor.scale, cursor.base, levels});
     };
     // The first word did not fit behind what is there: the text begins on the next line.
     const auto skips = [&](const layout::TextInfo* info) {
@@ -186,7 +164,6 @@ void InlineFlow::AddText(LayoutHandle& handle, Cursor& cursor) {
         AddPiece(items_.back(), cursor,
                  {static_cast<uint32_t>(lines_.size() - 1), i, static_cast<uint32_t>(items_.size() - 1),
                   start, std::max(line.extent - start, 0.0f), line.baseline, line.height - line.baseline});
-        pieces_.back().direction = DirectionOf(*info, line);
     }
 }
 
@@ -198,7 +175,8 @@ void InlineFlow::AddBox(LayoutHandle& handle, Cursor& cursor) {
     const float height = Finite(YGNodeLayoutGetHeight(node.flex)) + edges.margin.top + edges.margin.bottom;
     if (cursor.x > 0 && cursor.x + width > cursor.width + layout::kLengthTolerance) NewLine(cursor, true);
     const auto first = static_cast<uint32_t>(pieces_.size());
-    items_.push_back({&handle, Kind::Box, first, first});
+    items_.push_back({&handle, Kind::Box, first, first, cursor.text});
+    cursor.text += static_cast<uint32_t>(kBoxSign.size());
     AddPiece(items_.back(), cursor,
              {static_cast<uint32_t>(lines_.size() - 1), 0, static_cast<uint32_t>(items_.size() - 1), cursor.x,
               width, height, 0});
@@ -213,7 +191,10 @@ void InlineFlow::AddInline(LayoutHandle& handle, Cursor& cursor, uint32_t depth)
     cursor.opened += edges.Left();
     Walk(handle, cursor, depth + 1);
     cursor.x += edges.Right();
-    if (first == pieces_.size()) cursor.opened += edges.Right();
+    if (first == pieces_.size())
+        cursor.opened += edges.Right();
+    else
+        pieces_.back().closed += edges.Right();
     items_[open].endPiece = static_cast<uint32_t>(pieces_.size());
 }
 
@@ -225,6 +206,7 @@ void InlineFlow::AlignLines(css::TextAlignType align, float width) {
                                                             : 0.0f;
     for (Line& line : lines_)
         line.shift = std::max(width - line.width, 0.0f) * part;
+    runPlaces_.clear();
     for (uint32_t first = 0; first < pieces_.size();) {
         const uint32_t line = pieces_[first].line;
         uint32_t end = first;
@@ -232,8 +214,13 @@ void InlineFlow::AlignLines(css::TextAlignType align, float width) {
             pieces_[end].moved = pieces_[end].gap = 0;
         if (align == css::TextAlignType::Justify)
             JustifyLine(lines_[line], &pieces_[first], pieces_.data() + end, width);
-        if (base_ != BaseDirection::OfText)
-            OrderLine(lines_[line], &pieces_[first], pieces_.data() + end, 1 - part);
+        for (uint32_t i = first; i < end; ++i) {
+            Piece& piece = pieces_[i];
+            piece.left = piece.x + piece.moved;
+            piece.shown = piece.width + piece.Spread();
+            piece.firstPlace = kNoPlace;
+        }
+        if (!levels_.empty()) OrderLine(lines_[line], &pieces_[first], pieces_.data() + end, 1 - part);
         first = end;
     }
 }
@@ -291,40 +278,14 @@ void InlineFlow::JustifyLine(const Line& line, Piece* first, Piece* end, float w
     }
 }
 
-// From the order of reading to that on the line (Unicode Annex 9, rule L2, for whole pieces): what goes
-// against the paragraph turns around within its own stretch.
-void InlineFlow::OrderLine(const Line& line, Piece* first, Piece* end, float hung) const {
-    const auto mirror = [](Piece* from, Piece* to, float left, float right) {
-        for (Piece* piece = from; piece != to; ++piece)
-            piece->moved =
-                left + right - (piece->x + piece->moved + piece->width + piece->Spread()) - piece->x;
-    };
-    const bool backward = base_ == BaseDirection::RightToLeft;
-    const float right = std::max(end[-1].x + end[-1].moved + end[-1].width + end[-1].Spread(), line.width);
-    if (backward) mirror(first, end, 0, right - SpaceBehind(end[-1]) * hung);
-    const BaseDirection against = backward ? BaseDirection::LeftToRight : BaseDirection::RightToLeft;
-    for (Piece* from = first; from != end;) {
-        Piece* to = from;
-        while (to != end && to->direction == against)
-            ++to;
-        if (to - from > 1) {
-            const Piece& leftmost = backward ? to[-1] : *from;
-            const Piece& rightmost = backward ? *from : to[-1];
-            mirror(from, to, leftmost.x + leftmost.moved,
-                   rightmost.x + rightmost.moved + rightmost.width + rightmost.Spread());
-        }
-        from = to == from ? from + 1 : to;
-    }
-}
-
 Rect InlineFlow::Around(uint32_t firstPiece, uint32_t endPiece, Point origin) const {
     if (firstPiece == endPiece) return {origin.x, origin.y, 0, 0, 0};
     float left = 0, top = 0, right = 0, bottom = 0;
     for (uint32_t i = firstPiece; i < endPiece; ++i) {
         const Piece& piece = pieces_[i];
         const Line& line = lines_[piece.line];
-        const float x = line.shift + piece.x + piece.moved;
-        const float width = piece.width + piece.Spread();
+        const float x = line.shift + piece.left;
+        const float width = piece.shown;
         const float y = line.top + line.ascent - piece.ascent;
         const bool start = i == firstPiece;
         left = start ? x : std::min(left, x);
@@ -343,7 +304,9 @@ void InlineFlow::PlaceText(LayoutPass& pass, const Item& item, Point origin) {
     auto& text = static_cast<DisplayText&>(*node.display);
     const TempMark mark;
     TempVector<layout::LinePlacement> places;
-    places.resize(text.Info() ? text.Info()->lines.size() : 0, layout::LinePlacement{});
+    const layout::TextInfo* info = text.Info();
+    places.resize(info ? info->lines.size() : 0, layout::LinePlacement{});
+    TempVector<float> runs;
     for (uint32_t i = item.firstPiece; i < item.endPiece; ++i) {
         const Piece& piece = pieces_[i];
         const Line& line = lines_[piece.line];
@@ -352,8 +315,12 @@ void InlineFlow::PlaceText(LayoutPass& pass, const Item& item, Point origin) {
                                       origin.y + line.top + line.ascent - node.box.y, piece.gap,
                                       piece.firstGap, piece.endGap};
         }
+        if (piece.firstPlace == kNoPlace) continue;
+        const layout::TextLineInfo& laid = info->lines[piece.textLine];
+        if (runs.empty()) runs.resize(info->runs.size(), NAN);
+        std::copy_n(&runPlaces_[piece.firstPlace], laid.runCount, &runs[laid.firstRun]);
     }
-    text.PlaceLines(places.data(), places.size());
+    text.PlaceLines(places.data(), places.size(), runs.empty() ? nullptr : runs.data());
     NoteBoxChange(*item.handle, old, pass);
 }
 

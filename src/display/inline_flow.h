@@ -9,10 +9,14 @@
 // between words of lines that went on for want of room, whichever texts these gaps belong to; the boxes
 // behind them move along.
 //
-// A paragraph whose first letter runs from right to left has its lines ordered from the right. A piece moves
-// as a whole: where one text mixes directions, its parts do not change places with those of the next text.
+// Directions are those of the whole paragraph, in which a box stands for one neutral sign. A paragraph whose
+// first letter runs from right to left has its lines ordered from the right; on each line the parts of all
+// its texts change places together, whichever elements they belong to.
 #pragma once
 
+#include <string_view>
+
+#include "core/memory/temp_vector.h"
 #include "css/values/length_context.h"
 #include "layout/layout_handle.h"
 #include "layout/perform_layout.h"
@@ -30,12 +34,14 @@ class InlineFlow {
 
   private:
     enum class Kind : uint8_t { Text, Box, Inline };
+    static constexpr uint32_t kNoPlace = 0xFFFFFFFF;
     // In document order; an inline box stands before its content.
     struct Item {
         layout::LayoutHandle* handle;
         Kind kind;
         uint32_t firstPiece = 0;
         uint32_t endPiece = 0;
+        uint32_t text = 0;  // where its text, or the sign for it, stands in levels_
     };
     // What an item shows on one line.
     struct Piece {
@@ -51,8 +57,14 @@ class InlineFlow {
         float gap = 0;
         uint32_t firstGap = 0;
         uint32_t endGap = 0;
-        bool gapBehind = false;                                           // the space that ends the text
-        layout::BaseDirection direction = layout::BaseDirection::OfText;  // OfText: that of the paragraph
+        bool gapBehind = false;  // the space that ends the text
+        // Edges of the inline boxes that open in front of it and close behind it.
+        float opened = 0;
+        float closed = 0;
+        // Where it shows on the line, when all has its place.
+        float left = 0;
+        float shown = 0;
+        uint32_t firstPlace = kNoPlace;  // in runPlaces_, of its runs; kNoPlace: they moved with it
         float Spread() const { return gap * static_cast<float>(endGap - firstGap); }
     };
     struct Line {
@@ -71,8 +83,24 @@ class InlineFlow {
         // Of inline boxes that were opened behind the last piece: they go to the next line with their
         // content.
         float opened = 0;
+        uint32_t text = 0;  // in levels_
+    };
+    // A part of a line that stays whole: a run of a text, the space behind it, a box; with the edges around
+    // it.
+    struct Unit {
+        float x;
+        float width;
+        float opened;
+        float closed;
+        // Edges keep their sides where they belong to one unit; else those that opened stand where reading
+        // began.
+        float Left() const { return x + (level & 1 && !(opened > 0 && closed > 0) ? closed : opened); }
+        float Width() const { return width - opened - closed; }
+        uint32_t run;  // in TextInfo::runs; kNoPlace: none
+        uint8_t level;
     };
 
+    void FindDirections(const layout::LayoutHandle& paragraph);
     void Walk(layout::LayoutHandle& parent, Cursor& cursor, uint32_t depth);
     void AddText(layout::LayoutHandle& handle, Cursor& cursor);
     void AddBox(layout::LayoutHandle& handle, Cursor& cursor);
@@ -82,7 +110,10 @@ class InlineFlow {
 
     void AlignLines(css::TextAlignType align, float width);
     void JustifyLine(const Line& line, Piece* first, Piece* end, float width);
-    void OrderLine(const Line& line, Piece* first, Piece* end, float hung) const;
+    void OrderLine(const Line& line, Piece* first, Piece* end, float hung);
+    void AddUnits(const Piece& piece, bool endsLine, TempVector<Unit>& out) const;
+    void TakeUnits(Piece& piece, const Unit* first, const Unit* end);
+    uint8_t LevelAt(size_t byte) const;
     void FindGaps(Piece& piece, bool startsLine, bool endsLine) const;
     const layout::TextInfo* TextOf(const Piece& piece) const;
     float SpaceBehind(const Piece& piece) const;
@@ -98,6 +129,16 @@ class InlineFlow {
     List<Line> lines_;
     List<layout::LayoutHandle*> outOfFlow_;
     layout::BaseDirection base_ = layout::BaseDirection::OfText;
+    // Of each byte of the paragraph's text; empty where all of it runs from left to right.
+    List<uint8_t> levels_;
+    List<float> runPlaces_;
 };
+
+// U+FFFC, which a box is to the order of directions.
+inline constexpr std::string_view kBoxSign = "\xEF\xBF\xBC";
+
+// What a node below a paragraph is to its lines.
+enum class InlineContent : uint8_t { None, OutOfFlow, Text, Inline, Box };
+InlineContent ContentOf(const layout::LayoutNode& node);
 
 }  // namespace qorvex::dsp

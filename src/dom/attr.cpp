@@ -22,8 +22,9 @@ void Attr::SetOwnerElement(Element& element) {
 }
 
 std::string_view Attr::GetValue() const {
+    NodeText room;
     if (const Element* owner = GetOwnerElement())
-        if (const std::optional<Atom> value = owner->GetAttribute(name_)) value_ = value->view();
+        if (const auto value = owner->GetAttributeText(name_, room)) value_ = *value;
     return value_;
 }
 

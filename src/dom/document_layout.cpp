@@ -18,18 +18,6 @@ namespace {
 bool HasDisplay(const Node& node) {
     return node.GetLaidOutStyle().layout->display != css::CSSDisplay::None;
 }
-
-// Clearing makes a roomy set smaller step by step, and each step takes a block. Frames without changes take
-// none: what is left of a large change goes in the first of them at once.
-void ClearChanges(NodeSet& changes) {
-    constexpr uint32_t kKeptSlots = 199;
-    if (!changes.empty()) {
-        changes.clear();
-    } else if (changes.capacity() > kKeptSlots) {
-        NodeSet gone;
-        gone.swap(changes);
-    }
-}
 }  // namespace
 
 void Document::SetViewSize(uint32_t width, uint32_t height) {
@@ -166,7 +154,7 @@ layout::LayoutWork Document::UpdateLayoutStyles(bool force_full_layout) {
     for (Node* node : restyle_changes_)
         if (TakeChange(*node) && work == LayoutWork::None) work = LayoutWork::Transforms;
     for (NodeSet* set : {&layout_changes_, &transform_changes_, &visual_changes_, &restyle_changes_})
-        ClearChanges(*set);
+        set->clear();
     return work;
 }
 

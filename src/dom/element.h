@@ -47,7 +47,10 @@ class Element : public Node {
 
     // Names are compared without regard to case.
     std::optional<Atom> GetAttribute(std::string_view name) const;
-    bool HasAttribute(std::string_view name) const { return GetAttribute(name).has_value(); }
+    // The value for those who only read it. That of a style or of several classes is put into `room`: atoms
+    // stay for good, and a page may write and read another style in each frame.
+    std::optional<std::string_view> GetAttributeText(std::string_view name, NodeText& room) const;
+    bool HasAttribute(std::string_view name) const { return FindStored(name).has_value(); }
     void SetAttribute(std::string_view name, std::string_view value);
     void RemoveAttribute(std::string_view name);
     size_t GetAttributeCount() const;
@@ -171,6 +174,12 @@ class Element : public Node {
   private:
     void InstallHandlerAttribute(Atom name, Atom value);
     enum class Store { Id, Class, Style, Plain };
+    struct StoredAttribute {
+        Store store;
+        const Atom* value;  // null: the text has to be made, of classes or of the style
+    };
+    std::optional<StoredAttribute> FindStored(std::string_view name) const;
+    NodeText MakeAttributeText(Store store) const;
     static Store StoreOf(Atom name);
     void SetId(Atom id);
     void SetClassName(std::string_view text);
@@ -195,11 +204,11 @@ template <class Visitor>
 void Element::ForEachAttribute(Visitor&& visit) const {
     if (Is(kHasId) && !visit(std::string_view("id"), id_.view())) return;
     if (Is(kHasClasses)) {
-        const Atom classes = GetClassName();
+        const NodeText classes = MakeAttributeText(Store::Class);
         if (!visit(std::string_view("class"), classes.view())) return;
     }
     if (inline_style_ && !inline_style_->empty()) {
-        const css::CssString text = inline_style_->ToText();
+        const NodeText text = MakeAttributeText(Store::Style);
         if (!visit(std::string_view("style"), text.view())) return;
     }
     for (const AttributePair& entry : attributes_)

@@ -75,29 +75,58 @@ const Atom* Element::FindDataAttribute(Atom name) const {
     return nullptr;
 }
 
-std::optional<Atom> Element::GetAttribute(std::string_view name) const {
+std::optional<Element::StoredAttribute> Element::FindStored(std::string_view name) const {
     const SplitName split(name);
-    Document& document = *GetDocument();
-    const Atom atom = document.FindAtom(split.view);
+    const Atom atom = GetDocument()->FindAtom(split.view);
     if (atom == Atom() && !split.view.empty())
         return std::nullopt;  // no element has a name that nobody interned
-    if (split.is_data) {
-        const Atom* value = FindDataAttribute(atom);
-        return value ? std::optional<Atom>(*value) : std::nullopt;
-    }
-    switch (StoreOf(atom)) {
+    bool present = false;
+    StoredAttribute found{split.is_data ? Store::Plain : StoreOf(atom), nullptr};
+    switch (found.store) {
         case Store::Id:
-            return Is(kHasId) ? std::optional<Atom>(id_) : std::nullopt;
+            present = Is(kHasId);
+            found.value = &id_;
+            break;
         case Store::Class:
-            return Is(kHasClasses) ? std::optional<Atom>(GetClassName()) : std::nullopt;
+            present = Is(kHasClasses);
+            if (classes_.size() == 1) found.value = &classes_[0];
+            break;
         case Store::Style:
-            if (!inline_style_ || inline_style_->empty()) return std::nullopt;
-            return document.Intern(inline_style_->ToText());
+            present = inline_style_ && !inline_style_->empty();
+            break;
         case Store::Plain:
+            found.value = split.is_data ? FindDataAttribute(atom) : FindAttribute(atom);
+            present = found.value != nullptr;
             break;
     }
-    const Atom* value = FindAttribute(atom);
-    return value ? std::optional<Atom>(*value) : std::nullopt;
+    return present ? std::optional(found) : std::nullopt;
+}
+
+NodeText Element::MakeAttributeText(Store store) const {
+    NodeText text;
+    if (store == Store::Style) {
+        text = inline_style_->ToText().view();
+        return text;
+    }
+    for (const Atom name : classes_) {
+        if (!text.empty()) text.push_back(' ');
+        text.append(name.view());
+    }
+    return text;
+}
+
+std::optional<Atom> Element::GetAttribute(std::string_view name) const {
+    const std::optional<StoredAttribute> found = FindStored(name);
+    if (!found) return std::nullopt;
+    return found->value ? *found->value : GetDocument()->Intern(MakeAttributeText(found->store));
+}
+
+std::optional<std::string_view> Element::GetAttributeText(std::string_view name, NodeText& room) const {
+    const std::optional<StoredAttribute> found = FindStored(name);
+    if (!found) return std::nullopt;
+    if (found->value) return found->value->view();
+    room = MakeAttributeText(found->store);
+    return room.view();
 }
 
 void Element::SetAttribute(std::string_view name, std::string_view value) {
@@ -170,14 +199,16 @@ bool Element::RemoveDataAttribute(std::string_view unprefixed_name) {
 void Element::RemoveAttribute(std::string_view name) {
     const RefPtr<Node> self(this);
     Document& document = *GetDocument();
-    const std::optional<Atom> old_value = GetAttribute(name);
-    if (!old_value) return;
+    const std::optional<StoredAttribute> found = FindStored(name);
+    if (!found) return;
+    const bool observed = (document.mutationObserverKinds & kMutationAttributes) != 0;
+    const std::optional<Atom> old_value = found->value || observed ? GetAttribute(name) : std::nullopt;
     const SplitName split(name);
     if (split.is_data) {
         RemoveDataAttribute(split.view);
     } else {
         const Atom atom = document.Intern(split.view);
-        switch (StoreOf(atom)) {
+        switch (found->store) {
             case Store::Id:
                 SetId(Atom());
                 break;
@@ -243,9 +274,10 @@ RefPtr<NamedNodeMap> Element::GetAttributes() {
 }
 
 RefPtr<Attr> Element::GetAttributeNode(std::string_view name) {
-    const std::optional<Atom> value = GetAttribute(name);
+    NodeText room;
+    const std::optional<std::string_view> value = GetAttributeText(name, room);
     if (!value) return nullptr;
-    return script::MakeHandle<Attr>(*GetDocument(), name, value->view(), this);
+    return script::MakeHandle<Attr>(*GetDocument(), name, *value, this);
 }
 
 RefPtr<Attr> Element::SetAttributeNode(Attr& attribute) {
@@ -283,12 +315,7 @@ bool Element::HasClassNamed(std::string_view name) const {
 Atom Element::GetClassName() const {
     if (classes_.empty()) return Atom();
     if (classes_.size() == 1) return classes_[0];
-    NodeText joined;
-    for (const Atom name : classes_) {
-        if (!joined.empty()) joined.push_back(' ');
-        joined.append(name.view());
-    }
-    return GetDocument()->Intern(joined);
+    return GetDocument()->Intern(MakeAttributeText(Store::Class));
 }
 
 void Element::OnClassesChanged() {

@@ -42,8 +42,8 @@ unsigned ElementProxy::GetAttributeCount() const {
 }
 
 unsigned ElementProxy::GetAttribute(const char* name, char* buffer, unsigned size) const {
-    const std::optional<Atom> value = element_.GetAttribute(name ? name : "");
-    return CopyText(value ? value->view() : std::string_view(), buffer, size);
+    NodeText room;
+    return CopyText(element_.GetAttributeText(name ? name : "", room).value_or(""), buffer, size);
 }
 
 unsigned ElementProxy::GetAttributeAt(unsigned index, char* buffer, unsigned size) const {

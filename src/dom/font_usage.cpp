@@ -5,6 +5,8 @@
 #include <algorithm>
 
 #include "core/limits.h"
+#include "layout/text/complex_ranges.h"
+#include "qsl/city_hash.h"
 
 namespace qorvex::dom {
 
@@ -13,6 +15,7 @@ namespace {
 struct Work {
     FontUsage::Typefaces typefaces;
     Vector<uint32_t, MemoryTag::DOM> codes;
+    FontUsage::ShapedTexts texts;
 };
 
 // Every character goes to the first font that has it, as text layout does.
@@ -37,6 +40,19 @@ void Preload(fresco::IFontService& service, const Work& work) {
     }
 }
 
+void PreloadTexts(fresco::IFontService& service, const Work& work) {
+    for (const FontUsage::ShapedText& shaped : work.texts) {
+        for (const uint32_t id : work.typefaces) {
+            const fresco::IFont* font = id == css::kNoTypeface ? nullptr : service.GetFont(id);
+            uint32_t glyph = 0;
+            if (font != nullptr) font->GetGlyphIndices(&shaped.letter, 1, &glyph);
+            if (glyph == 0) continue;
+            font->PreloadText(shaped.text.data(), shaped.text.size());
+            break;
+        }
+    }
+}
+
 }  // namespace
 
 bool FontUsage::Entry::IsNew(uint32_t code) {
@@ -47,12 +63,18 @@ bool FontUsage::Entry::IsNew(uint32_t code) {
     return code > 0x20;
 }
 
+bool FontUsage::Entry::IsNewText(std::string_view utf8) {
+    return utf8.size() <= limits::kPreloadedTextBytes && seenTexts.size() < limits::kPreloadedTexts &&
+           seenTexts.insert(qsl::CityHash64(utf8)).second;
+}
+
 void FontUsage::Add(const Typefaces& typefaces, std::string_view utf8) {
     const auto first =
         std::find_if(typefaces.begin(), typefaces.end(), [](uint32_t id) { return id != css::kNoTypeface; });
     if (first == typefaces.end()) return;
     Entry& entry = entries_[*first];
     entry.typefaces = typefaces;
+    uint32_t complex = 0;
     for (size_t at = 0; at < utf8.size();) {
         const auto lead = static_cast<uint8_t>(utf8[at++]);
         uint32_t code = lead;
@@ -62,10 +84,15 @@ void FontUsage::Add(const Typefaces& typefaces, std::string_view utf8) {
             while (at < utf8.size() && (static_cast<uint8_t>(utf8[at]) & 0xC0) == 0x80)
                 code = code << 6 | (static_cast<uint8_t>(utf8[at++]) & 0x3F);
         }
+        if (complex == 0 && code >= layout::kFirstComplexCode && layout::NeedsComplexText(&code, 1))
+            complex = code;
         if (!entry.IsNew(code)) continue;
         entry.fresh.push_back(code);
         has_fresh_ = true;
     }
+    if (complex == 0 || !entry.IsNewText(utf8)) return;
+    entry.freshTexts.push_back({TaggedString<MemoryTag::DOM>(utf8), complex});
+    has_fresh_ = true;
 }
 
 TaskPtr FontUsage::TakeTask(fresco::IFontService& service) {
@@ -74,13 +101,16 @@ TaskPtr FontUsage::TakeTask(fresco::IFontService& service) {
     Vector<Work, MemoryTag::DOM> work;
     for (auto& slot : entries_) {
         Entry& entry = slot.second;
-        if (entry.fresh.empty()) continue;
-        work.push_back({entry.typefaces, std::move(entry.fresh)});
+        if (entry.fresh.empty() && entry.freshTexts.empty()) continue;
+        work.push_back({entry.typefaces, std::move(entry.fresh), std::move(entry.freshTexts)});
         entry.fresh = {};
+        entry.freshTexts = {};
     }
     return MakeTask("PreloadFontData", [&service, work = std::move(work)](TaskFamilyHandle) {
-        for (const Work& one : work)
+        for (const Work& one : work) {
             Preload(service, one);
+            PreloadTexts(service, one);
+        }
     });
 }
 

@@ -21,12 +21,12 @@ layout::HandlePtr Node::CreateLayoutNode(layout::LayoutTree& tree, layout::Layou
 }
 
 uint32_t Node::FindLayoutIndex(const layout::LayoutHandle& parent) const {
-    if (!parent_) return static_cast<uint32_t>(parent.data().children.size());
+    const layout::HandleVector& handles = parent.data().children;
+    if (!parent_) return handles.size();
     const NodeChildren& siblings = parent_->children_;
     const size_t own_index = GetIndexInParent();
     // Behind the nearest sibling that has a handle. That one comes as far from the front as among the
     // siblings but for those without a handle, and children that arrive in order come behind the last one.
-    const layout::HandleVector& handles = parent.data().children;
     for (size_t i = own_index; i-- > 0;) {
         ++document_->work.siblingsSearched;
         if (!siblings[i]->Is(kInLayoutTree)) continue;
@@ -38,11 +38,17 @@ uint32_t Node::FindLayoutIndex(const layout::LayoutHandle& parent) const {
         }
         break;
     }
-    return layout::LayoutIndexForChild(
-        parent, siblings.size(), static_cast<uint32_t>(own_index), [&](uint32_t i) {
-            const Node& sibling = *siblings[i];
-            return sibling.Is(kInLayoutTree) ? sibling.layout_node_.get() : nullptr;
-        });
+    // Nobody before it has one: in front of the first one behind it that does, which is the first of all.
+    for (size_t i = own_index + 1; i < siblings.size(); ++i) {
+        ++document_->work.siblingsSearched;
+        if (!siblings[i]->Is(kInLayoutTree)) continue;
+        for (uint32_t place = 0; place < handles.size(); ++place) {
+            ++document_->work.siblingsSearched;
+            if (handles[place] == siblings[i]->layout_node_) return place;
+        }
+        break;
+    }
+    return handles.size();
 }
 
 void Node::MarkLayoutDirty() {

@@ -72,20 +72,4 @@ class LayoutTree {
     HandleSet removed_;
 };
 
-// Where among its siblings' handles a new child goes: walks the DOM children backward together with the
-// layout children. `HandleAt(i)` gives the handle of DOM child i or null; domIndex is the new child's own
-// index.
-template <typename HandleAt>
-uint32_t LayoutIndexForChild(const LayoutHandle& parent, uint32_t domCount, uint32_t domIndex,
-                             HandleAt&& handleAt) {
-    const HandleVector& children = parent.data().children;
-    uint32_t index = static_cast<uint32_t>(children.size());
-    for (uint32_t i = domCount; i > domIndex + 1 && index > 0;) {
-        --i;
-        const LayoutHandle* handle = handleAt(i);
-        if (handle != nullptr && handle == children[index - 1].get()) --index;
-    }
-    return index;
-}
-
 }  // namespace qorvex::layout

@@ -1,6 +1,6 @@
 // Set of object addresses for the per-frame change lists: linear probing in a table of prime size, no
 // tombstones. It is filled, walked and cleared once a frame, so clear() is where it gives memory back: the
-// table shrinks by one prime when it was less than a quarter full.
+// table shrinks by one prime when it was less than a quarter full. Clearing an empty set allocates nothing.
 //
 // Invariant: less than 0.7 of the slots are taken; between an address's own slot and where it stands there is
 // no free slot. Walking order depends on the addresses: whatever must be repeatable sorts what it collects.
@@ -19,6 +19,9 @@ inline constexpr uint32_t kNodeSetPrimes[] = {
     6949,    14033,    28411,    57557,    116731,    236897,    480881,    976369,     1982627,    4026031,
     8175383, 16601593, 33712729, 68460391, 139022417, 282312799, 573292817, 1164186217, 2364114217,
 };
+
+// Slots that a set keeps however long it stays empty.
+inline constexpr uint32_t kNodeSetKeptSlots = 199;
 
 template <class Pointer, class Alloc = std::allocator<std::byte>>
 class NodeSet;
@@ -109,13 +112,11 @@ class NodeSet<T*, Alloc> {
     }
 
     void clear() {
-        if (slots_.empty()) return;
+        if (!size_) return GiveBack();
         const bool roomy = uint64_t{size_} * 4 < capacity();
         size_ = 0;
         if (roomy && capacity() > kNodeSetPrimes[0]) {
-            const uint32_t* now =
-                std::lower_bound(std::begin(kNodeSetPrimes), std::end(kNodeSetPrimes), capacity());
-            slots_.truncate(now[-1]);
+            slots_.truncate(PrimeBelow(capacity()));
             slots_.shrink_to_fit();
         }
         std::fill(slots_.begin(), slots_.end(), nullptr);
@@ -127,6 +128,18 @@ class NodeSet<T*, Alloc> {
     }
 
   private:
+    static uint32_t PrimeBelow(uint32_t prime) {
+        return std::lower_bound(std::begin(kNodeSetPrimes), std::end(kNodeSetPrimes), prime)[-1];
+    }
+
+    /// A smaller block would have to be allocated: the table becomes smaller inside its block, and the block
+    /// goes as a whole with the last step, when the set has been empty for a while.
+    void GiveBack() {
+        if (capacity() <= kNodeSetKeptSlots) return;
+        slots_.truncate(PrimeBelow(capacity()));
+        if (capacity() <= kNodeSetKeptSlots) slots_ = {};
+    }
+
     uint32_t HomeOf(const T* node) const { return static_cast<uint32_t>(HashPointer(node) % capacity()); }
     uint32_t Following(uint32_t index) const { return index + 1 == capacity() ? 0 : index + 1; }
 

@@ -49,7 +49,10 @@ void StylesheetCache::OnParsed(const URL& url, RefPtr<css::Stylesheet> sheet) {
     UrlKey key = MakeUrlKey(url);
     if (!in_flight_.contains(key)) return;
     const InFlightRequest request = in_flight_.take(key);
-    if (sheet) cached_.insert_or_assign(std::move(key), sheet);
+    if (sheet) {
+        strings_.KeepSoFar();
+        cached_.insert_or_assign(std::move(key), sheet);
+    }
     for (const OnSheet& on_sheet : request.waiting)
         on_sheet(sheet);
 }

@@ -30,6 +30,7 @@ class StylesheetCache {
     bool Remove(const URL& url) { return cached_.erase(MakeUrlKey(url)); }
     void Clear() { cached_.clear(); }
 
+    bool IsLoading() const { return !in_flight_.empty(); }
     // Tells the client that nobody wants the sheets that are on their way.
     void AbandonLoads();
 

@@ -4,7 +4,9 @@
 #include <fresco/rendering_library.h>
 #include <qorvex/text_services.h>
 
+#include <algorithm>
 #include <cctype>
+#include <vector>
 
 #include "display/display_text.h"
 #include "layout/fonts/fallback_font_data.h"
@@ -14,28 +16,36 @@
 namespace qorvex::test {
 namespace {
 
-// Hebrew runs from right to left, Latin letters from left to right, all else as the first letter or mark.
+// Hebrew runs from right to left, Latin letters from left to right; signs between two letters of one
+// direction go with them, others with the first letter of all.
 class Directions final : public IInternationalizationManager {
   public:
     TextDirection ComputeBaseDirection(const char* utf8, unsigned length) override {
-        for (unsigned i = 0; i < length; ++i) {
-            if (IsHebrew(utf8[i])) return TextDirection::RightToLeft;
-            if (std::isalpha(static_cast<unsigned char>(utf8[i]))) break;
-            if (utf8[i] != '\xE2' || i + 2 >= length) continue;
-            return utf8[i + 2] == '\x8F' ? TextDirection::RightToLeft : TextDirection::LeftToRight;
-        }
+        for (unsigned i = 0; i < length; ++i)
+            if (const int level = LevelOf(utf8[i], 0); level != kSign)
+                return level & 1 ? TextDirection::RightToLeft : TextDirection::LeftToRight;
         return TextDirection::LeftToRight;
     }
     void ComputeTextDirection(const char* utf8, unsigned length, i18n::TextDirectionResult* result) override {
-        const unsigned base = ComputeBaseDirection(utf8, length) == TextDirection::RightToLeft ? 1 : 0;
-        for (unsigned i = 0; i < length; ++i) {
-            const bool isLatin = std::isalpha(static_cast<unsigned char>(utf8[i])) != 0;
-            result->AddRun(i, 1, isLatin ? base * 2 : IsHebrew(utf8[i]) || (utf8[i] & 0x40) == 0 ? 1 : base);
+        ++asked;
+        const int base = ComputeBaseDirection(utf8, length) == TextDirection::RightToLeft ? 1 : 0;
+        int before = base;
+        for (unsigned first = 0, end = 0; first < length; first = end) {
+            while (end < length && LevelOf(utf8[end], base) == kSign)
+                ++end;
+            const int after = end < length ? LevelOf(utf8[end], base) : base;
+            result->AddRun(first, end - first, static_cast<unsigned>(before == after ? before : base));
+            if (end < length) result->AddRun(end++, 1, static_cast<unsigned>(before = after));
         }
     }
+    int asked = 0;
 
   private:
-    static bool IsHebrew(char byte) { return byte == '\xD7'; }
+    static constexpr int kSign = -1;
+    static int LevelOf(char byte, int base) {
+        if (byte == '\xD7') return 1;
+        return std::isalpha(static_cast<unsigned char>(byte)) ? base * 2 : kSign;
+    }
 };
 
 using dsp::DisplayParagraph;
@@ -171,6 +181,59 @@ TEST_F(ParagraphTest, LinesAreReadFromTheSideOfTheFirstLetter) {
     EXPECT_LT(Box(left[2]).left, Box(left[1]).left);
     EXPECT_LT(Box(left[1]).left, Box(left[3]).left);
     EXPECT_LT(Box(plain[0]).left, Box(plain[1]).left);
+    page.tree.SetTextServices({fonts->GetFontService()});
+}
+
+// The bidirectional algorithm sees one text: the parts of one element stand on both sides of another.
+TEST_F(ParagraphTest, PartsOfSeveralTextsChangePlacesTogether) {
+    Directions directions;
+    page.tree.SetTextServices({fonts->GetFontService(), &directions});
+    struct Row {
+        const char* first;
+        const char* inside;
+        const char* last;
+        bool boxOnTheLeft;
+    };
+    for (const Row& row : {Row{"one אב ", "גד", " two", false}, Row{"אב one ", "two", " גד", true}}) {
+        SCOPED_TRACE(row.first);
+        LayoutHandle* p = Paragraph("width:600px");
+        LayoutHandle* first = Text(p, row.first);
+        LayoutHandle* span = Inline(p, "padding-left:3px;padding-right:3px");
+        LayoutHandle* inside = Text(span, row.inside);
+        LayoutHandle* last = Text(p, row.last);
+        for (const char* align : {"text-align:left", "text-align:justify", "text-align:left"}) {
+            page.Change(p, align);
+            page.Settle();
+            // Runs of the first text as they are painted.
+            const layout::TextInfo& shown = *static_cast<DisplayText&>(*first->node().display).ShownInfo();
+            ASSERT_GE(shown.runs.size(), 2u);
+            std::vector<std::pair<float, float>> spans;
+            for (const layout::TextRun& run : shown.runs)
+                spans.push_back({run.x, run.x + run.width});
+            std::sort(spans.begin(), spans.end());
+            EXPECT_LE(spans.front().second, Box(span).left + 0.01f);
+            EXPECT_GE(spans.back().first, Right(span) - 0.01f);
+            EXPECT_NEAR(Box(first).left, spans.front().first, 0.01f);
+            EXPECT_NEAR(Right(first), spans.back().second, 0.01f);
+            EXPECT_NEAR(Box(inside).left, Box(span).left + 3, 0.01f);
+            EXPECT_NEAR(Right(inside), Right(span) - 3, 0.01f);
+            EXPECT_EQ(Box(last).left < Box(first).left, row.boxOnTheLeft);
+        }
+        // Nothing is asked or laid out again for a paragraph that did not change.
+        const int asked = directions.asked;
+        page.Settle();
+        EXPECT_EQ(directions.asked, asked);
+    }
+    // A box is a sign between letters, and a text of signs alone goes with the letters around it.
+    LayoutHandle* p = Paragraph("width:600px");
+    LayoutHandle* before = Text(p, "one אב");
+    LayoutHandle* box = Add(p, MakeRef<dsp::Box>(), "display:block;width:20px;height:5px");
+    LayoutHandle* sign = Text(p, "!");
+    Text(p, "גד");
+    page.Settle();
+    EXPECT_LT(Box(box).left, Right(before) - 1);
+    EXPECT_LT(Box(sign).left, Box(box).left);
+    EXPECT_TRUE(static_cast<DisplayText&>(*sign->node().display).Info()->runs[0].rightToLeft);
     page.tree.SetTextServices({fonts->GetFontService()});
 }
 

@@ -26,6 +26,24 @@ TEST_F(AttributeTest, AttrObjectsAreFreshAndWriteThrough) {
     EXPECT_EQ(title->GetValue(), "newer");
 }
 
+// Atoms stay for good, and a page may write and read another style in each frame.
+TEST_F(AttributeTest, ReadingATextThatIsMadeOfPartsInternsNothing) {
+    Load("<p id=a class='x y' title=t></p>");
+    Element& p = Find("a");
+    p.SetAttribute("style", "width: 31px");
+    const size_t before = host_->strings.size();
+    NodeText room;
+    EXPECT_NE(p.GetAttributeText("style", room)->find("31px"), std::string_view::npos);
+    EXPECT_EQ(p.GetAttributeText("class", room), "x y");
+    EXPECT_EQ(p.GetAttributeText("title", room), "t");
+    EXPECT_EQ(p.GetAttributeText("lang", room), std::nullopt);
+    EXPECT_TRUE(p.HasAttribute("style"));
+    EXPECT_EQ(p.GetAttributeNode("class")->GetValue(), "x y");
+    p.RemoveAttribute("style");
+    EXPECT_FALSE(p.HasAttribute("style"));
+    EXPECT_EQ(host_->strings.size(), before);
+}
+
 TEST_F(AttributeTest, MarksOnlyWhatSelectorsLookAt) {
     Load("<p id=a></p><p id=b></p>");
     document_->SolveStyles();

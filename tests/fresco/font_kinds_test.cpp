@@ -135,6 +135,7 @@ TEST_F(FontKinds, BrokenFilesAnswerOrAreRefused) {
         for (const ShapedGlyph& glyph : sink.glyphs)
             EXPECT_TRUE(std::isfinite(glyph.advance) && glyph.cluster < 7);
         font->PreloadGlyphs(text, 7);
+        font->PreloadText("afi \u0627\u0644\u0301\n\xF0", 13);
         EXPECT_TRUE(std::isfinite(font->GetMetrics(20).ascent));
         DrawText(canvas, id, "afi", 20, 30);
     }

@@ -11,6 +11,21 @@
 namespace qsl {
 namespace {
 
+int g_allocations = 0;
+
+template <class T>
+struct CountingAllocator {
+    using value_type = T;
+    CountingAllocator() = default;
+    template <class U>
+    CountingAllocator(const CountingAllocator<U>&) {}
+    T* allocate(size_t count) {
+        ++g_allocations;
+        return std::allocator<T>().allocate(count);
+    }
+    void deallocate(T* memory, size_t count) { std::allocator<T>().deallocate(memory, count); }
+};
+
 TEST(NodeSet, AgreesWithAReferenceUnderRandomWork) {
     std::mt19937 random(5);
     std::vector<int64_t> nodes(600);
@@ -54,6 +69,29 @@ TEST(NodeSet, GrowsByPrimesAndShrinksByOneWhenClearedRoomy) {
     set.clear();
     EXPECT_EQ(set.capacity(), 47u);
     EXPECT_FALSE(set.contains(&nodes[0]));
+    set.clear();
+    EXPECT_EQ(set.capacity(), 47u) << "a small table stays";
+}
+
+// Idle frames clear empty sets, and must not allocate.
+TEST(NodeSet, AnEmptySetGivesALargeTableBackInStepsWithoutAllocating) {
+    std::vector<int64_t> nodes(1000);
+    NodeSet<int64_t*, CountingAllocator<std::byte>> set;
+    for (int64_t& node : nodes)
+        set.insert(&node);
+    set.clear();
+    EXPECT_EQ(set.capacity(), 1741u);
+    const int before = g_allocations;
+    set.clear();
+    EXPECT_EQ(set.capacity(), 823u);
+    set.insert(&nodes[0]);
+    set.erase(&nodes[0]);
+    for (const uint32_t capacity : {409u, 0u, 0u}) {
+        set.clear();
+        EXPECT_EQ(set.capacity(), capacity);
+    }
+    EXPECT_EQ(g_allocations, before);
+    EXPECT_TRUE(set.insert(&nodes[0]));
 }
 
 TEST(Function, KeepsSmallCallablesInsideAndOwnsLargeOnes) {

@@ -80,6 +80,7 @@ class IFont {
     virtual void MarkAsUserBitmapFont() = 0;
     // Loads the outlines of the glyphs, so that a later draw need not.
     virtual void PreloadGlyphs(const uint32_t* codePoints, size_t count) const = 0;
+    // The same for the glyphs that shaping makes of a text.
     virtual void PreloadText(const char* utf8, size_t length) const = 0;
     virtual FontId GetId() const = 0;
 

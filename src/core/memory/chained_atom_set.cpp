@@ -14,7 +14,8 @@ uint64_t HashInterned(std::string_view text) {
 
 const AtomEntry* ChainedAtomSet::Find(std::string_view text, uint64_t hash) const {
     for (const Node* node = buckets_[BucketOf(hash)]; node; node = node->next) {
-        if (node->hash == hash && std::string_view(node->entry->text, node->entry->length) == text)
+        if (node->hash == static_cast<uint32_t>(hash) &&
+            std::string_view(node->entry->text, node->entry->length) == text)
             return node->entry;
     }
     return nullptr;
@@ -34,7 +35,20 @@ void ChainedAtomSet::Insert(Node* node) {
     }
     Node*& bucket = buckets_[BucketOf(node->hash)];
     node->next = std::exchange(bucket, node);
-    ++size_;
+    node->number = static_cast<uint32_t>(size_++);
+}
+
+void ChainedAtomSet::Truncate(size_t count) {
+    if (count >= size_) return;
+    for (Node*& bucket : buckets_) {
+        for (Node** link = &bucket; *link;) {
+            if ((*link)->number >= count)
+                *link = (*link)->next;
+            else
+                link = &(*link)->next;
+        }
+    }
+    size_ = count;
 }
 
 }  // namespace qorvex

@@ -1,4 +1,4 @@
-// Chained hash set of interned strings. Chains, because entries are never removed and lookups of one string
+// Chained hash set of interned strings. Chains, because entries never go one by one and lookups of one string
 // must not slow down however many others share its bucket's neighbourhood; nodes stand wherever the owner
 // puts them.
 #pragma once
@@ -18,7 +18,8 @@ class ChainedAtomSet {
   public:
     struct Node {
         Node* next;
-        uint64_t hash;
+        uint32_t hash;    // its low bits
+        uint32_t number;  // of those put in before; Insert sets it
         const AtomEntry* entry;
     };
 
@@ -29,6 +30,8 @@ class ChainedAtomSet {
     /// buckets.
     void Insert(Node* node);
     size_t size() const { return size_; }
+    /// Takes out all but the first `count` that were put in.
+    void Truncate(size_t count);
 
   private:
     uint32_t BucketOf(uint64_t hash) const { return static_cast<uint32_t>(hash) & (buckets_.size() - 1); }

@@ -26,8 +26,9 @@ StringPool::StringPool() : atoms_(kFirstBuckets) {
         Bump(kConstants * sizeof(ChainedAtomSet::Node), alignof(ChainedAtomSet::Node)));
     for (const AtomEntry* entry : kConstantEntries) {
         const uint64_t hash = HashInterned({entry->text, entry->length});
-        atoms_.Insert(::new (nodes++) ChainedAtomSet::Node{nullptr, hash, entry});
+        atoms_.Insert(::new (nodes++) ChainedAtomSet::Node{nullptr, static_cast<uint32_t>(hash), 0, entry});
     }
+    kept_ = MarkHere();
 }
 
 StringPool::~StringPool() {
@@ -53,8 +54,8 @@ Atom StringPool::Intern(std::string_view text, bool copy) {
         copied[text.size()] = '\0';
         stored = copied;
     }
-    auto* record =
-        ::new (memory) Record{{nullptr, hash, nullptr}, {stored, static_cast<uint32_t>(text.size())}};
+    auto* record = ::new (memory) Record{{nullptr, static_cast<uint32_t>(hash), 0, nullptr},
+                                         {stored, static_cast<uint32_t>(text.size())}};
     record->node.entry = &record->entry;
     atoms_.Insert(&record->node);
     return Atom(&record->entry);
@@ -70,6 +71,23 @@ Atom StringPool::Find(std::string_view text) const {
 size_t StringPool::size() const {
     qsl::MutexLock lock(mutex_);
     return atoms_.size();
+}
+
+StringPool::Mark StringPool::MarkHere() const {
+    return {atoms_.size(), blocks_.size(), blocks_.empty() ? 0 : blocks_.back().used};
+}
+
+void StringPool::KeepSoFar() {
+    qsl::MutexLock lock(mutex_);
+    kept_ = MarkHere();
+}
+
+void StringPool::ReleaseOthers() {
+    qsl::MutexLock lock(mutex_);
+    atoms_.Truncate(kept_.atoms);
+    while (blocks_.size() > kept_.blocks)
+        GetAllocator()->Deallocate(blocks_.take_back().memory, MemoryTag::General);
+    blocks_.back().used = kept_.usedOfLast;
 }
 
 std::byte* StringPool::Bump(size_t size, size_t alignment) {

@@ -98,12 +98,9 @@ bool Compare(const SimpleSelector& simple, std::string_view text) {
 }
 
 // id, class and style are attributes to a selector although the element keeps them in fields of their own.
-std::optional<Atom> FindStoredApart(Atom name, const dom::Element& element) {
-    if (name == atoms::kId) return element.Is(dom::kHasId) ? std::optional(element.GetId()) : std::nullopt;
-    if (name == atoms::kClass)
-        return element.Is(dom::kHasClasses) ? std::optional(element.GetClassName()) : std::nullopt;
-    if (name == atoms::kStyle) return element.GetAttribute("style");
-    return std::nullopt;
+std::optional<std::string_view> FindStoredApart(Atom name, const dom::Element& element, dom::NodeText& room) {
+    if (name != atoms::kId && name != atoms::kClass && name != atoms::kStyle) return std::nullopt;
+    return element.GetAttributeText(name.view(), room);
 }
 
 }  // namespace
@@ -116,8 +113,9 @@ bool MatchAttribute(const SimpleSelector& simple, const dom::Element& element) {
         return Compare(simple, stored->view());
     }
     if (simple.isData) return false;
-    const std::optional<Atom> apart = FindStoredApart(simple.name, element);
-    return apart && Compare(simple, apart->view());
+    dom::NodeText room;
+    const std::optional<std::string_view> apart = FindStoredApart(simple.name, element, room);
+    return apart && Compare(simple, *apart);
 }
 
 }  // namespace qorvex::css

@@ -4,6 +4,7 @@
 #include <memory>
 
 #include "core/logging/log.h"
+#include "css/values/text_reader.h"
 #include "layout/dom_tasks.h"
 #include "layout/fonts/fallback_font_data.h"
 #include "layout/fonts/memory_stream.h"
@@ -35,7 +36,7 @@ bool IsCollection(std::string_view url) {
     const size_t dot = url.rfind('.');
     if (dot == std::string_view::npos) return false;
     const std::string_view extension = url.substr(dot + 1);
-    return extension == "ttc" || extension == "otc";
+    return css::EqualsIgnoreCase(extension, "ttc") || css::EqualsIgnoreCase(extension, "otc");
 }
 
 // Closes the stream with the task that reads it, also when that task is dropped.

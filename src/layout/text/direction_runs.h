@@ -1,12 +1,17 @@
 // The direction of each character, from the client's international text services.
 #pragma once
 
+#include <span>
+
 #include "layout/text/characters.h"
 #include "layout/text/text_layout.h"
 
 namespace qorvex::layout {
 
-// Levels as in Unicode Annex 9: an odd one runs from right to left. Without a manager all are 0.
+// Levels as in Unicode Annex 9: an odd one runs from right to left. One for each byte, all 0 before; that of
+// a character is the one of its first byte.
+void ResolveByteLevels(IInternationalizationManager& manager, std::string_view text, std::span<uint8_t> out);
+// Of each character: those of the request, else the manager's. Without a manager all are 0.
 void ResolveLevels(const TextRequest& request, const Characters& characters, TempVector<uint8_t>& levels);
 
 // From the order of reading to the order on the line, left to right (Unicode Annex 9, rule L2). `Item` has

@@ -15,9 +15,9 @@ bool Fits(const TextRequest& request, const TextInfo& info) {
 bool FitsAt(const TextRequest& request, TextStyle& style, float size, TextInfo& out) {
     style.usedSize = size;
     const TextRequest sized = {
-        request.text,     style,        request.availableWidth,  request.availableHeight, request.fonts,
-        request.iterator, request.i18n, request.firstLineOffset, request.applyLineHeight, request.notesGaps,
-        request.base};
+        request.text,     style,         request.availableWidth,  request.availableHeight, request.fonts,
+        request.iterator, request.i18n,  request.firstLineOffset, request.applyLineHeight, request.notesGaps,
+        request.base,     request.levels};
     return CalculateTextRunsAndGlyphs(sized, out) && Fits(request, out);
 }
 

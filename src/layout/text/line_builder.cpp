@@ -202,6 +202,7 @@ class LineBuilder {
 
     float AddShapedRun(const LinePiece& piece, float x) {
         TextRun& run = StartRun(piece.span->font, piece.first, piece.end, x);
+        run.level = piece.level;
         run.rightToLeft = piece.span->IsRightToLeft();
         const auto [first, end] = GlyphsOf(piece);
         uint32_t following = piece.end;  // the cluster that is read after this one, in a backward run

@@ -21,6 +21,7 @@ struct TextRun {
     uint32_t endCharacter = 0;
     float x = 0;  // in the line, alignment included
     float width = 0;
+    uint8_t level = 0;  // as in Unicode Annex 9
     bool rightToLeft = false;
 };
 

@@ -1,5 +1,7 @@
 #include "layout/text/text_layout.h"
 
+#include <algorithm>
+
 #include "layout/text/complex_ranges.h"
 #include "layout/text/line_builder.h"
 #include "layout/text/text_alignment.h"
@@ -24,10 +26,15 @@ bool LayOut(const TextRequest& request, Path path, TextInfo& out) {
 
     Characters characters;
     DecodeCharacters(request.text, request.style.whiteSpace, characters);
-    // In a line that runs from right to left even plain text has parts that do: its punctuation.
+    // In a line that runs from right to left, or between words that do, even plain text has parts that do:
+    // its punctuation.
     const bool backward = request.base == BaseDirection::RightToLeft;
-    const bool needed = backward || (characters.highest >= kFirstComplexCode &&
-                                     NeedsComplexText(characters.codes.data(), characters.codes.size()));
+    const bool leveled =
+        request.levels != nullptr && std::any_of(request.levels, request.levels + request.text.size(),
+                                                 [](uint8_t level) { return level != 0; });
+    const bool needed = backward || leveled ||
+                        (characters.highest >= kFirstComplexCode &&
+                         NeedsComplexText(characters.codes.data(), characters.codes.size()));
     const bool complex = path == Path::Complex || (request.style.complexText && needed);
     GlyphMap map;
     ShapedText shaped;

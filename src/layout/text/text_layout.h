@@ -29,6 +29,7 @@ struct TextRequest {
     bool applyLineHeight = true;
     bool notesGaps = false;  // fill TextInfo::gaps
     BaseDirection base = BaseDirection::OfText;
+    const uint8_t* levels = nullptr;  // one for each byte of the text; null: `i18n` is asked
 };
 
 // One layout at style.usedSize, by the path that the text needs. False, with an empty result, when no

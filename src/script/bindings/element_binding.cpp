@@ -89,10 +89,14 @@ constexpr AttributeDescription ScrollInViewUnits(const char* name) {
     return Bind::ReadWrite<&InViewUnits<kGet, kAxis>, &SetInViewUnits<kSet, kAxis>>(name);
 }
 
-// --- Operations with a namespace, which is not looked at
+// --- Reading attributes, also with a namespace, which is not looked at
 
-std::optional<Atom> GetAttributeNS(Element& element, JSValueRef, std::string_view name) {
-    return element.GetAttribute(name);
+JSValueRef GetAttribute(Element& element, ScriptCall& call, std::string_view name) {
+    dom::NodeText room;
+    return ToScript(call.context, element.GetAttributeText(name, room));
+}
+JSValueRef GetAttributeNS(Element& element, ScriptCall& call, JSValueRef, std::string_view name) {
+    return GetAttribute(element, call, name);
 }
 RefPtr<dom::Attr> GetAttributeNodeNS(Element& element, JSValueRef, std::string_view name) {
     return element.GetAttributeNode(name);
@@ -170,7 +174,7 @@ constexpr MethodDescription kMethods[] = {
     Bind::Method<"closest", &Element::Closest, 1>(),
     Bind::Method<"focus", &Element::Focus>(),
     Bind::Method<"getAnimations", &NotAvailable<Element, "Element::GetAnimations">>(),
-    Bind::Method<"getAttribute", &Element::GetAttribute, 1>(),
+    Bind::Method<"getAttribute", &GetAttribute, 1>(),
     Bind::Method<"getAttributeNS", &GetAttributeNS, 2>(),
     Bind::Method<"getAttributeNames", &GetAttributeNames>(),
     Bind::Method<"getAttributeNode", &Element::GetAttributeNode, 1>(),

@@ -123,6 +123,37 @@ TEST(Life, WhatIsForgottenGoesWithTheLibrary) {
     EXPECT_EQ(allocator.wrong_tags(), 0u);
 }
 
+// The strings of its pages go with the last view; sheets in the cache keep theirs.
+TEST(Life, AViewThatGoesLeavesNoStringsBehind) {
+    Client client;
+    client.files.Put("coui://page/kept.css", ".kept { width: 77px }");
+    client.system->PreloadAndCacheStylesheet("coui://page/kept.css");
+    client.ServeResources();
+    client.system->Advance(1);
+    client.DestroyView();
+    int64_t blocks = 0;
+    for (const char* letter : {"a", "b", "c"}) {
+        qorvex::ViewSettings settings;
+        settings.Width = settings.Height = 8;
+        client.view = client.system->CreateView(settings);
+        client.last_frame = 0;
+        client.MakeRenderer();
+        client.Load(
+            "<html><head><link rel=\"stylesheet\" href=\"kept.css\"></head><body><p class=\"kept\"></p>"
+            "</body></html>");
+        client.view->ExecuteScript((std::string("var p = document.querySelector('p');"
+                                                "for (var i = 0; i < 4000; ++i) p.setAttribute('title', '") +
+                                    letter +
+                                    "' + i);"
+                                    "console.log(getComputedStyle(p).width)")
+                                       .c_str());
+        client.DestroyView();
+        if (*letter > 'b') EXPECT_LT(client.allocator.blocks() - blocks, 40);
+        blocks = client.allocator.blocks();
+    }
+    EXPECT_EQ(client.log.Count("77px"), 3u);
+}
+
 // A listener that ends what is calling it.
 class Destroyer final : public qorvex::IViewListener {
   public:
@@ -168,7 +199,11 @@ TEST(Life, OtherThreadsThanTheMainOneAreRefused) {
         [&] { client.view->LoadURL(kUrl); },
         [&] { client.view->Resize(1, 1); },
         [&] { EXPECT_EQ(client.view->GetImagesList(0), nullptr); },
+        [&] { EXPECT_EQ(client.view->GetWidth(), 0u); },
+        [&] { client.view->ContinuousRepaint(true); },
+        [&] { client.view->SetGestureScrollThreshold(99); },
         [&] { client.view->Destroy(); },
+        [&] { client.system->SetId(9); },
         [&] { EXPECT_EQ(client.system->CreateView({}), nullptr); },
         [&] { client.system->ClearStylesheetCache(); },
         [&] { EXPECT_FALSE(client.system->RemoveHTMLCacheEntry(kUrl)); },
@@ -179,7 +214,11 @@ TEST(Life, OtherThreadsThanTheMainOneAreRefused) {
                                             "View::LoadURL",
                                             "View::Resize",
                                             "View::GetImagesList",
+                                            "View::GetWidth",
+                                            "View::ContinuousRepaint",
+                                            "View::SetGestureScrollThreshold",
                                             "View::Destroy",
+                                            "System::SetId",
                                             "System::CreateView",
                                             "System::ClearStylesheetCache",
                                             "System::RemoveHTMLCacheEntry",
@@ -188,6 +227,7 @@ TEST(Life, OtherThreadsThanTheMainOneAreRefused) {
     client.log.Clear();
     const size_t requests = client.files.requests.size();
     const auto pixels = client.pixels;
+    const float threshold = client.view->GetGestureScrollThreshold();
     std::thread([&] {
         for (const auto& call : calls)
             call();
@@ -199,6 +239,8 @@ TEST(Life, OtherThreadsThanTheMainOneAreRefused) {
     client.Frame();
     EXPECT_EQ(client.files.requests.size(), requests);
     EXPECT_EQ(client.pixels, pixels);
+    EXPECT_EQ(client.view->GetGestureScrollThreshold(), threshold);
+    EXPECT_NE(client.system->GetId(), 9u);
 }
 
 TEST(Life, TimesThatAreNoneAreReportedAndIgnored) {

@@ -37,6 +37,25 @@ TEST_F(StringPoolTest, HoldsManyAndLargeTexts) {
     EXPECT_EQ(atom.view(), large);
 }
 
+TEST_F(StringPoolTest, FreesWhatIsNotKept) {
+    StringPool pool;
+    const Atom kept = pool.Intern("kept");
+    pool.KeepSoFar();
+    const size_t count = pool.size();
+    const size_t blocks = allocator_.LiveBlocks();
+    for (int round = 0; round < 3; ++round) {
+        for (int i = 0; i < 400; ++i)
+            pool.Intern("name" + std::to_string(i));
+        pool.ReleaseOthers();
+        EXPECT_EQ(pool.size(), count);
+        EXPECT_EQ(allocator_.LiveBlocks(), blocks);
+    }
+    EXPECT_EQ(pool.Intern(std::string("kept")), kept);
+    EXPECT_EQ(pool.Intern("href"), atoms::kHref);
+    EXPECT_TRUE(pool.Find("name7").empty());
+    EXPECT_EQ(pool.Intern("name7").view(), "name7");
+}
+
 TEST_F(StringPoolTest, EntersForeignTextWithoutCopying) {
     static const char text[] = "kept elsewhere";
     StringPool pool;

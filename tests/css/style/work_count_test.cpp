@@ -149,6 +149,26 @@ TEST_F(WorkCount, ManyNewSiblingsFindTheirPlacesAtOnce) {
     }
 }
 
+TEST_F(WorkCount, EachNewFirstChildFindsItsPlaceAtOnce) {
+    constexpr size_t kCount = 300;
+    Load("<p class='off'></p><p></p>", ".off { display: none }");
+    Solve();
+    document_->UpdateLayoutStyles(false);
+    document_->work = {};
+    for (size_t i = 0; i < kCount; ++i) {
+        Body().InsertBefore(document_->CreateElement("i"), Body().GetFirstChild());
+        Solve();
+        document_->UpdateLayoutStyles(false);
+    }
+    EXPECT_LE(document_->work.siblingsSearched, 4 * kCount);
+    const auto& handles = Body().GetLayoutHandle()->data().children;
+    const auto children = Body().GetChildren();
+    ASSERT_EQ(handles.size(), kCount + 1);
+    for (uint32_t i = 0; i < kCount; ++i)
+        ASSERT_EQ(handles[i].get(), children[i]->GetLayoutHandle()) << i;
+    EXPECT_EQ(handles.back().get(), children.back()->GetLayoutHandle());
+}
+
 // In whatever order a script comes to them.
 TEST_F(WorkCount, DirtyingManySiblingsVisitsEachOnce) {
     constexpr int kRows = 1000;
