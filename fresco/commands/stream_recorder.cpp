@@ -47,6 +47,28 @@ void StreamRecorder::Append(const Record& record) {
     std::memcpy(out + sizeof(header), &record, sizeof(record));
 }
 
+// As Append(Record{fields...}), but what a page consists of is written to its place at once: see WordAt.
+template <class Record, class... Fields>
+void StreamRecorder::AppendFields(const Fields&... fields) {
+    static_assert(std::is_trivially_copyable_v<Record> && sizeof(Record) == (sizeof(Fields) + ...));
+    static_assert(((sizeof(Fields) % 4 == 0) && ...));
+    if (!(IsFinite(fields) && ...)) return Refuse(Record::kType);
+    constexpr uint32_t kSize = sizeof(RecordHeader) + sizeof(Record);
+    uint8_t* out = stream_.Extend(kSize);
+    const RecordHeader header{uint32_t(Record::kType), kSize};
+    std::memcpy(out, &header, sizeof(header));
+    out += sizeof(header);
+    const auto copy = [&out](const auto& field) {
+        const auto* from = reinterpret_cast<const uint8_t*>(&field);
+        for (size_t i = 0; i < sizeof(field); i += 4) {
+            const uint32_t word = WordAt(from + i);
+            std::memcpy(out + i, &word, sizeof(word));
+        }
+        out += sizeof(field);
+    };
+    (copy(fields), ...);
+}
+
 template <class Record>
 void StreamRecorder::Append(const Record& record, std::initializer_list<Chunk> tail) {
     static_assert(std::is_trivially_copyable_v<Record> && alignof(Record) == 4);
@@ -130,7 +152,7 @@ void StreamRecorder::ClearRect(const Rect& rect, uint32_t flag) {
 }
 
 void StreamRecorder::FillRect(const Rect& rect, const Paint& paint) {
-    Append(FillRectRecord{rect, paint});
+    AppendFields<FillRectRecord>(rect, paint);
 }
 
 void StreamRecorder::StrokeRect(const Rect& rect, const Paint& paint) {

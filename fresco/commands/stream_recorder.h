@@ -95,6 +95,8 @@ class StreamRecorder final : public CommandBuffer {
     };
     template <class Record>
     void Append(const Record& record);
+    template <class Record, class... Fields>
+    void AppendFields(const Fields&... fields);
     template <class Record>
     void Append(const Record& record, std::initializer_list<Chunk> tail);
     template <class Record>

@@ -21,6 +21,7 @@ namespace {
 using Wide = __m512i;
 constexpr int kWide = 16;
 #define FRESCO_PARTIAL_STORES 1
+#define FRESCO_WHOLE_LINES 1
 #define WIDE(name) _mm512_##name
 #define WIDE_SI(name) _mm512_##name##_si512
 
@@ -52,6 +53,37 @@ inline Wide LoadPart(const uint32_t* p, Inside inside) {
 inline void StorePart(uint32_t* p, Inside inside, Wide v) {
     _mm512_mask_storeu_epi32(p, inside, v);
 }
+
+// In pixels, from where a register's worth of memory in one cache line begins.
+inline int LineOffset(const uint32_t* p) {
+    return int(reinterpret_cast<uintptr_t>(p) / 4) & (kWide - 1);
+}
+
+// As PlainPixels, for rows that lie otherwise to the cache lines than their targets: every load of such a row
+// would touch two lines. Here each line is loaded once and the parts of two are joined. Reads up to kAhead
+// pixels more than it has given.
+class SkewedPixels {
+  public:
+    static constexpr int kAhead = kWide;
+    explicit SkewedPixels(const uint32_t* from) {
+        const int offset = LineOffset(from);
+        line_ = from - offset;
+        index_ = _mm512_add_epi32(_mm512_set1_epi32(offset),
+                                  _mm512_set_epi32(15, 14, 13, 12, 11, 10, 9, 8, 7, 6, 5, 4, 3, 2, 1, 0));
+        held_ = LoadPart(line_, Inside(0xFFFFu << offset));
+    }
+    Wide Next() {
+        line_ += kWide;
+        const Wide next = _mm512_load_si512(line_);
+        const Wide pixels = _mm512_permutex2var_epi32(held_, index_, next);
+        held_ = next;
+        return pixels;
+    }
+
+  private:
+    const uint32_t* line_;
+    Wide index_, held_;
+};
 
 #include "fresco/cpu/rows_over.inc"
 

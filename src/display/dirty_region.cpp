@@ -17,7 +17,7 @@ Rect Inflate(const Rect& rect, float margin) {
 }
 }  // namespace
 
-void DirtyRegion::Add(const Rect& area) {
+void DirtyRegion::Insert(const Rect& area) {
     if (!layout::IsFinite(area)) return;
     // No view reaches so far; the bound keeps unions and the growing margins of Reduce finite.
     constexpr float kFar = 1e7f;
@@ -29,7 +29,6 @@ void DirtyRegion::Add(const Rect& area) {
         bounds_ = rect;
         return;
     }
-    // Frames that repaint everything add thousands of rectangles to one that holds them all.
     if (Contains(rects_[count_ - 1], rect)) return;
     bounds_ = Union(bounds_, rect);
     for (uint32_t i = 0; i < count_; ++i) {

@@ -17,7 +17,11 @@ class DirtyRegion {
     // What a recording gets as its scissor list.
     static constexpr uint32_t kScissorCount = 8;
 
-    void Add(const layout::Rect& area);
+    void Add(const layout::Rect& area) {
+        // Frames that repaint everything add thousands of rectangles to one that holds them all.
+        const bool held = count_ > 0 && layout::Contains(rects_[count_ - 1], area);
+        if (!held || layout::Contains(area, bounds_)) Insert(area);
+    }
     void Add(const DirtyRegion& other);
     bool Empty() const { return count_ == 0; }
     // Area of the bounds above the tolerance, the frame's test for "something to paint".
@@ -32,6 +36,7 @@ class DirtyRegion {
     void Clear();
 
   private:
+    void Insert(const layout::Rect& area);
     void Reduce(uint32_t target);
 
     layout::Rect bounds_{};

@@ -11,9 +11,10 @@
 #pragma once
 
 #include "core/memory/temp_vector.h"
-#include "layout/layout_handle.h"
+#include "layout/prefetch.h"
 #include "layout/work_counters.h"
 
+#include <algorithm>
 #include <span>
 
 namespace qorvex::dsp {
@@ -63,14 +64,20 @@ inline bool PaintsInTreeOrder(const layout::LayoutNode& node) {
 template <typename Visit>
 void ForEachChild(const layout::LayoutNode& parent, std::span<const layout::Rect> areas, Visit&& visit) {
     const uint32_t count = parent.children.size();
+    for (uint32_t i = 0; i < std::min(count, layout::kNodesAhead); ++i)
+        layout::PrefetchPaint(*parent.children[i]);
+    const auto visitChild = [&](uint32_t i) {
+        if (i + layout::kNodesAhead < count) layout::PrefetchPaint(*parent.children[i + layout::kNodesAhead]);
+        visit(parent.children[i]->node());
+    };
     if (parent.below && count > layout::ChildGroups::kFanout && parent.below->groups &&
         parent.below->groups->Fit(count)) {
         parent.below->groups->Walk([&](const layout::ChildSum& sum) { return TouchesAny(areas, sum.visual); },
-                                   [&](uint32_t i) { visit(parent.children[i]->node()); });
+                                   visitChild);
         return;
     }
-    for (const layout::HandlePtr& child : parent.children)
-        visit(child->node());
+    for (uint32_t i = 0; i < count; ++i)
+        visitChild(i);
 }
 
 }  // namespace qorvex::dsp

@@ -4,6 +4,7 @@
 #include "display/local_transform.h"
 #include "display/own_paint.h"
 #include "display/resolved_visuals.h"
+#include "layout/prefetch.h"
 #include "layout/scroll.h"
 
 #include <algorithm>
@@ -162,7 +163,13 @@ class TransformPass {
             below.clip = layout::Intersection(below.clip, clip);
         }
         bool dirty = false;
+        const uint32_t count = node.children.size();
+        for (uint32_t i = 0; i < std::min(count, layout::kNodesAhead); ++i)
+            layout::PrefetchNode(*node.children[i]);
         auto add = [&](uint32_t child, ChildSum& sum) {
+            if (child + layout::kNodesAhead < count)
+                layout::PrefetchNode(*node.children[child + layout::kNodesAhead]);
+            if (child + 2 < count) __builtin_prefetch(node.children[child + 2]->node().display.get());
             dirty = Visit(*node.children[child], below) || dirty;
             AddTo(sum, node.children[child]->node());
         };
@@ -238,7 +245,7 @@ class TransformPass {
                             node.boxMetricsChanged || !Same(before.paint, node.paintBounds);
         const bool bounds = !Same(before.visual, node.visualAabb) || !Same(before.aabb, node.aabb);
         if (paints) node.visualChanged = true;
-        if (paints || bounds || scrolls) pass_.update.updated.Insert(&handle);
+        if (paints || bounds || scrolls) pass_.update.updated.Add(handle);
 
         const bool spreads = node.visuals && !node.visuals->filters.empty();
         if (!paints && !(spreads && dirtyBelow)) return false;

@@ -5,6 +5,7 @@
 #include "display/transforms.h"
 #include "layout/layout_store.h"
 #include "layout/length_bounds.h"
+#include "layout/prefetch.h"
 
 #include <yoga/Yoga.h>
 
@@ -81,20 +82,12 @@ void Place(const Entry& entry, LayoutPass& pass) {
     node.box.y = entry.origin.y + BoundResult(YGNodeLayoutGetTop(node.flex));
 }
 
-// Asks for the memory of a node that is soon visited: the walk through a large page waits for little else.
-void Prefetch(const LayoutHandle* handle) {
-    constexpr size_t kCacheLine = 64;
-    const auto* memory = reinterpret_cast<const char*>(&handle->node());
-    for (size_t line = 0; line < sizeof(LayoutNode); line += kCacheLine)
-        __builtin_prefetch(memory + line);
-}
-
 // Those that Yoga laid out anew, or all.
 void PushChildren(const LayoutNode& node, Entry& child, bool all, TempVector<Entry>& stack) {
     for (auto i = static_cast<uint32_t>(YGNodeGetChildCount(node.flex)); i-- > 0;) {
         if (!all && !YGNodeGetHasNewLayout(YGNodeGetChild(node.flex, i))) continue;
         child.handle = node.children[i].get();
-        Prefetch(child.handle);
+        PrefetchHandle(*child.handle);
         stack.push_back(child);
     }
 }
@@ -117,11 +110,11 @@ void NoteBoxChange(LayoutHandle& handle, const OldBox& old, LayoutPass& pass) {
     const bool metrics = !Near(old.box.width, node.box.width) || !Near(old.box.height, node.box.height) ||
                          !Near(old.border, node.border()) || !Near(old.padding, node.padding());
     if (metrics) node.boxMetricsChanged = true;
-    const bool moved = !Near(SnapToPixels(old.box), SnapToPixels(node.box));
+    const bool moved = !Same(old.box, node.box) && !Near(SnapToPixels(old.box), SnapToPixels(node.box));
     if (moved) node.rectChanged = true;
     const bool shifted = old.box.x != node.box.x || old.box.y != node.box.y;
     if (!metrics && !moved && !shifted) return;
-    pass.update.updated.Insert(&handle);
+    pass.update.updated.Add(handle);
     dsp::MarkForTransform(handle);
 }
 

@@ -275,6 +275,24 @@ void MarkAbsoluteBelow(const LayoutNode& node, const LayoutHandle* root) {
     }
 }
 
+// Where a style is remembered.
+FlexStyleContext::Written& WrittenPlace(FlexStyleContext& context, const LayoutStyle* style) {
+    return context
+        .written[static_cast<uint64_t>(reinterpret_cast<uintptr_t>(style)) * 0x9E3779B97F4A7C15u >> 60];
+}
+
+// All of a node's style but for the position type.
+void SyncBox(YGNodeRef node, const LayoutNode& layoutNode, FlexStyleContext& context) {
+    const LayoutStyle& style = *layoutNode.style.layout;
+    YGNodeStyleSetDisplay(node, YGDisplayFlex);
+    SyncContainer(node, style, layoutNode.style.text->textAlign);
+    YGNodeStyleSetAlignSelf(node, SelfAlignment(layoutNode));
+    SyncFlex(node, style.flex, context);
+    SyncEdges(node, style, context.lengths);
+    SyncSizes(node, layoutNode, style, context.lengths);
+    SyncPosition(node, layoutNode, style, context);
+}
+
 }  // namespace
 
 Edges ResolveBorders(const LayoutStyle& style, const LengthContext& lengths) {
@@ -299,16 +317,21 @@ bool SyncStyleToYoga(LayoutHandle& handle, FlexStyleContext& context) {
         YGNodeStyleSetDisplay(node, YGDisplayNone);
         return true;
     }
-    context.lengths.em = layoutNode.style.text->computedFontSize;
-    YGNodeStyleSetDisplay(node, YGDisplayFlex);
-    YGNodeStyleSetPositionType(node, PositionType(layoutNode, &handle == context.root));
-    SyncContainer(node, style, layoutNode.style.text->textAlign);
-    YGNodeStyleSetAlignSelf(node, SelfAlignment(layoutNode));
+    const css::TextLayoutStyle& text = *layoutNode.style.text;
+    context.lengths.em = text.computedFontSize;
+    const YGPositionType position = PositionType(layoutNode, &handle == context.root);
+    const FlexStyleKey key{&style, text.computedFontSize, text.textAlign};
+    FlexStyleContext::Written& same = WrittenPlace(context, &style);
+    // The position type of a written node may have changed since, with what was found below it.
+    if (same.key == key && !layoutNode.flags.isReplaced &&
+        YGNodeStyleGetPositionType(same.node) == position) {
+        YGNodeCopyStyle(node, same.node);
+    } else {
+        YGNodeStyleSetPositionType(node, position);
+        SyncBox(node, layoutNode, context);
+        if (!layoutNode.flags.isReplaced) same = {key, node};
+    }
     SyncChildAlignment(layoutNode);
-    SyncFlex(node, style.flex, context);
-    SyncEdges(node, style, context.lengths);
-    SyncSizes(node, layoutNode, style, context.lengths);
-    SyncPosition(node, layoutNode, style, context);
     MarkAbsoluteBelow(layoutNode, context.root);
     return true;
 }

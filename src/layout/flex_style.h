@@ -5,12 +5,29 @@
 #include "css/values/length_context.h"
 #include "layout/layout_handle.h"
 
+#include <array>
+
 namespace qorvex::layout {
+
+// All that a node's style in Yoga follows from, but for its position type and for pictures.
+struct FlexStyleKey {
+    const css::LayoutStyle* layout = nullptr;
+    float em = 0;
+    css::TextAlignType align{};
+    friend bool operator==(const FlexStyleKey&, const FlexStyleKey&) = default;
+};
 
 struct FlexStyleContext {
     css::LengthContext lengths;  // em is set per node
     bool disableFlexBasisUnits = false;
     const LayoutHandle* root = nullptr;
+    // Nodes that were written in this pass. Boxes of one kind share their style, and to copy what Yoga has of
+    // it takes a third of writing it again.
+    struct Written {
+        FlexStyleKey key;
+        YGNode* node = nullptr;
+    };
+    std::array<Written, 16> written{};
 };
 
 bool SyncStyleToYoga(LayoutHandle& handle, FlexStyleContext& context);

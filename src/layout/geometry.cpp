@@ -14,33 +14,10 @@ bool IsFinite(const Rect& rect) {
            std::isfinite(rect.height);
 }
 
-Rect Union(const Rect& a, const Rect& b) {
-    if (IsEmpty(a)) return b;
-    if (IsEmpty(b)) return a;
-    const float x = std::min(a.x, b.x);
-    const float y = std::min(a.y, b.y);
-    return {x, y, 0, std::max(Right(a), Right(b)) - x, std::max(Bottom(a), Bottom(b)) - y};
-}
-
-Rect Intersection(const Rect& a, const Rect& b) {
-    const float x = std::max(a.x, b.x);
-    const float y = std::max(a.y, b.y);
-    const float width = std::min(Right(a), Right(b)) - x;
-    const float height = std::min(Bottom(a), Bottom(b)) - y;
-    if (!(width > 0 && height > 0)) return {};
-    return {x, y, 0, width, height};
-}
-
 Rect Inset(const Rect& rect, const Edges& edges) {
     return {rect.x + edges.left, rect.y + edges.top, rect.z,
             std::max(rect.width - edges.left - edges.right, 0.0f),
             std::max(rect.height - edges.top - edges.bottom, 0.0f)};
-}
-
-Rect RoundOut(const Rect& rect) {
-    const float x = std::floor(rect.x);
-    const float y = std::floor(rect.y);
-    return {x, y, rect.z, std::ceil(Right(rect)) - x, std::ceil(Bottom(rect)) - y};
 }
 
 bool Near(const Matrix& a, const Matrix& b) {
@@ -55,7 +32,7 @@ bool IsFlat(const Matrix& m) {
            m.m[10] == 1 && m.m[11] == 0 && m.m[14] == 0 && m.m[15] == 1;
 }
 
-Rect MapBounds(const Matrix& m, const Rect& rect) {
+Rect MapBoundsInSpace(const Matrix& m, const Rect& rect) {
     const float corners[4][2] = {
         {rect.x, rect.y}, {Right(rect), rect.y}, {Right(rect), Bottom(rect)}, {rect.x, Bottom(rect)}};
     constexpr float kHuge = 1e9f;

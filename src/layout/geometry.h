@@ -4,7 +4,9 @@
 
 #include <fresco/geometry.h>
 
+#include <algorithm>
 #include <cmath>
+#include <cstdint>
 
 namespace qorvex::layout {
 
@@ -68,8 +70,21 @@ inline bool Contains(const Rect& outer, const Rect& inner) {
            Bottom(outer) >= Bottom(inner);
 }
 // Empty rectangles count as nothing in a union.
-Rect Union(const Rect& a, const Rect& b);
-Rect Intersection(const Rect& a, const Rect& b);
+inline Rect Union(const Rect& a, const Rect& b) {
+    if (IsEmpty(a)) return b;
+    if (IsEmpty(b)) return a;
+    const float x = std::min(a.x, b.x);
+    const float y = std::min(a.y, b.y);
+    return {x, y, 0, std::max(Right(a), Right(b)) - x, std::max(Bottom(a), Bottom(b)) - y};
+}
+inline Rect Intersection(const Rect& a, const Rect& b) {
+    const float x = std::max(a.x, b.x);
+    const float y = std::max(a.y, b.y);
+    const float width = std::min(Right(a), Right(b)) - x;
+    const float height = std::min(Bottom(a), Bottom(b)) - y;
+    if (!(width > 0 && height > 0)) return {};
+    return {x, y, 0, width, height};
+}
 Rect Inset(const Rect& rect, const Edges& edges);
 // To the next whole number, halves away from zero. As std::round, which is a call.
 inline float RoundToPixel(float value) {
@@ -89,8 +104,22 @@ inline Rect SnapToPixels(const Rect& rect) {
     return {RoundToPixel(rect.x), RoundToPixel(rect.y), rect.z,
             RoundToPixel(x + rect.width) - RoundToPixel(x), RoundToPixel(y + rect.height) - RoundToPixel(y)};
 }
+// As std::floor and std::ceil, which are calls too.
+inline float RoundDown(float value) {
+    constexpr float kAllWhole = 8388608;
+    if (!(std::fabs(value) < kAllWhole)) return value;
+    const auto whole = static_cast<float>(static_cast<int32_t>(value));
+    return whole - static_cast<float>(whole > value);
+}
+inline float RoundUp(float value) {
+    return -RoundDown(-value);
+}
 // Outward to whole pixels.
-Rect RoundOut(const Rect& rect);
+inline Rect RoundOut(const Rect& rect) {
+    const float x = RoundDown(rect.x);
+    const float y = RoundDown(rect.y);
+    return {x, y, rect.z, RoundUp(Right(rect)) - x, RoundUp(Bottom(rect)) - y};
+}
 
 bool Near(const Matrix& a, const Matrix& b);
 // Neither depth nor perspective: what maps the plane to the plane.
@@ -98,7 +127,20 @@ bool IsFlat(const Matrix& m);
 bool IsFinite(const Rect& rect);
 // The axis-aligned bounds of a mapped rectangle. Empty when a corner is not finite or when all of it lies
 // behind the eye; a rectangle that is cut by the plane of the eye counts as unbounded on that side.
-Rect MapBounds(const Matrix& m, const Rect& rect);
+Rect MapBoundsInSpace(const Matrix& m, const Rect& rect);
+// The same, at once for matrices that only scale and move, which most are.
+inline Rect MapBounds(const Matrix& m, const Rect& rect) {
+    const float* a = m.m;
+    const bool straight = a[1] == 0 && a[4] == 0 && a[3] == 0 && a[7] == 0 && a[11] == 0 && a[15] == 1;
+    constexpr float kHuge = 1e9f;
+    const float x = a[0] * rect.x + a[8] * rect.z + a[12], y = a[5] * rect.y + a[9] * rect.z + a[13];
+    const float right = a[0] * Right(rect) + a[8] * rect.z + a[12];
+    const float bottom = a[5] * Bottom(rect) + a[9] * rect.z + a[13];
+    const float left = std::min(x, right), top = std::min(y, bottom);
+    const float width = std::max(x, right) - left, height = std::max(y, bottom) - top;
+    const bool ordinary = left > -kHuge && top > -kHuge && left + width < kHuge && top + height < kHuge;
+    return straight && ordinary ? Rect{left, top, 0, width, height} : MapBoundsInSpace(m, rect);
+}
 // False for a singular matrix.
 bool Invert(const Matrix& m, Matrix& out);
 

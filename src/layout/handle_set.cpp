@@ -32,4 +32,10 @@ void HandleSet::Swap(HandleSet& other) {
     set_.swap(other.set_);
 }
 
+void UpdatedList::Clear() {
+    for (const HandlePtr& handle : handles_)
+        handle->node().isInUpdated = false;
+    handles_.clear();
+}
+
 }  // namespace qorvex::layout

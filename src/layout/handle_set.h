@@ -33,4 +33,31 @@ class HandleSet {
     NodeSet<LayoutHandle*, MemoryTag::LayoutNodes> set_;
 };
 
+// The handles to which the layout side gave something new, in the order in which it found them, each once and
+// with one reference. A mark in the node, which no two frames' lists need at once, says who is in: most of a
+// page may be.
+class UpdatedList {
+  public:
+    UpdatedList() = default;
+    UpdatedList(const UpdatedList&) = delete;
+    UpdatedList& operator=(const UpdatedList&) = delete;
+    ~UpdatedList() { Clear(); }
+
+    void Add(LayoutHandle& handle) {
+        if (handle.node().isInUpdated) return;
+        handle.node().isInUpdated = true;
+        handles_.push_back(HandlePtr(&handle));
+    }
+    void Clear();
+
+    template <typename F>
+    void ForEach(F&& visit) const {
+        for (const HandlePtr& handle : handles_)
+            visit(*handle);
+    }
+
+  private:
+    Vector<HandlePtr, MemoryTag::LayoutNodes> handles_;
+};
+
 }  // namespace qorvex::layout

@@ -177,6 +177,8 @@ struct LayoutNode {
     bool boxMetricsChanged : 1 = false;
     // What the element measures changed, and the next layout asks whether its size did.
     bool contentChanged : 1 = false;
+    // Of an UpdatedList.
+    bool isInUpdated : 1 = false;
 
     // Sticky and conservative: there is an absolute or fixed box below, whose containing block may lie above
     // this node. When it is set here, it is set on all ancestors.

@@ -31,6 +31,7 @@ void SyncTrees(LayoutUpdateData& update) {
         node.previousPositioned = node.flags.isPositioned;
         node.previousClip = node.flags.shouldOverflowClip;
     });
+    update.updated.Clear();
 }
 
 }  // namespace qorvex::layout

@@ -23,7 +23,7 @@ struct LayoutUpdateData : AtomicRefCounted<LayoutUpdateData, MemoryTag::LayoutDa
     HandleSet changed;
     // Handles to which layout gave a new box, transform, bounds or stacking place; SyncTrees copies these
     // back.
-    HandleSet updated;
+    UpdatedList updated;
     // What handles that left the tree covered.
     dsp::DirtyRegion vanished;
     // Display of <body>: selects the layout engine. Block when there is no body.

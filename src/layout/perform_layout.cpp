@@ -11,11 +11,13 @@
 #include "layout/flex_style.h"
 #include "layout/layout_store.h"
 #include "layout/node_flags.h"
+#include "layout/prefetch.h"
 #include "layout/simple_layout.h"
 
 #include <yoga/Yoga.h>
 
 #include <algorithm>
+#include <array>
 #include <functional>
 #include <utility>
 
@@ -54,12 +56,35 @@ void SyncAllStyles(LayoutPass& pass, FlexStyleContext& context) {
     }
 }
 
+// By the address, as far as neighbours go: two rounds of counting tell apart what lies within 256 MiB, and no
+// more is needed than that the next one lies near.
+void OrderByMemory(TempVector<LayoutHandle*>& handles) {
+    constexpr uint32_t kBits = 11, kLine = 6, kWorthCounting = 512;
+    if (handles.size() < kWorthCounting) return std::sort(handles.begin(), handles.end(), std::less<>());
+    TempVector<LayoutHandle*> sorted;
+    sorted.resize(handles.size());
+    for (const uint32_t shift : {kLine, kLine + kBits}) {
+        std::array<uint32_t, 1u << kBits> places{};
+        const auto digit = [shift](const LayoutHandle* handle) {
+            return reinterpret_cast<uintptr_t>(handle) >> shift & ((1u << kBits) - 1);
+        };
+        for (const LayoutHandle* handle : handles)
+            ++places[digit(handle)];
+        uint32_t before = 0;
+        for (uint32_t& place : places)
+            before += std::exchange(place, before);
+        for (LayoutHandle* handle : handles)
+            sorted[places[digit(handle)]++] = handle;
+        handles.swap(sorted);
+    }
+}
+
 // The changed handles in the order of memory, which is mostly that of the page: in the order of their set
 // each would lie far from the one before.
 void CollectChanged(const LayoutPass& pass, TempVector<LayoutHandle*>& changed) {
     changed.reserve(pass.update.changed.Size());
     pass.update.changed.ForEach([&](LayoutHandle& handle) { changed.push_back(&handle); });
-    std::sort(changed.begin(), changed.end(), std::less<>());
+    OrderByMemory(changed);
 }
 
 bool TakeContentChange(LayoutNode& node) {
@@ -83,7 +108,11 @@ bool SyncChangedStyles(LayoutPass& pass, FlexStyleContext& context) {
     const TempMark mark;
     TempVector<LayoutHandle*> changed, contents;
     CollectChanged(pass, changed);
-    for (LayoutHandle* handle : changed) {
+    const uint32_t count = changed.size();
+    for (uint32_t i = 0; i < count; ++i) {
+        LayoutHandle* handle = changed[i];
+        if (i + 2 * kNodesAhead < count) PrefetchNode(*changed[i + 2 * kNodesAhead]);
+        if (i + kNodesAhead < count) PrefetchStyle(*changed[i + kNodesAhead]);
         if (SyncStyleToYoga(*handle, context)) ++pass.update.counters.synced;
         dsp::InvalidateParagraphs(*handle);
         if (TakeContentChange(handle->node())) contents.push_back(handle);

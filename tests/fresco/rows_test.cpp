@@ -5,6 +5,7 @@
 
 #include <functional>
 #include <random>
+#include <vector>
 
 #include <fresco/paint.h>
 
@@ -99,6 +100,30 @@ TEST(RowLoops, BlendsAndScalesAreEqualInEveryWay) {
         l.Premultiply(r.dst, r.count);
     });
     ExpectEqualWays("SwapRedAndBlue", [](const RowLoops& l, Sample& r) { l.SwapRedAndBlue(r.dst, r.count); });
+}
+
+// Their loops go by the cache lines of both rows.
+TEST(RowLoops, LongRowsBlendEquallyWhereverTheyLie) {
+    for (unsigned place = 0; place < 16 * 16; ++place) {
+        const size_t to = place % 16, from = place / 16, count = 300 + place % 67;
+        Sample random(place);
+        std::vector<uint32_t> src(from + count), dst(to + count);
+        // Runs of equal kinds: whole registers are blank or opaque.
+        for (size_t i = 0; i < src.size(); ++i)
+            src[i] = i % 150 < 80 ? random.Pixel() : i % 150 < 115 ? 0 : random.Pixel() | 0xFF000000u;
+        for (uint32_t& p : dst)
+            p = random.Pixel();
+        for (const uint32_t alpha : {255u, 99u}) {
+            std::vector<uint32_t> expected = dst;
+            GetRowLoops(RowWay::Plain)->BlendRow(expected.data() + to, src.data() + from, int(count), alpha);
+            for (const RowWay way : {RowWay::Sse2, RowWay::Avx2, RowWay::Avx512}) {
+                if (!GetRowLoops(way)) continue;
+                std::vector<uint32_t> wide = dst;
+                GetRowLoops(way)->BlendRow(wide.data() + to, src.data() + from, int(count), alpha);
+                ASSERT_EQ(wide, expected) << "way " << int(way) << " place " << place << " alpha " << alpha;
+            }
+        }
+    }
 }
 
 TEST(RowLoops, SamplesAndGradientsAreEqualInEveryWay) {

@@ -1,5 +1,7 @@
 #include "layout/page_fixture.h"
 
+#include <random>
+
 namespace qorvex::test {
 namespace {
 
@@ -144,6 +146,44 @@ TEST_F(FlexLayoutTest, ResizingWritesEveryStyleAnew) {
     page.Frame();
     EXPECT_EQ(BoxOf(box), "0 0 60 20");
     EXPECT_EQ(BoxOf(fixed), "590 0 10 10");
+}
+
+// A style that another node of the pass has too is copied from there; one of its own is written.
+TEST_F(FlexLayoutTest, SharedStylesGiveTheSameBoxesAsOwnOnes) {
+    std::vector<css::LayoutStyleRefs> kinds;
+    for (const char* text :
+         {"padding: 1em; width: 30%", "display: flex; flex: 1; margin: 2px 3em; border: 3px solid red",
+          "position: absolute; right: 5px; bottom: 10%; width: 10px; height: 2em",
+          "position: fixed; left: 3px; right: 4px; top: 10%; height: 5vh", "display: none",
+          "position: relative; left: 2px; max-width: 5em; min-height: 7px; align-self: center",
+          "display: inline; padding: 1px 2px 3px 4px; width: 20px; height: 10px"})
+        kinds.push_back(Page::Style(text));
+    const css::LayoutStyleRefs texts[] = {Page::Style("font-size: 10px"),
+                                          Page::Style("font-size: 20px; text-align: right"),
+                                          Page::Style("font-size: 10px; text-align: center")};
+    Page pages[2];
+    std::vector<LayoutHandle*> nodes[2];
+    std::mt19937 random(7);
+    for (int i = 0; i < 60; ++i) {
+        const size_t parent = random() % (i + 1);
+        for (int k = 0; k < 2; ++k)
+            nodes[k].push_back(pages[k].Add(parent == 0 ? pages[k].body : nodes[k][parent - 1], ""));
+    }
+    for (int frame = 0; frame < 40; ++frame) {
+        for (size_t i = 0; i < nodes[0].size(); ++i) {
+            if (random() % 3 == 0) continue;
+            css::LayoutStyleRefs style = kinds[random() % kinds.size()];
+            style.text = texts[random() % std::size(texts)].text;
+            style.written.AddAll();
+            pages[0].Restore(nodes[0][i], style);
+            style.Mutable<css::LayoutStyle>();
+            pages[1].Restore(nodes[1][i], style);
+        }
+        pages[0].Frame();
+        pages[1].Frame();
+        for (size_t i = 0; i < nodes[0].size(); ++i)
+            ASSERT_EQ(BoxOf(nodes[0][i]), BoxOf(nodes[1][i])) << "frame " << frame << " node " << i;
+    }
 }
 
 TEST_F(FlexLayoutTest, TinyDifferencesAreNoChange) {

@@ -44,6 +44,20 @@ TEST_F(LayoutTreeTest, CommitCopiesOnlyChangedHandles) {
     EXPECT_TRUE(page.tree.Changed().Empty());
 }
 
+TEST_F(LayoutTreeTest, AFrameThatIsDroppedTakesNothingFromTheNext) {
+    Page page;
+    LayoutHandle* box = page.Add(page.body, "width: 10px; height: 10px");
+    page.Frame();
+    page.sync = false;
+    page.Change(box, "width: 20px");
+    page.Frame();
+    page.update.reset();
+    page.sync = true;
+    page.Change(box, "width: 30px");
+    page.Frame();
+    EXPECT_EQ(BoxOf(box), "0 0 30 10");
+}
+
 TEST_F(LayoutTreeTest, RemovingTakesTheSubtreeOutOnceAndDirtiesWhatItCovered) {
     FakeNode node;
     Page page;
