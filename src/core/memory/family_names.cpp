@@ -28,7 +28,7 @@ class FamilyNames {
         used_ += text.size() + 1;
         Name* name = names_.emplace_back(New<Name, MemoryTag::General>());
         name->entry = {copy, static_cast<uint32_t>(text.size())};
-        name->node = {nullptr, hash, &name->entry};
+        name->node = {nullptr, static_cast<uint32_t>(hash), 0, &name->entry};
         set_.Insert(&name->node);
         return copy;
     }
