@@ -71,7 +71,7 @@ class LayoutPage {
     LayoutHandle* Add(LayoutHandle& parent, const css::LayoutStyleRefs& style) {
         own_styles_.push_back(style);
         return tree_
-            .AddChild(parent, parent.data().children.size(),
+            .AddChild(parent, parent.data().Children().size(),
                       {own_styles_.back(), MakeRef<dsp::Box>(), nullptr, {}, false})
             .get();
     }
@@ -169,7 +169,7 @@ class YogaTree {
         YGNodeCopyStyle(node, handle.node().flex);
         nodes_.push_back(node);
         uint32_t index = 0;
-        for (const layout::HandlePtr& child : handle.node().children)
+        for (const layout::HandlePtr& child : handle.node().Children())
             YGNodeInsertChild(node, Copy(*child), index++);
         return node;
     }

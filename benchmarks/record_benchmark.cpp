@@ -95,7 +95,7 @@ class RecordPage {
         style.Mutable<css::LayoutStyle>().height = css::Extent::Pixels(side);
     }
     layout::HandlePtr Add(layout::LayoutHandle& parent, const css::LaidOutStyle& style) {
-        return tree_.AddChild(parent, parent.data().children.size(),
+        return tree_.AddChild(parent, parent.data().Children().size(),
                               {style, MakeRef<dsp::Box>(), nullptr, {}, false});
     }
     void Commit() {

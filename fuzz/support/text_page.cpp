@@ -92,7 +92,7 @@ layout::LayoutHandle* TextPage::Keep(layout::HandlePtr handle) {
 layout::LayoutHandle& TextPage::AddBox(dsp::DisplayElementPtr display) {
     css::LayoutStyleRefs& style = kept_styles_.emplace_back(css::DefaultStyles());
     Require(test::ApplyDeclarations(style, "width: 60px; max-height: 40px"), "a style of the target's own");
-    const auto index = static_cast<uint32_t>(body_->data().children.size());
+    const auto index = static_cast<uint32_t>(body_->data().Children().size());
     return *Keep(tree_.AddChild(*body_, index, {style, std::move(display), nullptr, {}, false}));
 }
 
@@ -103,9 +103,9 @@ void TextPage::Fill(layout::LayoutHandle& box, std::string_view text, std::strin
     group.typefaces = typefaces_[handles_.size() % 2];
     if (text.size() % 3 == 0) group.computedLetterSpacing = 1.5f;
     if (text.size() % 5 == 0) group.computedStrokeWidth = 1;
-    auto display = MakeRef<dsp::DisplayText>(nullptr, &TextServices());
+    auto display = MakeRef<dsp::DisplayText>(&TextServices());
     display->SetText(text);
-    const auto index = static_cast<uint32_t>(box.data().children.size());
+    const auto index = static_cast<uint32_t>(box.data().Children().size());
     Keep(tree_.AddChild(box, index, {style, std::move(display), nullptr, {}, false}));
 }
 
@@ -131,7 +131,7 @@ void TextPage::LayOut(layout::LayoutUpdateData& update) {
         Require(std::isfinite(box.left) && std::isfinite(box.top) && std::isfinite(box.width) &&
                     std::isfinite(box.height),
                 "a box whose sides are no numbers");
-        const dsp::IDisplayElement* display = handle->data().display.get();
+        const dsp::IDisplayElement* display = handle->Display();
         if (display->Has(dsp::IDisplayElement::kIsText))
             CheckText(static_cast<const dsp::DisplayText&>(*display), handle->data().style->text->whiteSpace);
     }

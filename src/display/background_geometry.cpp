@@ -139,7 +139,7 @@ void ResolveGradient(const Gradient& gradient, Size tile, const LengthContext& l
 
 void ResolveBackgrounds(const LayoutNode& node, const Rect& box, const LengthContext& lengths,
                         ResolvedVisuals& out) {
-    const css::VisualStyle& style = *node.style.visual;
+    const css::VisualStyle& style = *node.style->visual;
     const Rect local{0, 0, 0, box.width, box.height};
     const Rect area = layout::Inset(local, node.border());
     const bool hasSlots = node.display && node.display->Has(IDisplayElement::kPaintsBox);

@@ -67,11 +67,11 @@ void DrawImageLayer(const ImageSlot& slot, const ResolvedImageLayer& layer, cons
 void PaintPlainColor(const LayoutNode& node, bool snapToPixels, CommandBuffer& buffer) {
     const Rect box = PaintBox(node, snapToPixels);
     if (box.width * box.height > kMinArea)
-        buffer.FillRect(box, SolidPaint(ToFresco(node.style.visual->backgroundColor)));
+        buffer.FillRect(box, SolidPaint(ToFresco(node.style->visual->backgroundColor)));
 }
 
 void PaintBackgroundColor(const LayoutNode& node, const BoxShape& shape, CommandBuffer& buffer) {
-    const css::VisualStyle& visual = *node.style.visual;
+    const css::VisualStyle& visual = *node.style->visual;
     if (visual.backgroundColor.alpha <= 0) return;
     const Edges inset = HasBorderImage(visual) ? Edges{} : BleedInset(shape);
     const Rect rect = layout::Inset(shape.box, inset);
@@ -91,7 +91,7 @@ void PaintBackgroundColor(const LayoutNode& node, const BoxShape& shape, Command
 
 void PaintBackgroundImages(PaintContext& context, const LayoutNode& node, const BoxShape& shape,
                            const ImageSlots* slots, CommandBuffer& buffer) {
-    const css::VisualStyle& visual = *node.style.visual;
+    const css::VisualStyle& visual = *node.style->visual;
     if (visual.backgroundImage.empty() || !node.visuals || layout::IsEmpty(shape.box)) return;
     const auto& layers = node.visuals->backgrounds;
     bool clipped = false;

@@ -221,7 +221,7 @@ void DrawParts(const NineParts& parts, const css::VisualStyle& style, PartPainte
 
 void ResolveBorderImage(const LayoutNode& node, const Rect& box, const LengthContext& lengths,
                         ResolvedVisuals& out) {
-    const css::VisualStyle& style = *node.style.visual;
+    const css::VisualStyle& style = *node.style->visual;
     if (style.borderImageSource.kind <= css::ImageKind::Initial) return;
     out.borderImageOutset =
         ResolveSides(style.borderImageOutset.sides, node.border(), {}, {box.width, box.height}, lengths);
@@ -248,7 +248,7 @@ void ResolveBorderImage(const LayoutNode& node, const Rect& box, const LengthCon
 
 bool PaintBorderImage(PaintContext& context, const LayoutNode& node, const BoxShape& shape,
                       const ImageSlots* slots, CommandBuffer& buffer) {
-    const css::VisualStyle& style = *node.style.visual;
+    const css::VisualStyle& style = *node.style->visual;
     if (style.borderImageSource.kind <= css::ImageKind::Initial || !node.visuals ||
         node.visuals->borderImages.empty())
         return false;

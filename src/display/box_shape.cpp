@@ -18,9 +18,9 @@ using layout::Point;
 namespace {
 
 void ReadSides(const LayoutNode& node, BoxShape& shape) {
-    const css::LayoutStyle& style = *node.style.layout;
-    const css::VisualStyle& visual = *node.style.visual;
-    const css::Color& current = node.style.text->color;
+    const css::LayoutStyle& style = *node.style->layout;
+    const css::VisualStyle& visual = *node.style->visual;
+    const css::Color& current = node.style->text->color;
     struct Side {
         float width;
         BorderStyleType type;

@@ -173,7 +173,7 @@ bool ClipSvgPath(const css::PathShape& shape, const Rect& in, PaintContext& cont
 }  // namespace
 
 bool ApplyClipPath(const LayoutNode& node, PaintContext& context, CommandBuffer& buffer) {
-    const css::ClipPathType& clip = node.style.visual->clipPath;
+    const css::ClipPathType& clip = node.style->visual->clipPath;
     if (clip.IsNone()) return true;
     const Rect in = ReferenceBox(node, clip, context.snapToPixels);
     if (!clip.shape) {

@@ -8,6 +8,7 @@
 #include "core/memory/ref_counted.h"
 #include "layout/geometry.h"
 
+#include <atomic>
 #include <cstdint>
 
 namespace fresco {
@@ -25,8 +26,9 @@ class PaintContext;
 
 enum class MeasureMode : uint8_t { Undefined, Exactly, AtMost };
 
-class IDisplayElement : public AtomicRefCounted<IDisplayElement, MemoryTag::Rendering> {
+class IDisplayElement {
   public:
+    static constexpr MemoryTag kMemoryTag = MemoryTag::Rendering;
     enum Flag : uint32_t {
         kPaintsBox = 1u << 0,  // paints backgrounds and borders
         kMeasures = 1u << 1,   // its size comes from Measure; it is a leaf of the box layout
@@ -43,11 +45,11 @@ class IDisplayElement : public AtomicRefCounted<IDisplayElement, MemoryTag::Rend
     uint32_t Flags() const { return flags_; }
     bool Has(Flag flag) const { return (flags_ & flag) != 0; }
 
-    // How far the painted content reaches beyond the box, in pixels: overhanging glyphs.
-    float InkOverflow() const { return inkOverflow_; }
-    // What the content takes from the box's corner: words that do not break may be longer than the box. Zero
-    // for content that keeps to its box.
-    layout::Size ContentSize() const { return contentSize_; }
+    void AddRef() const { count_.fetch_add(1, std::memory_order_relaxed); }
+    void Release() const {
+        if (count_.fetch_sub(1, std::memory_order_acq_rel) == 1)
+            const_cast<IDisplayElement*>(this)->Dispose();
+    }
 
     virtual ~IDisplayElement() = default;
     // Records the element's own commands, without its children.
@@ -66,16 +68,13 @@ class IDisplayElement : public AtomicRefCounted<IDisplayElement, MemoryTag::Rend
 
   protected:
     explicit IDisplayElement(uint32_t flags) : flags_(flags) {}
-    void SetInk(float overflow, layout::Size content) {
-        inkOverflow_ = overflow;
-        contentSize_ = content;
-    }
+    // Nobody holds the element any more.
+    virtual void Dispose() { Delete<kMemoryTag>(this); }
     void SetFlag(Flag flag, bool on) { flags_ = on ? flags_ | flag : flags_ & ~flag; }
 
   private:
+    mutable std::atomic<uint32_t> count_{1};
     uint32_t flags_;
-    float inkOverflow_ = 0;
-    layout::Size contentSize_;
 };
 
 using DisplayElementPtr = qsl::RefPtr<IDisplayElement>;

@@ -22,7 +22,7 @@ uint64_t TextBelow(const layout::LayoutHandle& paragraph) {
         const layout::LayoutNode& node = stack.back()->node();
         stack.pop_back();
         if (node.display) bytes += node.display->TextLength();
-        for (const layout::HandlePtr& child : node.children)
+        for (const layout::HandlePtr& child : node.Children())
             stack.push_back(child.get());
     }
     return bytes;
@@ -44,7 +44,7 @@ bool SameExtent(float a, float b) {
 
 void DisplayParagraph::FlowFor(layout::LayoutHandle& handle, float width, float height) {
     using css::FontFitModeType;
-    const css::TextLayoutStyle& style = *handle.node().style.text;
+    const css::TextLayoutStyle& style = *handle.node().style->text;
     const FontFitModeType mode = style.fontFitMode;
     const bool fit = mode != FontFitModeType::None && (!std::isnan(width) || !std::isnan(height)) &&
                      style.computedFontSize > 0;
@@ -73,8 +73,7 @@ void DisplayParagraph::Measure(layout::LayoutHandle& handle, float availableWidt
 
 void DisplayParagraph::PlaceContent(layout::LayoutHandle& handle, layout::LayoutPass& pass) {
     const layout::LayoutNode& node = handle.node();
-    const layout::Rect content =
-        layout::Inset(layout::Inset(node.box, node.edges.border()), node.edges.padding());
+    const layout::Rect content = layout::Inset(layout::Inset(node.box, node.border()), node.padding());
     // Lines that were not broken at an unknown width are right for the box that was made of them.
     const bool measured = !stale_ && std::isnan(width_) && content.width >= std::ceil(size_.width);
     if (!measured) FlowFor(handle, content.width, content.height);

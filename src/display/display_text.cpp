@@ -31,18 +31,35 @@ void DisplayText::DestroyIterator::operator()(i18n::IBreakIterator* iterator) co
     iterator->Destroy();
 }
 
-DisplayText::DisplayText(layout::NodeLinkPtr link, IInternationalizationManager* i18n)
-    : IDisplayElement(kMeasures | kIsText), link_(std::move(link)) {
-    if (i18n != nullptr) iterator_.reset(i18n->CreateBreakIterator(i18n::BreakIteratorBoundary::Line));
+DisplayText::DisplayText(IInternationalizationManager* i18n) : IDisplayElement(kMeasures | kIsText) {
+    if (i18n == nullptr) return;
+    i18n::IBreakIterator* iterator = i18n->CreateBreakIterator(i18n::BreakIteratorBoundary::Line);
+    if (iterator != nullptr) EnsureLines().iterator.reset(iterator);
 }
 
 DisplayText::~DisplayText() = default;
 
+DisplayText::Lines& DisplayText::EnsureLines() {
+    if (!lines_) lines_ = MakeUnique<Lines, MemoryTag::LayoutData>();
+    return *lines_;
+}
+
+float DisplayText::InkOverflow() const {
+    const layout::TextInfo* info = Info();
+    return info ? std::ceil(info->usedSize * kOverhang) : 0;
+}
+
+layout::Size DisplayText::ContentSize() const {
+    const layout::TextInfo* info = Info();
+    return info ? layout::Size{std::ceil(info->width), std::ceil(info->height)} : layout::Size();
+}
+
 void DisplayText::SetText(std::string_view text) {
     if (text == text_.view()) return;
-    if (iterator_) iterator_->ClearText();
+    i18n::IBreakIterator* iterator = Iterator();
+    if (iterator) iterator->ClearText();
     text_ = text;
-    if (iterator_) iterator_->SetText(text_.data(), static_cast<unsigned>(text_.size()));
+    if (iterator) iterator->SetText(text_.data(), static_cast<unsigned>(text_.size()));
     if (lines_) lines_->valid = false;
 }
 
@@ -86,11 +103,10 @@ bool DisplayText::EnsureLayout(const layout::TextServices& services, const Param
                                const uint8_t* levels) {
     if (services.fonts == nullptr) return false;
     if (Holds(wanted)) return true;
-    if (!lines_) lines_ = MakeUnique<Lines, MemoryTag::LayoutData>();
-    layout::TextInfo& info = lines_->info;
+    layout::TextInfo& info = EnsureLines().info;
     const layout::TextStyle style = MakeStyle(wanted);
     lines_->valid =
-        LayoutText({text_.view(), style, wanted.width, wanted.height, *services.fonts, iterator_.get(),
+        LayoutText({text_.view(), style, wanted.width, wanted.height, *services.fonts, Iterator(),
                     services.i18n, wanted.firstLineOffset, true, wanted.inFlow, wanted.base, levels},
                    info);
     if (!lines_->valid) {
@@ -100,7 +116,6 @@ bool DisplayText::EnsureLayout(const layout::TextServices& services, const Param
     }
     lines_->parameters = wanted;
     lines_->unpublished = true;
-    SetInk(std::ceil(info.usedSize * kOverhang), {std::ceil(info.width), std::ceil(info.height)});
     return true;
 }
 
@@ -118,7 +133,7 @@ layout::Size DisplayText::MeasureFor(layout::LayoutHandle& handle, float availab
         lines_->placed.clear();
         lines_->arranged.reset();
     }
-    const auto& style = handle.node().style.text;
+    const auto& style = handle.node().style->text;
     if (!style) return {};
     const layout::TextServices& services = handle.store().text;
     if (!EnsureLayout(services, {style, style->computedFontSize, availableWidth, availableHeight, 0, false,
@@ -155,7 +170,7 @@ bool DisplayText::KeepsSize(layout::LayoutHandle& handle) {
 
 const layout::TextInfo* DisplayText::LayoutInline(layout::LayoutHandle& handle,
                                                   const InlineTextRequest& request) {
-    const auto& style = handle.node().style.text;
+    const auto& style = handle.node().style->text;
     if (!style) return nullptr;
     const layout::TextServices& services = handle.store().text;
     const std::span<const uint8_t> levels = request.levels;
@@ -204,7 +219,9 @@ void DisplayText::GrowLastLine(float amount) {
 }
 
 void DisplayText::Publish(PaintContext& context) {
-    if (!lines_->unpublished || !link_ || context.family == nullptr) return;
+    if (!lines_->unpublished || context.family == nullptr) return;
+    const layout::NodeLinkPtr link = GetLink();
+    if (!link) return;
     lines_->unpublished = false;
     const layout::TextInfo& info = lines_->info;
     const css::TextLayoutStyle& group = *lines_->parameters.style;
@@ -220,12 +237,12 @@ void DisplayText::Publish(PaintContext& context) {
     using layout::DOMTaskKind;
     if (!lines_->publishedStyle || !lines_->publishedStyle->Same(*style)) {
         lines_->publishedStyle = style;
-        SendToDOM(*context.family, DOMTaskKind::UpdateFontStyleDataInDOM, link_, std::move(style),
+        SendToDOM(*context.family, DOMTaskKind::UpdateFontStyleDataInDOM, link, std::move(style),
                   layout::Delivery::ThroughChannel);
     }
     auto positions = MakeRef<layout::TextPositions>();
     ComputeTextPositions(lines_->Shown(), text_.view(), group.whiteSpace, lines_->Placements(), *positions);
-    SendToDOM(*context.family, DOMTaskKind::UpdateTextPositionsInDOM, link_, std::move(positions),
+    SendToDOM(*context.family, DOMTaskKind::UpdateTextPositionsInDOM, link, std::move(positions),
               layout::Delivery::ThroughChannel);
 }
 

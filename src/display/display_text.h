@@ -32,19 +32,28 @@ struct InlineTextRequest {
     std::span<const uint8_t> levels;  // of each byte of the text; empty: nothing in the flow runs backward
 };
 
-class DisplayText final : public IDisplayElement {
+class DisplayText : public IDisplayElement {
   public:
-    // The link (may be null) is told where the characters stand. The manager may be null.
-    explicit DisplayText(layout::NodeLinkPtr link = nullptr, IInternationalizationManager* i18n = nullptr);
+    // The manager may be null.
+    explicit DisplayText(IInternationalizationManager* i18n = nullptr);
     ~DisplayText() override;
 
     // Already transformed (text-transform) UTF-8. On the layout thread, or at the commit.
     void SetText(std::string_view text);
     std::string_view Text() const { return text_.view(); }
     // Of the last layout; null before the first one.
-    const layout::TextInfo* Info() const { return lines_ ? &lines_->info : nullptr; }
+    const layout::TextInfo* Info() const {
+        return lines_ && lines_->parameters.style ? &lines_->info : nullptr;
+    }
     // The same as it is painted, after PlaceLines.
-    const layout::TextInfo* ShownInfo() const { return lines_ ? &lines_->Shown() : nullptr; }
+    const layout::TextInfo* ShownInfo() const {
+        return lines_ && lines_->parameters.style ? &lines_->Shown() : nullptr;
+    }
+
+    // How far the painted content reaches beyond the box, in pixels: overhanging glyphs.
+    float InkOverflow() const;
+    // What the content takes from the box's corner: words that do not break may be longer than the box.
+    layout::Size ContentSize() const;
 
     void Paint(PaintContext& context, bool dirty, const layout::LayoutNode& node,
                fresco::CommandBuffer& buffer) override;
@@ -80,7 +89,10 @@ class DisplayText final : public IDisplayElement {
         float height;
         layout::Size size;
     };
-    // Made by the first layout: a text that is not shown has none of it.
+    struct DestroyIterator {
+        void operator()(i18n::IBreakIterator* iterator) const;
+    };
+    // Made by the first layout, or for the iterator: a text that is not shown has none of it.
     struct Lines {
         layout::TextInfo info;
         Parameters parameters;
@@ -95,14 +107,17 @@ class DisplayText final : public IDisplayElement {
         // info with wider gaps or runs in other places, where the flow justifies lines or orders their parts.
         UniquePtr<layout::TextInfo, MemoryTag::LayoutData> arranged;
         qsl::RefPtr<layout::TextFontStyle> publishedStyle;
+        std::unique_ptr<i18n::IBreakIterator, DestroyIterator> iterator;
 
         // The lines as they are painted.
         const layout::TextInfo& Shown() const { return arranged ? *arranged : info; }
         const layout::LinePlacement* Placements() const { return placed.empty() ? nullptr : placed.data(); }
     };
-    struct DestroyIterator {
-        void operator()(i18n::IBreakIterator* iterator) const;
-    };
+
+    // Who is told where the characters stand.
+    virtual layout::NodeLinkPtr GetLink() { return nullptr; }
+    Lines& EnsureLines();
+    i18n::IBreakIterator* Iterator() const { return lines_ ? lines_->iterator.get() : nullptr; }
 
     static layout::TextStyle MakeStyle(const Parameters& parameters);
     // Lays out when the style, the text or the available box differ from those of the stored lines. False
@@ -118,8 +133,7 @@ class DisplayText final : public IDisplayElement {
 
     TaggedString<MemoryTag::Rendering> text_;
     UniquePtr<Lines, MemoryTag::LayoutData> lines_;
-    layout::NodeLinkPtr link_;
-    std::unique_ptr<i18n::IBreakIterator, DestroyIterator> iterator_;
 };
+static_assert(sizeof(DisplayText) == 48);
 
 }  // namespace qorvex::dsp

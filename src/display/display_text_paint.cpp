@@ -117,8 +117,8 @@ bool IsMirrored(const layout::Matrix& world) {
 void DisplayText::PaintShadows(PaintContext& context, const layout::LayoutNode& node, layout::Point corner,
                                fresco::CommandBuffer& buffer) const {
     if (!node.visuals || node.visuals->textShadows.empty()) return;
-    const css::TextLayoutStyle& style = *node.style.text;
-    const auto& items = node.style.visual->textShadow.items;
+    const css::TextLayoutStyle& style = *node.style->text;
+    const auto& items = node.style->visual->textShadow.items;
     bool reported = false;
     for (size_t i = node.visuals->textShadows.size(); i-- > 0;) {
         const ResolvedShadow& shadow = node.visuals->textShadows[i];
@@ -150,15 +150,15 @@ void DisplayText::Paint(PaintContext& context, bool, const layout::LayoutNode& n
         AssertFailure("Trying to display text with invalid size.");
         return;
     }
-    const css::TextLayoutStyle& style = *node.style.text;
+    const css::TextLayoutStyle& style = *node.style->text;
     if (lines_ && !lines_->placed.empty()) {
         if (!lines_->valid) return;
     } else {
         // The box may have become another one than the last measure was asked about.
         if (node.parent == nullptr) return;
         const layout::TextServices& services = node.parent->store().text;
-        if (!EnsureLayout(services, {node.style.text, style.computedFontSize, node.box.width, node.box.height,
-                                     0, false, services.complexText}))
+        if (!EnsureLayout(services, {node.style->text, style.computedFontSize, node.box.width,
+                                     node.box.height, 0, false, services.complexText}))
             return;
     }
 
@@ -176,7 +176,7 @@ void DisplayText::Paint(PaintContext& context, bool, const layout::LayoutNode& n
         ForEachRun(lines_->Shown(), lines_->Placements(), {box.x, box.y}, params,
                    [&](const ShownRun& run) { buffer.StrokeGlyphs(run.glyphs, run.count, run.params); });
     }
-    if (node.style.visual->userSelect != css::UserSelect::None) Publish(context);
+    if (node.style->visual->userSelect != css::UserSelect::None) Publish(context);
 }
 
 }  // namespace qorvex::dsp

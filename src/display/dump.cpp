@@ -16,7 +16,7 @@ void AppendLine(DumpText& out, uint32_t depth, const LayoutNode& node, bool with
     char line[256];
     const int length =
         std::snprintf(line, sizeof(line), "%*s%s (%g, %g) %gx%g%s%s%s", static_cast<int>(depth * 2), "",
-                      css::KeywordText(node.style.layout->display).data(), node.box.x, node.box.y,
+                      css::KeywordText(node.style->layout->display).data(), node.box.x, node.box.y,
                       node.box.width, node.box.height, node.flags.measuredByDisplayElement ? " measured" : "",
                       node.flags.isFixed        ? " fixed"
                       : node.flags.isAbsolute   ? " absolute"
@@ -25,7 +25,7 @@ void AppendLine(DumpText& out, uint32_t depth, const LayoutNode& node, bool with
                       node.flags.shouldOverflowClip ? " clip" : "");
     out.append(std::string_view(line, static_cast<size_t>(std::min<int>(length, sizeof(line) - 1))));
     if (node.establishesStackingContext) {
-        const int extra = withZ ? std::snprintf(line, sizeof(line), " context z=%d", node.zIndex)
+        const int extra = withZ ? std::snprintf(line, sizeof(line), " context z=%d", node.ZIndex())
                                 : std::snprintf(line, sizeof(line), " context");
         out.append(std::string_view(line, static_cast<size_t>(extra)));
     }
@@ -48,8 +48,9 @@ DumpText DumpLayoutTree(const LayoutHandle& root) {
         const Pending at = stack.back();
         stack.pop_back();
         AppendLine(out, at.depth, *at.node, true);
-        for (uint32_t i = at.node->children.size(); i-- > 0;)
-            stack.push_back({&at.node->children[i]->node(), at.depth + 1});
+        const layout::HandleSpan children = at.node->Children();
+        for (size_t i = children.size(); i-- > 0;)
+            stack.push_back({&children[i]->node(), at.depth + 1});
     }
     return out;
 }

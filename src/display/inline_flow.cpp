@@ -33,7 +33,7 @@ bool IsText(const LayoutNode& node) {
 
 // Its content flows with the lines around it; without content it is a box like others.
 bool IsInline(const LayoutNode& node) {
-    return node.style.layout->display == css::CSSDisplay::Inline && !node.children.empty() &&
+    return node.style->layout->display == css::CSSDisplay::Inline && !node.Children().empty() &&
            !node.flags.measuredByDisplayElement && !node.flags.isReplaced;
 }
 
@@ -59,7 +59,7 @@ struct OuterEdges {
 }  // namespace
 
 InlineContent ContentOf(const LayoutNode& node) {
-    if (node.style.layout->display == css::CSSDisplay::None) return InlineContent::None;
+    if (node.style->layout->display == css::CSSDisplay::None) return InlineContent::None;
     const bool hasBox = node.flex != nullptr;  // none beyond the depth limit
     if (node.flags.isAbsolute || node.flags.isFixed)
         return hasBox ? InlineContent::OutOfFlow : InlineContent::None;
@@ -95,7 +95,7 @@ Size InlineFlow::Flow(LayoutHandle& paragraph, float width, float scale) {
 
 void InlineFlow::Walk(LayoutHandle& parent, Cursor& cursor, uint32_t depth) {
     if (depth >= limits::kMaxLayoutDepth) return;
-    for (const layout::HandlePtr& child : parent.node().children) {
+    for (const layout::HandlePtr& child : parent.node().Children()) {
         switch (ContentOf(child->node())) {
             case InlineContent::None:
                 break;
@@ -338,7 +338,7 @@ void InlineFlow::PlaceInline(LayoutPass& pass, const Item& item, Point origin) {
     LayoutNode& node = item.handle->node();
     const layout::OldBox old(node);
     const OuterEdges edges(node);
-    node.edges.Set({edges.border, edges.padding, edges.margin}, item.handle->store().recentEdges);
+    node.AsBox().edges.Set({edges.border, edges.padding, edges.margin}, item.handle->store().recentEdges);
     const Rect content = Around(item.firstPiece, item.endPiece, origin);
     const layout::Edges around{edges.border.left + edges.padding.left,
                                edges.border.right + edges.padding.right, edges.border.top + edges.padding.top,
@@ -349,7 +349,7 @@ void InlineFlow::PlaceInline(LayoutPass& pass, const Item& item, Point origin) {
 }
 
 void InlineFlow::Place(LayoutPass& pass, LayoutHandle& paragraph, Point origin, float width) {
-    AlignLines(paragraph.node().style.text->textAlign, width);
+    AlignLines(paragraph.node().style->text->textAlign, width);
     for (const Item& item : items_) {
         switch (item.kind) {
             case Kind::Text:

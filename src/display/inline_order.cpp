@@ -26,7 +26,7 @@ struct ParagraphText {
 // In the order of InlineFlow::Walk.
 void CollectText(const LayoutHandle& parent, uint32_t depth, ParagraphText& out) {
     if (depth >= limits::kMaxLayoutDepth) return;
-    for (const layout::HandlePtr& child : parent.node().children) {
+    for (const layout::HandlePtr& child : parent.node().Children()) {
         const layout::LayoutNode& node = child->node();
         const InlineContent content = ContentOf(node);
         if (content == InlineContent::Inline) CollectText(*child, depth + 1, out);

@@ -59,7 +59,7 @@ FilterRecord ToRecord(const css::FilterFunction& filter, const LayoutNode& node,
             break;
         case css::FilterKind::DropShadow: {
             const css::ShadowItem& shadow = filter.shadow;
-            const css::Color color = shadow.color.Resolve(node.style.text->color);
+            const css::Color color = shadow.color.Resolve(node.style->text->color);
             SetValues(record, fresco::FilterKind::DropShadow,
                       {ResolveLength(shadow.offsetX, lengths), ResolveLength(shadow.offsetY, lengths),
                        pixels(shadow.blur), color.red, color.green, color.blue, color.alpha});
@@ -92,7 +92,7 @@ struct EffectList {
 };
 
 void CollectEffects(const LayoutNode& node, PaintContext& context, EffectList& list) {
-    const VisualStyle& style = *node.style.visual;
+    const VisualStyle& style = *node.style->visual;
     fresco::IEffectFactory& factory = *fresco::GetEffectFactory();
     if (!style.filter.empty()) {
         const TempMark mark;
@@ -115,12 +115,12 @@ void CollectEffects(const LayoutNode& node, PaintContext& context, EffectList& l
 }
 
 void AnnotateLayer(const LayoutNode& node, PaintContext& context, CommandBuffer& buffer) {
-    const VisualStyle& style = *node.style.visual;
+    const VisualStyle& style = *node.style->visual;
     buffer.Annotate(fresco::kAnnotateBaseTransform, node.world.Get().m);
     if (!style.compositionId.empty()) {
         buffer.Annotate(fresco::kAnnotateCompositionId, style.compositionId.value.c_str());
         buffer.Annotate(fresco::kAnnotateWorldMatrix, node.world.Get().m);
-        buffer.Annotate(fresco::kAnnotateAABB, &node.aabb);
+        buffer.Annotate(fresco::kAnnotateAABB, &node.AsBox().aabb);
     }
     if (layout::Near(context.scaleX, 1) && layout::Near(context.scaleY, 1)) return;
     if (layout::Near(context.scaleX, 0) || layout::Near(context.scaleY, 0)) {
@@ -135,7 +135,7 @@ void AnnotateLayer(const LayoutNode& node, PaintContext& context, CommandBuffer&
 }  // namespace
 
 bool NeedsLayer(const LayoutNode& node) {
-    const VisualStyle& style = *node.style.visual;
+    const VisualStyle& style = *node.style->visual;
     return style.opacity.value < 1 || !style.filter.empty() ||
            // A mask erases what it is applied to, so it must never meet the parent's pixels.
            style.maskImage.kind > css::ImageKind::Initial ||
@@ -145,7 +145,7 @@ bool NeedsLayer(const LayoutNode& node) {
 }
 
 CommandBuffer* OpenLayer(const LayoutNode& node, PaintContext& context, CommandBuffer* buffer) {
-    const fresco::LayerPaint paint = fresco::MakeLayerPaint(node.style.visual->opacity.value);
+    const fresco::LayerPaint paint = fresco::MakeLayerPaint(node.style->visual->opacity.value);
     EffectList effects;
     CollectEffects(node, context, effects);
     CommandBuffer* layer = effects.count == 0 ? buffer->BeginLayer(fresco::kLayerContent, paint)
@@ -156,7 +156,8 @@ CommandBuffer* OpenLayer(const LayoutNode& node, PaintContext& context, CommandB
 }
 
 CommandBuffer* CloseLayer(const LayoutNode& node, CommandBuffer* buffer) {
-    if (!node.style.visual->compositionId.empty()) buffer->Annotate(fresco::kAnnotateEndComposition, nullptr);
+    if (!node.style->visual->compositionId.empty())
+        buffer->Annotate(fresco::kAnnotateEndComposition, nullptr);
     return buffer->EndLayerTransformed(nullptr);
 }
 

@@ -111,9 +111,11 @@ Matrix TransformMatrix(const css::Transform& transform, const Rect& box, const L
 }
 
 bool UpdateLocalMatrices(LayoutNode& node, const Rect& box, const LengthContext& lengths) {
-    const css::TransformStyle& style = *node.style.transform;
+    if (!node.isBox) return false;
+    layout::BoxNode& own = node.AsBox();
+    const css::TransformStyle& style = *node.style->transform;
     const bool hasPerspective = style.perspective.kind == css::PerspectiveKind::Length;
-    if (style.transform.empty() && !hasPerspective && !node.local && !node.perspective) return false;
+    if (style.transform.empty() && !hasPerspective && !own.local && !own.perspective) return false;
 
     Matrix local;
     if (!style.transform.empty()) {
@@ -126,19 +128,19 @@ bool UpdateLocalMatrices(LayoutNode& node, const Rect& box, const LengthContext&
     const float distance = hasPerspective ? ResolveLength(style.perspective.length, lengths) : 0;
     const bool projects = distance > 0;
     const Matrix perspective = projects ? PerspectiveMatrix(style, box, lengths, distance) : Matrix();
-    const bool localChanged = Store(node.local, !style.transform.empty(), local);
-    const bool perspectiveChanged = Store(node.perspective, projects, perspective);
+    const bool localChanged = Store(own.local, !style.transform.empty(), local);
+    const bool perspectiveChanged = Store(own.perspective, projects, perspective);
     return localChanged || perspectiveChanged;
 }
 
 void UpdateStacking(LayoutNode& node) {
-    const css::VisualStyle& visual = *node.style.visual;
-    const css::TransformStyle& transform = *node.style.transform;
+    const css::VisualStyle& visual = *node.style->visual;
+    const css::TransformStyle& transform = *node.style->transform;
     const bool flexItem =
-        node.parent != nullptr && node.parent->node().style.layout->display == css::CSSDisplay::Flex;
+        node.parent != nullptr && node.parent->node().style->layout->display == css::CSSDisplay::Flex;
     const bool hasZIndex =
         transform.zIndex.kind == css::ZIndexKind::Value && (node.flags.isPositioned || flexItem);
-    node.zIndex = hasZIndex ? transform.zIndex.value : 0;
+    if (node.isBox) node.AsBox().zIndex = hasZIndex ? transform.zIndex.value : 0;
     node.establishesStackingContext =
         hasZIndex || !transform.transform.empty() ||
         transform.perspective.kind != css::PerspectiveKind::None || visual.opacity.value < 1 ||

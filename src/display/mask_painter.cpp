@@ -21,7 +21,7 @@ ImageSlots* SlotsOf(const LayoutNode& node) {
 
 // Outside of this box nothing of the content stays.
 Rect MaskClipBox(const LayoutNode& node, const Rect& box) {
-    switch (node.style.visual->maskClip) {
+    switch (node.style->visual->maskClip) {
         case css::MaskClipType::ContentBox:
             return layout::Inset(layout::Inset(box, node.border()), node.padding());
         case css::MaskClipType::PaddingBox:
@@ -38,7 +38,7 @@ void ApplyGradientMask(const LayoutNode& node, PaintContext& context, const Reso
         buffer.BeginLayer(fresco::kLayerContent, fresco::MakeLayerPaint(1, fresco::kBlendDestinationIn));
     mask->PushState(fresco::kStateClip);
     mask->ClipRect(clip, fresco::kClipIntersect);
-    PaintGradientLayer(context, *node.style.visual->maskImage.gradient, layer, {box.x, box.y}, clip, *mask);
+    PaintGradientLayer(context, *node.style->visual->maskImage.gradient, layer, {box.x, box.y}, clip, *mask);
     mask->PopState();
     mask->EndLayer();
 }
@@ -46,7 +46,7 @@ void ApplyGradientMask(const LayoutNode& node, PaintContext& context, const Reso
 }  // namespace
 
 MaskState PrepareMask(const LayoutNode& node) {
-    const css::ImageValue& image = node.style.visual->maskImage;
+    const css::ImageValue& image = node.style->visual->maskImage;
     if (image.kind <= css::ImageKind::Initial) return MaskState::None;
     if (image.gradient) return MaskState::Ready;
     const ImageSlots* slots = SlotsOf(node);
@@ -60,7 +60,7 @@ void ApplyMask(const LayoutNode& node, PaintContext& context, CommandBuffer& buf
     const ResolvedImageLayer& layer = node.visuals->masks[0];
     const Rect box = PaintBox(node, context.snapToPixels);
     Rect area = MaskClipBox(node, box);
-    if (node.style.visual->maskImage.gradient) {
+    if (node.style->visual->maskImage.gradient) {
         ApplyGradientMask(node, context, layer, box, area, buffer);
         return;
     }

@@ -11,7 +11,7 @@ namespace {
 
 // Dotted and dashed sides take room but paint nothing.
 bool HasBorder(const LayoutNode& node) {
-    const css::LayoutStyle& style = *node.style.layout;
+    const css::LayoutStyle& style = *node.style->layout;
     const layout::Edges& border = node.border();
     auto draws = [](css::BorderStyleType type, float width) {
         return type == css::BorderStyleType::Solid && width > layout::kLengthTolerance;
@@ -24,7 +24,7 @@ bool HasBorder(const LayoutNode& node) {
 
 uint8_t FindOwnPaint(const LayoutNode& node) {
     using namespace layout;
-    const css::VisualStyle& visual = *node.style.visual;
+    const css::VisualStyle& visual = *node.style->visual;
     if (!node.display || visual.visibility != css::Visibility::Visible) return 0;
     if (!node.display->Has(IDisplayElement::kPaintsBox)) return kPaintsContent;
     uint32_t own = node.display->Has(IDisplayElement::kPaintsContent) ? kPaintsContent : 0;

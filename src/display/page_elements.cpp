@@ -10,7 +10,7 @@ namespace qorvex::dsp {
 // The root's background covers the canvas, not its box (CSS Backgrounds 3, section 2.11.1).
 void DisplayHTML::Paint(PaintContext& context, bool, const layout::LayoutNode& node,
                         fresco::CommandBuffer& buffer) {
-    const css::Color& color = node.style.visual->backgroundColor;
+    const css::Color& color = node.style->visual->backgroundColor;
     if (color.alpha <= 0) return;
     buffer.FillRect({0, 0, 0, context.viewSize.width, context.viewSize.height}, SolidPaint(ToFresco(color)));
 }
@@ -20,7 +20,7 @@ bool FillsCanvas(const layout::LayoutNode& root) {
     if (!root.display || root.display->Has(IDisplayElement::kPaintsBox) ||
         root.display->Has(IDisplayElement::kMeasures))
         return false;
-    const css::VisualStyle& visual = *root.style.visual;
+    const css::VisualStyle& visual = *root.style->visual;
     return visual.visibility == css::Visibility::Visible && visual.backgroundColor.alpha >= 1;
 }
 

@@ -52,10 +52,10 @@ class Collector {
         const bool positioned = node.flags.isPositioned || node.establishesStackingContext;
         const uint32_t own = positioned ? order_ : layer;
         const bool unit = PaintsAsUnit(node);
-        const bool run = runs_ && !unit && !node.children.empty() && PaintsInTreeOrder(node);
+        const bool run = runs_ && !unit && !node.Children().empty() && PaintsInTreeOrder(node);
         // What has no transform lies in the plane of the context.
-        const int32_t depth = !inSpace_ ? 0 : node.local ? DepthOf(node) : planeDepth_;
-        out_.push_back({&node, node.establishesStackingContext ? node.zIndex : 0, own, order_, depth, run});
+        const int32_t depth = !inSpace_ ? 0 : node.Local() ? DepthOf(node) : planeDepth_;
+        out_.push_back({&node, node.establishesStackingContext ? node.ZIndex() : 0, own, order_, depth, run});
         if (!unit && !run) Walk(node, own);
     }
 

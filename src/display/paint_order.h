@@ -57,24 +57,27 @@ inline bool TouchesAny(std::span<const layout::Rect> areas, const layout::Rect& 
 
 // Is there nothing below but in-flow content, up to the contexts' and clips' own?
 inline bool PaintsInTreeOrder(const layout::LayoutNode& node) {
-    return !node.below || !node.below->sum.layered;
+    return !node.layeredBelow;
 }
 
 // Calls visit(child) for the children that may touch the areas.
 template <typename Visit>
 void ForEachChild(const layout::LayoutNode& parent, std::span<const layout::Rect> areas, Visit&& visit) {
-    const uint32_t count = parent.children.size();
+    const layout::HandleSpan children = parent.Children();
+    const auto count = static_cast<uint32_t>(children.size());
     for (uint32_t i = 0; i < std::min(count, layout::kNodesAhead); ++i)
-        layout::PrefetchPaint(*parent.children[i]);
+        layout::PrefetchPaint(*children[i]);
     const auto visitChild = [&](uint32_t i) {
-        if (i + layout::kNodesAhead < count) layout::PrefetchPaint(*parent.children[i + layout::kNodesAhead]);
-        visit(parent.children[i]->node());
+        if (i + layout::kNodesAhead < count) layout::PrefetchPaint(*children[i + layout::kNodesAhead]);
+        visit(children[i]->node());
     };
-    if (parent.below && count > layout::ChildGroups::kFanout && parent.below->groups &&
-        parent.below->groups->Fit(count)) {
-        parent.below->groups->Walk([&](const layout::ChildSum& sum) { return TouchesAny(areas, sum.visual); },
-                                   visitChild);
-        return;
+    if (count > layout::ChildGroups::kFanout) {
+        const auto& below = parent.AsBox().below;
+        if (below && below->groups && below->groups->Fit(count)) {
+            below->groups->Walk([&](const layout::ChildSum& sum) { return TouchesAny(areas, sum.visual); },
+                                visitChild);
+            return;
+        }
     }
     for (uint32_t i = 0; i < count; ++i)
         visitChild(i);

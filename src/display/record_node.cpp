@@ -42,13 +42,13 @@ class StateScope {
 
 // The caller has looked at the visual bounds, which a node without children paints all by itself.
 void PaintOwn(const LayoutNode& node, PaintContext& context, Areas areas, CommandBuffer& buffer) {
-    if (node.ownPaint == 0 || (!node.children.empty() && !TouchesAny(areas, node.paintBounds))) return;
+    if (node.ownPaint == 0 || (!node.Children().empty() && !TouchesAny(areas, node.PaintBounds()))) return;
     ++context.counters.recorded;
     if (node.ownPaint == layout::kPaintsColor) {
         PaintPlainColor(node, context.snapToPixels, buffer);
         return;
     }
-    context.lengths.em = node.style.text->computedFontSize;
+    context.lengths.em = node.style->text->computedFontSize;
     node.display->Paint(context, context.partialRedraw, node, buffer);
 }
 
@@ -87,7 +87,7 @@ class ChildAreas {
 
 // Neither a filter nor the client's effect says which pixels it needs for those in sight.
 bool NeedsWholeContent(const LayoutNode& node) {
-    return !node.style.visual->filter.empty() || !node.style.visual->customEffectName.empty();
+    return !node.style->visual->filter.empty() || !node.style->visual->customEffectName.empty();
 }
 
 void PushChildState(const LayoutNode& node, const PaintContext& context, StateScope& scope,
@@ -96,16 +96,22 @@ void PushChildState(const LayoutNode& node, const PaintContext& context, StateSc
         scope.Push(fresco::kStateTransform);
         buffer.FlattenTransform();
     }
-    if (node.perspective) {
+    if (const layout::Matrix* perspective = node.Perspective()) {
         scope.Push(fresco::kStateTransform);
-        buffer.MultiplyTransform(*node.perspective);
+        buffer.MultiplyTransform(*perspective);
     }
-    const bool scrolled = layout::IsScrolled(node.scroll);
+    const layout::ScrollPosition scroll = node.Scroll();
+    const bool scrolled = layout::IsScrolled(scroll);
     if (!scrolled && !node.flags.shouldOverflowClip) return;
     scope.Push((node.flags.shouldOverflowClip ? fresco::kStateClip : 0u) |
                (scrolled ? fresco::kStateTransform : 0u));
     if (node.flags.shouldOverflowClip) ClipToPaddingBox(node, context, buffer);
-    if (scrolled) buffer.Translate(-node.scroll.x, -node.scroll.y);
+    if (scrolled) buffer.Translate(-scroll.x, -scroll.y);
+}
+
+const Rect& ChildrenVisual(const LayoutNode& node) {
+    const layout::BoxNode& box = node.AsBox();
+    return box.below ? box.below->sum.visual : box.children[0]->node().visualAabb;
 }
 
 // In-flow content needs no list: it paints in tree order.
@@ -119,7 +125,7 @@ void RecordFlow(const LayoutNode& parent, PaintContext& context, Areas areas, Co
             return;
         }
         PaintOwn(child, context, areas, buffer);
-        if (!child.children.empty()) RecordFlow(child, context, areas, buffer);
+        if (!child.Children().empty()) RecordFlow(child, context, areas, buffer);
     });
 }
 
@@ -135,12 +141,12 @@ void RecordLayers(const PaintList& list, PaintContext& context, Areas areas, Com
 }
 
 void RecordChildren(const LayoutNode& node, PaintContext& context, Areas areas, CommandBuffer& buffer) {
-    if (node.children.empty() || areas.empty()) return;
+    if (node.Children().empty() || areas.empty()) return;
     const bool inOrder = PaintsInTreeOrder(node);
     const TempMark mark;
     PaintList list;
     if (inOrder) {
-        if (!TouchesAny(areas, node.below->sum.visual)) return;
+        if (!TouchesAny(areas, ChildrenVisual(node))) return;
     } else {
         CollectPaintRuns(node, areas, list, context.counters);
         if (list.empty()) return;
@@ -151,13 +157,13 @@ void RecordChildren(const LayoutNode& node, PaintContext& context, Areas areas, 
 }
 
 void RecordContent(const LayoutNode& node, PaintContext& context, Areas areas, CommandBuffer& buffer) {
-    const css::VisualStyle& visual = *node.style.visual;
+    const css::VisualStyle& visual = *node.style->visual;
     const MaskState mask = PrepareMask(node);
     if (mask == MaskState::Hold) return;
     StateScope scope(buffer);
     if (!visual.clipPath.IsNone()) {
         scope.Push(fresco::kStateClip);
-        context.lengths.em = node.style.text->computedFontSize;
+        context.lengths.em = node.style->text->computedFontSize;
         if (!ApplyClipPath(node, context, buffer)) return;
     }
     PaintOwn(node, context, areas, buffer);
@@ -168,21 +174,22 @@ void RecordContent(const LayoutNode& node, PaintContext& context, Areas areas, C
 }  // namespace
 
 void RecordNode(const LayoutNode& node, PaintContext& context, Areas areas, CommandBuffer* buffer) {
-    const css::VisualStyle& visual = *node.style.visual;
+    const css::VisualStyle& visual = *node.style->visual;
     if (visual.opacity.value <= 0 || !TouchesAny(areas, node.visualAabb)) return;
     // The transform goes around the layer, so that filters measure in the node's own space.
-    if (node.local) {
+    const layout::Matrix* local = node.Local();
+    if (local) {
         buffer->PushState(fresco::kStateTransform);
-        buffer->MultiplyTransform(*node.local);
+        buffer->MultiplyTransform(*local);
     }
     const bool hasLayer = NeedsLayer(node);
     if (hasLayer) {
-        context.lengths.em = node.style.text->computedFontSize;
+        context.lengths.em = node.style->text->computedFontSize;
         buffer = OpenLayer(node, context, buffer);
     }
     RecordContent(node, context, NeedsWholeContent(node) ? Areas(&node.visualAabb, 1) : areas, *buffer);
     if (hasLayer) buffer = CloseLayer(node, buffer);
-    if (node.local) buffer->PopState();
+    if (local) buffer->PopState();
 }
 
 }  // namespace qorvex::dsp

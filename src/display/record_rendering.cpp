@@ -60,9 +60,9 @@ void SetScissors(std::span<const Rect> rects, bool scaled, CommandBuffer& buffer
 // Whether the root's background hides what the target shows of the last frame. It begins and ends on whole
 // pixels in a view that is not scaled only.
 bool HidesLastFrame(const layout::LayoutNode& root, std::span<const Rect> areas, bool scaled) {
-    return !scaled && FillsCanvas(root) && !root.local && !NeedsLayer(root) &&
-           root.style.visual->clipPath.IsNone() && TouchesAny(areas, root.visualAabb) &&
-           TouchesAny(areas, root.paintBounds);
+    return !scaled && FillsCanvas(root) && !root.Local() && !NeedsLayer(root) &&
+           root.style->visual->clipPath.IsNone() && TouchesAny(areas, root.visualAabb) &&
+           TouchesAny(areas, root.PaintBounds());
 }
 
 // Older lists in other colours, the newest on top.

@@ -21,8 +21,8 @@ bool IsBlurred(const ResolvedShadow& shadow) {
 }
 
 fresco::Color ShadowColor(const LayoutNode& node, size_t index) {
-    const css::ShadowItem& item = node.style.visual->boxShadow[index];
-    return ToFresco(item.color.Resolve(node.style.text->color));
+    const css::ShadowItem& item = node.style->visual->boxShadow[index];
+    return ToFresco(item.color.Resolve(node.style->text->color));
 }
 
 void FillRounded(CommandBuffer& buffer, const Rect& rect, const CornerRadii& radii,
@@ -161,7 +161,7 @@ void PaintBlurredInset(PaintContext& context, const Rect& padding, const Resolve
 }
 
 bool HasOpaqueBackground(const LayoutNode& node) {
-    const css::VisualStyle& visual = *node.style.visual;
+    const css::VisualStyle& visual = *node.style->visual;
     return visual.opacity.value >= 1 && visual.backgroundColor.alpha >= 1 && visual.backgroundImage.empty();
 }
 

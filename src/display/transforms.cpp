@@ -1,9 +1,11 @@
 #include "display/transforms.h"
 
 #include "display/dirty_region.h"
+#include "display/display_text.h"
 #include "display/local_transform.h"
 #include "display/own_paint.h"
 #include "display/resolved_visuals.h"
+#include "layout/layout_store.h"
 #include "layout/prefetch.h"
 #include "layout/scroll.h"
 
@@ -64,12 +66,17 @@ struct Above {
     bool moved;  // the matrix or the scroll position differs from the last pass
 };
 
-void AddTo(ChildSum& sum, const LayoutNode& child) {
-    sum.content =
-        layout::Union(sum.content, child.local ? layout::MapBounds(*child.local, child.aabb) : child.aabb);
+void AddTo(ChildSum& sum, const LayoutHandle& handle) {
+    const LayoutNode& child = handle.node();
+    sum.content = layout::Union(sum.content, layout::ContentOf(handle));
     sum.visual = layout::Union(sum.visual, child.visualAabb);
     sum.layered = sum.layered || child.flags.isPositioned || child.establishesStackingContext ||
-                  (child.below && child.below->sum.layered && !child.flags.shouldOverflowClip);
+                  (child.layeredBelow && !child.flags.shouldOverflowClip);
+}
+
+// Under which the matrices of the children were made.
+layout::ScrollPosition AppliedScroll(const LayoutNode& node) {
+    return node.isBox && node.AsBox().below ? node.AsBox().below->appliedScroll : layout::ScrollPosition();
 }
 
 class TransformPass {
@@ -90,16 +97,16 @@ class TransformPass {
         if (self) {
             if (node.needsTransform || pass_.everything) node.ownPaint = FindOwnPaint(node);
             UpdateStacking(node);
-            lengths_.em = node.style.text->computedFontSize;
+            lengths_.em = node.style->text->computedFontSize;
             ownMatricesChanged = UpdateLocalMatrices(node, box, lengths_) ||
-                                 (node.needsTransform && (node.local || node.perspective));
+                                 (node.needsTransform && (node.Local() || node.Perspective()));
             worldChanged = UpdateWorld(node, above);
         }
         bool dirtyBelow = UpdateChildren(node, above, worldChanged || ownMatricesChanged);
         UpdateBounds(node, box);
-        const layout::ScrollPosition clamped = layout::ClampScroll(node.scroll, node);
-        if (!Same(clamped, node.scroll)) {
-            node.scroll = clamped;
+        const layout::ScrollPosition scroll = node.Scroll(), clamped = layout::ClampScroll(scroll, node);
+        if (!Same(clamped, scroll)) {
+            node.AsBox().scroll = clamped;
             dirtyBelow = UpdateChildren(node, above, true) || dirtyBelow;
             UpdateBounds(node, box);
         }
@@ -114,48 +121,50 @@ class TransformPass {
         Rect aabb, paint, visual;
         layout::Size scrollSize;
         layout::ScrollPosition scroll;
+        bool children;  // are others
         explicit Before(const LayoutNode& node)
-            : aabb(node.aabb),
-              paint(node.paintBounds),
+            : aabb(node.isBox ? node.AsBox().aabb : Rect()),
+              paint(node.PaintBounds()),
               visual(node.visualAabb),
               scrollSize(node.ScrollSize()),
-              scroll(node.below ? node.below->appliedScroll : layout::ScrollPosition()) {}
+              scroll(AppliedScroll(node)),
+              children(node.childrenChanged) {}
     };
 
     static bool UpdateWorld(LayoutNode& node, const Above& above) {
         const bool scrolled = layout::IsScrolled(above.scroll);
-        if (above.shared && !scrolled && !node.local) return node.world.Share(*above.shared);
+        const Matrix* local = node.Local();
+        if (above.shared && !scrolled && !local) return node.world.Share(*above.shared);
         Matrix world = above.children;
         if (scrolled) world = world * fresco::TranslationMatrix(-above.scroll.x, -above.scroll.y);
-        return node.world.Set(node.local ? world * *node.local : world);
+        return node.world.Set(local ? world * *local : world);
     }
 
     // Do the children stand in the node's own matrix?
     static bool HandsDownWorld(const LayoutNode& node) {
-        return !node.perspective && (node.flags.preserves3d || layout::IsFlat(node.world.Get()));
+        return !node.Perspective() && (node.flags.preserves3d || layout::IsFlat(node.world.Get()));
     }
 
     static Matrix ChildrenMatrix(const LayoutNode& node) {
         Matrix children = node.world.Get();
         if (!node.flags.preserves3d && !layout::IsFlat(children)) children = fresco::Flattened(children);
-        return node.perspective ? children * *node.perspective : children;
+        const Matrix* perspective = node.Perspective();
+        return perspective ? children * *perspective : children;
     }
 
     bool UpdateChildren(LayoutNode& node, const Above& above, bool matricesChanged) {
-        if (node.children.empty()) {
-            node.below.reset();
-            childrenVisual_ = {};
-            return false;
-        }
-        if (!node.below) node.below = MakeUnique<layout::ChildBounds, MemoryTag::LayoutNodes>();
-        const bool scrolled = !Same(node.scroll, node.below->appliedScroll);
-        node.below->appliedScroll = node.scroll;
-        if (HidesChildren(node)) {
-            childrenVisual_ = {};
+        children_ = {};
+        if (!node.isBox) return false;
+        layout::BoxNode& own = node.AsBox();
+        const bool hidden = HidesChildren(node);
+        const bool scrolled = !Same(own.scroll, AppliedScroll(node));
+        KeepBounds(own, hidden);
+        if (hidden || own.children.empty()) {
+            node.layeredBelow = false;
             return false;
         }
         const Matrix children = ChildrenMatrix(node);
-        Above below{children, HandsDownWorld(node) ? &node.world : nullptr, node.scroll, above.clip,
+        Above below{children, HandsDownWorld(node) ? &node.world : nullptr, own.scroll, above.clip,
                     above.moved || matricesChanged || scrolled};
         if (node.flags.shouldOverflowClip) {
             const Rect clip =
@@ -163,23 +172,37 @@ class TransformPass {
             below.clip = layout::Intersection(below.clip, clip);
         }
         bool dirty = false;
-        const uint32_t count = node.children.size();
+        const uint32_t count = own.children.size();
         for (uint32_t i = 0; i < std::min(count, layout::kNodesAhead); ++i)
-            layout::PrefetchNode(*node.children[i]);
+            layout::PrefetchNode(*own.children[i]);
         auto add = [&](uint32_t child, ChildSum& sum) {
             if (child + layout::kNodesAhead < count)
-                layout::PrefetchNode(*node.children[child + layout::kNodesAhead]);
-            if (child + 2 < count) __builtin_prefetch(node.children[child + 2]->node().display.get());
-            dirty = Visit(*node.children[child], below) || dirty;
-            AddTo(sum, node.children[child]->node());
+                layout::PrefetchNode(*own.children[child + layout::kNodesAhead]);
+            if (child + 2 < count) __builtin_prefetch(own.children[child + 2]->node().display.get());
+            dirty = Visit(*own.children[child], below) || dirty;
+            AddTo(sum, *own.children[child]);
         };
-        node.below->sum = SumChildren(node, below.moved || pass_.everything, add);
-        childrenVisual_ = node.below->sum.visual;
+        const ChildSum sum = SumChildren(own, below.moved || pass_.everything, add);
+        if (own.below) own.below->sum = sum;
+        node.layeredBelow = sum.layered;
+        children_ = sum;
         return dirty;
     }
 
+    // A single child that shows and was never scrolled tells all that there is to know.
+    static void KeepBounds(layout::BoxNode& node, bool hidden) {
+        const bool simple = node.children.size() == 1 && !hidden && Same(node.scroll, {});
+        if (simple || node.children.empty()) {
+            node.below.reset();
+            return;
+        }
+        if (!node.below) node.below = MakeUnique<layout::ChildBounds, MemoryTag::LayoutNodes>();
+        node.below->appliedScroll = node.scroll;
+        if (hidden) node.below->sum = {};
+    }
+
     template <typename AddChild>
-    static ChildSum SumChildren(LayoutNode& node, bool all, AddChild&& add) {
+    static ChildSum SumChildren(layout::BoxNode& node, bool all, AddChild&& add) {
         const uint32_t count = node.children.size();
         if (count > ChildGroups::kFanout) {
             auto& groups = node.below->groups;
@@ -193,31 +216,32 @@ class TransformPass {
         return sum;
     }
 
-    static void UpdateBounds(LayoutNode& node, const Rect& box) {
-        const bool overflows =
-            !node.flags.shouldOverflowClip && node.below && !layout::IsEmpty(node.below->sum.content);
-        node.aabb = overflows ? layout::Union(box, node.below->sum.content) : box;
+    void UpdateBounds(LayoutNode& node, const Rect& box) const {
+        if (!node.isBox) return;
+        const bool overflows = !node.flags.shouldOverflowClip && !layout::IsEmpty(children_.content);
+        node.AsBox().aabb = overflows ? layout::Union(box, children_.content) : box;
     }
 
     void UpdatePaintBounds(LayoutNode& node, const Rect& box) {
         Rect reach = box;
-        Rect subtree = childrenVisual_;
+        Rect subtree = children_.visual;
         if (node.flags.shouldOverflowClip && !layout::IsEmpty(subtree)) {
             const Rect clip = layout::MapBounds(node.world.Get(), ClipBox(node, pass_.snapToPixels));
             subtree = layout::Intersection(subtree, layout::RoundOut(clip));
         }
-        if (node.display) {
-            float ink = node.display->InkOverflow();
-            if (node.display->Has(IDisplayElement::kIsText)) ink += StrokeReach(*node.style.text);
-            const layout::Size content = node.display->ContentSize();
+        if (!node.isBox && node.display) {
+            const auto& text = static_cast<const DisplayText&>(*node.display);
+            const float ink = text.InkOverflow() + StrokeReach(*node.style->text);
+            const layout::Size content = text.ContentSize();
             // Lines may be aligned to either side.
             const float wider = ink + std::max(content.width - box.width, 0.0f);
             const float taller = ink + std::max(content.height - box.height, 0.0f);
             reach = Outset(reach, {wider, wider, ink, taller});
         }
         if (node.visuals) reach = Outset(reach, PaintOutset(*node.visuals));
-        node.paintBounds = ToVisual(layout::MapBounds(node.world.Get(), reach));
-        node.visualAabb = layout::Union(node.paintBounds, subtree);
+        const Rect paint = ToVisual(layout::MapBounds(node.world.Get(), reach));
+        if (node.isBox) node.AsBox().paintBounds = paint;
+        node.visualAabb = layout::Union(paint, subtree);
         if (node.visuals && !node.visuals->filters.empty() && !layout::IsEmpty(node.visualAabb)) {
             node.visualAabb = layout::RoundOut(Outset(node.visualAabb, FilterReach(node)));
         }
@@ -235,15 +259,17 @@ class TransformPass {
     bool NoteChanges(LayoutHandle& handle, const Before& before, const Above& above, bool moved,
                      bool dirtyBelow) {
         LayoutNode& node = handle.node();
-        const bool stacking =
-            node.establishesStackingContext != node.previousStacking || node.zIndex != node.previousZIndex;
+        const bool stacking = node.establishesStackingContext != node.previousStacking ||
+                              (node.isBox && node.AsBox().zIndex != node.AsBox().previousZIndex);
         const layout::Size scrollSize = node.ScrollSize();
-        const bool scrolls = !layout::Near(before.scrollSize.width, scrollSize.width) ||
+        const bool scrolls = before.children || !layout::Near(before.scrollSize.width, scrollSize.width) ||
                              !layout::Near(before.scrollSize.height, scrollSize.height) ||
-                             !Same(before.scroll, node.scroll);
+                             !Same(before.scroll, node.Scroll());
+        const Rect& paintBounds = node.PaintBounds();
         const bool paints = node.visualChanged || stacking || moved || node.rectChanged ||
-                            node.boxMetricsChanged || !Same(before.paint, node.paintBounds);
-        const bool bounds = !Same(before.visual, node.visualAabb) || !Same(before.aabb, node.aabb);
+                            node.boxMetricsChanged || !Same(before.paint, paintBounds);
+        const bool bounds =
+            !Same(before.visual, node.visualAabb) || (node.isBox && !Same(before.aabb, node.AsBox().aabb));
         if (paints) node.visualChanged = true;
         if (paints || bounds || scrolls) pass_.update.updated.Add(handle);
 
@@ -255,20 +281,21 @@ class TransformPass {
                           node.flags.shouldOverflowClip || node.previousClip ||
                           node.flags.isPositioned != node.previousPositioned;
         pass_.dirty.Add(layout::Intersection(unit ? before.visual : before.paint, above.clip));
-        pass_.dirty.Add(layout::Intersection(unit ? node.visualAabb : node.paintBounds, above.clip));
+        pass_.dirty.Add(layout::Intersection(unit ? node.visualAabb : paintBounds, above.clip));
         return true;
     }
 
     LayoutPass& pass_;
     css::LengthContext lengths_;
     // Of the children of the node that was updated last.
-    Rect childrenVisual_{};
+    ChildSum children_;
 };
 
 }  // namespace
 
 void RunTransformPass(LayoutPass& pass) {
     if (pass.root == nullptr) return;
+    pass.root->store().snapsToPixels = pass.snapToPixels;
     const Matrix identity;
     const Rect view{0, 0, 0, static_cast<float>(pass.viewWidth), static_cast<float>(pass.viewHeight)};
     const layout::WorldMatrix none;
@@ -280,7 +307,8 @@ void MarkForTransform(LayoutHandle& handle) {
     uint32_t index = handle.node().index;
     for (LayoutHandle* parent = handle.node().parent; parent != nullptr; parent = parent->node().parent) {
         LayoutNode& node = parent->node();
-        const bool groupKnown = !node.below || !node.below->groups || !node.below->groups->MarkDirty(index);
+        const auto& below = node.AsBox().below;
+        const bool groupKnown = !below || !below->groups || !below->groups->MarkDirty(index);
         if (node.descendantNeedsTransform && groupKnown) break;
         node.descendantNeedsTransform = true;
         index = node.index;

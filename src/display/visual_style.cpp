@@ -56,12 +56,12 @@ FilterExtent ResolveFilter(const css::FilterFunction& filter, const LengthContex
 
 // True when the stored values differ, which makes the node paint anew.
 bool Refresh(LayoutNode& node, LengthContext& lengths, bool snapToPixels) {
-    if (!NeedsResolvedVisuals(*node.style.visual)) {
+    if (!NeedsResolvedVisuals(*node.style->visual)) {
         if (!node.visuals) return false;
         node.visuals.reset();
         return true;
     }
-    lengths.em = node.style.text->computedFontSize;
+    lengths.em = node.style->text->computedFontSize;
     ResolvedVisuals fresh;
     ResolveVisuals(node, PaintBox(node, snapToPixels), lengths, fresh);
     if (node.visuals) {
@@ -85,7 +85,7 @@ bool NeedsResolvedVisuals(const css::VisualStyle& style) {
 
 void ResolveVisuals(const LayoutNode& node, const Rect& box, const LengthContext& lengths,
                     ResolvedVisuals& out) {
-    const css::VisualStyle& style = *node.style.visual;
+    const css::VisualStyle& style = *node.style->visual;
     out.radii = {ResolveRadius(style.borderTopLeftRadius, box, lengths),
                  ResolveRadius(style.borderTopRightRadius, box, lengths),
                  ResolveRadius(style.borderBottomRightRadius, box, lengths),

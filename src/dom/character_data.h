@@ -2,8 +2,10 @@
 #pragma once
 
 #include "core/memory/atoms.h"
+#include "css/values/shared_style.h"
 #include "dom/node.h"
 #include "layout/text/text_positions.h"
+#include "script/pooled_memory.h"
 
 namespace qorvex::dom {
 
@@ -42,16 +44,20 @@ class CharacterData : public Node {
 class Text final : public CharacterData {
     QORVEX_SCRIPT_CLASS(Text)
   public:
+    QORVEX_POOLED(Text, 160)
     Text(Document& document, std::string_view data);
+    ~Text() override;
 
     Atom GetNodeName() const override { return atoms::kText; }
     void ToDebugString(NodeText& out) const override;
     qsl::RefPtr<Node> CloneNode(bool deep) override;
     void OnInsertedIntoDocument() override;
     void OnComputedStyleChanged() override;
+    layout::HandlePtr CreateLayoutNode(layout::LayoutTree& tree, layout::LayoutHandle& parent) override;
     // Its parent's text values, and of the others what texts are laid out and painted with.
-    css::LaidOutStyle& GetStyle() { return style_; }
-    const css::LaidOutStyle& GetStyle() const { return style_; }
+    const css::LaidOutStyle& GetStyle() const { return *style_; }
+    void SetStyle(css::SharedStylePtr style);
+    css::WrittenGroups* GetWrittenGroups() override { return &written_; }
     // Cuts this text at `offset` bytes; the rest becomes a new text behind it.
     qsl::RefPtr<Text> SplitText(size_t offset);
 
@@ -73,17 +79,21 @@ class Text final : public CharacterData {
 
   protected:
     void OnTextChanged() override;
-    css::LaidOutStyle* GetOwnLaidOutStyle() override { return &style_; }
+    const css::LaidOutStyle* GetOwnLaidOutStyle() const override { return style_.get(); }
     void ResetStyle() override;
 
   private:
+    friend class ShownText;
+
     void UpdateTransformedText();
     void ForgetTransformedText();
 
-    css::LaidOutStyle style_;
+    css::WrittenGroups written_;
+    css::SharedStylePtr style_;
     qsl::RefPtr<layout::TextPositions> positions_;
     qsl::RefPtr<layout::TextFontStyle> font_style_;
 };
+static_assert(sizeof(Text) <= 160, "as many bytes as the pool gives");
 
 class Comment final : public CharacterData {
     QORVEX_SCRIPT_CLASS(Comment)

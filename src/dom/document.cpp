@@ -27,7 +27,8 @@ Document::Document(DocumentParams params)
       complex_selectors_(params.host->AreComplexSelectorsEnabled()),
       style_engine_(std::move(params.style_engine)),
       loader_(std::move(params.loader)),
-      default_style_(&style_engine_->GetDefaultStyle()) {
+      default_style_(&style_engine_->GetDefaultStyle()),
+      default_text_style_(MakeRef<css::SharedStyle>(*default_style_)) {
     SetFlag(kIsDocument, true);
     GetStyle() = *default_style_;
     const HostSize size = host_->GetViewSize();

@@ -131,6 +131,7 @@ class Document : public Element {
 
     // --- Style
     const css::LayoutStyleRefs& GetDefaultStyle() const { return *default_style_; }
+    const css::SharedStylePtr& GetDefaultTextStyle() const { return default_text_style_; }
     bool AreComplexSelectorsEnabled() const { return complex_selectors_; }
     // `media` is the text of a link's media attribute, empty for none.
     void AddStyleSheet(Element& owner, css::StylesheetPtr sheet, std::string_view media);
@@ -288,6 +289,7 @@ class Document : public Element {
     UniquePtr<IStyleEngine, MemoryTag::DOM> style_engine_;
     UniquePtr<IDocumentLoader, MemoryTag::DOM> loader_;
     const css::LayoutStyleRefs* default_style_;
+    css::SharedStylePtr default_text_style_;
     script::ScriptingContext* scripting_context_ = nullptr;
     EventTarget* window_ = nullptr;
 

@@ -80,7 +80,7 @@ void Document::AppendLayoutSubtree(Node& top, layout::LayoutHandle& handle) {
             layout::LayoutHandle* made = child.get() == html_
                                              ? child->layout_node_.get()
                                              : child->CreateLayoutNode(layout_tree_, *entry.parent).get();
-            if (made) child->GetOwnLaidOutStyle()->written.Clear();
+            if (made) child->GetWrittenGroups()->Clear();
             queue.push_back({child.get(), made ? made : entry.parent});
         }
     }
@@ -104,11 +104,11 @@ bool Document::AttachLayoutNode(Node& node) {
     if (node.layout_node_) {
         const uint32_t index = node.FindLayoutIndex(parent_handle);
         layout_tree_.Attach(*node.layout_node_, parent_handle, index);
-        layout_tree_.UpdateStyle(*node.layout_node_, *node.GetOwnLaidOutStyle());
+        layout_tree_.UpdateStyle(*node.layout_node_, *node.GetOwnLaidOutStyle(), *node.GetWrittenGroups());
     } else if (!node.CreateLayoutNode(layout_tree_, parent_handle)) {
         return false;
     }
-    node.GetOwnLaidOutStyle()->written.Clear();
+    node.GetWrittenGroups()->Clear();
     QueueLayoutChange(node);
     return true;
 }
@@ -122,9 +122,9 @@ void Document::DetachLayoutNode(Node& node) {
 
 bool Document::TakeChange(Node& node) {
     if (!node.layout_node_ || !node.IsInDocument()) return false;
-    css::LaidOutStyle& style = *node.GetOwnLaidOutStyle();
-    layout_tree_.UpdateStyle(*node.layout_node_, style);
-    style.written.Clear();
+    css::WrittenGroups& written = *node.GetWrittenGroups();
+    layout_tree_.UpdateStyle(*node.layout_node_, *node.GetOwnLaidOutStyle(), written);
+    written.Clear();
     return true;
 }
 

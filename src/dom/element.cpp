@@ -183,7 +183,7 @@ RefPtr<HTMLCollection> Element::GetChildElements() {
 // --- Geometry
 
 layout::Rect Element::GetBoundingBox() const {
-    const layout::LayoutResult* box = GetLayoutResult();
+    const layout::BoxResult* box = GetBoxResult();
     return box ? box->viewBox : layout::MakeRect(0, 0, 0, 0);
 }
 

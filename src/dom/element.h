@@ -165,7 +165,8 @@ class Element : public Node {
     ~Element() override = default;
     // Attributes and declared style.
     void CopyElementTo(Element& target);
-    css::LaidOutStyle* GetOwnLaidOutStyle() override { return &style_; }
+    const css::LaidOutStyle* GetOwnLaidOutStyle() const override { return &style_; }
+    css::WrittenGroups* GetWrittenGroups() override { return &style_.written; }
     void ResetStyle() override;
     // The document's own atoms are not there yet while the document itself is constructed.
     struct ForDocument {};

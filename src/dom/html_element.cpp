@@ -65,7 +65,7 @@ float HTMLElement::GetOffsetTop() const {
     if (!box) return 0;
     const Element* parent = GetOffsetParent();
     const layout::LayoutResult* outer = parent ? parent->GetLayoutResult() : nullptr;
-    return outer ? box->top - outer->top - outer->edges.border().top : box->top;
+    return outer ? box->top - outer->top - parent->GetBoxResult()->edges.border().top : box->top;
 }
 
 float HTMLElement::GetOffsetLeft() const {
@@ -73,7 +73,7 @@ float HTMLElement::GetOffsetLeft() const {
     if (!box) return 0;
     const Element* parent = GetOffsetParent();
     const layout::LayoutResult* outer = parent ? parent->GetLayoutResult() : nullptr;
-    return outer ? box->left - outer->left - outer->edges.border().left : box->left;
+    return outer ? box->left - outer->left - parent->GetBoxResult()->edges.border().left : box->left;
 }
 
 float HTMLElement::GetOffsetWidth() const {

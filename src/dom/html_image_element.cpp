@@ -67,7 +67,8 @@ HTMLImageElement::~HTMLImageElement() {
 uint32_t HTMLImageElement::GetWidth() const {
     std::optional<float> laid_out;
     if (const layout::LayoutResult* box = GetLayoutResult()) {
-        const layout::Edges &border = box->edges.border(), &padding = box->edges.padding();
+        const layout::SharedEdges& edges = GetBoxResult()->edges;
+        const layout::Edges &border = edges.border(), &padding = edges.padding();
         laid_out = box->width - border.left - border.right - padding.left - padding.right;
     }
     return RenderedSide(laid_out, FindAttribute(atoms::kWidth), GetNaturalSize().width);
@@ -76,7 +77,8 @@ uint32_t HTMLImageElement::GetWidth() const {
 uint32_t HTMLImageElement::GetHeight() const {
     std::optional<float> laid_out;
     if (const layout::LayoutResult* box = GetLayoutResult()) {
-        const layout::Edges &border = box->edges.border(), &padding = box->edges.padding();
+        const layout::SharedEdges& edges = GetBoxResult()->edges;
+        const layout::Edges &border = edges.border(), &padding = edges.padding();
         laid_out = box->height - border.top - border.bottom - padding.top - padding.bottom;
     }
     return RenderedSide(laid_out, FindAttribute(atoms::kHeight), GetNaturalSize().height);

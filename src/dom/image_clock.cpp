@@ -10,7 +10,7 @@ namespace qorvex::dom {
 namespace {
 
 bool IsOnScreen(const Node& node) {
-    const layout::LayoutResult* box = node.GetLayoutResult();
+    const layout::BoxResult* box = node.GetBoxResult();
     if (!box || node.GetLaidOutStyle().visual->visibility != css::Visibility::Visible) return false;
     const HostSize view = node.GetDocument()->GetHost().GetViewSize();
     const layout::Rect& seen = box->visualAabb;

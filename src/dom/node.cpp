@@ -41,7 +41,7 @@ Node::~Node() {
 }
 
 const css::LaidOutStyle& Node::GetLaidOutStyle() const {
-    const css::LaidOutStyle* own = const_cast<Node*>(this)->GetOwnLaidOutStyle();
+    const css::LaidOutStyle* own = GetOwnLaidOutStyle();
     return own ? *own : document_->GetDefaultStyle();
 }
 

@@ -152,6 +152,8 @@ class Node : public EventTarget {
     dsp::IDisplayElement* GetDisplayElement() const { return display_element_.get(); }
     // The geometry of the last finished layout; null without a box.
     const layout::LayoutResult* GetLayoutResult() const;
+    // The rest of it, which texts have none of.
+    const layout::BoxResult* GetBoxResult() const;
     // What layout and tasks hold of this node: it reads null after the node's death.
     qsl::RefPtr<NodeLink> GetLayoutLink();
 
@@ -185,7 +187,9 @@ class Node : public EventTarget {
     // Listeners of this node, and clones of its children when `deep`.
     void CopyCommon(Node& target, bool deep);
     // Null for a node without a style of its own.
-    virtual css::LaidOutStyle* GetOwnLaidOutStyle() { return nullptr; }
+    virtual const css::LaidOutStyle* GetOwnLaidOutStyle() const { return nullptr; }
+    // What of it layout has not taken over yet.
+    virtual css::WrittenGroups* GetWrittenGroups() { return nullptr; }
     virtual void ResetStyle() {}
     void SetFlag(uint32_t flag, bool on) { flags_ = on ? flags_ | flag : flags_ & ~flag; }
     void SetScroll(layout::ScrollPosition wanted);
@@ -230,6 +234,6 @@ class Node : public EventTarget {
     qsl::RefPtr<NodeLink> link_;
 };
 // Every node of a page pays for a word more.
-static_assert(sizeof(Node) == 112);
+static_assert(sizeof(Node) == 104);
 
 }  // namespace qorvex::dom

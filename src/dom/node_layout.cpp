@@ -9,7 +9,7 @@
 namespace qorvex::dom {
 
 layout::HandlePtr Node::CreateLayoutNode(layout::LayoutTree& tree, layout::LayoutHandle& parent) {
-    css::LaidOutStyle* style = GetOwnLaidOutStyle();
+    const css::LaidOutStyle* style = GetOwnLaidOutStyle();
     if (!Is(kDisplayable) || !style) return nullptr;
     layout_node_ = tree.AddChild(parent, FindLayoutIndex(parent),
                                  {.style = *style,
@@ -21,8 +21,8 @@ layout::HandlePtr Node::CreateLayoutNode(layout::LayoutTree& tree, layout::Layou
 }
 
 uint32_t Node::FindLayoutIndex(const layout::LayoutHandle& parent) const {
-    const layout::HandleVector& handles = parent.data().children;
-    if (!parent_) return handles.size();
+    const layout::HandleSpan handles = parent.data().Children();
+    if (!parent_) return static_cast<uint32_t>(handles.size());
     const NodeChildren& siblings = parent_->children_;
     const size_t own_index = GetIndexInParent();
     // Behind the nearest sibling that has a handle. That one comes as far from the front as among the
@@ -31,7 +31,7 @@ uint32_t Node::FindLayoutIndex(const layout::LayoutHandle& parent) const {
         ++document_->work.siblingsSearched;
         if (!siblings[i]->Is(kInLayoutTree)) continue;
         const layout::HandlePtr& before = siblings[i]->layout_node_;
-        if (!handles.empty() && handles.back() == before) return handles.size();
+        if (!handles.empty() && handles.back() == before) return static_cast<uint32_t>(handles.size());
         for (size_t place = std::min<size_t>(i + 1, handles.size()); place > 0; --place) {
             ++document_->work.siblingsSearched;
             if (handles[static_cast<uint32_t>(place - 1)] == before) return static_cast<uint32_t>(place);
@@ -62,11 +62,18 @@ const layout::LayoutResult* Node::GetLayoutResult() const {
     return layout_node_ && Is(kInLayoutTree) ? &layout_node_->data().result : nullptr;
 }
 
+const layout::BoxResult* Node::GetBoxResult() const {
+    const bool has_box = layout_node_ && Is(kInLayoutTree) && layout_node_->data().isBox;
+    return has_box ? &layout_node_->data().AsBox().result : nullptr;
+}
+
 layout::ScrollPosition Node::ClampScroll(layout::ScrollPosition wanted) const {
-    const layout::LayoutResult* box = GetLayoutResult();
+    const layout::LayoutResult* outer = GetLayoutResult();
+    const layout::BoxResult* box = GetBoxResult();
     if (!box) return wanted;
-    const float width = box->width - box->edges.border().left - box->edges.border().right;
-    const float height = box->height - box->edges.border().top - box->edges.border().bottom;
+    const layout::Edges& border = box->edges.border();
+    const float width = outer->width - border.left - border.right;
+    const float height = outer->height - border.top - border.bottom;
     const float max_x = std::max(0.0f, box->scrollSize.width - width);
     const float max_y = std::max(0.0f, box->scrollSize.height - height);
     return {std::clamp(wanted.x, 0.0f, max_x), std::clamp(wanted.y, 0.0f, max_y)};
@@ -104,13 +111,13 @@ void Node::SetScroll(layout::ScrollPosition wanted) {
 }
 
 float Node::GetScrollWidth() const {
-    const layout::LayoutResult* box = GetLayoutResult();
-    return box ? std::max(box->scrollSize.width, box->width) : 0;
+    const layout::BoxResult* box = GetBoxResult();
+    return box ? std::max(box->scrollSize.width, GetLayoutResult()->width) : 0;
 }
 
 float Node::GetScrollHeight() const {
-    const layout::LayoutResult* box = GetLayoutResult();
-    return box ? std::max(box->scrollSize.height, box->height) : 0;
+    const layout::BoxResult* box = GetBoxResult();
+    return box ? std::max(box->scrollSize.height, GetLayoutResult()->height) : 0;
 }
 
 }  // namespace qorvex::dom

@@ -1,6 +1,5 @@
 #include "dom/node_link.h"
 
-#include "dom/character_data.h"
 #include "dom/document.h"
 #include "layout/dom_tasks.h"
 
@@ -18,27 +17,14 @@ std::string_view NodeLink::DebugName() const {
     return node_ ? node_->GetMarkupName().view() : std::string_view();
 }
 
-void NodeLink::Receive(layout::DOMTaskKind kind, const layout::DOMTaskData& data) {
-    using layout::DOMTaskKind;
-    const bool ofText =
-        kind == DOMTaskKind::UpdateTextPositionsInDOM || kind == DOMTaskKind::UpdateFontStyleDataInDOM;
-    if (ofText && node_ && node_->Is(kIsText)) {
-        auto& text = static_cast<Text&>(*node_);
-        // Blocks are immutable once sent; the node only shares this one.
-        auto& shared = const_cast<layout::DOMTaskData&>(data);
-        if (kind == DOMTaskKind::UpdateTextPositionsInDOM)
-            text.TakeTextPositions(qsl::RefPtr(&static_cast<layout::TextPositions&>(shared)));
-        else
-            text.TakeFontStyle(qsl::RefPtr(&static_cast<layout::TextFontStyle&>(shared)));
-        return;
-    }
+void NodeLink::Receive(layout::DOMTaskKind kind, const layout::DOMTaskData&) {
     if (kind == layout::DOMTaskKind::FontArrived && node_ && node_->IsElement() && node_->IsInDocument()) {
         // The next solve asks for the faces of the family list again.
         static_cast<Element*>(node_)->GetDirtyProperties().Add(css::PropertyId::FontFamily);
         node_->GetDocument()->MarkNodeDirty(*node_);
         return;
     }
-    // Text controls, which are what else layout reports to, come with their own classes.
+    // What else layout reports goes to texts and text controls, which come with their own classes.
 }
 
 }  // namespace qorvex::dom

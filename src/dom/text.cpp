@@ -1,9 +1,10 @@
 #include "core/logging/log.h"
-#include "display/display_text.h"
 #include "dom/character_data.h"
 #include "dom/document.h"
 #include "dom/document_host.h"
+#include "dom/shown_text.h"
 #include "dom/text_transform.h"
+#include "layout/layout_tree.h"
 #include "script/make_handle.h"
 
 namespace qorvex::dom {
@@ -11,10 +12,31 @@ namespace qorvex::dom {
 using qsl::RefPtr;
 
 Text::Text(Document& document, std::string_view data)
-    : CharacterData(document, kIsText | kDisplayable, data), style_(document.GetDefaultStyle()) {}
+    : CharacterData(document, kIsText | kDisplayable, data), style_(document.GetDefaultTextStyle()) {}
+
+Text::~Text() {
+    if (display_element_) static_cast<ShownText&>(*display_element_).Cut();
+}
+
+layout::HandlePtr Text::CreateLayoutNode(layout::LayoutTree& tree, layout::LayoutHandle& parent) {
+    if (!display_element_) return nullptr;
+    AdoptLayoutHandle(tree.AddChild(parent, FindLayoutIndex(parent),
+                                    {.style = *style_,
+                                     .display = display_element_,
+                                     .link = layout::NodeLinkPtr(&static_cast<ShownText&>(*display_element_)),
+                                     .scroll = {}}));
+    return layout::HandlePtr(GetLayoutHandle());
+}
 
 void Text::ResetStyle() {
-    style_ = GetDocument()->GetDefaultStyle();
+    SetStyle(GetDocument()->GetDefaultTextStyle());
+}
+
+void Text::SetStyle(css::SharedStylePtr style) {
+    style_ = std::move(style);
+    // The former record may be gone.
+    layout::LayoutHandle* handle = GetLayoutHandle();
+    if (handle && handle->data().style) handle->data().style = style_.get();
 }
 
 void Text::ToDebugString(NodeText& out) const {
@@ -41,8 +63,7 @@ void Text::OnInsertedIntoDocument() {
     ForgetTransformedText();
     CharacterData::OnInsertedIntoDocument();
     if (!display_element_) {
-        display_element_ = MakeRef<dsp::DisplayText>(
-            GetLayoutLink(), GetDocument()->GetHost().GetInternationalizationManager());
+        display_element_ = ShownText::Make(*this, GetDocument()->GetHost().GetInternationalizationManager());
     }
     GetDocument()->QueueTextCommit(*this);
 }

@@ -11,6 +11,7 @@
 #include <yoga/Yoga.h>
 
 #include <algorithm>
+#include <utility>
 
 namespace qorvex::layout {
 
@@ -24,12 +25,28 @@ bool SameChildren(const HandleVector& a, const HandleVector& b) {
 void Sever(LayoutHandle& handle) {
     LayoutNode& node = handle.node();
     node.parent = nullptr;
-    node.children.clear();
-    node.below.reset();
     node.depth = 0;
-    node.absoluteBelow = false;
-    node.paintBounds = node.visualAabb = {};
+    node.absoluteBelow = node.layeredBelow = false;
+    node.visualAabb = {};
+    if (node.isBox) {
+        BoxNode& box = node.AsBox();
+        box.children.clear();
+        box.below.reset();
+        box.paintBounds = {};
+    }
     handle.store().FreeFlexNode(node);
+}
+
+void CopyBox(const BoxData& data, LayoutNode& node) {
+    BoxNode& box = node.AsBox();
+    box.zIndex = data.zIndex;
+    box.scroll = data.scroll;
+    node.display = data.display;
+    if (SameChildren(box.children, data.children)) return;
+    box.children = data.children;
+    // The bounds by groups are made anew: any child may have moved to another one.
+    if (box.below && box.below->groups) box.below->groups->Clear();
+    node.childrenChanged = true;
 }
 
 void CopyToLayoutSide(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
@@ -40,12 +57,8 @@ void CopyToLayoutSide(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
     if (data.changed && data.inTree && dirty != nullptr) {
         dirty->Add(dsp::ClipToAncestors(node));
     }
-    if (data.style != nullptr) node.style = *data.style;
-    node.style.written = data.written;
-    node.display = data.display;
-    node.scroll = data.scroll;
+    if (data.style != nullptr) handle.TakeStyle(*data.style);
     node.flags = data.flags;
-    node.zIndex = data.zIndex;
     node.parent = data.parent;
     // A layout or transform value may change paint order and stacking although every box stays.
     node.visualChanged = node.visualChanged || data.changed || data.written.Has(css::StyleGroup::Layout) ||
@@ -59,12 +72,7 @@ void CopyToLayoutSide(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
     }
     data.changed = false;
     data.written.Clear();
-    if (!SameChildren(node.children, data.children)) {
-        node.children = data.children;
-        // The bounds by groups are made anew: any child may have moved to another one.
-        if (node.below && node.below->groups) node.below->groups->Clear();
-        node.childrenChanged = true;
-    }
+    if (data.isBox) CopyBox(data.AsBox(), node);
 }
 
 }  // namespace
@@ -78,6 +86,12 @@ void LayoutTree::Commit(LayoutUpdateData& update, dsp::DirtyRegion* dirty, Debug
         if (parent == nullptr || parent->data().inTree)
             update.vanished.Add(dsp::ClipToAncestors(handle.node()));
     });
+    if (std::exchange(textsMoved_, false)) {
+        changed_.ForEach([&](LayoutHandle& handle) {
+            const LayoutNode& node = handle.node();
+            if (!node.isBox && node.parent != nullptr) update.vanished.Add(dsp::ClipToAncestors(node));
+        });
+    }
     changed_.ForEach([&](LayoutHandle& handle) {
         CopyToLayoutSide(handle, dirty);
         if (names != nullptr && handle.data().node) names->Set(&handle, handle.data().node->DebugName());

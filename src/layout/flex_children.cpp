@@ -21,7 +21,7 @@ bool IsMeasured(const LayoutNode& node) {
 // Measured nodes are leaves to Yoga, and so is the last level that takes part in layout.
 uint32_t FlexChildCount(const LayoutNode& node) {
     const bool leaf = IsMeasured(node) || node.depth + 1 >= limits::kMaxLayoutDepth;
-    return leaf ? 0 : static_cast<uint32_t>(node.children.size());
+    return leaf ? 0 : static_cast<uint32_t>(node.Children().size());
 }
 
 bool FlowsChildren(const LayoutNode& node) {
@@ -40,7 +40,7 @@ void ReportDepth(LayoutHandle& handle) {
 // Children that Yoga has to know: what a paragraph flows is no child of its node, but the flow asks Yoga for
 // edges and sizes of it.
 static uint32_t KnownChildCount(const LayoutNode& node) {
-    return FlowsChildren(node) ? static_cast<uint32_t>(node.children.size()) : FlexChildCount(node);
+    return FlowsChildren(node) ? static_cast<uint32_t>(node.Children().size()) : FlexChildCount(node);
 }
 
 static void SyncOneLevel(LayoutHandle& handle) {
@@ -48,16 +48,17 @@ static void SyncOneLevel(LayoutHandle& handle) {
     YGNode* owner = node.flex;
     if (!IsMeasured(node)) YGNodeSetMeasureFunc(owner, nullptr);
     const uint32_t wanted = FlexChildCount(node);
-    if (wanted == 0 && !node.children.empty() && !IsMeasured(node)) ReportDepth(handle);
+    if (wanted == 0 && !node.Children().empty() && !IsMeasured(node)) ReportDepth(handle);
     if (FlowsChildren(node)) handle.store().flowsText = true;
     uint32_t present = static_cast<uint32_t>(YGNodeGetChildCount(owner));
+    const HandleSpan children = node.Children();
     uint32_t prefix = 0;
     while (prefix < wanted && prefix < present &&
-           YGNodeGetChild(owner, prefix) == node.children[prefix]->node().flex)
+           YGNodeGetChild(owner, prefix) == children[prefix]->node().flex)
         ++prefix;
     uint32_t suffix = 0;
     while (suffix < wanted - prefix && suffix < present - prefix &&
-           YGNodeGetChild(owner, present - 1 - suffix) == node.children[wanted - 1 - suffix]->node().flex)
+           YGNodeGetChild(owner, present - 1 - suffix) == children[wanted - 1 - suffix]->node().flex)
         ++suffix;
     if (prefix == 0 && suffix == 0 && present > 0) {
         // One pass instead of one search a child.
@@ -67,7 +68,7 @@ static void SyncOneLevel(LayoutHandle& handle) {
     for (uint32_t i = present - suffix; i-- > prefix;)
         YGNodeRemoveChild(owner, YGNodeGetChild(owner, i));
     for (uint32_t i = prefix; i < wanted - suffix; ++i) {
-        YGNode* child = node.children[i]->node().flex;
+        YGNode* child = children[i]->node().flex;
         // A child that moved here may still stand in its former parent's list, whose turn comes later.
         if (YGNode* former = YGNodeGetOwner(child)) YGNodeRemoveChild(former, child);
         YGNodeInsertChild(owner, child, i);
@@ -92,7 +93,7 @@ static void SyncFlexTree(LayoutHandle& handle, const HandleSet* changed) {
             fresh.push_back(parent);
         }
         for (uint32_t i = KnownChildCount(parent->node()); i-- > 0;) {
-            LayoutHandle* child = parent->node().children[i].get();
+            LayoutHandle* child = parent->node().Children()[i].get();
             if (child->node().flex == nullptr) stack.push_back(child);
         }
     }
@@ -111,6 +112,11 @@ bool EnsureFlexTree(LayoutHandle& handle) {
     return true;
 }
 
+static void ForgetBox(LayoutNode& node) {
+    node.box = node.visualAabb = {};
+    if (node.isBox) node.AsBox().aabb = node.AsBox().paintBounds = {};
+}
+
 void UpdateDepths(LayoutHandle& top, const HandleSet& changed) {
     const TempMark mark;
     TempVector<LayoutHandle*> stack;
@@ -119,13 +125,14 @@ void UpdateDepths(LayoutHandle& top, const HandleSet& changed) {
         LayoutHandle* parent = stack.back();
         stack.pop_back();
         LayoutNode& node = parent->node();
-        for (uint32_t i = 0; i < node.children.size(); ++i) {
-            LayoutNode& child = node.children[i]->node();
+        const HandleSpan children = node.Children();
+        for (uint32_t i = 0; i < children.size(); ++i) {
+            LayoutNode& child = children[i]->node();
             child.index = i;
             const bool moved = child.depth != node.depth + 1;
             child.depth = node.depth + 1;
-            if (child.IsBeyondLimit()) child.box = child.aabb = child.paintBounds = child.visualAabb = {};
-            if (moved || changed.Contains(node.children[i].get())) stack.push_back(node.children[i].get());
+            if (child.IsBeyondLimit()) ForgetBox(child);
+            if (moved || changed.Contains(children[i].get())) stack.push_back(children[i].get());
         }
         if (!changed.Contains(parent)) SyncFlexChildren(*parent, changed);
     }

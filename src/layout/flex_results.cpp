@@ -30,11 +30,12 @@ void CopyEdges(YGNodeConstRef flex, float (*get)(YGNodeConstRef, YGEdge), Edges&
 void CopyMetrics(LayoutNode& node, EdgesCache& cache) {
     node.box.width = BoundSize(YGNodeLayoutGetWidth(node.flex));
     node.box.height = BoundSize(YGNodeLayoutGetHeight(node.flex));
+    if (!node.isBox) return;
     BoxEdges edges;
     CopyEdges(node.flex, YGNodeLayoutGetBorder, edges.border);
     CopyEdges(node.flex, YGNodeLayoutGetPadding, edges.padding);
     CopyEdges(node.flex, YGNodeLayoutGetMargin, edges.margin);
-    node.edges.Set(edges, cache);
+    node.AsBox().edges.Set(edges, cache);
 }
 
 // The box that a fixed node is placed in: the padding box of its container, or the view.
@@ -84,9 +85,10 @@ void Place(const Entry& entry, LayoutPass& pass) {
 
 // Those that Yoga laid out anew, or all.
 void PushChildren(const LayoutNode& node, Entry& child, bool all, TempVector<Entry>& stack) {
+    const HandleSpan children = node.Children();
     for (auto i = static_cast<uint32_t>(YGNodeGetChildCount(node.flex)); i-- > 0;) {
         if (!all && !YGNodeGetHasNewLayout(YGNodeGetChild(node.flex, i))) continue;
-        child.handle = node.children[i].get();
+        child.handle = children[i].get();
         PrefetchHandle(*child.handle);
         stack.push_back(child);
     }

@@ -96,22 +96,22 @@ void SyncContainer(YGNodeRef node, const LayoutStyle& style, css::TextAlignType 
 
 // A picture stretches in flex containers alone; in lines and blocks it keeps its size.
 YGAlign SelfAlignment(const LayoutNode& node) {
-    const YGAlign self = Pick(kAlignSelf, node.style.layout->alignSelf);
+    const YGAlign self = Pick(kAlignSelf, node.style->layout->alignSelf);
     if (self != YGAlignAuto || !node.flags.isReplaced || node.parent == nullptr) return self;
     const LayoutNode& parent = node.parent->node();
-    if (parent.style.layout->display == css::CSSDisplay::Flex) return self;
-    const css::TextAlignType align = parent.style.text->textAlign;
-    const bool aligned = parent.style.layout->display != css::CSSDisplay::Inline &&
+    if (parent.style->layout->display == css::CSSDisplay::Flex) return self;
+    const css::TextAlignType align = parent.style->text->textAlign;
+    const bool aligned = parent.style->layout->display != css::CSSDisplay::Inline &&
                          (align == css::TextAlignType::Right || align == css::TextAlignType::Center);
     return aligned ? self : YGAlignFlexStart;
 }
 
 // Children that stand for themselves need not have changed when their container becomes another kind.
 void SyncChildAlignment(LayoutNode& container) {
-    const bool isFlex = container.style.layout->display == css::CSSDisplay::Flex;
+    const bool isFlex = container.style->layout->display == css::CSSDisplay::Flex;
     if (container.wasFlexContainer == isFlex) return;
     container.wasFlexContainer = isFlex;
-    for (const HandlePtr& child : container.children) {
+    for (const HandlePtr& child : container.Children()) {
         const LayoutNode& node = child->node();
         if (node.flags.isReplaced && node.flex != nullptr)
             YGNodeStyleSetAlignSelf(node.flex, SelfAlignment(node));
@@ -283,9 +283,9 @@ FlexStyleContext::Written& WrittenPlace(FlexStyleContext& context, const LayoutS
 
 // All of a node's style but for the position type.
 void SyncBox(YGNodeRef node, const LayoutNode& layoutNode, FlexStyleContext& context) {
-    const LayoutStyle& style = *layoutNode.style.layout;
+    const LayoutStyle& style = *layoutNode.style->layout;
     YGNodeStyleSetDisplay(node, YGDisplayFlex);
-    SyncContainer(node, style, layoutNode.style.text->textAlign);
+    SyncContainer(node, style, layoutNode.style->text->textAlign);
     YGNodeStyleSetAlignSelf(node, SelfAlignment(layoutNode));
     SyncFlex(node, style.flex, context);
     SyncEdges(node, style, context.lengths);
@@ -310,14 +310,14 @@ Edges ResolveBorders(const LayoutStyle& style, const LengthContext& lengths) {
 bool SyncStyleToYoga(LayoutHandle& handle, FlexStyleContext& context) {
     LayoutNode& layoutNode = handle.node();
     YGNodeRef node = layoutNode.flex;
-    const LayoutStyle& style = *layoutNode.style.layout;
+    const LayoutStyle& style = *layoutNode.style->layout;
     RefreshNodeFlags(layoutNode);
     if (node == nullptr) return false;
     if (style.display == css::CSSDisplay::None) {
         YGNodeStyleSetDisplay(node, YGDisplayNone);
         return true;
     }
-    const css::TextLayoutStyle& text = *layoutNode.style.text;
+    const css::TextLayoutStyle& text = *layoutNode.style->text;
     context.lengths.em = text.computedFontSize;
     const YGPositionType position = PositionType(layoutNode, &handle == context.root);
     const FlexStyleKey key{&style, text.computedFontSize, text.textAlign};

@@ -1,5 +1,8 @@
 #include "layout/layout_handle.h"
 
+#include "display/resolved_visuals.h"
+#include "layout/layout_store.h"
+
 #include <algorithm>
 #include <bit>
 
@@ -17,7 +20,55 @@ bool Same(const Matrix& a, const Matrix& b) {
     return std::equal(a.m, a.m + 16, b.m);
 }
 
+// Of a text that no commit has seen.
+const css::LaidOutStyle kNoStyle;
+
+void ReleaseStyle(const css::LaidOutStyle* style) {
+    if (style != &kNoStyle) static_cast<const css::SharedStyle*>(style)->Release();
+}
+
 }  // namespace
+
+LayoutData::LayoutData(bool box) : isBox(box) {}
+LayoutNode::LayoutNode(bool box) : isBox(box), style(&kNoStyle) {}
+
+LayoutHandle::LayoutHandle(bool isBox) : LayoutData(isBox), LayoutNode(isBox) {}
+
+LayoutHandle::~LayoutHandle() {
+    if (!LayoutNode::isBox) ReleaseStyle(LayoutNode::style);
+}
+
+void LayoutHandle::TakeStyle(const css::LaidOutStyle& style) {
+    if (LayoutNode::isBox) {
+        LayoutNode::AsBox().style = style;
+        return;
+    }
+    css::SharedStylePtr shared = store_->textStyles.Get(style);
+    ReleaseStyle(LayoutNode::style);
+    LayoutNode::style = shared.leak();
+}
+
+BoxHandle::BoxHandle() : LayoutHandle(true) {
+    node().style = &node().AsBox().style;
+}
+
+BoxHandle::~BoxHandle() = default;
+
+Rect ContentOf(const LayoutHandle& child) {
+    const LayoutNode& node = child.node();
+    if (!node.isBox) return child.store().snapsToPixels ? SnapToPixels(node.box) : node.box;
+    const BoxNode& box = node.AsBox();
+    return box.local ? MapBounds(*box.local, box.aabb) : box.aabb;
+}
+
+Size LayoutNode::ScrollSize() const {
+    if (!isBox) return {};
+    const BoxNode& own = AsBox();
+    if (own.below) return {own.below->sum.content.width, own.below->sum.content.height};
+    if (own.children.size() != 1) return {};
+    const Rect content = ContentOf(*own.children[0]);
+    return {content.width, content.height};
+}
 
 void SharedEdges::Set(const BoxEdges& edges, EdgesCache& cache) {
     if (Same(edges, Get())) return;

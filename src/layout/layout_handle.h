@@ -5,6 +5,9 @@
 // SyncTrees runs; those two are the only code that touches both. So neither half has a lock: only the counts
 // of handles, style groups, node links and display elements are atomic.
 //
+// A text has neither children nor edges nor scrolling, so half of what a box needs is left out of its handle:
+// both halves have a part that only boxes have. What a handle is of stays so for its life.
+//
 // Owners of a handle: its element, the child vector of its parent's halves, change sets and tasks. Both
 // halves lie in the handle, which returns to the pool of the tree's store.
 #pragma once
@@ -20,7 +23,9 @@
 
 #include <array>
 #include <atomic>
+#include <cassert>
 #include <cstdint>
+#include <span>
 
 struct YGNode;
 
@@ -31,12 +36,16 @@ struct ResolvedVisuals;
 namespace qorvex::layout {
 
 class LayoutHandle;
+class BoxHandle;
+struct BoxData;
+struct BoxNode;
 class LayoutStore;
 template <typename T>
 class ObjectPool;
 class LayoutTree;
 using HandlePtr = qsl::RefPtr<LayoutHandle>;
 using HandleVector = CompactVector<HandlePtr, MemoryTag::LayoutNodes>;
+using HandleSpan = std::span<const HandlePtr>;
 
 // Facts that follow from a node's style alone. Computed on the layout side, mirrored to the DOM side.
 struct NodeFlags {
@@ -68,6 +77,7 @@ class SharedEdges {
     const Edges& padding() const { return Get().padding; }
     const Edges& margin() const { return Get().margin; }
     void Set(const BoxEdges& edges, EdgesCache& cache);
+    static const BoxEdges& None() { return kNone; }
 
   private:
     static constexpr BoxEdges kNone{};
@@ -97,6 +107,8 @@ struct LayoutResult {
     float top = 0;
     float width = 0;
     float height = 0;
+};
+struct BoxResult {
     SharedEdges edges;
     Rect visualAabb{};
     Rect viewBox{};  // the box under its transforms and the scrolling of its ancestors, in view coordinates
@@ -105,22 +117,39 @@ struct LayoutResult {
 
 struct LayoutData {
     LayoutHandle* parent = nullptr;
-    HandleVector children;  // DOM order among the siblings that have handles
-    dsp::DisplayElementPtr display;
     NodeLinkPtr node;
     // Of the node, read by the commit. Null once the node has died or left the document.
     const css::LaidOutStyle* style = nullptr;
     css::WrittenGroups written;  // since the last commit
     NodeFlags flags;
+    bool isBox : 1;  // and no text
     bool establishesStackingContext : 1 = false;
     bool isImage : 1 = false;
     bool changed : 1 = false;  // an edit that the next commit must carry over
     bool inTree : 1 = false;
-    int32_t zIndex = 0;
-    ScrollPosition scroll;
     LayoutResult result;
+
+  private:
+    friend class LayoutHandle;
+    friend class LayoutStore;
+    std::atomic<uint32_t> count_{1};  // of the handle, which has no better room for it
+
+  public:
+    explicit LayoutData(bool box);
+    // DOM order among the siblings that have handles; none of a text.
+    HandleSpan Children() const;
+    BoxData& AsBox();
+    const BoxData& AsBox() const;
 };
-static_assert(sizeof(LayoutData) == 128);
+static_assert(sizeof(LayoutData) == 48);
+
+struct BoxData {
+    HandleVector children;
+    dsp::DisplayElementPtr display;
+    ScrollPosition scroll;
+    int32_t zIndex = 0;
+    BoxResult result;
+};
 
 // What a node paints by itself; found when its style, its display element or its borders change, so that the
 // recording asks for nothing that is not there.
@@ -134,37 +163,18 @@ enum OwnPaint : uint8_t {
 };
 
 struct LayoutNode {
-    // First what the recording reads of every node.
-    HandleVector children;
-    Rect visualAabb{};  // what the node and its subtree can touch, view coordinates
-    Rect box{};         // document coordinates; z and the pixel grid play no part yet
-    // Small fields stand in the room that the member before them leaves at its end.
-    [[no_unique_address]] css::LaidOutStyle style;
-    NodeFlags flags;
-    bool establishesStackingContext = false;
-    uint8_t ownPaint = 0;  // OwnPaint
-    int32_t zIndex = 0;
-    dsp::DisplayElementPtr display;
-    Rect paintBounds{};  // what the node's own content can touch, view coordinates
-    // Depth below the root, which is 0. Nodes at kMaxLayoutDepth and deeper keep zero boxes.
-    uint32_t depth = 0;
-    // Made by the transform pass where there are children.
-    UniquePtr<ChildBounds, MemoryTag::LayoutNodes> below;
-
     LayoutHandle* parent = nullptr;
     // Its context points back at the handle. Only of nodes that Yoga lays out: none in a page, or a part of
     // it, that the simple engine places.
     YGNode* flex = nullptr;
-    ScrollPosition scroll;
-    SharedEdges edges;
-    Rect aabb{};  // snapped box and in-flow overflow, document coordinates
+    // Depth below the root, which is 0. Nodes at kMaxLayoutDepth and deeper keep zero boxes.
+    uint32_t depth = 0;
     // Place among the parent's children, for the bounds that the parent keeps by groups of children.
     uint32_t index = 0;
     // Present only where the style needs them.
-    UniquePtr<Matrix, MemoryTag::LayoutNodes> local;
-    UniquePtr<Matrix, MemoryTag::LayoutNodes> perspective;
     UniquePtr<dsp::ResolvedVisuals, MemoryTag::LayoutNodes> visuals;
 
+    // Small fields stand in the room that the member before them leaves at its end.
     [[no_unique_address]] WorldMatrix world;
     // As of the last SyncTrees.
     bool previousStacking : 1 = false;
@@ -190,20 +200,71 @@ struct LayoutNode {
     bool childrenChanged : 1 = false;
     // What Yoga was told last about the node as a container.
     bool wasFlexContainer : 1 = false;
-    int32_t previousZIndex = 0;  // as of the last SyncTrees
 
-    const Edges& border() const { return edges.border(); }
-    const Edges& padding() const { return edges.padding(); }
-    const Edges& margin() const { return edges.margin(); }
-    Size ScrollSize() const {
-        return below ? Size{below->sum.content.width, below->sum.content.height} : Size{};
-    }
+    // From here on what the recording reads of every node.
+    bool isBox : 1;  // and no text
+    bool establishesStackingContext : 1 = false;
+    // A child, or a plain node below, is positioned or a stacking context: not all below paints in tree
+    // order.
+    bool layeredBelow : 1 = false;
+    NodeFlags flags;
+    uint8_t ownPaint = 0;  // OwnPaint
+    // That of a text is there from the first moment and stays.
+    dsp::DisplayElementPtr display;
+    // Of a box its own, in its other part; of a text a record that all texts of that style share.
+    const css::LaidOutStyle* style;
+    Rect visualAabb{};  // what the node and its subtree can touch, view coordinates
+    Rect box{};         // document coordinates; z and the pixel grid play no part yet
+
+    explicit LayoutNode(bool box);
+
+    // The part that a box has on top.
+    BoxNode& AsBox();
+    const BoxNode& AsBox() const;
+    // And what a text has none of.
+    HandleSpan Children() const;
+    const Matrix* Local() const;
+    const Matrix* Perspective() const;
+    ScrollPosition Scroll() const;
+    int32_t ZIndex() const;
+    const Edges& border() const;
+    const Edges& padding() const;
+    const Edges& margin() const;
+    // Extent of the content.
+    Size ScrollSize() const;
+    // What the node's own content can touch, view coordinates.
+    const Rect& PaintBounds() const;
+
     // Beyond the depth limit a node takes no part in layout, transforms and painting.
     bool IsBeyondLimit() const { return depth >= limits::kMaxLayoutDepth; }
 };
-static_assert(sizeof(LayoutNode) == 224);
+static_assert(sizeof(LayoutNode) == 104);
 
-class LayoutHandle {
+// Lies right behind the node, the children first: the recording reads on.
+struct BoxNode {
+    HandleVector children;
+    [[no_unique_address]] css::LaidOutStyle style;
+    int32_t zIndex = 0;
+    int32_t previousZIndex = 0;  // as of the last SyncTrees
+    Rect paintBounds{};
+    Rect aabb{};  // snapped box and in-flow overflow, document coordinates
+    ScrollPosition scroll;
+    SharedEdges edges;
+    // Made by the transform pass where one child does not tell it all.
+    UniquePtr<ChildBounds, MemoryTag::LayoutNodes> below;
+    // Present only where the style needs them.
+    UniquePtr<Matrix, MemoryTag::LayoutNodes> local;
+    UniquePtr<Matrix, MemoryTag::LayoutNodes> perspective;
+};
+static_assert(sizeof(BoxNode) == 136);
+
+class HandleHead {
+  protected:
+    LayoutStore* store_ = nullptr;
+};
+
+// The handle of a text, and the base of a box's.
+class LayoutHandle : private HandleHead, private LayoutData, private LayoutNode {
   public:
     LayoutHandle(const LayoutHandle&) = delete;
     LayoutHandle& operator=(const LayoutHandle&) = delete;
@@ -212,24 +273,96 @@ class LayoutHandle {
     void Release() noexcept;
 
     // DOM thread.
-    LayoutData& data() { return data_; }
-    const LayoutData& data() const { return data_; }
+    LayoutData& data() { return *this; }
+    const LayoutData& data() const { return *this; }
     // Layout thread.
-    LayoutNode& node() { return node_; }
-    const LayoutNode& node() const { return node_; }
+    LayoutNode& node() { return *this; }
+    const LayoutNode& node() const { return *this; }
+    // DOM thread.
+    dsp::IDisplayElement* Display() const;
+    // The node takes over the style; on the layout side, at the commit.
+    void TakeStyle(const css::LaidOutStyle& style);
     // Shared by all handles of a tree; outlives the tree while a handle lives.
     LayoutStore& store() const { return *store_; }
 
+  protected:
+    explicit LayoutHandle(bool isBox);
+    ~LayoutHandle();
+
   private:
+    friend struct LayoutData;
+    friend struct LayoutNode;
     friend class LayoutStore;
     friend class ObjectPool<LayoutHandle>;
-    LayoutHandle() = default;
-    ~LayoutHandle() = default;
-
-    std::atomic<uint32_t> count_{1};
-    LayoutStore* store_ = nullptr;
-    LayoutData data_;
-    LayoutNode node_;
+    LayoutHandle() : LayoutHandle(false) {}
 };
+static_assert(sizeof(LayoutHandle) == 160);
+
+class BoxHandle final : public LayoutHandle, private BoxNode, private BoxData {
+    friend struct layout::LayoutData;
+    friend struct layout::LayoutNode;
+    friend class LayoutStore;
+    friend class ObjectPool<BoxHandle>;
+    BoxHandle();
+    ~BoxHandle();
+};
+static_assert(sizeof(BoxHandle) == 384);
+
+// What a child and its flow cover, in the coordinates of its parent.
+Rect ContentOf(const LayoutHandle& child);
+
+inline BoxData& LayoutData::AsBox() {
+    assert(isBox);
+    return static_cast<BoxHandle&>(static_cast<LayoutHandle&>(*this));
+}
+inline const BoxData& LayoutData::AsBox() const {
+    return const_cast<LayoutData*>(this)->AsBox();
+}
+inline HandleSpan LayoutData::Children() const {
+    if (!isBox) return {};
+    const HandleVector& children = AsBox().children;
+    return {children.data(), children.size()};
+}
+
+inline dsp::IDisplayElement* LayoutHandle::Display() const {
+    return LayoutData::isBox ? LayoutData::AsBox().display.get() : LayoutNode::display.get();
+}
+
+inline BoxNode& LayoutNode::AsBox() {
+    assert(isBox);
+    return static_cast<BoxHandle&>(static_cast<LayoutHandle&>(*this));
+}
+inline const BoxNode& LayoutNode::AsBox() const {
+    return const_cast<LayoutNode*>(this)->AsBox();
+}
+inline HandleSpan LayoutNode::Children() const {
+    if (!isBox) return {};
+    const HandleVector& children = AsBox().children;
+    return {children.data(), children.size()};
+}
+inline const Matrix* LayoutNode::Local() const {
+    return isBox ? AsBox().local.get() : nullptr;
+}
+inline const Matrix* LayoutNode::Perspective() const {
+    return isBox ? AsBox().perspective.get() : nullptr;
+}
+inline ScrollPosition LayoutNode::Scroll() const {
+    return isBox ? AsBox().scroll : ScrollPosition();
+}
+inline int32_t LayoutNode::ZIndex() const {
+    return isBox ? AsBox().zIndex : 0;
+}
+inline const Edges& LayoutNode::border() const {
+    return isBox ? AsBox().edges.border() : SharedEdges::None().border;
+}
+inline const Edges& LayoutNode::padding() const {
+    return isBox ? AsBox().edges.padding() : SharedEdges::None().padding;
+}
+inline const Edges& LayoutNode::margin() const {
+    return isBox ? AsBox().edges.margin() : SharedEdges::None().margin;
+}
+inline const Rect& LayoutNode::PaintBounds() const {
+    return isBox ? AsBox().paintBounds : visualAabb;
+}
 
 }  // namespace qorvex::layout

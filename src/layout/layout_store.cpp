@@ -15,9 +15,9 @@ LayoutStore::~LayoutStore() {
     YGConfigFree(config_);
 }
 
-HandlePtr LayoutStore::MakeHandle() {
+HandlePtr LayoutStore::MakeHandle(bool isBox) {
     const std::lock_guard lock(mutex_);
-    LayoutHandle* handle = handles_.Make();
+    LayoutHandle* handle = isBox ? boxes_.Make() : texts_.Make();
     AddRef();
     handle->store_ = this;
     return qsl::AdoptRef(handle);
@@ -41,26 +41,29 @@ void LayoutStore::FreeFlexNode(LayoutNode& node) noexcept {
 // deep stack. The list runs through the parent links, which mean nothing any more in a dead handle.
 void LayoutStore::Destroy(LayoutHandle* first) noexcept {
     uint32_t died = 0;
-    first->data_.parent = nullptr;
+    first->data().parent = nullptr;
     for (LayoutHandle* handle = first; handle != nullptr;) {
-        LayoutHandle* next = handle->data_.parent;
+        LayoutHandle* next = handle->data().parent;
         auto drop = [&](HandleVector& children, bool dataSide) {
             for (HandlePtr& child : children) {
                 LayoutHandle* raw = child.leak();
-                if (dataSide && raw->data_.parent == handle) raw->data_.parent = nullptr;
-                if (!dataSide && raw->node_.parent == handle) raw->node_.parent = nullptr;
+                if (dataSide && raw->data().parent == handle) raw->data().parent = nullptr;
+                if (!dataSide && raw->node().parent == handle) raw->node().parent = nullptr;
                 if (raw->count_.fetch_sub(1, std::memory_order_acq_rel) != 1) continue;
-                raw->data_.parent = next;
+                raw->data().parent = next;
                 next = raw;
             }
             children.clear();
         };
-        drop(handle->data_.children, true);
-        drop(handle->node_.children, false);
+        const bool isBox = handle->node().isBox;
+        if (isBox) {
+            drop(handle->data().AsBox().children, true);
+            drop(handle->node().AsBox().children, false);
+        }
         {
             const std::lock_guard lock(mutex_);
-            FreeFlexNode(handle->node_);
-            handles_.Recycle(handle);
+            FreeFlexNode(handle->node());
+            isBox ? boxes_.Recycle(static_cast<BoxHandle*>(handle)) : texts_.Recycle(handle);
         }
         ++died;
         handle = next;

@@ -5,6 +5,7 @@
 // else here belongs to the layout thread.
 #pragma once
 
+#include "css/values/shared_style.h"
 #include "layout/layout_handle.h"
 #include "layout/object_pool.h"
 #include "layout/text/text_services.h"
@@ -20,7 +21,7 @@ class LayoutStore : public AtomicRefCounted<LayoutStore, MemoryTag::LayoutNodes>
     LayoutStore();
     ~LayoutStore();
 
-    HandlePtr MakeHandle();
+    HandlePtr MakeHandle(bool isBox);
     void Destroy(LayoutHandle* handle) noexcept;
     // Yoga's node is larger than all else that a handle has, so it is made when Yoga first has to lay the
     // node out, and given back when it has not any more.
@@ -40,9 +41,12 @@ class LayoutStore : public AtomicRefCounted<LayoutStore, MemoryTag::LayoutNodes>
     TextServices text;
     // Some paragraph of the tree flows its children; never taken back.
     bool flowsText = false;
+    // As of the last transform pass.
+    bool snapsToPixels = true;
     // The warning about the depth limit is given once a tree.
     bool reportedDepth = false;
     EdgesCache recentEdges;
+    css::SharedStyles textStyles;
     // Yoga has nodes whose style was never written.
     bool flexStylesMissing = false;
     // The engine of the last layout; the other one's inputs are stale.
@@ -51,7 +55,8 @@ class LayoutStore : public AtomicRefCounted<LayoutStore, MemoryTag::LayoutNodes>
 
   private:
     std::mutex mutex_;
-    ObjectPool<LayoutHandle> handles_;
+    ObjectPool<LayoutHandle> texts_;
+    ObjectPool<BoxHandle> boxes_;
     YGConfig* config_;
 };
 

@@ -16,16 +16,22 @@ LayoutTree::~LayoutTree() {
 }
 
 HandlePtr LayoutTree::Create(NewNode&& node) {
-    HandlePtr handle = store_->MakeHandle();
+    HandlePtr handle =
+        store_->MakeHandle(!(node.display && node.display->Has(dsp::IDisplayElement::kIsText)));
     LayoutData& data = handle->data();
     data.style = &node.style;
     // The first commit carries everything.
     data.written.AddAll();
-    data.display = std::move(node.display);
     data.node = std::move(node.link);
-    data.scroll = node.scroll;
     data.isImage = node.isImage;
-    SetDisplayFlags(data.flags, data.display.get());
+    SetDisplayFlags(data.flags, node.display.get());
+    if (data.isBox) {
+        data.AsBox().scroll = node.scroll;
+        data.AsBox().display = std::move(node.display);
+    } else {
+        // No task knows of the handle yet.
+        handle->node().display = std::move(node.display);
+    }
     data.changed = true;
     changed_.Insert(handle.get());
     return handle;
@@ -48,13 +54,13 @@ HandlePtr LayoutTree::AddChild(LayoutHandle& parent, uint32_t index, NewNode&& n
 void LayoutTree::Attach(LayoutHandle& handle, LayoutHandle& parent, uint32_t index) {
     LayoutData& data = handle.data();
     if (data.inTree) Remove(handle, nullptr);
-    HandleVector& siblings = parent.data().children;
+    HandleVector& siblings = parent.data().AsBox().children;
     siblings.insert(siblings.begin() + std::min<uint32_t>(index, siblings.size()), HandlePtr(&handle));
     data.parent = &parent;
     data.inTree = true;
     data.changed = true;
     if (data.node) data.node->SetInLayoutTree(true);
-    removed_.Erase(&handle);
+    if (removed_.Erase(&handle) && !data.isBox) textsMoved_ = true;
     changed_.Insert(&handle);
     changed_.Insert(&parent);
 }
@@ -64,7 +70,7 @@ void LayoutTree::Attach(LayoutHandle& handle, LayoutHandle& parent, uint32_t ind
 void LayoutTree::Remove(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
     if (!handle.data().inTree) return;
     if (LayoutHandle* parent = handle.data().parent) {
-        HandleVector& siblings = parent->data().children;
+        HandleVector& siblings = parent->data().AsBox().children;
         // From both ends: children that go one after another do so from the first or from the last.
         for (uint32_t front = 0, back = siblings.size(); front < back; ++front) {
             const bool isFront = siblings[front].get() == &handle;
@@ -81,15 +87,18 @@ void LayoutTree::Remove(LayoutHandle& handle, dsp::DirtyRegion* dirty) {
     queue.push_back(&handle);
     for (uint32_t next = 0; next < queue.size(); ++next) {
         LayoutData& data = queue[next]->data();
-        if (dirty != nullptr) dirty->Add(data.result.visualAabb);
         data.inTree = false;
         data.parent = nullptr;
         if (data.node) data.node->SetInLayoutTree(false);
-        for (HandlePtr& child : data.children) {
+        // What a text covered the next commit finds out.
+        if (!data.isBox) continue;
+        BoxData& box = data.AsBox();
+        if (dirty != nullptr) dirty->Add(box.result.visualAabb);
+        for (HandlePtr& child : box.children) {
             removed_.Insert(child.get());
             queue.push_back(child.get());
         }
-        data.children.clear();
+        box.children.clear();
     }
     if (root_ == &handle) root_.reset();
 }
@@ -105,22 +114,23 @@ void LayoutTree::MarkChanged(LayoutHandle& handle) {
     changed_.Insert(&handle);
 }
 
-void LayoutTree::UpdateStyle(LayoutHandle& handle, const css::LaidOutStyle& style) {
+void LayoutTree::UpdateStyle(LayoutHandle& handle, const css::LaidOutStyle& style,
+                             css::WrittenGroups written) {
     LayoutData& data = handle.data();
     data.style = &style;
-    data.written |= style.written;
+    data.written |= written;
     changed_.Insert(&handle);
 }
 
 void LayoutTree::SetScroll(LayoutHandle& handle, ScrollPosition scroll) {
-    handle.data().scroll = scroll;
+    handle.data().AsBox().scroll = scroll;
     MarkChanged(handle);
 }
 
 void LayoutTree::SetDisplayElement(LayoutHandle& handle, dsp::DisplayElementPtr display) {
     LayoutData& data = handle.data();
-    data.display = std::move(display);
-    SetDisplayFlags(data.flags, data.display.get());
+    data.AsBox().display = std::move(display);
+    SetDisplayFlags(data.flags, data.AsBox().display.get());
     MarkChanged(handle);
 }
 

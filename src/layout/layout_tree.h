@@ -14,7 +14,7 @@
 
 namespace qorvex::layout {
 
-// What a node brings along when its handle is made.
+// What a node brings along when its handle is made. The display element tells whether it is a text.
 struct NewNode {
     // Stays where it is until the node has left the document; the commit reads it.
     const css::LaidOutStyle& style;
@@ -52,7 +52,10 @@ class LayoutTree {
     void MarkChanged(LayoutHandle& handle);
     // The next commit takes over the element's groups; the caller clears the element's written flags after
     // it.
-    void UpdateStyle(LayoutHandle& handle, const css::LaidOutStyle& style);
+    void UpdateStyle(LayoutHandle& handle, const css::LaidOutStyle& style) {
+        UpdateStyle(handle, style, style.written);
+    }
+    void UpdateStyle(LayoutHandle& handle, const css::LaidOutStyle& style, css::WrittenGroups written);
     void SetScroll(LayoutHandle& handle, ScrollPosition scroll);
     void SetDisplayElement(LayoutHandle& handle, dsp::DisplayElementPtr display);
 
@@ -70,6 +73,8 @@ class LayoutTree {
     HandlePtr root_;
     HandleSet changed_;
     HandleSet removed_;
+    // A text was taken out and placed again since the last commit.
+    bool textsMoved_ = false;
 };
 
 }  // namespace qorvex::layout

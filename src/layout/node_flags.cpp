@@ -3,8 +3,8 @@
 namespace qorvex::layout {
 
 void RefreshNodeFlags(LayoutNode& node) {
-    const css::LayoutStyle& style = *node.style.layout;
-    const css::TransformStyle& transform = *node.style.transform;
+    const css::LayoutStyle& style = *node.style->layout;
+    const css::TransformStyle& transform = *node.style->transform;
     NodeFlags& flags = node.flags;
     flags.isPositioned = style.position != css::CSSPosition::Static;
     flags.isFixed = style.position == css::CSSPosition::Fixed;
@@ -13,7 +13,7 @@ void RefreshNodeFlags(LayoutNode& node) {
         style.overflowX != css::CSSOverflow::Visible || style.overflowY != css::CSSOverflow::Visible;
     flags.containsFixedDescendants = !transform.transform.empty() ||
                                      transform.perspective.kind != css::PerspectiveKind::None ||
-                                     !node.style.visual->filter.empty();
+                                     !node.style->visual->filter.empty();
     flags.preserves3d = transform.transformStyle == css::TransformStyleProperty::Preserve3D;
     SetDisplayFlags(flags, node.display.get());
 }

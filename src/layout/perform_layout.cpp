@@ -30,7 +30,7 @@ namespace {
 bool TakeMetrics(LayoutPass& pass, LayoutStore::Engine engine) {
     LayoutStore& store = pass.root->store();
     const LayoutStore::Metrics now{pass.viewWidth, pass.viewHeight,
-                                   pass.root->node().style.text->computedFontSize};
+                                   pass.root->node().style->text->computedFontSize};
     const bool same = store.metrics == now && store.engine == engine;
     store.metrics = now;
     store.engine = engine;
@@ -51,7 +51,7 @@ void SyncAllStyles(LayoutPass& pass, FlexStyleContext& context) {
         if (SyncStyleToYoga(*handle, context)) ++pass.update.counters.synced;
         dsp::InvalidateParagraphs(*handle);
         if (YGNodeGetChildCount(handle->node().flex) == 0 && !FlowsChildren(handle->node())) continue;
-        for (const HandlePtr& child : handle->node().children)
+        for (const HandlePtr& child : handle->node().Children())
             stack.push_back(child.get());
     }
 }
@@ -146,7 +146,7 @@ void PerformFlexLayout(LayoutPass& pass, const css::LengthContext& lengths) {
 }  // namespace
 
 css::LengthContext MakeLengthContext(const LayoutPass& pass) {
-    const float rem = pass.root->node().style.text->computedFontSize;
+    const float rem = pass.root->node().style->text->computedFontSize;
     return {static_cast<float>(pass.viewWidth) / 100, static_cast<float>(pass.viewHeight) / 100, rem, rem, 0};
 }
 

@@ -19,8 +19,9 @@ inline void PrefetchBytes(const void* begin, size_t size) {
     __builtin_prefetch(memory + size - 1);
 }
 
+// With the part that boxes have behind it.
 inline void PrefetchNode(const LayoutHandle& handle) {
-    PrefetchBytes(&handle.node(), sizeof(LayoutNode));
+    PrefetchBytes(&handle.node(), sizeof(LayoutNode) + sizeof(BoxNode));
 }
 
 // The node, and what the handle itself holds.
@@ -29,10 +30,10 @@ inline void PrefetchHandle(const LayoutHandle& handle) {
     PrefetchNode(handle);
 }
 
-// What the recording reads of every node, which stands first.
+// What the recording reads of every node, from its visuals to a box's children.
 inline void PrefetchPaint(const LayoutHandle& handle) {
     constexpr size_t kPaintBytes = 128;
-    PrefetchBytes(&handle.node(), kPaintBytes);
+    PrefetchBytes(&handle.node().visuals, kPaintBytes);
 }
 
 // What writing a node's style touches beside the node, whose own memory has arrived. Yoga's nodes begin with

@@ -48,6 +48,7 @@ Rect ContainingBox(const LayoutNode& node, const Containers& in, const LengthCon
 }
 
 void ResolveEdges(LayoutHandle& handle, const LayoutStyle& style, const LengthContext& lengths, float base) {
+    if (!handle.node().isBox) return;
     BoxEdges edges;
     edges.border = ResolveBorders(style, lengths);
     // Stored for scripts; in this engine margins move nothing.
@@ -55,7 +56,7 @@ void ResolveEdges(LayoutHandle& handle, const LayoutStyle& style, const LengthCo
                     Resolve(style.marginTop, lengths, base), Resolve(style.marginBottom, lengths, base)};
     edges.padding = {Resolve(style.paddingLeft, lengths, base), Resolve(style.paddingRight, lengths, base),
                      Resolve(style.paddingTop, lengths, base), Resolve(style.paddingBottom, lengths, base)};
-    handle.node().edges.Set(edges, handle.store().recentEdges);
+    handle.node().AsBox().edges.Set(edges, handle.store().recentEdges);
 }
 
 Point PlaceIn(const Rect& in, const LayoutNode& node, const LayoutStyle& style,
@@ -73,7 +74,7 @@ void FitAutoSizes(LayoutNode& node, const LayoutStyle& style) {
     if (style.width.IsLength() && style.height.IsLength()) return;
     Size sum{node.padding().left + node.padding().right + node.border().left + node.border().right,
              node.padding().top + node.padding().bottom + node.border().top + node.border().bottom};
-    for (const HandlePtr& child : node.children) {
+    for (const HandlePtr& child : node.Children()) {
         const LayoutNode& flow = child->node();
         if (flow.flags.isAbsolute || flow.flags.isFixed) continue;
         sum.width += flow.box.width;
@@ -112,7 +113,7 @@ void SyncFlow(LayoutHandle& paragraph, LayoutPass& pass, const LengthContext& le
     queue.push_back(&paragraph);
     for (uint32_t next = 0; next < queue.size(); ++next) {
         SyncStyleToYoga(*queue[next], context);
-        for (const HandlePtr& child : queue[next]->node().children)
+        for (const HandlePtr& child : queue[next]->node().Children())
             queue.push_back(child.get());
     }
     dsp::InvalidateParagraphs(paragraph);
@@ -123,9 +124,9 @@ void LayoutSimpleSubtree(LayoutHandle& handle, LayoutPass& pass, LengthContext l
     if (node.IsBeyondLimit()) return;
     handle.store().FreeFlexNode(node);
     RefreshNodeFlags(node);
-    const LayoutStyle& style = *node.style.layout;
+    const LayoutStyle& style = *node.style->layout;
     const OldBox old(node);
-    lengths.em = node.style.text->computedFontSize;
+    lengths.em = node.style->text->computedFontSize;
     const Rect containing = ContainingBox(node, in, lengths);
     ResolveEdges(handle, style, lengths, containing.width);
     const Point place = PlaceIn(containing, node, style, lengths);
@@ -154,17 +155,17 @@ void LayoutSimpleSubtree(LayoutHandle& handle, LayoutPass& pass, LengthContext l
         NoteBoxChange(handle, old, pass);
         return;
     }
-    for (const HandlePtr& child : node.children) {
+    for (const HandlePtr& child : node.Children()) {
         LayoutNode& childNode = child->node();
-        if (childNode.style.layout->display != css::CSSDisplay::Flex) {
+        if (childNode.style->layout->display != css::CSSDisplay::Flex) {
             LayoutSimpleSubtree(*child, pass, lengths, below);
             continue;
         }
         RefreshNodeFlags(childNode);
         LengthContext own = lengths;
-        own.em = childNode.style.text->computedFontSize;
+        own.em = childNode.style->text->computedFontSize;
         const Rect box = ContainingBox(childNode, below, own);
-        LayoutFlexInSimple(lengths, pass, *child, PlaceIn(box, childNode, *childNode.style.layout, own),
+        LayoutFlexInSimple(lengths, pass, *child, PlaceIn(box, childNode, *childNode.style->layout, own),
                            below.fixed);
     }
     FitAutoSizes(node, style);
@@ -179,7 +180,7 @@ LayoutHandle* TopMostChanged(LayoutHandle& handle, const LayoutPass& pass) {
         // Inside a flex element the run of Yoga begins at that element.
         // Inside a paragraph the lines begin at that paragraph.
         const bool flows = node.display && node.display->Has(dsp::IDisplayElement::kFlowsChildren);
-        if (pass.update.changed.Contains(parent) || node.style.layout->display == css::CSSDisplay::Flex ||
+        if (pass.update.changed.Contains(parent) || node.style->layout->display == css::CSSDisplay::Flex ||
             flows)
             top = parent;
     }
@@ -200,14 +201,14 @@ Containers ContainersAbove(const LayoutHandle& handle, const LayoutPass& pass) {
 void LayoutFrom(LayoutHandle& handle, LayoutPass& pass, const LengthContext& lengths) {
     const Containers above = ContainersAbove(handle, pass);
     LayoutNode& node = handle.node();
-    if (node.style.layout->display != css::CSSDisplay::Flex) {
+    if (node.style->layout->display != css::CSSDisplay::Flex) {
         LayoutSimpleSubtree(handle, pass, lengths, above);
         return;
     }
     RefreshNodeFlags(node);
     LengthContext own = lengths;
-    own.em = node.style.text->computedFontSize;
-    const Point place = PlaceIn(ContainingBox(node, above, own), node, *node.style.layout, own);
+    own.em = node.style->text->computedFontSize;
+    const Point place = PlaceIn(ContainingBox(node, above, own), node, *node.style->layout, own);
     LayoutFlexInSimple(lengths, pass, handle, place, above.fixed);
 }
 
@@ -243,7 +244,7 @@ void LayoutFlexInSimple(const LengthContext& lengths, LayoutPass& pass, LayoutHa
         const LayoutNode& node = current->node();
         const bool flows = node.display && node.display->Has(dsp::IDisplayElement::kFlowsChildren);
         if (YGNodeGetChildCount(node.flex) == 0 && !flows) continue;
-        for (const HandlePtr& child : current->node().children)
+        for (const HandlePtr& child : current->node().Children())
             queue.push_back(child.get());
     }
     YGNodeRef flex = handle.node().flex;

@@ -21,7 +21,9 @@ class PooledMemory {
     }
 
   private:
-    static inline constinit ObjectPool pool_{kBytes, alignof(std::max_align_t), kBatch, MemoryTag::DOM};
+    static constexpr size_t kAlignment =
+        kBytes % alignof(std::max_align_t) == 0 ? alignof(std::max_align_t) : 8;
+    static inline constinit ObjectPool pool_{kBytes, kAlignment, kBatch, MemoryTag::DOM};
 };
 
 // The two operators in a class's public section.

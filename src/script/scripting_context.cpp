@@ -57,6 +57,10 @@ void UnregisterScriptingContext(ScriptingContext& context) {
     }
 }
 
+ScriptingContext* GetFirstScriptingContext() {
+    return t_contexts;
+}
+
 ScriptingContext* GetScriptingContext(JSContextRef context) {
     // What the engine hands to callbacks is the global context itself, so the question that would settle it,
     // which takes the engine's lock, is hardly ever asked.

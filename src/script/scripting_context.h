@@ -79,6 +79,9 @@ struct ScriptingContext {
 void RegisterScriptingContext(ScriptingContext& context);
 void UnregisterScriptingContext(ScriptingContext& context);
 
+// The chain of the thread's contexts; null for an empty one.
+[[nodiscard]] ScriptingContext* GetFirstScriptingContext();
+
 // The context of the page that `context` belongs to; null for a context that no page owns. A short walk: a
 // thread has as many contexts as it has views.
 [[nodiscard]] ScriptingContext* GetScriptingContext(JSContextRef context);

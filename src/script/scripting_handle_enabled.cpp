@@ -20,21 +20,21 @@ void ScriptingHandleEnabled::operator delete(void* memory) {
 
 void ScriptingHandleEnabled::ReleaseWrapper() {
     if (!wrapper_ || IsScriptContextTeardown()) return;
-    if (ScriptingContext* page = GetScriptingContext(wrapper_context_)) page->wrappers.LetGo(wrapper_);
+    for (ScriptingContext* page = GetFirstScriptingContext(); page; page = page->next)
+        page->wrappers.LetGo(wrapper_);
 }
 
 void ScriptingHandleEnabled::HoldWrapper() {
     if (IsScriptContextTeardown()) return;
-    if (ScriptingContext* page = GetScriptingContext(wrapper_context_)) page->wrappers.Hold(wrapper_);
+    for (ScriptingContext* page = GetFirstScriptingContext(); page; page = page->next)
+        page->wrappers.Hold(wrapper_);
 }
 
 bool ScriptingHandleEnabled::MakeWrapper(ScriptClass script_class, bool has_weak, JSContextRef context) {
     ScriptingContext* page = GetScriptingContext(context);
     if (!page) return false;
     wrapper_ = page->wrappers.Add(script_class, PackPrivate(this, script_class, has_weak));
-    if (!wrapper_) return false;
-    wrapper_context_ = page->context;
-    return true;
+    return wrapper_ != nullptr;
 }
 
 WeakHandleBlock* MakeWeakHandleBlock(ScriptingHandleEnabledRefCountedWithWeak* object) {

@@ -45,7 +45,6 @@ class ScriptingHandleEnabled {
     virtual void GetOrCreateWrapper(JSContextRef context, JSValueRef* out) = 0;
 
     [[nodiscard]] JSObjectRef wrapper() const { return wrapper_; }
-    [[nodiscard]] JSContextRef wrapper_context() const { return wrapper_context_; }
 
     // Memory of the DOM area from the client's allocator.
     static void* operator new(size_t size);
@@ -56,9 +55,8 @@ class ScriptingHandleEnabled {
     // True when it was made.
     bool MakeWrapper(ScriptClass script_class, bool has_weak, JSContextRef context);
 
+    // Null until the first wrapping. Of which page it is the pages of the thread know.
     JSObjectRef wrapper_ = nullptr;
-    // The global context in which the wrapper was made; null until the first wrapping.
-    JSContextRef wrapper_context_ = nullptr;
 };
 
 // Plain count that weak control blocks use: the one part another thread may touch.
@@ -163,7 +161,6 @@ class ReferenceCounted : public ScriptingHandleEnabled, protected WeakPolicy, pr
     void DetachWrapper() {
         Counter::TurnWrapperIntoNative();
         wrapper_ = nullptr;
-        wrapper_context_ = nullptr;
     }
     [[nodiscard]] bool IsHeldByWrapperOnly() const { return Counter::value() == 1; }
 

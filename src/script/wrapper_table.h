@@ -51,7 +51,7 @@ class WrapperTable final : private IHeapObserver {
 
     // A new wrapper of the class, held. Null when the page has no such class (any more).
     [[nodiscard]] JSObjectRef Add(ScriptClass script_class, const void* packed);
-    // The first native holder is there again, or the last one has gone.
+    // The first native holder is there again, or the last one has gone. Nothing for wrappers of other pages.
     void Hold(JSObjectRef wrapper);
     void LetGo(JSObjectRef wrapper);
 

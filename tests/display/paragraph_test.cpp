@@ -64,7 +64,7 @@ class ParagraphTest : public LayoutTest {
     LayoutHandle* Add(LayoutHandle* parent, dsp::DisplayElementPtr display, std::string_view style) {
         css::LayoutStyleRefs refs = Page::Style(style);
         refs.Mutable<css::TextLayoutStyle>().typefaces.push_back(font);
-        kept.push_back(page.tree.AddChild(*parent, parent->data().children.size(),
+        kept.push_back(page.tree.AddChild(*parent, parent->data().Children().size(),
                                           {page.Store(refs), std::move(display), nullptr, {}, false}));
         return kept.back().get();
     }

@@ -2,6 +2,7 @@
 // is laid out from nothing.
 #include <fresco/rendering_library.h>
 
+#include <algorithm>
 #include <random>
 
 #include "display/display_text.h"
@@ -96,6 +97,30 @@ TEST_F(TextChangeTest, BoxesAreThoseOfANewPage) {
         fresh.page.Frame();
         ASSERT_EQ(labels.Boxes(), fresh.Boxes()) << step;
     }
+}
+
+TEST_F(TextChangeTest, WhereATextWasIsPaintedAnew) {
+    Labels labels(Fonts(), {"10", "20", "30"});
+    Page& page = labels.page;
+    LayoutHandle* clip =
+        page.Add(page.body, "position: absolute; left: 500px; width: 40px; overflow: hidden");
+    page.Settle();
+    const auto paints = [&](const layout::Rect& area) {
+        EXPECT_FALSE(layout::IsEmpty(area));
+        return std::any_of(page.dirty.begin(), page.dirty.end(),
+                           [&](const layout::Rect& rect) { return layout::Contains(rect, area); });
+    };
+    const layout::Rect moved = labels.handles[0]->node().visualAabb;
+    page.dirty.Clear();
+    page.tree.Remove(*labels.handles[0], &page.dirty);
+    page.tree.Attach(*labels.handles[0], *clip, 0);
+    page.Frame();
+    EXPECT_TRUE(paints(moved));
+    const layout::Rect gone = labels.handles[2]->node().visualAabb;
+    page.dirty.Clear();
+    page.tree.Remove(*labels.handles[2], &page.dirty);
+    page.Frame();
+    EXPECT_TRUE(paints(gone));
 }
 
 }  // namespace

@@ -54,7 +54,7 @@ TEST_F(TransformTest, OperationsApplyInOrderAroundTheOrigin) {
     page.Change(box, "transform: none");
     page.Frame(LayoutWork::Transforms);
     ExpectRect(Mapped(box), 100, 50, 40, 20);
-    EXPECT_FALSE(box->node().local);
+    EXPECT_FALSE(box->node().Local());
 }
 
 TEST_F(TransformTest, PerspectiveAppliesToChildrenAndFlatteningDropsDepth) {
@@ -80,7 +80,7 @@ TEST_F(TransformTest, PerspectiveAppliesToChildrenAndFlatteningDropsDepth) {
     }
     page.Change(near, "transform: scale(0)");
     page.Frame(LayoutWork::Transforms);
-    EXPECT_TRUE(layout::IsEmpty(near->node().paintBounds));
+    EXPECT_TRUE(layout::IsEmpty(near->node().PaintBounds()));
 }
 
 TEST_F(TransformTest, VisualBoundsIncludeShadowsAndFilters) {
@@ -170,10 +170,10 @@ TEST_F(TransformTest, StackingContexts) {
         page.Change(box, c.style);
         page.Frame();
         EXPECT_EQ(box->data().establishesStackingContext, c.context) << c.style;
-        EXPECT_EQ(box->data().zIndex, c.z) << c.style;
+        EXPECT_EQ(box->data().AsBox().zIndex, c.z) << c.style;
     }
     EXPECT_TRUE(item->data().establishesStackingContext);
-    EXPECT_EQ(item->data().zIndex, 1);
+    EXPECT_EQ(item->data().AsBox().zIndex, 1);
 }
 
 // --- The incremental passes against the full ones.
@@ -220,11 +220,11 @@ std::string Describe(const LayoutHandle* handle) {
         std::snprintf(part, sizeof(part), "[%g %g %g %g]", rect.x, rect.y, rect.width, rect.height);
         return std::string(part);
     };
-    std::snprintf(text, sizeof(text), " scroll %g %g %g %g z %d %d world %g %g %g %g %g %g", n.scroll.x,
-                  n.scroll.y, n.ScrollSize().width, n.ScrollSize().height, n.zIndex,
+    std::snprintf(text, sizeof(text), " scroll %g %g %g %g z %d %d world %g %g %g %g %g %g", n.Scroll().x,
+                  n.Scroll().y, n.ScrollSize().width, n.ScrollSize().height, n.ZIndex(),
                   n.establishesStackingContext, n.world.Get().m[0], n.world.Get().m[1], n.world.Get().m[4],
                   n.world.Get().m[5], n.world.Get().m[12], n.world.Get().m[13]);
-    return BoxOf(handle) + r(n.box) + r(n.aabb) + r(n.paintBounds) + r(n.visualAabb) + text;
+    return BoxOf(handle) + r(n.box) + r(n.AsBox().aabb) + r(n.PaintBounds()) + r(n.visualAabb) + text;
 }
 
 TEST_F(TransformTest, IncrementalPassesEqualFullOnesUnderRandomChanges) {
@@ -278,7 +278,7 @@ TEST_F(TransformTest, IncrementalPassesEqualFullOnesUnderRandomChanges) {
                 gone[node] = false;
                 continue;
             }
-            const uint32_t children = twin.fastNodes[node]->data().children.size();
+            const uint32_t children = twin.fastNodes[node]->data().Children().size();
             switch (pick(twin.fastNodes.size() < 60 ? 3 : 8)) {
                 case 0:
                 case 1: {

@@ -15,9 +15,9 @@ class LayoutMarksTest : public DomTest {
     // Ids and texts of the layout tree below a handle.
     static std::string Boxes(const layout::LayoutHandle& handle) {
         std::string text(handle.data().node->DebugName());
-        if (handle.data().children.empty()) return text;
+        if (handle.data().Children().empty()) return text;
         text += "(";
-        for (const auto& child : handle.data().children) {
+        for (const auto& child : handle.data().Children()) {
             if (text.back() != '(') text += " ";
             text += Boxes(*child);
         }

@@ -17,8 +17,8 @@ TEST_F(FlexLayoutTest, BlocksStackAndStretch) {
     EXPECT_EQ(BoxOf(page.root), "0 0 1000 500");
     EXPECT_EQ(BoxOf(a), "5 5 990 20");
     EXPECT_EQ(BoxOf(b), "0 30 1000 96");
-    EXPECT_EQ(a->data().result.edges.border().left, 2);
-    EXPECT_EQ(a->data().result.edges.padding().top, 1);
+    EXPECT_EQ(a->data().AsBox().result.edges.border().left, 2);
+    EXPECT_EQ(a->data().AsBox().result.edges.padding().top, 1);
 }
 
 TEST_F(FlexLayoutTest, ContainerPropertiesFollowDisplay) {

@@ -13,7 +13,7 @@ using LayoutTreeTest = LayoutTest;
 
 std::vector<const LayoutHandle*> NodeChildren(const LayoutHandle* handle) {
     std::vector<const LayoutHandle*> children;
-    for (const HandlePtr& child : handle->node().children)
+    for (const HandlePtr& child : handle->node().Children())
         children.push_back(child.get());
     return children;
 }
@@ -73,7 +73,7 @@ TEST_F(LayoutTreeTest, RemovingTakesTheSubtreeOutOnceAndDirtiesWhatItCovered) {
     EXPECT_FALSE(node.inTree);
     EXPECT_FALSE(child->data().inTree);
     page.Frame();
-    EXPECT_TRUE(page.body->node().children.empty());
+    EXPECT_TRUE(page.body->node().Children().empty());
     EXPECT_EQ(BoxOf(page.body), "0 0 1000 0");
     EXPECT_TRUE(layout::Contains(page.dirty.Bounds(), layout::MakeRect(0, 0, 80, 90)));
 }
@@ -88,7 +88,7 @@ TEST_F(LayoutTreeTest, MovedNodeIsRemovedAndAttached) {
     page.tree.Attach(*moved, *b, 0);
     EXPECT_TRUE(page.tree.Removed().Empty());
     page.Frame();
-    EXPECT_TRUE(a->node().children.empty());
+    EXPECT_TRUE(a->node().Children().empty());
     EXPECT_EQ(BoxOf(moved), "0 10 10 5");
     // There and back between two frames.
     page.tree.Remove(*moved, nullptr);
@@ -131,17 +131,17 @@ TEST_F(LayoutTreeTest, ScrollPositionIsClampedWhenContentShrinks) {
     page.Settle();
     page.tree.SetScroll(*scroller, {0, 300});
     page.Frame();
-    EXPECT_EQ(scroller->data().scroll.y, 300);
+    EXPECT_EQ(scroller->data().AsBox().scroll.y, 300);
     EXPECT_EQ(content->node().world.Get().m[13], -300);
-    EXPECT_EQ(scroller->data().result.scrollSize.height, 500);
+    EXPECT_EQ(scroller->data().AsBox().result.scrollSize.height, 500);
     page.Change(content, "height: 250px");
     page.Frame();
-    EXPECT_EQ(scroller->data().scroll.y, 150);
+    EXPECT_EQ(scroller->data().AsBox().scroll.y, 150);
     EXPECT_EQ(content->node().world.Get().m[13], -150);
     page.tree.SetScroll(*scroller, {std::nanf(""), -5});
     page.Frame();
-    EXPECT_EQ(scroller->data().scroll.x, 0);
-    EXPECT_EQ(scroller->data().scroll.y, 0);
+    EXPECT_EQ(scroller->data().AsBox().scroll.x, 0);
+    EXPECT_EQ(scroller->data().AsBox().scroll.y, 0);
 }
 
 }  // namespace

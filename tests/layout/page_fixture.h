@@ -72,7 +72,7 @@ class Page {
     css::LayoutStyleRefs& Store(const css::LayoutStyleRefs& style) { return styles_.emplace_back(style); }
 
     layout::LayoutHandle* Add(layout::LayoutHandle* parent, std::string_view style) {
-        return Insert(parent, parent->data().children.size(), style);
+        return Insert(parent, parent->data().Children().size(), style);
     }
     layout::LayoutHandle* Insert(layout::LayoutHandle* parent, uint32_t index, std::string_view style,
                                  layout::NodeLinkPtr link = nullptr) {
@@ -81,7 +81,7 @@ class Page {
     }
     layout::LayoutHandle* AddText(layout::LayoutHandle* parent, RefPtr<FakeText> text,
                                   std::string_view style = "") {
-        return Keep(tree.AddChild(*parent, parent->data().children.size(),
+        return Keep(tree.AddChild(*parent, parent->data().Children().size(),
                                   {Store(Style(style)), text, nullptr, {}, false}));
     }
     // Adds declarations to the style that the handle has.

@@ -20,8 +20,8 @@ TEST_F(SimpleLayoutTest, ChildrenOverlapAndAutoSizesAddUp) {
     EXPECT_EQ(BoxOf(a), "5 5 10 20");
     EXPECT_EQ(BoxOf(b), "5 5 30 40");
     EXPECT_EQ(BoxOf(box), "0 0 50 70");
-    EXPECT_EQ(b->data().result.edges.margin().left, 9);
-    EXPECT_EQ(box->data().result.edges.margin().left, 0);
+    EXPECT_EQ(b->data().AsBox().result.edges.margin().left, 9);
+    EXPECT_EQ(box->data().AsBox().result.edges.margin().left, 0);
     EXPECT_EQ(out->data().result.width, 500);
 }
 

@@ -56,7 +56,7 @@ class TestElement final : public TestNode {
 
   public:
     using TestNode::TestNode;
-    void Fail(std::string_view message) { RaiseError(GetScriptingContext(wrapper_context()), message); }
+    void Fail(std::string_view message) { RaiseError(GetFirstScriptingContext(), message); }
 };
 
 // A plain counted object, in script a NodeList whose items are their own indices.

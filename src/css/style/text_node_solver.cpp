@@ -16,21 +16,6 @@ uint8_t TextKindOf(WhiteSpaceMode mode) {
     }
 }
 
-template <class Group>
-bool Take(LaidOutStyle& style, StyleHandle<Group>& own, const StyleHandle<Group>& group) {
-    if (own == group) return false;
-    own = group;
-    style.written.Add(kGroupOf<Group>);
-    return true;
-}
-
-uint32_t TakeParentText(LaidOutStyle& style, const LaidOutStyle& parent, TextStep& step) {
-    if (style.text == parent.text) return 0;
-    const uint32_t mask = step.MaskOfText(style.text, parent.text);
-    Take(style, style.text, parent.text);
-    return mask;
-}
-
 // What a text takes from its parent in groups other than the text group.
 constexpr PropertySet kOutsideTextGroup = [] {
     PropertySet set;
@@ -46,19 +31,37 @@ constexpr PropertySet kOutsideTextGroup = [] {
 uint32_t SolveTextNode(dom::Text& text, const PropertySet& parentDirty, StyleRun& run) {
     ++run.counters.textNodesSolved;
     const LaidOutStyle& parent = text.GetParent()->GetLaidOutStyle();
-    LaidOutStyle& style = text.GetStyle();
+    const LaidOutStyle& style = text.GetStyle();
+    WrittenGroups& written = *text.GetWrittenGroups();
     uint32_t mask = dom::kChangeSolved;
     const CSSDisplay display = parent.layout->display;
+    const StyleHandle<LayoutStyle>* layout = &style.layout;
+    const StyleHandle<VisualStyle>* visual = &style.visual;
     if (parentDirty.Intersects(kOutsideTextGroup)) {
         // Below a parent without display the kind stays what it was: nothing is laid out, and nothing
         // changes.
         const uint8_t kind =
             display == CSSDisplay::None ? style.layout->textKind : TextKindOf(parent.text->whiteSpace);
-        if (Take(style, style.layout, run.textStyles.LayoutFor(display, kind))) mask |= dom::kChangeLayout;
-        if (Take(style, style.visual, run.textStyles.VisualFor(*parent.visual))) mask |= dom::kChangeVisual;
+        layout = &run.textStyles.LayoutFor(display, kind);
+        visual = &run.textStyles.VisualFor(*parent.visual);
     }
-    mask |= TakeParentText(style, parent, run.textStep);
-    if (style.written.Has(StyleGroup::Transform)) mask |= dom::kChangeTransform;
+    const bool newLayout = !(*layout == style.layout), newVisual = !(*visual == style.visual);
+    const bool newText = !(parent.text == style.text);
+    if (newLayout) {
+        written.Add(StyleGroup::Layout);
+        mask |= dom::kChangeLayout;
+    }
+    if (newVisual) {
+        written.Add(StyleGroup::Visual);
+        mask |= dom::kChangeVisual;
+    }
+    if (newText) {
+        written.Add(StyleGroup::TextLayout);
+        mask |= run.textStep.MaskOfText(style.text, parent.text);
+    }
+    if (newLayout || newVisual || newText)
+        text.SetStyle(run.textStyles.Records().Get(style, *layout, *visual, parent.text));
+    if (written.Has(StyleGroup::Transform)) mask |= dom::kChangeTransform;
 
     const bool inLayout = text.Is(dom::kInLayoutTree);
     if (display != CSSDisplay::None && !inLayout) mask |= dom::kChangeEnteredLayout | dom::kChangeLayout;

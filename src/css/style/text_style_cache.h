@@ -3,7 +3,7 @@
 // made once.
 #pragma once
 
-#include "css/values/layout_style_refs.h"
+#include "css/values/shared_style.h"
 
 namespace qorvex::css {
 
@@ -15,6 +15,9 @@ class TextStyleCache {
     // background.
     const StyleHandle<VisualStyle>& VisualFor(const VisualStyle& parent);
 
+    // The whole styles.
+    SharedStyles& Records() { return records_; }
+
   private:
     static constexpr size_t kDisplays = 5, kTextKinds = 4;
     StyleHandle<LayoutStyle> layouts_[kDisplays][kTextKinds];
@@ -22,6 +25,7 @@ class TextStyleCache {
     static constexpr size_t kVisuals = 8;
     StyleHandle<VisualStyle> visuals_[kVisuals];
     size_t nextVisual_ = 0;
+    SharedStyles records_;
 };
 
 }  // namespace qorvex::css

@@ -23,7 +23,6 @@ Window::Window(IWindowHost& host, script::ScriptingContext& context, Document& d
       console_(script::MakeHandle<Console>()),
       performance_(script::MakeHandle<Performance>(*this)) {
     wrapper_ = JSContextGetGlobalObject(context.context);
-    wrapper_context_ = context.context;
     timer_queue_.SetClock(this);
 }
 
@@ -99,7 +98,6 @@ void Window::DetachFromContext() {
     timer_queue_.CancelAll();
     document_->GetEventListenerTable().Remove(*this);
     wrapper_ = nullptr;
-    wrapper_context_ = nullptr;
     context_ = nullptr;
 }
 

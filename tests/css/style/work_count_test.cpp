@@ -140,7 +140,7 @@ TEST_F(WorkCount, ManyNewSiblingsFindTheirPlacesAtOnce) {
         document_->work = {};
         Solve();
         EXPECT_LE(document_->work.siblingsSearched, 4 * kCount);
-        const auto& handles = Body().GetLayoutHandle()->data().children;
+        const auto& handles = Body().GetLayoutHandle()->data().Children();
         const auto children = Body().GetChildren();
         ASSERT_EQ(handles.size(), children.size());
         for (uint32_t i = 0; i < handles.size(); ++i)
@@ -161,7 +161,7 @@ TEST_F(WorkCount, EachNewFirstChildFindsItsPlaceAtOnce) {
         document_->UpdateLayoutStyles(false);
     }
     EXPECT_LE(document_->work.siblingsSearched, 4 * kCount);
-    const auto& handles = Body().GetLayoutHandle()->data().children;
+    const layout::HandleSpan handles = Body().GetLayoutHandle()->data().Children();
     const auto children = Body().GetChildren();
     ASSERT_EQ(handles.size(), kCount + 1);
     for (uint32_t i = 0; i < kCount; ++i)
