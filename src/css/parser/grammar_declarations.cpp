@@ -69,6 +69,20 @@ bool Grammar::StartsTerm() const {
 
 namespace {
 
+// Does it end in the number of an escape that has not taken its space yet?
+bool EndsInOpenEscape(std::string_view text) {
+    constexpr size_t kMostDigits = 6;
+    const auto isHex = [](char c) { return IsDigit(c) || (ToLower(c) >= 'a' && ToLower(c) <= 'f'); };
+    size_t start = text.size();
+    while (start > 0 && isHex(text[start - 1]))
+        --start;
+    const size_t digits = text.size() - start;
+    size_t backslashes = 0;
+    while (backslashes < start && text[start - 1 - backslashes] == '\\')
+        ++backslashes;
+    return digits > 0 && digits <= kMostDigits && backslashes % 2 != 0;
+}
+
 // Builds the normalised text of a value. As long as that equals the text as written it is a slice of it;
 // copying into the arena starts with the first difference.
 class ValueText {
@@ -76,6 +90,7 @@ class ValueText {
     explicit ValueText(ParserArena& arena) : arena_(arena) {}
 
     void Append(std::string_view piece) {
+        last_ = piece;
         if (!copied_ && (slice_.empty() || slice_.data() + slice_.size() == piece.data())) {
             slice_ = slice_.empty() ? piece : std::string_view(slice_.data(), slice_.size() + piece.size());
             return;
@@ -83,15 +98,17 @@ class ValueText {
         StartCopy();
         arena_.AppendText(piece);
     }
-    // One space, then the piece.
+    // One space, then the piece. The first space behind the number of an escape is a part of that.
     void AppendTerm(std::string_view piece) {
         const char* end = slice_.data() + slice_.size();
-        if (!copied_ && end + 1 == piece.data() && *end == ' ') {
+        const bool isOpen = EndsInOpenEscape(last_);
+        last_ = piece;
+        if (!copied_ && !isOpen && end + 1 == piece.data() && *end == ' ') {
             slice_ = {slice_.data(), slice_.size() + 1 + piece.size()};
             return;
         }
         StartCopy();
-        arena_.AppendText(" ");
+        arena_.AppendText(isOpen ? "  " : " ");
         arena_.AppendText(piece);
     }
     // An escape that ends the text needs its space no more, and what is read again comes without.
@@ -107,6 +124,7 @@ class ValueText {
 
     ParserArena& arena_;
     std::string_view slice_;
+    std::string_view last_;
     bool copied_ = false;
 };
 
