@@ -90,26 +90,26 @@ class ValueText {
     explicit ValueText(ParserArena& arena) : arena_(arena) {}
 
     void Append(std::string_view piece) {
-        last_ = piece;
         if (!copied_ && (slice_.empty() || slice_.data() + slice_.size() == piece.data())) {
             slice_ = slice_.empty() ? piece : std::string_view(slice_.data(), slice_.size() + piece.size());
             return;
         }
         StartCopy();
         arena_.AppendText(piece);
+        last_ = piece;
     }
-    // One space, then the piece. The first space behind the number of an escape is a part of that.
+    // One space, then the piece. The first space behind the number of an escape is a part of that, so a
+    // piece behind a space as written does not follow such a number.
     void AppendTerm(std::string_view piece) {
         const char* end = slice_.data() + slice_.size();
-        const bool isOpen = EndsInOpenEscape(last_);
-        last_ = piece;
-        if (!copied_ && !isOpen && end + 1 == piece.data() && *end == ' ') {
+        if (!copied_ && end + 1 == piece.data() && *end == ' ') {
             slice_ = {slice_.data(), slice_.size() + 1 + piece.size()};
             return;
         }
         StartCopy();
-        arena_.AppendText(isOpen ? "  " : " ");
+        arena_.AppendText(EndsInOpenEscape(last_) ? "  " : " ");
         arena_.AppendText(piece);
+        last_ = piece;
     }
     // An escape that ends the text needs its space no more, and what is read again comes without.
     std::string_view Finish() { return Trim(copied_ ? arena_.FinishText() : slice_); }
@@ -120,11 +120,12 @@ class ValueText {
         copied_ = true;
         arena_.BeginText();
         arena_.AppendText(slice_);
+        last_ = slice_;
     }
 
     ParserArena& arena_;
     std::string_view slice_;
-    std::string_view last_;
+    std::string_view last_;  // that was copied
     bool copied_ = false;
 };
 
