@@ -72,9 +72,8 @@ namespace {
 // Does it end in the number of an escape that has not taken its space yet?
 bool EndsInOpenEscape(std::string_view text) {
     constexpr size_t kMostDigits = 6;
-    const auto isHex = [](char c) { return IsDigit(c) || (ToLower(c) >= 'a' && ToLower(c) <= 'f'); };
     size_t start = text.size();
-    while (start > 0 && isHex(text[start - 1]))
+    while (start > 0 && IsHexDigit(text[start - 1]))
         --start;
     const size_t digits = text.size() - start;
     size_t backslashes = 0;

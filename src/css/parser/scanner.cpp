@@ -75,9 +75,8 @@ bool IsUnit(std::string_view text) {
 const char* Scanner::SkipEscape(const char* backslash) const {
     const char* next = backslash + 1;
     if (next == end_ || IsLineEnd(*next)) return backslash;
-    auto isHex = [](char c) { return IsDigit(c) || (ToLower(c) >= 'a' && ToLower(c) <= 'f'); };
-    if (!isHex(*next)) return next + 1;
-    for (int digits = 0; digits < 6 && next != end_ && isHex(*next); ++digits)
+    if (!IsHexDigit(*next)) return next + 1;
+    for (int digits = 0; digits < 6 && next != end_ && IsHexDigit(*next); ++digits)
         ++next;
     if (next != end_ && Has(*next, kSpace)) ++next;
     return next;

@@ -13,11 +13,10 @@ bool EndsInBackslash(std::string_view text) {
 
 // Where the escape ends that starts at `backslash`; a number takes the space behind it.
 size_t EndOfEscape(std::string_view text, size_t backslash) {
-    const auto isHex = [](char c) { return IsDigit(c) || (ToLower(c) >= 'a' && ToLower(c) <= 'f'); };
     size_t end = backslash + 1;
     if (end == text.size()) return end;
-    if (!isHex(text[end])) return end + 1;
-    while (end < text.size() && end <= backslash + 6 && isHex(text[end]))
+    if (!IsHexDigit(text[end])) return end + 1;
+    while (end < text.size() && end <= backslash + 6 && IsHexDigit(text[end]))
         ++end;
     return end < text.size() && IsSpace(text[end]) ? end + 1 : end;
 }

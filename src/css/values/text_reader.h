@@ -17,6 +17,9 @@ constexpr bool IsDigit(char c) {
 constexpr char ToLower(char c) {
     return c >= 'A' && c <= 'Z' ? static_cast<char>(c + ('a' - 'A')) : c;
 }
+constexpr bool IsHexDigit(char c) {
+    return IsDigit(c) || (ToLower(c) >= 'a' && ToLower(c) <= 'f');
+}
 
 [[nodiscard]] std::string_view Trim(std::string_view text);
 [[nodiscard]] bool EqualsIgnoreCase(std::string_view a, std::string_view b);
