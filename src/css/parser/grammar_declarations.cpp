@@ -160,7 +160,6 @@ Grammar::Outcome Grammar::ParseValue(std::string_view& text, uint8_t& flags) {
     enum class State { NeedsTerm, FunctionOpened, AfterTerm } state = State::NeedsTerm;
     ValueText value(arena_);
     size_t depth = 0;
-    bool signPending = false;
     Joint joint;
     TokenKind before = TokenKind::End;
     // True when the token after it needs a space before itself.
@@ -174,19 +173,13 @@ Grammar::Outcome Grammar::ParseValue(std::string_view& text, uint8_t& flags) {
         joint = {};
         return spaced;
     };
-    // Space matters behind a sign alone.
-    for (;; signPending ? Advance() : AdvanceBeyondSpace()) {
-        if (token_.kind == TokenKind::Space) {
-            signPending = false;
-            continue;
-        }
+    for (;; AdvanceBeyondSpace()) {
         if (StartsTerm()) {
             if (placeJoint() || state == State::AfterTerm)
                 value.AppendTerm(token_.text());
             else
                 value.Append(token_.text());
             before = token_.kind;
-            signPending = false;
             state = State::AfterTerm;
             if (token_.kind == TokenKind::Function) {
                 if (token_.text().find("var(") != std::string_view::npos) flags |= kHasVar;
@@ -205,11 +198,10 @@ Grammar::Outcome Grammar::ParseValue(std::string_view& text, uint8_t& flags) {
         } else if (IsOperator(token_) && state == State::AfterTerm) {
             joint = {token_};
             state = State::NeedsTerm;
-        } else if ((token_.Is('+') || token_.Is('-')) && state != State::AfterTerm && !signPending) {
-            // A sign of its own before a term.
+        } else if ((token_.Is('+') || token_.Is('-')) && state != State::AfterTerm && !joint.isSign) {
+            // A sign of its own before a term, which has one at most.
             const bool spaced = placeJoint();
             joint = {token_, true, spaced};
-            signPending = true;
             state = State::NeedsTerm;
         } else {
             break;

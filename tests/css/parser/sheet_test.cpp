@@ -118,13 +118,16 @@ TEST_F(SheetTest, InlineStylesSelectorsAndMediaTexts) {
     // Printed and read again it is the same, whatever operators and signs stand between names and numbers.
     for (const char* const value :
          {"#a - calc(1px)", "1px - var(--b)", "1 + 2", "calc(1px + 2px)", "calc(1px - (2px))", "calc(a - b)",
-          "calc(1px) - -2px", "- -calc(1px)", "calc(1px) * - - 1px", "calc(- url(a b))", "calc(1px)-url(x/y)",
-          "calc(1) + .5 - \"a\"", "(--x)-#y", "calc(--x - --y)", "1%-2%", "- (1px)", "calc(2)/-3"}) {
+          "calc(1px) - -2px", "- calc(1px)", "calc(1px) * - 1px", "a - - b", "calc(- url(a b))",
+          "calc(1px)-url(x/y)", "calc(1) + .5 - \"a\"", "(--x)-#y", "calc(--x - --y)", "1%-2%", "- (1px)",
+          "calc(2)/-3"}) {
         for (const char* const name : {"--x: ", "width: ", "qor-composition-id: "}) {
             const std::string once = inlineText(std::string(name) + value);
             EXPECT_EQ(inlineText(once), once) << value;
         }
     }
+    // Printed without its space a second sign would not be read.
+    EXPECT_EQ(inlineText("--x: - -calc(1px); --x: - + -b; --x: 1px * - - a"), "");
     EXPECT_EQ(inlineText("width: calc( 1px+var(--x)/2 - 3px )"), "width: calc(1px+var(--x)/2 - 3px); ");
 
     auto selectors = [&](std::string_view text) {
