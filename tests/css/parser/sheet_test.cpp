@@ -127,7 +127,7 @@ TEST_F(SheetTest, InlineStylesSelectorsAndMediaTexts) {
         }
     }
     // Printed without its space a second sign would not be read.
-    EXPECT_EQ(inlineText("--x: - -calc(1px); --x: - + -b; --x: 1px * - - a"), "");
+    EXPECT_EQ(inlineText("--x: - - calc(1px); --x: - + -b; --x: 1px * - - a"), "");
     EXPECT_EQ(inlineText("width: calc( 1px+var(--x)/2 - 3px )"), "width: calc(1px+var(--x)/2 - 3px); ");
 
     auto selectors = [&](std::string_view text) {
