@@ -6,8 +6,10 @@
 #include <qorvex/images_list.h>
 
 #include <algorithm>
+#include <chrono>
 #include <memory>
 #include <set>
+#include <thread>
 
 #include "core/frame/client.h"
 #include "host/unruly_resource_handler.h"
@@ -437,7 +439,7 @@ TEST_P(UnrulyImages, EndRight) {
     auto* debug = static_cast<IDebugInterface*>(client_->library->GetFeatureInterface(kDebugFeature));
     for (int i = 0; i < 2000 && !debug->IsLoaded(client_->view); ++i) {
         client_->Frame();
-        std::this_thread::yield();
+        std::this_thread::sleep_for(std::chrono::milliseconds(1));  // a busy machine runs workers late
     }
     ASSERT_TRUE(debug->IsLoaded(client_->view));
     for (int step = 0; step < 120; ++step) {
@@ -455,7 +457,7 @@ TEST_P(UnrulyImages, EndRight) {
         "document.body.children[1].style.cssText = 'left: 30px; background-image: url(green.png)';");
     for (int i = 0; i < 400 && !(Pixel(5, 5) == kSeenRed && Pixel(35, 5) == kSeenGreen); ++i) {
         client_->Frame();
-        std::this_thread::yield();
+        std::this_thread::sleep_for(std::chrono::milliseconds(1));
     }
     EXPECT_EQ(Pixel(5, 5), kSeenRed);
     EXPECT_EQ(Pixel(35, 5), kSeenGreen);
