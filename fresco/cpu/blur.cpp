@@ -117,23 +117,28 @@ constexpr int kColumnBlock = 16;
 void BlurColumns(const Bitmap& bitmap, const LineBlur& blur) {
     const int height = bitmap.bounds.Height();
     Lines from(kColumnBlock, height, blur.pad()), to(kColumnBlock, height, 0);
+    uint32_t *gathered[kColumnBlock], *blurred[kColumnBlock];
+    for (int i = 0; i < kColumnBlock; ++i)
+        gathered[i] = from.At(i), blurred[i] = to.At(i);
     for (int x0 = bitmap.bounds.x0; x0 < bitmap.bounds.x1; x0 += kColumnBlock) {
         const int block = std::min(kColumnBlock, bitmap.bounds.x1 - x0);
+        uint32_t any[kColumnBlock] = {};
         for (int y = 0; y < height; ++y) {
             const uint32_t* row = bitmap.Row(bitmap.bounds.y0 + y) + x0;
             for (int i = 0; i < block; ++i)
-                from.At(i)[y] = row[i];
+                any[i] |= gathered[i][y] = row[i];
         }
+        if (std::all_of(any, any + block, [](uint32_t column) { return column == 0; })) continue;
         for (int i = 0; i < block; ++i) {
-            if (IsBlank(from.At(i), height))
-                std::memset(to.At(i), 0, size_t(height) * 4);
+            if (any[i] == 0)
+                std::memset(blurred[i], 0, size_t(height) * 4);
             else
-                blur.Run(from.At(i), to.At(i), height);
+                blur.Run(gathered[i], blurred[i], height);
         }
         for (int y = 0; y < height; ++y) {
             uint32_t* row = bitmap.Row(bitmap.bounds.y0 + y) + x0;
             for (int i = 0; i < block; ++i)
-                row[i] = to.At(i)[y];
+                row[i] = blurred[i][y];
         }
     }
 }
