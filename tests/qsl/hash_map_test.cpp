@@ -44,7 +44,9 @@ TEST(HashMap, AgreesWithAReferenceUnderRandomWork) {
                 const Counting* value = map.get(key);
                 const auto found = reference.find(key);
                 ASSERT_EQ(value != nullptr, found != reference.end());
-                if (value) EXPECT_EQ(*value->value, found->second);
+                if (value) {
+                    EXPECT_EQ(*value->value, found->second);
+                }
             }
         }
         ASSERT_EQ(map.size(), reference.size());
@@ -120,7 +122,9 @@ TEST(HashMap, AgreesWithAReferenceWhenKeysAreMadeToCollide) {
         const Counting* value = map.get(asked);
         const auto found = reference.find(asked);
         ASSERT_EQ(value != nullptr, found != reference.end());
-        if (value) EXPECT_EQ(*value->value, found->second);
+        if (value) {
+            EXPECT_EQ(*value->value, found->second);
+        }
     }
     EXPECT_EQ(Counting::live, static_cast<int>(reference.size()));
     EXPECT_LE(map.capacity(), 64u * 1024);
