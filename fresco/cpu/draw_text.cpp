@@ -65,10 +65,10 @@ void CpuBackend::DrawCachedRun(const FontFace& face, const GlyphRunParams& run, 
     PaintSink sink(target, ink, row_);
     for (const PlacedGlyph& glyph : placed_) {
         const uint8_t* line = glyph.coverage;
-        for (int y = glyph.box.y0; y < glyph.box.y1; ++y, line += glyph.pitch) {
-            if (clip_.IsSimple())
-                sink.Mask(y, glyph.box.x0, line, glyph.box.Width());
-            else
+        if (clip_.IsSimple()) {
+            sink.Box(glyph.box, line, glyph.pitch);
+        } else {
+            for (int y = glyph.box.y0; y < glyph.box.y1; ++y, line += glyph.pitch)
                 clip_.Filter(y, glyph.box.x0, line, glyph.box.Width(), sink);
         }
         Touch(glyph.box);

@@ -72,9 +72,20 @@ void GlyphCache::FromOutline(const FontFace& face, uint32_t glyph, double size, 
     Homography transform;
     transform.xx = transform.yy = size / face.GetUnitsPerEm();
     transform.x0 = double(subpixel) / kSubpixels;
-    uint8_t* bytes = Reserve(OutlineBuilder::DeviceBounds(outline.path, transform), size, out);
+    const Vec2 first = transform.Apply(outline.left, outline.top);
+    const Vec2 last = transform.Apply(outline.right, outline.bottom);
+    // Rounding may carry a point over the edge of its pixel.
+    constexpr double kSlack = 1e-3;
+    const IRect wanted = RoundOut(first.x - kSlack, first.y - kSlack, last.x + kSlack, last.y + kSlack);
+    uint8_t* bytes = Reserve(wanted, size, out);
     if (!bytes) return;
     const IRect bounds{out.left, out.top, out.left + out.width, out.top + out.height};
+    if (Rasterizer::IsSmall(bounds)) {
+        rasterizer_.BeginSmall(bounds);
+        builder_.AddFill(outline.path, transform, rasterizer_);
+        rasterizer_.SweepInto(bytes);
+        return;
+    }
     BitmapSink sink(bytes, bounds);
     rasterizer_.Begin(bounds);
     builder_.AddFill(outline.path, transform, rasterizer_);

@@ -28,7 +28,8 @@ int CurvePieces(double secondDifference, double factor, double scale) {
 }
 
 double SecondDifference(Vec2 a, Vec2 b, Vec2 c) {
-    return std::hypot(a.x - 2 * b.x + c.x, a.y - 2 * b.y + c.y);
+    const double x = a.x - 2 * b.x + c.x, y = a.y - 2 * b.y + c.y;
+    return std::sqrt(x * x + y * y);
 }
 
 // A factor from user units to device pixels that is good enough to count chords with.

@@ -3,6 +3,7 @@
 #include <fresco/paint.h>
 #include "fresco/cpu/blend.h"
 #include "fresco/cpu/clip.h"
+#include "fresco/cpu/rows.h"
 #include "fresco/cpu/sources.h"
 
 namespace fresco::cpu {
@@ -41,9 +42,49 @@ class PaintSink final : public CoverageSink {
             return BlendSolidMask(dst, count, color, coverage);
         BlendRowMode(ink_.blend, dst, Source(y, x0, count), count, coverage, 255);
     }
+    // Upright edges of borders and boxes are columns of one or two pixels.
+    void Rows(int y, int rows, std::span<const Piece> pieces, const uint8_t* masks) override {
+        if (!solid_ || ink_.blend != kBlendNormal) return CoverageSink::Rows(y, rows, pieces, masks);
+        for (const Piece& piece : pieces) {
+            painted_ += uint64_t(piece.count) * uint64_t(rows);
+            if (!piece.masked) {
+                for (int i = 0; i < rows; ++i)
+                    BlendSolid(target_.Row(y + i) + piece.x, piece.count, ink_.color, piece.coverage);
+                continue;
+            }
+            for (int i = 0; i < piece.count; ++i)
+                row_[size_t(i)] = ScalePixel(ink_.color, *masks++);
+            if (piece.count <= kColumn) {
+                for (int i = 0; i < piece.count; ++i)
+                    BlendColumn(y, rows, piece.x + i, row_[size_t(i)]);
+                continue;
+            }
+            for (int i = 0; i < rows; ++i)
+                BlendRow(target_.Row(y + i) + piece.x, row_.data(), piece.count, nullptr, 255);
+        }
+    }
+    // Coverage of all pixels of a box, `pitch` bytes a row.
+    void Box(const IRect& box, const uint8_t* coverage, int pitch) {
+        if (solid_ && ink_.blend == kBlendNormal) {
+            painted_ += uint64_t(box.Width()) * uint64_t(box.Height());
+            return cpu::Rows().BlendSolidMasks(target_.Row(box.y0) + box.x0, target_.pitch / sizeof(uint32_t),
+                                               box.Width(), box.Height(), ink_.color, coverage,
+                                               size_t(pitch));
+        }
+        for (int y = box.y0; y < box.y1; ++y, coverage += pitch)
+            Mask(y, box.x0, coverage, box.Width());
+    }
     uint64_t painted() const { return painted_; }
 
   private:
+    static constexpr int kColumn = 4;
+    void BlendColumn(int y, int rows, int x, uint32_t color) {
+        const uint32_t rest = 255 - (color >> 24);
+        const size_t pitch = target_.pitch / sizeof(uint32_t);
+        uint32_t* at = target_.Row(y) + x;
+        for (uint32_t* const end = at + size_t(rows) * pitch; at != end; at += pitch)
+            *at = color + ScalePixel(*at, rest);
+    }
     bool HasRowColor(int y, uint32_t* color) { return ink_.source && ink_.source->RowColor(y, color); }
     const uint32_t* Source(int y, int x0, int count) {
         if (ink_.bitmap) return ink_.bitmap->Row(y) + x0;

@@ -27,11 +27,104 @@ inline uint8_t ToCoverage(int32_t area, FillRule rule) {
 
 }  // namespace
 
+void CoverageSink::Rows(int y, int rows, std::span<const Piece> pieces, const uint8_t* masks) {
+    for (const int end = y + rows; y < end; ++y) {
+        const uint8_t* mask = masks;
+        for (const Piece& piece : pieces) {
+            if (piece.masked) {
+                Mask(y, piece.x, mask, piece.count);
+                mask += piece.count;
+            } else {
+                Span(y, piece.x, piece.x + piece.count, piece.coverage);
+            }
+        }
+    }
+}
+
 void Rasterizer::Begin(const IRect& bounds) {
     bounds_ = bounds;
     edges_.clear();
     firstRow_ = bounds.y1;
     lastRow_ = bounds.y0 - 1;
+    small_ = false;
+}
+
+void Rasterizer::BeginSmall(const IRect& bounds) {
+    Begin(bounds);
+    small_ = true;
+    const size_t cells = size_t(bounds.Width() + 1) * size_t(bounds.Height());
+    if (grid_.size() < cells) grid_.resize(cells);
+}
+
+// Where the edge crosses a height, from the left side of the bounds. All positions come from the edge's own
+// equation, never from the neighbouring row or cell, so that clipping cannot change them.
+inline double Rasterizer::PlaceAt(const Edge& edge, int64_t y) const {
+    return std::clamp(edge.x + (double(y) / kOne - edge.y) * edge.slope, edge.minX, edge.maxX) - bounds_.x0;
+}
+
+namespace {
+
+// Adds what an edge between two places covers of a row, `height` high, by add(cell, value).
+template <class Add>
+inline void Accumulate(double left, double right, int32_t height, int32_t winding, int width, Add add) {
+    if (left > right) std::swap(left, right);
+    if (left >= width) return;
+    if (right <= 0) return add(0, winding * height);
+    int cell = int(left);
+    if (left < cell) --cell;
+    if (right <= cell + 1) {
+        const int32_t beyond = RoundPositive(height * ((left + right) * 0.5 - cell));
+        add(cell, winding * (height - beyond));
+        add(cell + 1, winding * beyond);
+        return;
+    }
+    // The edge crosses several cells: the height it has gained at each cell boundary is rounded, and the
+    // cell's share is the difference, so that the shares add up to the whole.
+    const double perPixel = height / (right - left);
+    int32_t gained = 0;
+    double from = left;
+    if (cell < 0) {
+        gained = RoundPositive(-left * perPixel);
+        add(0, winding * gained);
+        cell = 0;
+        from = 0;
+    }
+    for (; cell < width; ++cell) {
+        const bool last = right <= cell + 1;
+        const double to = last ? right : cell + 1;
+        const int32_t reached = last ? height : std::min(height, RoundPositive((to - left) * perPixel));
+        const int32_t share = reached - gained;
+        const int32_t beyond = RoundPositive(share * ((from + to) * 0.5 - cell));
+        add(cell, winding * (share - beyond));
+        add(cell + 1, winding * beyond);
+        gained = reached;
+        from = to;
+        if (last) break;
+    }
+}
+
+}  // namespace
+
+void Rasterizer::AccumulateRow(const Edge& edge, int row) {
+    const int64_t rowTop = int64_t(row) << kShift;
+    const int64_t y0 = std::max(edge.top, rowTop), y1 = std::min(edge.bottom, rowTop + kOne);
+    const double above = PlaceAt(edge, y0), below = edge.slope == 0 ? above : PlaceAt(edge, y1);
+    Accumulate(above, below, int32_t(y1 - y0), edge.winding, bounds_.Width(),
+               [this](int x, int32_t value) { AddCell(x, value); });
+}
+
+inline void Rasterizer::AccumulateGrid(const Edge& edge) {
+    const int width = bounds_.Width();
+    int64_t y0 = edge.top;
+    int32_t* cells = grid_.data() + ((y0 >> kShift) - bounds_.y0) * (width + 1);
+    for (double above = PlaceAt(edge, y0); y0 < edge.bottom; cells += width + 1) {
+        const int64_t y1 = std::min(edge.bottom, ((y0 >> kShift) + 1) << kShift);
+        const double below = PlaceAt(edge, y1);
+        Accumulate(above, below, int32_t(y1 - y0), edge.winding, width,
+                   [cells](int x, int32_t value) { cells[x] += value; });
+        y0 = y1;
+        above = below;
+    }
 }
 
 void Rasterizer::AddLine(double x0, double y0, double x1, double y1) {
@@ -57,57 +150,23 @@ void Rasterizer::AddLine(double x0, double y0, double x1, double y1) {
     edge.top = std::max(top, clipTop), edge.bottom = std::min(bottom, clipBottom);
     edge.winding = winding;
     edge.next = -1;
+    if (small_) return AccumulateGrid(edge);
     firstRow_ = std::min(firstRow_, int(edge.top >> kShift));
     lastRow_ = std::max(lastRow_, int((edge.bottom - 1) >> kShift));
     edges_.push_back(edge);
 }
 
-// Adds what the edge covers of one row. All positions come from the edge's own equation, never from the
-// neighbouring row or cell, so that clipping cannot change them.
-void Rasterizer::AccumulateRow(const Edge& edge, int row) {
-    const int64_t rowTop = int64_t(row) << kShift;
-    const int64_t y0 = std::max(edge.top, rowTop), y1 = std::min(edge.bottom, rowTop + kOne);
-    const int32_t height = int32_t(y1 - y0);
-    const auto xAt = [&](int64_t y) {
-        return std::clamp(edge.x + (double(y) / kOne - edge.y) * edge.slope, edge.minX, edge.maxX) -
-               bounds_.x0;
-    };
-    double left = xAt(y0), right = edge.slope == 0 ? left : xAt(y1);
-    if (left > right) std::swap(left, right);
+void Rasterizer::SweepInto(uint8_t* coverage) {
     const int width = bounds_.Width();
-    if (left >= width) return;
-    if (right <= 0) return AddCell(0, edge.winding * height);
-    const double firstCell = std::floor(left);
-    if (right <= firstCell + 1) {
-        const int cell = int(firstCell);
-        const int32_t beyond = RoundPositive(height * ((left + right) * 0.5 - firstCell));
-        AddCell(cell, edge.winding * (height - beyond));
-        AddCell(cell + 1, edge.winding * beyond);
-        return;
-    }
-    // The edge crosses several cells: the height it has gained at each cell boundary is rounded, and the
-    // cell's share is the difference, so that the shares add up to the whole.
-    const double perPixel = height / (right - left);
-    int cell = int(firstCell);
-    int32_t gained = 0;
-    double from = left;
-    if (cell < 0) {
-        gained = RoundPositive(-left * perPixel);
-        AddCell(0, edge.winding * gained);
-        cell = 0;
-        from = 0;
-    }
-    for (; cell < width; ++cell) {
-        const bool last = right <= cell + 1;
-        const double to = last ? right : cell + 1;
-        const int32_t reached = last ? height : std::min(height, RoundPositive((to - left) * perPixel));
-        const int32_t share = reached - gained;
-        const int32_t beyond = RoundPositive(share * ((from + to) * 0.5 - cell));
-        AddCell(cell, edge.winding * (share - beyond));
-        AddCell(cell + 1, edge.winding * beyond);
-        gained = reached;
-        from = to;
-        if (last) break;
+    int32_t* cells = grid_.data();
+    for (int y = bounds_.y0; y < bounds_.y1; ++y, cells += width + 1, coverage += width) {
+        // Two steps: the second one goes by whole registers.
+        int32_t sum = 0;
+        for (int x = 0; x < width; ++x)
+            cells[x] = sum += cells[x];
+        for (int x = 0; x < width; ++x)
+            coverage[x] = ToCoverage(cells[x], kFillNonZero);
+        std::fill_n(cells, width + 1, 0);
     }
 }
 
@@ -160,18 +219,18 @@ void Rasterizer::EmitRow(int y, FillRule rule, CoverageSink& sink) {
     touched_[words - 1] = 0;
 }
 
-class Rasterizer::RunRecorder final : public CoverageSink {
+class Rasterizer::RowRecorder final : public CoverageSink {
   public:
-    explicit RunRecorder(Rasterizer& owner) : owner_(owner) {
-        owner_.runs_.clear();
-        owner_.runMasks_.clear();
+    explicit RowRecorder(Rasterizer& owner) : owner_(owner) {
+        owner_.pieces_.clear();
+        owner_.pieceMasks_.clear();
     }
     void Span(int, int x0, int x1, uint8_t coverage) override {
-        owner_.runs_.push_back({x0, x1 - x0, coverage, false});
+        owner_.pieces_.push_back({x0, x1 - x0, coverage, false});
     }
     void Mask(int, int x0, const uint8_t* coverage, int count) override {
-        owner_.runs_.push_back({x0, count, 0, true});
-        owner_.runMasks_.insert(owner_.runMasks_.end(), coverage, coverage + count);
+        owner_.pieces_.push_back({x0, count, 0, true});
+        owner_.pieceMasks_.insert(owner_.pieceMasks_.end(), coverage, coverage + count);
     }
 
   private:
@@ -195,19 +254,9 @@ int Rasterizer::CountEqualRows(int y) const {
 }
 
 void Rasterizer::EmitEqualRows(int y, int count, FillRule rule, CoverageSink& sink) {
-    RunRecorder recorder(*this);
+    RowRecorder recorder(*this);
     EmitRow(y, rule, recorder);
-    for (int row = y; row < y + count; ++row) {
-        const uint8_t* mask = runMasks_.data();
-        for (const Run& run : runs_) {
-            if (run.masked) {
-                sink.Mask(row, run.x, mask, run.count);
-                mask += run.count;
-            } else {
-                sink.Span(row, run.x, run.x + run.count, run.coverage);
-            }
-        }
-    }
+    sink.Rows(y, count, {pieces_.data(), pieces_.size()}, pieceMasks_.data());
 }
 
 void Rasterizer::Sweep(FillRule rule, CoverageSink& sink) {

@@ -4,8 +4,11 @@
 // weighted by area, which the fill rule turns into coverage. Sums are integers (1 / 65536 of a pixel), so the
 // coverage of a pixel depends neither on the bounds nor on the order of the edges: a partial repaint gives
 // the pixels of a full one, bit for bit. A row only visits cells that an edge touched; between them it emits
-// spans. Rows that only upright edges cross are worked out once and emitted as often as they come.
+// spans. Rows that only upright edges cross are worked out once and emitted as often as they come. What is as
+// small as a glyph skips the edges: its lines go straight into a grid of cells.
 #pragma once
+#include <span>
+
 #include <fresco/path.h>
 #include "fresco/cpu/pixels.h"
 
@@ -17,6 +20,14 @@ class CoverageSink {
     virtual void Span(int y, int x0, int x1, uint8_t coverage) = 0;
     // One byte a pixel from x0 on.
     virtual void Mask(int y, int x0, const uint8_t* coverage, int count) = 0;
+    // A piece of a row: a span, or a mask whose bytes follow those of the piece before it.
+    struct Piece {
+        int x, count;
+        uint8_t coverage;
+        bool masked;
+    };
+    // The same row several times. To be overridden where that is cheaper than one after the other.
+    virtual void Rows(int y, int rows, std::span<const Piece> pieces, const uint8_t* masks);
 
   protected:
     ~CoverageSink() = default;
@@ -32,7 +43,16 @@ class Rasterizer {
     void Sweep(FillRule rule, CoverageSink& sink);
     bool HasEdges() const { return !edges_.empty(); }
 
+    // The same for bounds of few pixels, without a sink: SweepInto writes one byte for each, row by row, by
+    // the non-zero rule.
+    static bool IsSmall(const IRect& bounds) {
+        return int64_t(bounds.Width()) * bounds.Height() <= kSmallArea;
+    }
+    void BeginSmall(const IRect& bounds);
+    void SweepInto(uint8_t* coverage);
+
   private:
+    static constexpr int64_t kSmallArea = 16 << 10;
     struct Edge {
         double x, y;  // upper end
         double slope, minX, maxX;
@@ -41,7 +61,9 @@ class Rasterizer {
         int32_t next;
     };
 
+    double PlaceAt(const Edge& edge, int64_t y) const;
     void AccumulateRow(const Edge& edge, int row);
+    void AccumulateGrid(const Edge& edge);
     void AddCell(int x, int32_t value) {
         cells_[size_t(x)] += value;
         touched_[size_t(x) >> 6] |= uint64_t(1) << (x & 63);
@@ -59,15 +81,13 @@ class Rasterizer {
     Vector<uint64_t> touched_;
     Vector<uint8_t> mask_;
 
-    // Pieces of a row that repeats; masks follow each other in runMasks_.
-    struct Run {
-        int x, count;
-        uint8_t coverage;
-        bool masked;
-    };
-    class RunRecorder;
-    Vector<Run> runs_;
-    Vector<uint8_t> runMasks_;
+    // Of a row that repeats.
+    class RowRecorder;
+    Vector<CoverageSink::Piece> pieces_;
+    Vector<uint8_t> pieceMasks_;
+
+    bool small_ = false;
+    Vector<int32_t> grid_;  // of small bounds: rows with one cell more; zero between shapes
 };
 
 }  // namespace fresco::cpu

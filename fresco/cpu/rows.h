@@ -5,6 +5,7 @@
 //
 // Pixels are premultiplied RGBA8. No row may overlap another one but where it says so.
 #pragma once
+#include <cstddef>
 #include <cstdint>
 
 namespace fresco::cpu {
@@ -54,6 +55,9 @@ struct ColorMatrix {
        under coverage. */                                                                                    \
     X(BlendSolid, (uint32_t * dst, int count, uint32_t color))                                               \
     X(BlendSolidMask, (uint32_t * dst, int count, uint32_t color, const uint8_t* mask))                      \
+    /* The same for the rows of a glyph. */                                                                  \
+    X(BlendSolidMasks, (uint32_t * dst, size_t pitch, int count, int rows, uint32_t color,                   \
+                        const uint8_t* mask, size_t maskPitch))                                              \
     X(BlendRow, (uint32_t * dst, const uint32_t* src, int count, uint32_t alpha))                            \
     X(BlendRowMask, (uint32_t * dst, const uint32_t* src, int count, const uint8_t* mask))                   \
     /* A CSS blend mode from multiply to exclusion, and a Porter-Duff operator: the source times `source`    \

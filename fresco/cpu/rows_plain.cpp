@@ -46,6 +46,12 @@ void BlendSolidMask(uint32_t* dst, int count, uint32_t color, const uint8_t* mas
         dst[i] = Over(ScalePixel(color, mask[i]), dst[i]);
 }
 
+void BlendSolidMasks(uint32_t* dst, size_t pitch, int count, int rows, uint32_t color, const uint8_t* mask,
+                     size_t maskPitch) {
+    for (int i = 0; i < rows; ++i, dst += pitch, mask += maskPitch)
+        BlendSolidMask(dst, count, color, mask);
+}
+
 void BlendRow(uint32_t* dst, const uint32_t* src, int count, uint32_t alpha) {
     for (int i = 0; i < count; ++i)
         dst[i] = Over(ScalePixel(src[i], alpha), dst[i]);

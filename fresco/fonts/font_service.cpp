@@ -204,8 +204,12 @@ bool FontService::LoadSystemFonts() {
         FontDataPtr data = MakeFontData(std::move(reader));
         if (!data) return;
         data = ShareData(std::move(data));
-        for (uint32_t face = 0; AddFace(data, face, SdfMode::WhenLarge, nextId_, kAnyStyle); ++face)
+        uint32_t count = 1;
+        for (uint32_t face = 0; face < count; ++face) {
+            if (!AddFace(data, face, SdfMode::WhenLarge, nextId_, kAnyStyle)) break;
+            count = static_cast<const ScalableFace&>(*faces_.find(order_.back())->second).GetFaceCount();
             AddInstances(data, face, SdfMode::WhenLarge);
+        }
     });
     order_.insert(order_.end(), loaded.begin(), loaded.end());
     return opened;

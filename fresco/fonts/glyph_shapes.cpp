@@ -66,7 +66,14 @@ void ReadOutline(FT_FaceRec_* face, uint32_t glyph, GlyphOutline& out) {
     const FT_Outline_Funcs functions = {
         OutlineSink::Move, OutlineSink::Line, OutlineSink::Conic, OutlineSink::Cubic, 0, 0};
     OutlineSink outlineSink{&out};
-    FT_Outline_Decompose(&face->glyph->outline, &functions, &outlineSink);
+    FT_Outline& outline = face->glyph->outline;
+    // Every point of the font ends a line or a curve or bends one; each contour has a start and an end more.
+    const auto isBend = [](char tag) { return FT_CURVE_TAG(tag) != FT_CURVE_TAG_ON; };
+    const size_t count = size_t(outline.n_points), contours = size_t(outline.n_contours);
+    out.path.verbs.reserve(count + 2 * contours);
+    out.path.points.reserve(count + size_t(std::count_if(outline.tags, outline.tags + count, isBend)) +
+                            contours);
+    FT_Outline_Decompose(&outline, &functions, &outlineSink);
     if (outlineSink.open) out.path.Close();
     const Vector<Point>& points = out.path.points;
     if (points.empty()) return;

@@ -63,6 +63,7 @@ bool ScalableFace::Load(FT_LibraryRec_* library, FontDataPtr data, uint32_t face
     // Without an outline or a picture of anything there is nothing to show, not even a box.
     if (face_->num_glyphs <= 0) return false;
     faceIndex_ = faceIndex;
+    faceCount_ = uint32_t(std::max<FT_Long>(face_->num_faces, 1));
     sdf_ = sdf;
     id_ = id;
     if (!MakeShaper()) return false;
@@ -96,8 +97,6 @@ bool ScalableFace::MakeShaper() {
 
     const size_t count = size_t(std::min<FT_Long>(face_->num_glyphs, 65536));
     advances_ = Vector<std::atomic<uint16_t>>(count);
-    for (std::atomic<uint16_t>& advance : advances_)
-        advance.store(kUnknownAdvance, std::memory_order_relaxed);
     return true;
 }
 
@@ -202,10 +201,10 @@ FontMetrics ScalableFace::GetMetrics(float size) const {
 uint32_t ScalableFace::Advance(uint32_t glyph) const {
     std::atomic<uint16_t>& slot = advances_[glyph];
     const uint16_t known = slot.load(std::memory_order_relaxed);
-    if (known != kUnknownAdvance) return known;
+    if (known != kUnknownAdvance) return known - 1u;
     const hb_position_t advance = hb_font_get_glyph_h_advance(hbFont_, glyph);
-    const auto kept = uint16_t(std::clamp<hb_position_t>(advance, 0, kUnknownAdvance - 1));
-    slot.store(kept, std::memory_order_relaxed);
+    const auto kept = uint32_t(std::clamp<hb_position_t>(advance, 0, kLargestAdvance));
+    slot.store(uint16_t(kept + 1), std::memory_order_relaxed);
     return kept;
 }
 

@@ -30,6 +30,8 @@ class ScalableFace final : public FontFace {
     // The index, with an instance in its high half, whose style comes nearest to a flag word.
     uint32_t FindInstance(uint32_t flags) const;
     uint32_t GetInstanceCount() const;
+    // Of the file.
+    uint32_t GetFaceCount() const { return faceCount_; }
 
     void GetGlyphIndices(const uint32_t* codePoints, size_t count, uint32_t* glyphs) const override;
     FontMetrics GetMetrics(float size) const override;
@@ -43,7 +45,8 @@ class ScalableFace final : public FontFace {
     const DistanceField* GetDistanceField(uint32_t glyph) const override;
 
   private:
-    static constexpr uint32_t kUnknownAdvance = 0xFFFF;
+    // The table keeps an advance with one added to it.
+    static constexpr uint32_t kUnknownAdvance = 0, kLargestAdvance = 0xFFFE;
 
     template <class T>
     using ShapeMap = HashMap<uint32_t, std::unique_ptr<T, HeapDeleter<T>>>;
@@ -69,6 +72,7 @@ class ScalableFace final : public FontFace {
     GlyphTable glyphs_;
     // In font units, filled as they are asked for: a font of all Chinese characters has 65,535.
     mutable Vector<std::atomic<uint16_t>> advances_;
+    uint32_t faceCount_ = 1;
     mutable ShapeCache shapes_;
 
     mutable std::mutex mutex_;

@@ -6,6 +6,7 @@
 
 #include <fresco/paint.h>
 #include "fresco/cpu/outline.h"
+#include "fresco/cpu/paint_sink.h"
 #include "fresco/cpu/rasterizer.h"
 
 namespace fresco::cpu {
@@ -137,6 +138,66 @@ TEST(Rasterizer, BoundsNeverChangeAPixel) {
                           inside ? whole.values[size_t(y * kSize + x)] : 0);
             }
         }
+    }
+}
+
+TEST(Rasterizer, SmallShapesAreTheSameWithoutEdges) {
+    std::mt19937 random(13);
+    std::uniform_real_distribution<double> around(-30, kSize + 30);
+    Rasterizer rasterizer;  // one for all: each shape finds what the one before left behind
+    for (int round = 0; round < 300; ++round) {
+        Polygon polygon;
+        for (int i = 0; i < 3 + round % 9; ++i)
+            polygon.push_back({around(random), around(random)});
+        if (round % 3 == 0) polygon[1] = {polygon[0].x, polygon[2].y};
+        const IRect bounds{round % 5, round % 7, kSize - round % 11, kSize};
+        const Coverage expected = Rasterize(polygon, kFillNonZero, bounds);
+        std::vector<uint8_t> bytes(size_t(bounds.Width()) * size_t(bounds.Height()), 77);
+        rasterizer.BeginSmall(bounds);
+        Add(rasterizer, polygon);
+        rasterizer.SweepInto(bytes.data());
+        size_t at = 0;
+        for (int y = bounds.y0; y < bounds.y1; ++y) {
+            for (int x = bounds.x0; x < bounds.x1; ++x)
+                ASSERT_EQ(bytes[at++], expected.values[size_t(y * kSize + x)])
+                    << round << ": " << x << "," << y;
+        }
+    }
+}
+
+// Rows that repeat are painted by columns, glyphs by boxes: the pixels are those of one piece after the
+// other.
+TEST(PaintSink, RowsAndBoxesAreTheSameAsTheirPieces) {
+    std::mt19937 random(17);
+    for (int round = 0; round < 200; ++round) {
+        std::vector<uint32_t> pixels(kSize * kSize), expected;
+        for (uint32_t& pixel : pixels)
+            pixel = random() | 0xFF000000u;
+        expected = pixels;
+        uint8_t masks[kSize];
+        for (uint8_t& mask : masks)
+            mask = uint8_t(random() % 4 ? random() : random() % 2 * 255);
+        const auto bitmap = [](std::vector<uint32_t>& memory) {
+            return Bitmap{reinterpret_cast<uint8_t*>(memory.data()), kSize * 4, {0, 0, kSize, kSize}};
+        };
+        Ink ink;
+        ink.color = ScalePixel(random() | 0xFF000000u, random() % 256);
+        if (round % 8 == 0) ink.blend = kBlendMultiply;
+        const CoverageSink::Piece pieces[] = {{int(random() % 3), 1 + round % 9, 0, true},
+                                              {12, 9, uint8_t(random()), false},
+                                              {22, 1 + round % 12, 0, true}};
+        Vector<uint32_t> row;
+        const Bitmap fast = bitmap(pixels), plain = bitmap(expected);
+        PaintSink sink(fast, ink, row);
+        sink.Rows(3, 30, pieces, masks);
+        const IRect box{1, 34, 1 + round % 15, 36};
+        sink.Box(box, masks, 19);
+        PaintSink slow(plain, ink, row);
+        slow.CoverageSink::Rows(3, 30, pieces, masks);
+        for (int y = 34; y < 36; ++y)
+            slow.Mask(y, 1, masks + (y - 34) * 19, box.Width());
+        ASSERT_EQ(pixels, expected) << round;
+        EXPECT_EQ(sink.painted(), slow.painted());
     }
 }
 

@@ -67,6 +67,10 @@ TEST(RowLoops, BlendsAndScalesAreEqualInEveryWay) {
     ExpectEqualWays("BlendSolidMask", [](const RowLoops& l, Sample& r) {
         l.BlendSolidMask(r.dst, r.count, r.Pixel(), r.mask);
     });
+    ExpectEqualWays("BlendSolidMasks", [](const RowLoops& l, Sample& r) {
+        const int width = std::min(r.count, 24);
+        l.BlendSolidMasks(r.dst, 30, width, 3, r.Pixel(), r.mask, size_t(width));
+    });
     ExpectEqualWays("BlendRow", [](const RowLoops& l, Sample& r) {
         l.BlendRow(r.dst, r.src, r.count, r.random() % 2 ? 255 : r.random() % 256);
     });
