@@ -120,16 +120,24 @@ void CountSpecificity(const SimpleSelector& simple, Specificity& out) {
 
 std::optional<ComplexSelector> ConvertComplexSelector(const SelectorSyntax& syntax, StringPool& strings) {
     ComplexSelector made;
+    const auto convert = [&](const CompoundSyntax& compound, CompoundSelector& out) {
+        for (const SimpleSelectorSyntax& simple : compound.simple) {
+            if (!ConvertSimple(simple, strings, out.simple.emplace_back())) return false;
+            CountSpecificity(out.simple.back(), made.specificity);
+        }
+        return true;
+    };
+    // Most selectors are one compound and need no list.
+    if (syntax.compounds.size() == 1) {
+        if (!convert(*syntax.compounds.begin(), made.key)) return std::nullopt;
+        return made;
+    }
     // Converted in the order of the text and turned round at the end: the list is chained one way.
     CssVector<CompoundSelector>& compounds = made.compounds;
     compounds.reserve(syntax.compounds.size());
     for (const CompoundSyntax& compound : syntax.compounds) {
         if (!compounds.empty()) made.combinators.push_back(compound.combinator);
-        CompoundSelector& converted = compounds.emplace_back();
-        for (const SimpleSelectorSyntax& simple : compound.simple) {
-            if (!ConvertSimple(simple, strings, converted.simple.emplace_back())) return std::nullopt;
-            CountSpecificity(converted.simple.back(), made.specificity);
-        }
+        if (!convert(compound, compounds.emplace_back())) return std::nullopt;
     }
     if (compounds.size() != made.combinators.size() + 1) {
         LogWarning(

@@ -79,7 +79,10 @@ void ConvertMedia(const MediaSyntax& syntax, ConversionContext& context, size_t&
 StylesheetPtr ConvertStylesheet(const ParserContext& context, std::string_view baseUrl, StringPool& strings) {
     StylesheetPtr sheet = MakeRef<Stylesheet>();
     ConversionContext conversion{URL(baseUrl), strings, &sheet->imageUrls};
-    sheet->rules.reserve(context.GetRulesets().size());
+    size_t count = 0;
+    for (const RulesetSyntax& ruleset : context.GetRulesets())
+        count += ruleset.selectors.size();
+    sheet->rules.reserve(count);
     for (const RulesetSyntax& ruleset : context.GetRulesets())
         ConvertRule(ruleset, conversion, sheet->rules);
     size_t copiesLeft = limits::kMaxMediaRuleCopies;

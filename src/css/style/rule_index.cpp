@@ -115,6 +115,8 @@ RuleIdListPtr RuleIndex::AddSheet(const Stylesheet& sheet, std::span<const Media
     for (const MediaFeatureList& features : media)
         AddMediaGroup(features, sheet.rules, *ids);
     if (media.empty()) {
+        if (quickRules_.empty()) Reserve(sheet.rules.size());
+        ids->ids.reserve(sheet.rules.size());
         for (const Ruleset& rule : sheet.rules)
             ids->ids.push_back(AddRule(rule));
     }

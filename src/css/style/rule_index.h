@@ -37,10 +37,10 @@ struct RuleIdList : SharedValue<RuleIdList> {
 };
 using RuleIdListPtr = qsl::RefPtr<RuleIdList>;
 
-// Indices of the rules with one key.
+// Indices of the rules with one key. Most keys have one rule or two.
 struct RuleBucket {
-    CssVector<uint32_t> quick;
-    CssVector<uint32_t> complex;
+    CssSmallVector<uint32_t, 2> quick;
+    CssSmallVector<uint32_t, 2> complex;
 };
 
 class RuleIndex {
@@ -49,6 +49,8 @@ class RuleIndex {
     // link's media attribute: the top-level rules then apply while any of them holds. Nothing of a media
     // group applies before the next UpdateMedia.
     RuleIdListPtr AddSheet(const Stylesheet& sheet, std::span<const MediaFeatureList> media = {});
+    // Room for the rules of a first sheet, most of which are quick.
+    void Reserve(size_t rules) { quickRules_.reserve(rules); }
     uint64_t AddRule(Ruleset rule);
     // The new rule takes the cascade position of the rule `before`, which moves behind it with all later
     // ones.

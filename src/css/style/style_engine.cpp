@@ -10,7 +10,11 @@
 namespace qorvex::css {
 
 DefaultRules::DefaultRules(StringPool& strings) {
-    if (const StylesheetPtr sheet = MakeStylesheet(DefaultSheetText(), {}, strings)) index_.AddSheet(*sheet);
+    const StylesheetPtr sheet = MakeStylesheet(DefaultSheetText(), {}, strings);
+    if (!sheet) return;
+    index_.Reserve(sheet->rules.size());
+    for (Ruleset& rule : sheet->rules)
+        index_.AddRule(std::move(rule));
 }
 
 StyleEngine::StyleEngine(StringPool& strings, DefaultRulesPtr defaults)
