@@ -164,6 +164,8 @@ void Document::QueueTextCommit(Text& text) {
 
 TaskPtr Document::TakeFontPreload(fresco::IFontService& service) {
     for (Node* node : text_commits_) {
+        // Scripts, style sheets and titles are text nodes, too.
+        if (!node->Is(kInLayoutTree)) continue;
         const css::LaidOutStyle& style = node->GetLaidOutStyle();
         if (style.text) font_usage_.Add(style.text->typefaces, static_cast<Text*>(node)->GetDisplayedText());
     }

@@ -11,7 +11,8 @@ namespace qorvex::dom {
 namespace {
 
 constexpr size_t kArenaPerSourceByte = 32;
-constexpr size_t kMinArenaBytes = 0x40000;
+// Small pages leave a block behind that the rest of their making can use.
+constexpr size_t kMinArenaBytes = 0x4000;
 constexpr size_t kMaxFirstChunkBytes = size_t{64} << 20;
 
 void* AllocateInArena(void* arena, size_t size) {
