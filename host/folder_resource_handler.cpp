@@ -2,10 +2,9 @@
 
 #include <algorithm>
 #include <cctype>
-#include <cstdio>
-#include <memory>
 
 #include "file_stream_reader.h"
+#include "opened_file.h"
 
 namespace qorvex::host {
 namespace fs = std::filesystem;
@@ -53,22 +52,8 @@ std::string PercentDecode(std::string_view text) {
     return out;
 }
 
-bool IsInside(const fs::path& root, const fs::path& path) {
-    return std::mismatch(root.begin(), root.end(), path.begin(), path.end()).first == root.end();
-}
-
-}  // namespace
-
-FolderResourceHandler::FolderResourceHandler(const fs::path& root, Report report)
-    : report_(std::move(report)) {
-    std::error_code fault;
-    root_ = fs::weakly_canonical(root, fault);
-    if (fault) root_ = root;
-    // "folder/" has an empty last component, which no file below it matches.
-    if (!root_.has_filename()) root_ = root_.parent_path();
-}
-
-fs::path FolderResourceHandler::Resolve(std::string_view url, std::string& why) const {
+// The path of a file URL, or an empty string with the reason in `why`.
+std::string PathOf(std::string_view url, std::string& why) {
     constexpr std::string_view kScheme = "file://";
     if (url.substr(0, kScheme.size()) != kScheme) {
         why = "only file:// is served";
@@ -76,66 +61,60 @@ fs::path FolderResourceHandler::Resolve(std::string_view url, std::string& why) 
     }
     url.remove_prefix(kScheme.size());
     url = url.substr(0, url.find_first_of("?#"));
-    const std::string name = PercentDecode(url);
-    if (name.empty() || name[0] != '/' || name.find('\0') != std::string::npos) {
-        why = "not an absolute path";
-        return {};
-    }
-    std::error_code fault;
-    const fs::path path = fs::canonical(name, fault);
-    if (fault) {
-        why = "no such file";
-        return {};
-    }
-    if (!IsInside(root_, path)) {
-        why = "outside of " + root_.string();
-        return {};
-    }
-    if (!fs::is_regular_file(path, fault)) {
-        why = "not a file";
-        return {};
-    }
-    if (fs::file_size(path, fault) > kLargestFile || fault) {
-        why = "too large";
-        return {};
-    }
-    return path;
+    std::string name = PercentDecode(url);
+    if (!name.empty() && name[0] == '/' && name.find('\0') == std::string::npos) return name;
+    why = "not an absolute path";
+    return {};
 }
 
-fs::path FolderResourceHandler::Locate(std::string_view url) const {
+}  // namespace
+
+FolderResourceHandler::FolderResourceHandler(const fs::path& root, Report report)
+    : report_(std::move(report)) {
+    std::error_code fault;
+    const fs::path real = fs::weakly_canonical(root, fault);
+    root_ = fault ? root.string() : real.string();
+    // What begins like this lies below it: "/page/" and not "/pages".
+    if (root_.empty() || root_.back() != '/') root_ += '/';
+}
+
+std::unique_ptr<OpenedFile> FolderResourceHandler::Find(std::string_view url) const {
     std::string why;
-    fs::path path = Resolve(url, why);
-    if (path.empty() && report_) report_("404 " + std::string(url) + ": " + why);
-    return path;
+    const std::string name = PathOf(url, why);
+    auto file = name.empty() ? nullptr : std::make_unique<OpenedFile>(name);
+    if (file && !*file)
+        why = file->GetFault();
+    else if (file && file->GetPath().compare(0, root_.size(), root_) != 0)
+        why = "outside of " + root_;
+    else if (file && file->GetSize() > kLargestFile)
+        why = "too large";
+    if (why.empty()) return file;
+    if (report_) report_("404 " + std::string(url) + ": " + why);
+    return nullptr;
 }
 
 void FolderResourceHandler::OnResourceRequest(const IAsyncResourceRequest* request,
                                               IAsyncResourceResponse* response) {
     using Status = IAsyncResourceResponse::Status;
-    const fs::path path = Locate(request->GetAbsoluteURL());
-    const auto close = [](std::FILE* file) { std::fclose(file); };
-    const std::unique_ptr<std::FILE, decltype(close)> file(
-        path.empty() ? nullptr : std::fopen(path.c_str(), "rb"), close);
+    const std::unique_ptr<OpenedFile> file = Find(request->GetAbsoluteURL());
     if (!file) {
         response->SetStatus(kNotFound);
         response->Finish(Status::Failure);
         return;
     }
-    std::fseek(file.get(), 0, SEEK_END);
-    const long size = std::max(0L, std::ftell(file.get()));
-    std::rewind(file.get());
-    void* space = response->GetSpace(static_cast<std::size_t>(size));
-    const std::size_t read = space ? std::fread(space, 1, static_cast<std::size_t>(size), file.get()) : 0;
-    response->SetHeader("Content-Type", MimeType(path.filename().string()));
+    const auto size = static_cast<std::size_t>(file->GetSize());
+    void* space = response->GetSpace(size);
+    const bool whole = size == 0 || (space && file->ReadAll(space, size));
+    response->SetHeader("Content-Type", MimeType(file->GetPath()));
     response->SetStatus(kOk);
-    response->Finish(read == static_cast<std::size_t>(size) ? Status::Success : Status::Failure);
+    response->Finish(whole ? Status::Success : Status::Failure);
 }
 
 void FolderResourceHandler::OnResourceStreamRequest(const IAsyncResourceRequest* request,
                                                     IAsyncResourceStreamResponse* response) {
     using Status = IAsyncResourceStreamResponse::Status;
-    const fs::path path = Locate(request->GetAbsoluteURL());
-    ISyncStreamReader* reader = path.empty() ? nullptr : FileStreamReader::Open(path);
+    const std::unique_ptr<OpenedFile> file = Find(request->GetAbsoluteURL());
+    ISyncStreamReader* reader = file ? FileStreamReader::Open(file->GetPath()) : nullptr;
     if (reader) response->SetStreamReader(reader);
     response->Finish(reader ? Status::Success : Status::Failure);
 }
@@ -158,6 +137,7 @@ std::string FileURL(const fs::path& path) {
 }
 
 const char* MimeType(std::string_view file_name) {
+    file_name.remove_prefix(file_name.rfind('/') + 1);
     const size_t dot = file_name.rfind('.');
     if (dot != std::string_view::npos) {
         std::string extension(file_name.substr(dot + 1));

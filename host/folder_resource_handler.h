@@ -5,10 +5,13 @@
 #include <cstdint>
 #include <filesystem>
 #include <functional>
+#include <memory>
 #include <string>
 #include <string_view>
 
 namespace qorvex::host {
+
+class OpenedFile;
 
 // Serves "file://" URLs from one folder and below. What is missing gets status 404 and a line to the report
 // callback; what lies outside of the root, by ".." or by a symbolic link, counts as missing. Answers come
@@ -26,18 +29,17 @@ class FolderResourceHandler final : public IAsyncResourceHandler {
                                  IAsyncResourceStreamResponse* response) override;
 
   private:
-    // The file that a URL names, or an empty path with the reason in `why`.
-    [[nodiscard]] std::filesystem::path Resolve(std::string_view url, std::string& why) const;
-    [[nodiscard]] std::filesystem::path Locate(std::string_view url) const;
+    // The file that a URL names; null, reported, when there is none to be served.
+    [[nodiscard]] std::unique_ptr<OpenedFile> Find(std::string_view url) const;
 
-    std::filesystem::path root_;
+    std::string root_;  // real, with a slash behind it
     Report report_;
 };
 
 // "file://" URL of a path, percent-encoded.
 [[nodiscard]] std::string FileURL(const std::filesystem::path& path);
 
-// The MIME type of a file name by its extension; "application/octet-stream" when unknown.
+// The MIME type of a file name or path by its extension; "application/octet-stream" when unknown.
 [[nodiscard]] const char* MimeType(std::string_view file_name);
 
 }  // namespace qorvex::host
