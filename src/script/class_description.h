@@ -45,6 +45,8 @@ struct PropertyAccessDescription {
 struct ClassDescription {
     ScriptClass script_class;
     std::span<const AttributeDescription> attributes = {};
+    // The one list that several classes have alike: a page makes their functions once.
+    std::span<const AttributeDescription> shared_attributes = {};
     std::span<const MethodDescription> methods = {};
     std::span<const ConstantDescription> constants = {};
     // Called with new.target, then the arguments of `new`; returns the object. Null: "Invalid constructor!".

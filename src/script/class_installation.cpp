@@ -3,6 +3,7 @@
 #include <JavaScriptCore/JavaScript.h>
 
 #include <algorithm>
+#include <array>
 #include <span>
 
 #include "script/class_description.h"
@@ -69,15 +70,25 @@ constexpr size_t kToolsAt = 2 * kScriptClassCount;
 
 class ScriptName {
   public:
-    explicit ScriptName(const char* text) : string_(JSStringCreateWithUTF8CString(text)) {}
-    ~ScriptName() { JSStringRelease(string_); }
+    ScriptName() = default;
+    explicit ScriptName(const char* text) { Set(text); }
+    ~ScriptName() {
+        if (string_) JSStringRelease(string_);
+    }
+    // Once.
+    void Set(const char* text) { string_ = JSStringCreateWithUTF8CString(text); }
     ScriptName(const ScriptName&) = delete;
     ScriptName& operator=(const ScriptName&) = delete;
     operator JSStringRef() const { return string_; }  // NOLINT: implicit by design
 
   private:
-    JSStringRef string_;
+    JSStringRef string_ = nullptr;
 };
+
+// On the stack, where the collector sees what stands in it.
+constexpr size_t kBatch = 32;
+template <class T>
+using Batch = std::array<T, kBatch>;
 
 class Installer {
   public:
@@ -85,14 +96,17 @@ class Installer {
 
     // Install and PrototypeOf as functions of the script engine, to be called from outside of it: all that
     // they call is nested then and spares the way in, which takes the clock twice for the time limit of
-    // scripts.
+    // scripts. The engine lets go of its lock for a callback: it is taken once here, and not by each of some
+    // hundred calls.
     static JSValueRef InstallInside(JSContextRef context, JSObjectRef, JSObjectRef, size_t,
                                     const JSValueRef[], JSValueRef*) {
+        const ScriptEngineLock lock(context);
         if (ScriptingContext* page = GetScriptingContext(context)) Installer(*page).Install();
         return JSValueMakeUndefined(context);
     }
     static JSValueRef PrototypeInside(JSContextRef context, JSObjectRef, JSObjectRef, size_t count,
                                       const JSValueRef arguments[], JSValueRef* exception) {
+        const ScriptEngineLock lock(context);
         const JSValueRef undefined = JSValueMakeUndefined(context);
         ScriptingContext* page = GetScriptingContext(context);
         const double number = count > 0 ? JSValueToNumber(context, arguments[0], nullptr) : -1;
@@ -140,8 +154,9 @@ class Installer {
         JSObjectSetPrototype(context_, prototype, JSValueMakeNull(context_));
         Label(prototype, script_class);
         // Its constructor costs more than the rest of it, and a page asks for few.
-        DefineAccessor(prototype, ScriptName("constructor"), Tool(ClassTool::HiddenAccessor),
-                       Tool(ClassTool::ConstructorGetter), Tool(ClassTool::ConstructorSetter));
+        const JSValueRef constructor[] = {prototype, Tool(ClassTool::ConstructorKey),
+                                          Tool(ClassTool::ConstructorAccessor)};
+        Call(AsObject(context_, Tool(ClassTool::DefineProperty)), constructor);
         const ClassDescription* description = GetClassDescription(script_class);
         if (description && description->properties.indexed) DefineIterator(prototype);
         // The window's own stand on the global object.
@@ -178,16 +193,13 @@ class Installer {
                                  const JSValueRef arguments[], JSValueRef* exception) {
         const JSValueRef undefined = JSValueMakeUndefined(context);
         ScriptingContext* page = GetScriptingContext(context);
-        if (!page) return undefined;
-        for (const LazyClassName& name : page->class_names) {
-            if (name.accessor != function) continue;
-            Installer installer(*page);
-            const JSValueRef value = count > 0 ? arguments[0] : installer.ConstructorOf(name.script_class);
-            if (value) installer.DefineValue(page->global_object, name.name, ClassTool::HiddenValue, value);
-            if (installer.exception()) *exception = installer.exception();
-            return value && count == 0 ? value : undefined;
-        }
-        return undefined;
+        if (!page || !page->class_keeper) return undefined;
+        const auto* name = static_cast<const LazyClassName*>(JSObjectGetPrivate(function));
+        Installer installer(*page);
+        const JSValueRef value = count > 0 ? arguments[0] : installer.ConstructorOf(name->script_class);
+        if (value) installer.DefineValue(page->global_object, name->name, ClassTool::HiddenValue, value);
+        if (installer.exception()) *exception = installer.exception();
+        return value && count == 0 ? value : undefined;
     }
 
     // `constructor` of every prototype: the class is that of the first prototype on the way up from `this`.
@@ -265,36 +277,79 @@ class Installer {
         KeepTool(ClassTool::ToStringTag, Get(symbol, "toStringTag"));
         KeepTool(ClassTool::Iterator, Get(symbol, "iterator"));
         KeepTool(ClassTool::WalkArray, Get(Get(Get(page_.global_object, "Array"), "prototype"), "values"));
-        KeepTool(ClassTool::Accessor, MakeDescriptor(true, true));
+        const JSValueRef object_prototype = Get(object, "prototype");
+        KeepTool(ClassTool::DefineGetter, Get(object_prototype, "__defineGetter__"));
+        KeepTool(ClassTool::DefineSetter, Get(object_prototype, "__defineSetter__"));
         KeepTool(ClassTool::HiddenAccessor, MakeDescriptor(true, false));
         KeepTool(ClassTool::HiddenValue, MakeDescriptor(false, false));
         KeepTool(ClassTool::Method, MakeDescriptor(false, true));
+        for (const auto& [tool, name] :
+             {std::pair(ClassTool::GetKey, "get"), std::pair(ClassTool::SetKey, "set"),
+              std::pair(ClassTool::ValueKey, "value"), std::pair(ClassTool::ConstructorKey, "constructor")})
+            KeepTool(tool, JSValueMakeString(context_, ScriptName(name)));
         const ScriptName name("constructor");
-        KeepTool(ClassTool::ConstructorGetter,
-                 JSObjectMakeFunctionWithCallback(context_, name, GetConstructor));
-        KeepTool(ClassTool::ConstructorSetter,
-                 JSObjectMakeFunctionWithCallback(context_, name, SetConstructor));
+        KeepTool(ClassTool::ConstructorAccessor, MakeDescriptor(true, false));
+        SetOf(Tool(ClassTool::ConstructorAccessor), ClassTool::GetKey, MakeFunction(name, GetConstructor));
+        SetOf(Tool(ClassTool::ConstructorAccessor), ClassTool::SetKey, MakeFunction(name, SetConstructor));
         KeepTool(ClassTool::MakePrototype,
                  JSObjectMakeFunctionWithCallback(context_, nullptr, PrototypeInside));
     }
 
     void InstallNames() {
-        page_.class_names.reserve(kScriptClassCount);
+        auto& names = page_.class_names;
+        names.reserve(2 * kScriptClassCount);  // they stay in their place
+        String json;
+        const auto add = [&](const char* name, ScriptClass script_class) {
+            json.append(json.empty() ? "[\"" : ",\"");
+            json.append(name);
+            json.append("\"");
+            names.push_back({name, script_class});
+        };
         for (size_t i = 0; i < kScriptClassCount; ++i) {
             const auto script_class = static_cast<ScriptClass>(i);
             const ClassDescription* description = GetClassDescription(script_class);
             if (description && !description->has_global_name) continue;
-            InstallName(kScriptClassRows[i].name, script_class);
-            if (description && description->alias) InstallName(description->alias, script_class);
+            add(kScriptClassRows[i].name, script_class);
+            if (description && description->alias) add(description->alias, script_class);
         }
+        json.append("]");
+        DefineNames(json.c_str());
     }
 
-    void InstallName(const char* name, ScriptClass script_class) {
-        // One function for both ways: a setter has an argument.
-        const ScriptName text(name);
-        const JSObjectRef access = JSObjectMakeFunctionWithCallback(context_, text, AccessName);
-        page_.class_names.push_back({access, name, script_class});
-        DefineAccessor(page_.global_object, text, Tool(ClassTool::HiddenAccessor), access, access);
+    // A hundred names as one text, and objects that can be called: a string of the engine and a function for
+    // each would take twice as long.
+    void DefineNames(const char* json) {
+        JSClassDefinition definition = kJSClassDefinitionEmpty;
+        definition.attributes = kJSClassAttributeNoAutomaticPrototype;
+        definition.callAsFunction = AccessName;
+        JSClassRef accessor_class = JSClassCreate(&definition);
+        const JSObjectRef list = AsObject(context_, JSValueMakeFromJSONString(context_, ScriptName(json)));
+        for (size_t i = 0; list && i < page_.class_names.size(); ++i) {
+            const JSValueRef name =
+                JSObjectGetPropertyAtIndex(context_, list, static_cast<unsigned>(i), &exception_);
+            // One for both ways: a setter has an argument.
+            const JSObjectRef access = JSObjectMake(context_, accessor_class, &page_.class_names[i]);
+            SetOf(Tool(ClassTool::HiddenAccessor), ClassTool::GetKey, access);
+            SetOf(Tool(ClassTool::HiddenAccessor), ClassTool::SetKey, access);
+            const JSValueRef arguments[] = {page_.global_object, name, Tool(ClassTool::HiddenAccessor)};
+            Call(AsObject(context_, Tool(ClassTool::DefineProperty)), arguments);
+        }
+        JSClassRelease(accessor_class);
+    }
+
+    // The names of some rows as script strings at a time. A step is done for the whole batch before the next
+    // one: each runs through some ten kilobytes of the engine's code, and all of them one after the other
+    // through more than the processor's nearest cache holds.
+    template <class Row, class F>
+    static void InBatches(std::span<Row> rows, F&& use) {
+        while (!rows.empty()) {
+            const std::span<Row> batch = rows.first(std::min(rows.size(), kBatch));
+            ScriptName names[kBatch];
+            for (size_t i = 0; i < batch.size(); ++i)
+                names[i].Set(batch[i].name);
+            use(batch, names);
+            rows = rows.subspan(batch.size());
+        }
     }
 
     void Keep(size_t index, JSValueRef value) {
@@ -328,9 +383,13 @@ class Installer {
     }
 
     JSValueRef Call(JSObjectRef function, std::span<const JSValueRef> arguments) {
+        return CallOn(nullptr, function, arguments);
+    }
+
+    JSValueRef CallOn(JSObjectRef self, JSObjectRef function, std::span<const JSValueRef> arguments) {
         if (!function || exception_) return nullptr;
-        const JSValueRef result = JSObjectCallAsFunction(context_, function, nullptr, arguments.size(),
-                                                         arguments.data(), &exception_);
+        const JSValueRef result =
+            JSObjectCallAsFunction(context_, function, self, arguments.size(), arguments.data(), &exception_);
         return exception_ ? nullptr : result;
     }
 
@@ -339,24 +398,16 @@ class Installer {
         Call(AsObject(context_, Tool(ClassTool::DefineProperty)), arguments);
     }
 
-    // The descriptors are there for all: only what differs is set. Null stands for no function.
-    void DefineAccessor(JSObjectRef target, JSStringRef name, JSValueRef descriptor, JSValueRef getter,
-                        JSValueRef setter) {
-        const JSValueRef undefined = JSValueMakeUndefined(context_);
-        SetOf(descriptor, get_, getter ? getter : undefined);
-        SetOf(descriptor, set_, setter ? setter : undefined);
-        DefineProperty(target, name, descriptor);
-    }
-
     void DefineValue(JSObjectRef target, const char* name, ClassTool descriptor, JSValueRef value) {
-        SetOf(Tool(descriptor), value_, value);
+        SetOf(Tool(descriptor), ClassTool::ValueKey, value);
         DefineProperty(target, ScriptName(name), Tool(descriptor));
-        SetOf(Tool(descriptor), value_, JSValueMakeUndefined(context_));
+        SetOf(Tool(descriptor), ClassTool::ValueKey, JSValueMakeUndefined(context_));
     }
 
-    void SetOf(JSValueRef descriptor, JSStringRef name, JSValueRef value) {
-        JSObjectSetProperty(context_, AsObject(context_, descriptor), name, value, kJSPropertyAttributeNone,
-                            nullptr);
+    // By a key that is there already: a name would become a string of the engine each time.
+    void SetOf(JSValueRef descriptor, ClassTool key, JSValueRef value) {
+        JSObjectSetPropertyForKey(context_, AsObject(context_, descriptor), Tool(key), value,
+                                  kJSPropertyAttributeNone, nullptr);
     }
 
     void Label(JSObjectRef target, ScriptClass script_class) {
@@ -376,20 +427,78 @@ class Installer {
     }
 
     void DefineMembers(JSObjectRef target, const ClassDescription& description) {
-        for (const MethodDescription& method : description.methods) {
-            const ScriptName name(method.name);
-            JSObjectSetProperty(context_, target, name, MakeFunction(name, method.callback),
-                                kJSPropertyAttributeNone, &exception_);
-        }
-        for (const AttributeDescription& attribute : description.attributes) {
-            const ScriptName name(attribute.name);
-            DefineAccessor(target, name, Tool(ClassTool::Accessor), MakeFunction(name, attribute.getter),
-                           MakeFunction(name, attribute.setter));
-        }
+        DefineMethods(target, description.methods);
+        InBatches(description.attributes, [&](auto attributes, const ScriptName* names) {
+            Batch<ScriptAccessor> made;
+            DefineAccessors(target, MakeAccessors(attributes, names, made));
+        });
+        if (!description.shared_attributes.empty()) DefineShared(target, description.shared_attributes);
         for (const ConstantDescription& constant : description.constants) {
             JSObjectSetProperty(context_, target, ScriptName(constant.name),
                                 JSValueMakeNumber(context_, constant.value), kConstant, &exception_);
         }
+    }
+
+    void DefineMethods(JSObjectRef target, std::span<const MethodDescription> methods) {
+        InBatches(methods, [&](auto batch, const ScriptName* names) {
+            Batch<JSObjectRef> functions;
+            for (size_t i = 0; i < batch.size(); ++i)
+                functions[i] = MakeFunction(names[i], batch[i].callback);
+            for (size_t i = 0; i < batch.size(); ++i)
+                JSObjectSetProperty(context_, target, names[i], functions[i], kJSPropertyAttributeNone,
+                                    &exception_);
+        });
+    }
+
+    std::span<ScriptAccessor> MakeAccessors(std::span<const AttributeDescription> attributes,
+                                            const ScriptName* names, Batch<ScriptAccessor>& out) {
+        for (size_t i = 0; i < attributes.size(); ++i)
+            out[i].name = JSValueMakeString(context_, names[i]);
+        for (size_t i = 0; i < attributes.size(); ++i) {
+            out[i].getter = MakeFunction(names[i], attributes[i].getter);
+            out[i].setter = MakeFunction(names[i], attributes[i].setter);
+        }
+        return {out.data(), attributes.size()};
+    }
+
+    // Not by descriptor: the engine asks one for six properties each time.
+    void DefineAccessors(JSObjectRef target, std::span<const ScriptAccessor> accessors) {
+        const auto define = [&](ClassTool tool, const ScriptAccessor& accessor, JSObjectRef function) {
+            const JSValueRef arguments[] = {accessor.name, function};
+            CallOn(target, AsObject(context_, Tool(tool)), arguments);
+        };
+        for (const ScriptAccessor& accessor : accessors)
+            define(ClassTool::DefineGetter, accessor, accessor.getter);
+        for (const ScriptAccessor& accessor : accessors) {
+            if (accessor.setter) define(ClassTool::DefineSetter, accessor, accessor.setter);
+        }
+    }
+
+    // The first class that comes makes them.
+    void DefineShared(JSObjectRef target, std::span<const AttributeDescription> attributes) {
+        auto& shared = page_.shared_accessors;
+        if (shared.empty()) {
+            InBatches(attributes, [&](auto batch, const ScriptName* names) {
+                Batch<ScriptAccessor> made;
+                const std::span<ScriptAccessor> accessors = MakeAccessors(batch, names, made);
+                KeepAccessors(accessors);
+                shared.insert(shared.end(), accessors.begin(), accessors.end());
+            });
+        }
+        DefineAccessors(target, {shared.data(), shared.size()});
+    }
+
+    // In an array, the last batch with the one before it.
+    void KeepAccessors(std::span<const ScriptAccessor> accessors) {
+        std::array<JSValueRef, 3 * kBatch + 1> values;
+        size_t count = 0;
+        for (const ScriptAccessor& accessor : accessors) {
+            values[count++] = accessor.name;
+            values[count++] = accessor.getter;
+            if (accessor.setter) values[count++] = accessor.setter;
+        }
+        if (Tool(ClassTool::SharedAccessors)) values[count++] = Tool(ClassTool::SharedAccessors);
+        KeepTool(ClassTool::SharedAccessors, JSObjectMakeArray(context_, count, values.data(), &exception_));
     }
 
     JSObjectRef MakeConstructor(ScriptClass script_class, JSObjectRef prototype) {
@@ -420,7 +529,6 @@ class Installer {
     ScriptingContext& page_;
     JSGlobalContextRef context_;
     JSValueRef exception_ = nullptr;
-    const ScriptName get_{"get"}, set_{"set"}, value_{"value"};
 };
 
 }  // namespace
@@ -447,6 +555,7 @@ void UninstallClasses(ScriptingContext& page) {
     page.prototypes = {};
     page.class_tools = {};
     page.class_names = {};
+    page.shared_accessors = {};
 }
 
 }  // namespace qorvex::script

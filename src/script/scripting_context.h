@@ -34,24 +34,34 @@ enum class ClassTool : uint8_t {
     ToStringTag,
     Iterator,
     WalkArray,
-    Accessor,
+    DefineGetter,
+    DefineSetter,
+    SharedAccessors,
     HiddenAccessor,
     HiddenValue,
     Method,
-    ConstructorGetter,
-    ConstructorSetter,
+    GetKey,
+    SetKey,
+    ValueKey,
+    ConstructorKey,
+    ConstructorAccessor,
     MakePrototype,
     ConstructorOf,
     BlanksOf,
 };
 inline constexpr size_t kClassToolCount = static_cast<size_t>(ClassTool::BlanksOf) + 1;
 
-// A global name whose class is made when script reads it, and the function that does that: to be compared
-// only, since a page may drop the name.
+// A global name whose class is made when script reads it.
 struct LazyClassName {
-    JSObjectRef accessor;
     const char* name;
     ScriptClass script_class;
+};
+
+// A property with functions instead of a value; without a setter it cannot be written.
+struct ScriptAccessor {
+    JSValueRef name;
+    JSObjectRef getter;
+    JSObjectRef setter;
 };
 
 struct ScriptingContext {
@@ -68,6 +78,7 @@ struct ScriptingContext {
     std::array<JSObjectRef, kScriptClassCount> prototypes{};
     std::array<JSValueRef, kClassToolCount> class_tools{};
     Vector<LazyClassName, MemoryTag::DOM> class_names;
+    Vector<ScriptAccessor, MemoryTag::DOM> shared_accessors;
     JSObjectRef class_keeper = nullptr;
     WrapperTable wrappers;
     // Chain of the thread's contexts, see GetScriptingContext.

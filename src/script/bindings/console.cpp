@@ -36,6 +36,12 @@ void Console::EndTimer(std::string_view label) {
 
 namespace qorvex::script {
 
+template <>
+dom::Console* NativeOf<dom::Console>(JSContextRef context, JSObjectRef) {
+    const ScriptingContext* page = GetScriptingContext(context);
+    return page && page->window ? &page->window->console() : nullptr;
+}
+
 namespace {
 
 using dom::Console;

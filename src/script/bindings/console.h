@@ -5,6 +5,7 @@
 #include <string_view>
 
 #include "core/memory/containers.h"
+#include "script/native_private.h"
 #include "script/scripting_handle_enabled.h"
 
 namespace qorvex::dom {
@@ -21,3 +22,12 @@ class Console final : public script::ScriptingHandleEnabledRefCounted {
 };
 
 }  // namespace qorvex::dom
+
+namespace qorvex::script {
+
+// A page has one console: its functions work on that whatever `this` is, so that `const { log } = console`
+// does what it says.
+template <>
+dom::Console* NativeOf<dom::Console>(JSContextRef context, JSObjectRef object);
+
+}  // namespace qorvex::script

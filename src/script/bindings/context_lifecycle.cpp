@@ -33,19 +33,14 @@ void FixDates(JSContextRef context, JSObjectRef global) {
     Copy(context, prototype, "toLocaleTimeString", "toTimeString");
 }
 
-// So that `const log = console.log` works.
-void BindConsole(JSContextRef context, JSObjectRef global) {
+// Pages look for its functions among its own properties, as on the web. They need no binding: a first call of
+// `bind` takes longer than all of the above (the engine has it in script of its own, to be parsed first).
+void OwnConsoleFunctions(JSContextRef context, JSObjectRef global) {
     constexpr std::string_view kMethods[] = {"assert", "debug", "error",   "info",
                                              "log",    "time",  "timeEnd", "warn"};
     const JSObjectRef console = GetObject(context, global, "console");
-    if (!console) return;
     for (const std::string_view name : kMethods) {
-        const JSObjectRef method = GetObject(context, console, name);
-        const JSObjectRef bind = GetObject(context, method, "bind");
-        if (!bind) continue;
-        const JSValueRef self = console;
-        if (const JSValueRef bound = JSObjectCallAsFunction(context, bind, method, 1, &self, nullptr))
-            SetProperty(context, console, name, bound, kJSPropertyAttributeNone);
+        if (console) Copy(context, console, name, name);
     }
 }
 
@@ -74,6 +69,8 @@ ScriptingContextPtr CreateScriptingContext(dom::IWindowHost& host, dom::Document
     JSContextGroupRef group = JSContextGroupCreate();
     page->context = JSGlobalContextCreateInGroup(group, nullptr);
     RegisterScriptingContext(*page);
+    // Each call below would take and leave the engine's lock for itself.
+    const ScriptEngineLock lock(page->context);
 
     // The context owns the window by the reference that it was made with.
     page->window = MakeHandle<dom::Window>(host, *page, document).leak();
@@ -90,8 +87,9 @@ ScriptingContextPtr CreateScriptingContext(dom::IWindowHost& host, dom::Document
 
 // Done by calls: as scripts, parsed and run cold for each page, the same takes a tenth of a context.
 void RunPreludeScripts(ScriptingContext& page) {
+    const ScriptEngineLock lock(page.context);
     FixDates(page.context, page.global_object);
-    BindConsole(page.context, page.global_object);
+    OwnConsoleFunctions(page.context, page.global_object);
 }
 
 void DestroyScriptingContext(ScriptingContextPtr page) {

@@ -84,7 +84,6 @@ constexpr AttributeDescription kAttributes[] = {
     Bind::ReadOnly<&Document::GetFocusedElementOrBody>("activeElement"),
     Bind::ReadOnly<&Document::GetCurrentScript>("currentScript"),
     Bind::ReadOnly<&GetStyleSheets>("styleSheets"),
-    QORVEX_COMMON_EVENT_HANDLERS,
 };
 
 constexpr MethodDescription kMethods[] = {
@@ -115,7 +114,9 @@ constexpr MethodDescription kMethods[] = {
 
 }  // namespace
 
-const ClassDescription kDocumentClass = {
-    .script_class = ScriptClass::Document, .attributes = kAttributes, .methods = kMethods};
+const ClassDescription kDocumentClass = {.script_class = ScriptClass::Document,
+                                         .attributes = kAttributes,
+                                         .shared_attributes = kCommonEventHandlers,
+                                         .methods = kMethods};
 
 }  // namespace qorvex::script

@@ -161,7 +161,6 @@ constexpr AttributeDescription kAttributes[] = {
     ScrollInViewUnits<&Node::GetScrollTop, &Node::SetScrollTop, ViewAxis::Height>("scrollTopVH"),
     Bind::ReadWrite<&Element::GetClassName, &SetClassName>("className"),
     Bind::ReadWrite<&GetInnerHTML, &Element::SetInnerHTML>("innerHTML"),
-    QORVEX_COMMON_EVENT_HANDLERS,
     EventHandler<"focusin">(),
     EventHandler<"focusout">(),
     EventHandler<"change">(),
@@ -206,7 +205,9 @@ constexpr MethodDescription kMethods[] = {
 
 }  // namespace
 
-const ClassDescription kElementClass = {
-    .script_class = ScriptClass::Element, .attributes = kAttributes, .methods = kMethods};
+const ClassDescription kElementClass = {.script_class = ScriptClass::Element,
+                                        .attributes = kAttributes,
+                                        .shared_attributes = kCommonEventHandlers,
+                                        .methods = kMethods};
 
 }  // namespace qorvex::script

@@ -45,14 +45,15 @@ constexpr AttributeDescription EventHandler() {
 }
 
 // Those that documents, elements and windows share.
-#define QORVEX_COMMON_EVENT_HANDLERS                                                                      \
-    EventHandler<"abort">(), EventHandler<"blur">(), EventHandler<"click">(), EventHandler<"dblclick">(), \
-        EventHandler<"error">(), EventHandler<"focus">(), EventHandler<"keydown">(),                      \
-        EventHandler<"keypress">(), EventHandler<"keyup">(), EventHandler<"load">(),                      \
-        EventHandler<"mousedown">(), EventHandler<"mouseover">(), EventHandler<"mouseout">(),             \
-        EventHandler<"mouseenter">(), EventHandler<"mouseleave">(), EventHandler<"mousemove">(),          \
-        EventHandler<"mouseup">(), EventHandler<"input">(), EventHandler<"scroll">(),                     \
-        EventHandler<"wheel">(), EventHandler<"touchstart">(), EventHandler<"touchend">(),                \
-        EventHandler<"touchmove">()
+inline constexpr AttributeDescription kCommonEventHandlers[] = {
+    EventHandler<"abort">(),     EventHandler<"blur">(),       EventHandler<"click">(),
+    EventHandler<"dblclick">(),  EventHandler<"error">(),      EventHandler<"focus">(),
+    EventHandler<"keydown">(),   EventHandler<"keypress">(),   EventHandler<"keyup">(),
+    EventHandler<"load">(),      EventHandler<"mousedown">(),  EventHandler<"mouseover">(),
+    EventHandler<"mouseout">(),  EventHandler<"mouseenter">(), EventHandler<"mouseleave">(),
+    EventHandler<"mousemove">(), EventHandler<"mouseup">(),    EventHandler<"input">(),
+    EventHandler<"scroll">(),    EventHandler<"wheel">(),      EventHandler<"touchstart">(),
+    EventHandler<"touchend">(),  EventHandler<"touchmove">(),
+};
 
 }  // namespace qorvex::script

@@ -88,7 +88,6 @@ constexpr AttributeDescription kAttributes[] = {
     Bind::ReadOnly<&GetScrollX>("pageXOffset"),
     Bind::ReadOnly<&GetScrollY>("pageYOffset"),
     Bind::ReadOnly<&GetOne>("devicePixelRatio"),
-    QORVEX_COMMON_EVENT_HANDLERS,
     EventHandler<"gamepadconnected">(),
     EventHandler<"gamepaddisconnected">(),
     EventHandler<"popstate">(),
@@ -111,7 +110,9 @@ constexpr MethodDescription kMethods[] = {
 
 }  // namespace
 
-const ClassDescription kWindowClass = {
-    .script_class = ScriptClass::Window, .attributes = kAttributes, .methods = kMethods};
+const ClassDescription kWindowClass = {.script_class = ScriptClass::Window,
+                                       .attributes = kAttributes,
+                                       .shared_attributes = kCommonEventHandlers,
+                                       .methods = kMethods};
 
 }  // namespace qorvex::script

@@ -39,8 +39,12 @@ TEST_F(ConsoleTest, TimesByLabel) {
 }
 
 TEST_F(ConsoleTest, WorksDetached) {
-    Run("const { log } = console; log('alone')");
+    Run("const { log, time } = console; log('alone'); log.call({}, 'borrowed'); time('a'); "
+        "console.time('a')");
     EXPECT_EQ(Count(Logging::Info, "alone "), 1u);
+    EXPECT_EQ(Count(Logging::Info, "borrowed "), 1u);
+    EXPECT_EQ(Count(Logging::Warning, "Timer \"a\" already exists."), 1u);
+    EXPECT_EQ(Run("Object.keys(console).join()"), "assert,debug,error,info,log,time,timeEnd,warn");
 }
 
 }  // namespace
