@@ -19,10 +19,11 @@ DebugDump* ViewImpl::DumpDOM(unsigned) {
 DebugDump* ViewImpl::DumpStackingContexts() {
     const APICall call(family_, api_depth_);
     if (!call) return nullptr;
+    // First: results that come in meanwhile may bring another document, or take the last one away.
+    WaitUntilLayoutIdle();
     if (!document_) return nullptr;
     layout::LayoutHandle* root = document_->GetLayoutTree().Root();
     if (!root) return New<DebugDumpImpl, MemoryTag::DebugDump>(std::string_view());
-    WaitUntilLayoutIdle();
     return New<DebugDumpImpl, MemoryTag::DebugDump>(dsp::DumpStackingContexts(*root));
 }
 

@@ -91,9 +91,15 @@ class Allocator final : public qorvex::IAllocator {
 class Log final : public qorvex::Logging::ILogHandler {
   public:
     void WriteLog(qorvex::Logging::Severity severity, const char* text, unsigned length) override {
-        std::lock_guard<std::mutex> lock(mutex_);
-        lines_.emplace_back(severity, std::string(text, length ? length - 1 : 0));
+        const std::string line(text, length ? length - 1 : 0);
+        {
+            std::lock_guard<std::mutex> lock(mutex_);
+            lines_.emplace_back(severity, line);
+        }
+        if (on_line) on_line(line);
     }
+    // A page calls into the test by a line on its console.
+    std::function<void(const std::string&)> on_line;
     std::vector<std::string> Lines(qorvex::Logging::Severity at_least = qorvex::Logging::Trace) const {
         std::lock_guard<std::mutex> lock(mutex_);
         std::vector<std::string> result;

@@ -98,6 +98,34 @@ TEST(Life, AFrameThatNoThreadServesHoldsNothingUp) {
     }
 }
 
+// Whoever waits for the layout side runs what has come in since, another page for example.
+TEST(Life, ADumpIsOfThePageThatIsThereWhenItHasWaited) {
+    client::Options options;
+    options.dedicated_layout = true;
+    Client client(options);
+    client.files.Put(kUrl,
+                     "<body>x<script>requestAnimationFrame(() => console.log('drawn'))</script></body>");
+    client.files.Put("coui://page/next.html", "<html><body></body></html>");
+    // Within a frame, behind its own results: the page stands in the queue before what ends the frame.
+    bool drawn = false;
+    client.log.on_line = [&](const std::string& line) {
+        if (line != "drawn ") return;
+        drawn = true;
+        client.view->LoadURL("coui://page/next.html");
+    };
+    client.system->PreloadAndCacheHTML("coui://page/next.html");
+    client.view->LoadURL(kUrl);
+    client.view->ContinuousRepaint(true);
+    for (int i = 0; i < 9 && !drawn; ++i) {
+        client.library->ExecuteWork(qorvex::WorkType::Layout, qorvex::WorkExecutionMode::RunUntilEmpty,
+                                    client.view->GetTaskFamilyId());
+        client.Advance();
+    }
+    ASSERT_EQ(client.log.Count("has new HTML content"), 1u);
+    if (qorvex::DebugDump* layers = client.view->DumpStackingContexts()) layers->Destroy();
+    EXPECT_EQ(client.log.Count("has new HTML content"), 2u);
+}
+
 TEST(Life, WhatIsForgottenGoesWithTheLibrary) {
     client::Allocator allocator;
     client::Log log;
