@@ -1,7 +1,8 @@
 // Free list of equal objects in chunks, for the per-node records of a layout tree: they stay off the general
 // allocator and close together.
 //
-// Invariant: every slot is either a live object or a link of the free list. Chunks go with the pool.
+// Invariant: every slot is a live object, a link of the free list, or has never been touched. Chunks go with
+// the pool.
 #pragma once
 
 #include "core/memory/containers.h"
@@ -22,9 +23,13 @@ class ObjectPool {
     }
 
     T* Make() {
-        if (free_ == nullptr) AddChunk();
         Slot* slot = free_;
-        free_ = slot->next;
+        if (slot != nullptr) {
+            free_ = slot->next;
+        } else {
+            if (fresh_ == end_) AddChunk();
+            slot = fresh_++;
+        }
         return new (slot->bytes) T();
     }
     void Recycle(T* object) {
@@ -46,15 +51,15 @@ class ObjectPool {
         auto* chunk = static_cast<Slot*>(
             GetAllocator()->AlignedAllocate(sizeof(Slot) * kChunk, alignof(Slot), MemoryTag::LayoutNodes));
         chunks_.push_back(chunk);
-        // Handed out in ascending order, as a tree is built.
-        for (uint32_t i = kChunk; i-- > 0;) {
-            chunk[i].next = free_;
-            free_ = &chunk[i];
-        }
+        fresh_ = chunk;
+        end_ = chunk + kChunk;
     }
 
     Vector<Slot*, MemoryTag::LayoutNodes> chunks_;
     Slot* free_ = nullptr;
+    // What is left of the last chunk, in ascending order, as a tree is built.
+    Slot* fresh_ = nullptr;
+    Slot* end_ = nullptr;
 };
 
 }  // namespace qorvex::layout
