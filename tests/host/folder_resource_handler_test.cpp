@@ -52,8 +52,7 @@ struct Response final : IAsyncResourceResponse {
 class FolderTest : public testing::Test {
   protected:
     FolderTest() {
-        std::string name = (fs::temp_directory_path() / "qorvex-XXXXXX").string();
-        base_ = mkdtemp(name.data());
+        base_ = fs::temp_directory_path() / ("qorvex-folder-" + std::to_string(getpid()));
         fs::create_directories(base_ / "page/sub");
         fs::create_directories(base_ / "pages");
         for (const char* file : {"page/a b.html", "page/sub/s.css", "pages/other.html", "secret.txt"})
