@@ -57,8 +57,9 @@ class StreamStack {
     LineStream streams_[limits::kLogStreams];
 };
 
+constexpr auto kLogNothing = static_cast<Logging::Severity>(Logging::Assert + 1);
+
 struct Logger {
-    Logging::Severity threshold;
     bool owns_handler;
     Logging::ILogHandler* handler;
     StreamStack streams;
@@ -89,14 +90,11 @@ void ReportEmptyFunctionCall() {
 
 }  // namespace
 
-bool IsLogged(Logging::Severity severity) {
-    const Logger* logger = g_logger.load(std::memory_order_acquire);
-    return logger && severity >= logger->threshold;
-}
+constinit std::atomic<Logging::Severity> detail::g_log_threshold{kLogNothing};
 
 void WriteLogLine(Logging::Severity severity, std::span<const LogPiece> pieces) {
     Logger* logger = g_logger.load(std::memory_order_acquire);
-    if (!logger || severity < logger->threshold) return;
+    if (!logger || !IsLogged(severity)) return;
     const uint32_t index = logger->streams.Pop();
     LineStream& stream = logger->streams[index];
     stream.Reset();
@@ -119,16 +117,17 @@ bool StartLogging(Logging::Severity threshold, Logging::ILogHandler* handler) {
         return false;
     }
     auto* logger = New<Logger, MemoryTag::Logging>();
-    logger->threshold = threshold;
     logger->owns_handler = !handler;
     logger->handler = handler ? handler : New<DefaultLogHandler, MemoryTag::Logging>();
     g_logger.store(logger, std::memory_order_release);
+    detail::g_log_threshold.store(threshold, std::memory_order_relaxed);
     qsl::g_on_empty_function_call = &ReportEmptyFunctionCall;
     return true;
 }
 
 void EndLogging() {
     qsl::g_on_empty_function_call = nullptr;
+    detail::g_log_threshold.store(kLogNothing, std::memory_order_relaxed);
     Logger* logger = g_logger.exchange(nullptr, std::memory_order_acq_rel);
     if (!logger) return;
     if (logger->owns_handler) Delete<MemoryTag::Logging>(logger->handler);
@@ -141,8 +140,7 @@ Logging::ILogHandler* GetLogHandler() {
 }
 
 Logging::Severity GetLoggingSeverity() {
-    const Logger* logger = g_logger.load(std::memory_order_acquire);
-    return logger ? logger->threshold : static_cast<Logging::Severity>(Logging::Assert + 1);
+    return detail::g_log_threshold.load(std::memory_order_relaxed);
 }
 
 }  // namespace qorvex

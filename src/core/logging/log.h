@@ -2,6 +2,7 @@
 // allocates nothing. Callable from any thread; a line below the threshold costs one load and a compare.
 #pragma once
 
+#include <atomic>
 #include <concepts>
 #include <cstdint>
 #include <span>
@@ -38,7 +39,14 @@ struct LogPiece {
     };
 };
 
-bool IsLogged(Logging::Severity severity);
+namespace detail {
+/// Of the logger; above every severity while there is none.
+extern constinit std::atomic<Logging::Severity> g_log_threshold;
+}  // namespace detail
+
+inline bool IsLogged(Logging::Severity severity) {
+    return severity >= detail::g_log_threshold.load(std::memory_order_relaxed);
+}
 void WriteLogLine(Logging::Severity severity, std::span<const LogPiece> pieces);
 
 template <class... Pieces>

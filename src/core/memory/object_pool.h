@@ -1,6 +1,6 @@
 // The part of an object pool that does not depend on the type: chunks, spare batches, and the calling
 // thread's list. An object taken on one thread and given on another goes to the second one's list; a thread
-// holds fewer than 2N free objects, and hands the oldest N on in one batch, so there is one lock for every N
+// holds fewer than 2N free objects, and hands N of them on in one batch, so there is one lock for every N
 // operations.
 #pragma once
 
@@ -9,12 +9,13 @@
 #include <cstdint>
 
 #include "core/memory/allocator.h"
-#include "core/memory/pool_cache.h"
+#include "core/memory/thread_scope.h"
 #include "qsl/mutex.h"
 
 namespace qorvex {
 
-/// Whether objects come from pools; set before the first is made. Without pools each is a block of its own.
+/// Whether objects come from pools; set before the first is made, while no other thread is in a scope.
+/// Without pools each is a block of its own.
 void SetPoolsEnabled(bool enabled);
 bool ArePoolsEnabled();
 
@@ -28,18 +29,47 @@ class ObjectPool {
     static constexpr size_t kSmallestObject = 2 * sizeof(void*);
 
     static constexpr uint32_t kUnbounded = 0xFFFFFFFF;
+    /// Numbers 1 to this are given out by hand.
+    static constexpr uint32_t kFixedNumbers = 3;
 
+    /// `number` is 0, for one of its own when it is first used, or a fixed one.
     constexpr ObjectPool(size_t object_size, size_t alignment, uint32_t batch, MemoryTag tag,
-                         uint32_t max_chunks = kUnbounded)
+                         uint32_t max_chunks = kUnbounded, uint32_t number = 0)
         : object_size_(object_size),
           alignment_(alignment),
           batch_(batch),
           max_chunks_(max_chunks),
-          tag_(tag) {}
+          tag_(tag),
+          index_(number) {}
 
     /// Null when the pool has as many chunks as it may have and this thread finds none of their objects free.
-    void* Take();
-    void Give(void* object);
+    void* Take() {
+        PoolList* lists = t_thread_record.pool_lists;
+        // The list of pools that are not in use yet is always empty.
+        const uint32_t index = index_.load(std::memory_order_acquire);
+        return lists && lists[index].head ? TakeFrom(lists[index]) : TakeSlowly();
+    }
+    void Give(void* object) {
+        PoolList* lists = t_thread_record.pool_lists;
+        const uint32_t index = index_.load(std::memory_order_acquire);
+        lists&& index != kUnregistered ? GiveTo(lists[index], object) : GiveSlowly(object);
+    }
+
+    // The parts of Take and Give, for one who knows the list of the pool.
+    static void* TakeFrom(PoolList& list) {
+        FreeObject* object = list.head;
+        list.head = object->next;
+        --list.count;
+        return object;
+    }
+    /// How many there are then; a batch is to be put aside.
+    static uint32_t Add(PoolList& list, void* memory) {
+        list.head = ::new (memory) FreeObject{list.head};
+        return ++list.count;
+    }
+    void* TakeSlowly();
+    void GiveSlowly(void* object);
+    void PutAside(PoolList& list) QSL_EXCLUDES(mutex_);
 
   private:
     friend void FreePoolChunks();
@@ -51,18 +81,17 @@ class ObjectPool {
         FreeObject head;
         Batch* below;
     };
-    static constexpr int32_t kUnregistered = -1;
+    /// Also of a pool that finds no number left.
+    static constexpr uint32_t kUnregistered = 0;
 
-    /// The fast road: null when the thread is in no scope or the pool is not in use yet, or not at all.
-    PoolList* ListOfThisThread();
-    static void* TakeFrom(PoolList& list);
-    void GiveTo(PoolList& list, void* object);
-    void* TakeSlowly();
-    void GiveSlowly(void* object);
-    int32_t Index();
-    void Register() QSL_REQUIRES(mutex_);
+    void GiveTo(PoolList& list, void* memory) {
+        if (Add(list, memory) == batch_) [[unlikely]]
+            PutAside(list);
+    }
+    uint32_t Index();
+    void TakeNumber() QSL_REQUIRES(mutex_);
+    void Enlist() QSL_REQUIRES(mutex_);
     bool Refill(PoolList& list) QSL_EXCLUDES(mutex_);
-    void HandOn(PoolList& list) QSL_EXCLUDES(mutex_);
     FreeObject* AddChunk() QSL_REQUIRES(mutex_);
     uint32_t FreeChunks() QSL_EXCLUDES(mutex_);
 
@@ -71,7 +100,9 @@ class ObjectPool {
     const uint32_t batch_;
     const uint32_t max_chunks_;
     const MemoryTag tag_;
-    std::atomic<int32_t> index_{kUnregistered};
+    std::atomic<uint32_t> index_;
+    bool enlisted_ QSL_GUARDED_BY(mutex_) = false;
+    bool asked_for_number_ QSL_GUARDED_BY(mutex_) = false;
     ObjectPool* next_pool_ = nullptr;
     qsl::Mutex mutex_;
     Chunk* chunks_ QSL_GUARDED_BY(mutex_) = nullptr;

@@ -12,12 +12,12 @@ struct FreeObject {
     FreeObject* next;
 };
 
-/// The newest object is at the head. `split` is the object behind which the oldest N stand once the list has
-/// grown beyond N, so that cutting off a batch walks nothing.
+/// Fewer than N objects, the newest at the head, and a full batch of N or none: neither taking one object nor
+/// giving one back walks a list, and a thread at the border of a batch does not take and give batches.
 struct PoolList {
     FreeObject* head = nullptr;
-    FreeObject* split = nullptr;
-    uint32_t count = 0;
+    FreeObject* full = nullptr;
+    uint32_t count = 0;  ///< Of those at the head.
 };
 
 struct PoolCache {

@@ -10,6 +10,7 @@ namespace qorvex {
 TempAllocator::TempAllocator() {
     blocks_.reserve(64);
     AddBlock(limits::kTempBlockBytes);
+    Fill(0, 0);
 }
 
 TempAllocator::~TempAllocator() {
@@ -19,19 +20,27 @@ TempAllocator::~TempAllocator() {
 
 void TempAllocator::AddBlock(size_t capacity) {
     auto* memory = static_cast<std::byte*>(GetAllocator()->Allocate(capacity, MemoryTag::Temporary));
-    blocks_.push_back({memory, 0, capacity});
+    blocks_.push_back({memory, capacity, 0});
+}
+
+void TempAllocator::Fill(uint32_t block, size_t used) {
+    current_ = block;
+    top_ = blocks_[block].Begin() + used;
+    end_ = blocks_[block].Begin() + blocks_[block].capacity;
+    origin_ = blocks_[block].Begin() - used_before_;
 }
 
 void* TempAllocator::AllocateInNewBlock(size_t size, size_t alignment) {
-    const size_t next = current_ + 1;
+    const uint32_t next = current_ + 1;
     if (blocks_.size() > next && blocks_[next].capacity < size + alignment) {
         GetAllocator()->Deallocate(blocks_[next].memory, MemoryTag::Temporary);
         blocks_.pop_back();
     }
     if (blocks_.size() == next) AddBlock(std::max(limits::kTempBlockBytes, size + alignment));
-    blocks_[next].used = 0;
-    used_before_ += blocks_[current_].used;
-    current_ = static_cast<uint32_t>(next);
+    Block& full = blocks_[current_];
+    full.used = top_ - full.Begin();
+    used_before_ += full.used;
+    Fill(next, 0);
     return Allocate(size, alignment);
 }
 
@@ -42,12 +51,14 @@ void TempAllocator::ReleaseBlocks(size_t mark) {
         GetAllocator()->Deallocate(blocks_.back().memory, MemoryTag::Temporary);
         blocks_.pop_back();
     };
+    size_t used = top_ - blocks_[current_].Begin();
     while (current_ && mark <= used_before_) {
         if (blocks_.size() > current_ + 1) drop_last();
-        used_before_ -= blocks_[--current_].used;
+        used = blocks_[--current_].used;
+        used_before_ -= used;
     }
     if (blocks_.size() > current_ + 1 && blocks_.back().capacity != limits::kTempBlockBytes) drop_last();
-    blocks_[current_].used = std::min(blocks_[current_].used, mark - used_before_);
+    Fill(current_, std::min(used, mark - used_before_));
 }
 
 TempAllocator& CurrentTempAllocator() {

@@ -21,24 +21,21 @@ class TempAllocator {
     TempAllocator& operator=(const TempAllocator&) = delete;
 
     void* Allocate(size_t size, size_t alignment) {
-        Block& block = blocks_[current_];
-        const uintptr_t top = reinterpret_cast<uintptr_t>(block.memory) + block.used;
-        const size_t padding = (alignment - top % alignment) % alignment;
-        if (block.used + padding + size <= block.capacity) [[likely]] {
-            block.used += padding + size;
-            return reinterpret_cast<void*>(top + padding);
+        const uintptr_t place = (top_ + alignment - 1) & ~(uintptr_t{alignment} - 1);
+        if (place <= end_ && size <= end_ - place) [[likely]] {
+            top_ = place + size;
+            return reinterpret_cast<void*>(place);
         }
         return AllocateInNewBlock(size, alignment);
     }
 
     /// Bytes used in all blocks up to the current one.
-    size_t Mark() const { return used_before_ + blocks_[current_].used; }
+    size_t Mark() const { return top_ - origin_; }
     /// Frees the blocks behind the one that the mark lies in and resets that one.
     void Release(size_t mark) {
         if (mark < used_before_ || (current_ && mark == used_before_)) [[unlikely]]
             return ReleaseBlocks(mark);
-        Block& block = blocks_[current_];
-        if (mark - used_before_ < block.used) block.used = mark - used_before_;
+        if (origin_ + mark < top_) top_ = origin_ + mark;
     }
     size_t BlockCount() const { return blocks_.size(); }
 
@@ -48,16 +45,23 @@ class TempAllocator {
   private:
     struct Block {
         std::byte* memory;
-        size_t used;
         size_t capacity;
+        size_t used;  ///< Once a later one is being filled.
+
+        uintptr_t Begin() const { return reinterpret_cast<uintptr_t>(memory); }
     };
     [[gnu::noinline]] void* AllocateInNewBlock(size_t size, size_t alignment);
     void AddBlock(size_t capacity);
+    void Fill(uint32_t block, size_t used);
     [[gnu::noinline]] void ReleaseBlocks(size_t mark);
 
     qsl::Vector<Block, TaggedStdAllocator<Block, MemoryTag::General>> blocks_;
-    uint32_t current_ = 0;
+    uintptr_t top_ = 0;
+    uintptr_t end_ = 0;
+    /// Where mark 0 would lie if the blocks before the current one stood in front of it without a gap.
+    uintptr_t origin_ = 0;
     size_t used_before_ = 0;  ///< In the blocks before the current one.
+    uint32_t current_ = 0;
 };
 
 /// The calling thread's arena.
@@ -66,7 +70,8 @@ TempAllocator& CurrentTempAllocator();
 /// Gives back all temporary memory that was taken since it was made.
 class TempMark {
   public:
-    TempMark() : allocator_(CurrentTempAllocator()), mark_(allocator_.Mark()) {}
+    TempMark() : TempMark(CurrentTempAllocator()) {}
+    explicit TempMark(TempAllocator& allocator) : allocator_(allocator), mark_(allocator_.Mark()) {}
     ~TempMark() { allocator_.Release(mark_); }
     TempMark(const TempMark&) = delete;
     TempMark& operator=(const TempMark&) = delete;

@@ -2,7 +2,7 @@
 
 #include <atomic>
 
-#include "core/memory/allocator.h"
+#include "core/memory/object_pool.h"
 
 namespace qorvex {
 
@@ -63,8 +63,10 @@ constinit IdleStack<PoolCache> g_idle_pool_caches;
 namespace detail {
 
 void OpenOutermostScope() {
-    t_thread_record.temp = g_idle_temp_allocators.Take();
-    t_thread_record.pools = g_idle_pool_caches.Take();
+    ThreadRecord& record = t_thread_record;
+    record.temp = g_idle_temp_allocators.Take();
+    record.pools = g_idle_pool_caches.Take();
+    record.pool_lists = ArePoolsEnabled() ? record.pools->lists : nullptr;
 }
 
 void CloseOutermostScope() {
@@ -72,6 +74,7 @@ void CloseOutermostScope() {
     // Whatever was taken without a mark ends with the scope.
     record.temp->Release(0);
     g_idle_temp_allocators.Give(std::exchange(record.temp, nullptr));
+    record.pool_lists = nullptr;
     g_idle_pool_caches.Give(std::exchange(record.pools, nullptr));
 }
 

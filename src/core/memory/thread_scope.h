@@ -12,6 +12,8 @@ namespace qorvex {
 struct ThreadRecord {
     TempAllocator* temp = nullptr;
     PoolCache* pools = nullptr;
+    /// The lists of `pools`, null as well while objects do not come from pools.
+    PoolList* pool_lists = nullptr;
     /// Inside a callback that announces work, where running work is refused.
     bool in_work_callback = false;
 };
