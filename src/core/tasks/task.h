@@ -15,7 +15,7 @@
 #include <qorvex/work.h>
 
 #include "core/memory/allocator.h"
-#include "qsl/vector.h"
+#include "qsl/small_vector.h"
 
 namespace qorvex {
 
@@ -23,7 +23,8 @@ class Task;
 class TaskSystem;
 
 struct TaskDeleter {
-    void operator()(Task* task) const;
+    void operator()(Task* task) const { Destroy(task); }
+    static void Destroy(Task* task);
 };
 using TaskPtr = std::unique_ptr<Task, TaskDeleter>;
 
@@ -50,6 +51,21 @@ struct TaskHandle {
     std::atomic<Task*> task{nullptr};
 };
 
+/// What few tasks have, apart from the task: one without it fills a cache line together with a function that
+/// captures three words.
+struct TaskRelations {
+    /// Change under the task system's mutex; read without it where zero is final.
+    std::atomic<uint32_t> child_count{0};
+    uint32_t dependency_count = 0;
+    Task* parent = nullptr;
+    TaskHandle* handle = nullptr;
+    /// Those that wait for the task.
+    qsl::SmallVector<Task*, 2, TaggedStdAllocator<Task*, MemoryTag::Tasks>> dependents;
+    uint8_t block = 0;
+
+    bool HasChildren() const { return child_count.load(std::memory_order_acquire) != 0; }
+};
+
 class alignas(8) Task {
   public:
     explicit Task(const char* name) : id_(NextId()), name_(name) {}
@@ -57,11 +73,17 @@ class alignas(8) Task {
     Task& operator=(const Task&) = delete;
 
     virtual void Execute(TaskFamilyHandle family) = 0;
-    virtual ~Task() { ClearHandle(); }
+    virtual ~Task() {
+        if (relations_) DropRelations();
+    }
 
     int32_t id() const { return id_; }
     const char* name() const { return name_; }
     void SetHandle(TaskHandle* handle);
+
+  protected:
+    /// Of a class: a task of it that has no relations needs no destructor.
+    static constexpr bool kHoldsNothing = false;
 
   private:
     friend class TaskChannel;
@@ -82,28 +104,22 @@ class alignas(8) Task {
         int32_t end = 0;
         void Refill();
     };
-    void ClearHandle() {
-        if (handle_) ClearHandleSlowly();
-    }
-    void ClearHandleSlowly();
+    TaskRelations& Relations();
+    void DropRelations();
+    void ClearHandle();
     /// Nothing waits for this task and it waits for nothing: it ends without telling anybody.
-    bool StandsAlone() const {
-        return child_count_.load(std::memory_order_acquire) == 0 && !parent_ && !handle_ &&
-               dependents_.empty();
-    }
+    bool StandsAlone() const { return !relations_; }
+    bool HasChildren() const { return relations_ && relations_->HasChildren(); }
+    bool Waits() const { return relations_ && (relations_->dependency_count || relations_->HasChildren()); }
 
     static constinit thread_local IdBlock t_ids_;
 
     const int32_t id_;
     uint8_t block_ = 0;
+    bool holds_nothing_ = false;
     const char* const name_;  ///< A literal.
     Task* next_ = nullptr;    ///< In the queue that owns this task.
-    Task* parent_ = nullptr;
-    TaskHandle* handle_ = nullptr;
-    /// Changes under the task system's mutex; read without it where zero is final.
-    std::atomic<uint32_t> child_count_{0};
-    uint32_t dependency_count_ = 0;
-    qsl::Vector<Task*, TaggedStdAllocator<Task*, MemoryTag::Tasks>> dependents_;
+    TaskRelations* relations_ = nullptr;
 };
 
 namespace detail {
@@ -123,6 +139,10 @@ class TaskFunc final : public Task {
     void Execute(TaskFamilyHandle family) override { detail::CallTaskFunction(function_, family); }
 
   private:
+    template <class Made, class... Args>
+    friend TaskPtr NewTask(Args&&... args);
+    static constexpr bool kHoldsNothing = std::is_trivially_destructible_v<F>;
+
     F function_;
 };
 
@@ -142,26 +162,31 @@ class TaskFuncFinalizer final : public Task {
 
 /// Memory of tasks: most are small and short-lived, so blocks of a few sizes are kept for the next ones. A
 /// block is known by its size's place in the table plus one; 0 stands for a block of its own.
-inline constexpr size_t kTaskBlockSizes[] = {96, 128, 256};
+inline constexpr size_t kTaskBlockSizes[] = {64, 128, 256};
 constexpr uint8_t TaskBlockFor(size_t size) {
     uint8_t block = 0;
     while (block < std::size(kTaskBlockSizes) && kTaskBlockSizes[block] < size)
         ++block;
     return block < std::size(kTaskBlockSizes) ? block + 1 : 0;
 }
-/// Sets `block` to 0 when no kept block is to be had.
-[[nodiscard]] void* AllocateTask(size_t size, uint8_t& block);
+struct TaskMemory {
+    void* memory;
+    uint8_t block;
+};
+/// `size` is at most that of the block. A block of its own is what it gets when no kept one is to be had.
+template <uint8_t block>
+[[nodiscard]] TaskMemory AllocateTask(size_t size);
 void DeallocateTask(void* memory, uint8_t block);
 
 template <class Made, class... Args>
 [[nodiscard]] TaskPtr NewTask(Args&&... args) {
     static_assert(alignof(Made) <= alignof(Task));
-    uint8_t block = TaskBlockFor(sizeof(Made));
-    void* memory = AllocateTask(sizeof(Made), block);
+    const TaskMemory place = AllocateTask<TaskBlockFor(sizeof(Made))>(sizeof(Made));
     // Task is the first base, so both have the same address.
-    TaskPtr task(qsl::ConstructAt<Made>(memory, std::forward<Args>(args)...));
-    task->block_ = block;
-    return task;
+    Task* task = qsl::ConstructAt<Made>(place.memory, std::forward<Args>(args)...);
+    task->block_ = place.block;
+    task->holds_nothing_ = Made::kHoldsNothing;
+    return TaskPtr(task);
 }
 
 /// `function` takes the TaskFamilyHandle of the queue it came from, or nothing.

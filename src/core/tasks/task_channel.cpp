@@ -1,7 +1,6 @@
 #include "core/tasks/task_channel.h"
 
 #include "core/logging/log.h"
-#include "core/memory/temp_allocator.h"
 #include "core/tasks/task_system.h"
 
 namespace qorvex {
@@ -45,6 +44,10 @@ class TaskChannel::RunFrame {
 
 constinit thread_local TaskChannel::RunFrame* TaskChannel::RunFrame::innermost_ = nullptr;
 
+static bool IsStopped(const std::atomic<uint32_t>* stop_flag) {
+    return stop_flag && stop_flag->load(std::memory_order_acquire) != 0;
+}
+
 void TaskChannel::Start(TaskChannels number, TaskSystem* system, OnTaskFinished on_finished,
                         OnTaskPushed on_pushed) {
     number_ = number;
@@ -78,7 +81,6 @@ void TaskChannel::Close(uint32_t family) {
         }
         if (!queue) return;
         left.swap(queue->queue);
-        CountPending(-static_cast<int32_t>(left.size()));
         idle = std::move(queue->idle);
         families_.erase(queue);
         wake = choosy_waiters_ > 0;
@@ -89,35 +91,30 @@ void TaskChannel::Close(uint32_t family) {
     // What a task owns may come back here when it goes, so the tasks go after the lock.
 }
 
-void TaskChannel::Put(uint32_t family, TaskPtr&& task) {
+void TaskChannel::Announce(const FamilyQueue& queue) {
+    if (!HasWorkers(queue) || number_ == TaskChannels::Resources) on_pushed_(queue.family);
+}
+
+void TaskChannel::Wake() {
     bool wake_all;
     {
         qsl::MutexLock lock(mutex_);
-        FamilyQueue* queue = Find(family);
-        if (!queue) {
-            lock.Unlock();
-            LogDebug("Trying to push task '", task->name(), "' to closed channel in family ", family,
-                     " dropping task!");
-            task.reset();
-            lock.Lock();
-            return;
-        }
-        queue->queue.push_back(std::move(task));
-        CountPending(+1);
-        if (IsAnnounced() && (!HasWorkers(*queue) || number_ == TaskChannels::Resources)) on_pushed_(family);
-        if (!waiters_) return;
         // One signal could reach a thread that waits for another family and be lost with it.
         wake_all = choosy_waiters_ && waiters_ > 1;
     }
     wake_all ? work_.Broadcast() : work_.Signal();
 }
 
+void TaskChannel::Drop(uint32_t family, TaskPtr task) {
+    LogDebug("Trying to push task '", task->name(), "' to closed channel in family ", family,
+             " dropping task!");
+}
+
 void TaskChannel::Run(bool blocking, const std::atomic<uint32_t>* stop_flag, uint32_t family) {
-    const auto stopped = [stop_flag] { return stop_flag && stop_flag->load(std::memory_order_acquire) != 0; };
     qsl::MutexLock lock(mutex_);
     GiveBackOnThisThread();
     Register(family, +1);
-    while (!stopped()) {
+    while (!IsStopped(stop_flag)) {
         if (quit_.load(std::memory_order_relaxed)) return Leave(family, false);
         FamilyQueue* queue = Choose(family);
         if (!queue && family != kAllTaskFamilies && !Find(family)) {
@@ -133,14 +130,9 @@ void TaskChannel::Run(bool blocking, const std::atomic<uint32_t>* stop_flag, uin
         RunFrame frame(this, queue->family);
         Take(*queue, IsTakenWhole() && family != kAllTaskFamilies, frame);
         lock.Unlock();
-        uint32_t done = 0;
-        do {
-            Execute(frame.rest().pop_front(), frame.family());
-            ++done;
-        } while (!frame.rest().empty() && !stopped() && !interrupts_.load(std::memory_order_relaxed));
+        const uint32_t done = ExecuteTaken(frame, stop_flag);
         lock.Lock();
         GiveBack(frame);
-        CountPending(-static_cast<int32_t>(done));
         NoteFinished(frame.family(), done);
     }
     Leave(family, true);
@@ -167,14 +159,38 @@ void TaskChannel::GiveBackOnThisThread() {
     if (RunFrame* frame = RunFrame::InnermostOf(this)) GiveBack(*frame);
 }
 
-void TaskChannel::Execute(TaskPtr task, uint32_t family) {
-    TempMark mark;
-    LogTrace("Executing task ", task->name());
-    task->Execute({family, system_});
-    // A task that nobody waits for, like most, ends without asking.
-    if (!task->StandsAlone() || !on_finished_) on_finished_(family, task);
-    // Before it stops counting as in flight: once a family is closed nothing of it is left.
-    task.reset();
+uint32_t TaskChannel::ExecuteTaken(RunFrame& frame, const std::atomic<uint32_t>* stop_flag) {
+    const uint32_t family = frame.family();
+    TempAllocator& temporary = CurrentTempAllocator();
+    const size_t mark = temporary.Mark();
+    const bool tells_end = static_cast<bool>(on_finished_);
+    uint32_t done = 0;
+    // A task goes before it stops counting as in flight: once a family is closed nothing of it is left.
+    do {
+        TaskPtr task = frame.rest().pop_front();
+        LogTrace("Executing task ", task->name());
+        task->Execute({family, system_});
+        // A task that nobody waits for, like most, ends without asking.
+        if (task->StandsAlone() && tells_end) [[likely]]
+            task.reset();
+        else
+            End(family, std::move(task));
+        if (temporary.Mark() != mark) temporary.Release(mark);
+        ++done;
+    } while (!frame.rest().empty() && !IsStopped(stop_flag) && !interrupts_.load(std::memory_order_relaxed));
+    return done;
+}
+
+void TaskChannel::End(uint32_t family, TaskPtr task) {
+    on_finished_(family, task);
+}
+
+uint32_t TaskChannel::GetPending() const {
+    qsl::MutexLock lock(mutex_);
+    uint32_t pending = 0;
+    for (const FamilyQueue& queue : families_)
+        pending += queue.queue.size() + static_cast<uint32_t>(queue.in_flight);
+    return pending;
 }
 
 void TaskChannel::Quit() {
@@ -184,12 +200,6 @@ void TaskChannel::Quit() {
         interrupts_.fetch_add(1, std::memory_order_relaxed);
     }
     work_.Broadcast();
-}
-
-TaskChannel::FamilyQueue* TaskChannel::Find(uint32_t family) {
-    for (FamilyQueue& queue : families_)
-        if (queue.family == family) return &queue;
-    return nullptr;
 }
 
 TaskChannel::FamilyQueue* TaskChannel::Choose(uint32_t family) {
@@ -214,12 +224,6 @@ void TaskChannel::Register(uint32_t family, int change) {
     FamilyQueue* queue = Find(family);
     // A family that was closed and opened again in between does not know this thread.
     if (queue && (change > 0 || queue->workers)) queue->workers += change;
-}
-
-void TaskChannel::CountPending(int32_t change) {
-    // Written under the mutex only, so readers need an atomic but the count no read-modify-write.
-    pending_.store(pending_.load(std::memory_order_relaxed) + static_cast<uint32_t>(change),
-                   std::memory_order_release);
 }
 
 bool TaskChannel::HasWorkers(const FamilyQueue& queue) const {

@@ -11,6 +11,7 @@
 #include <cstdint>
 
 #include "core/memory/containers.h"
+#include "core/memory/temp_allocator.h"
 #include "core/tasks/task_queue.h"
 #include "qsl/mutex.h"
 
@@ -30,14 +31,29 @@ class TaskChannel {
     /// it.
     void Close(uint32_t family) QSL_EXCLUDES(mutex_);
     /// A task for a family that is not open is destroyed.
-    void Put(uint32_t family, TaskPtr&& task) QSL_EXCLUDES(mutex_);
+    void Put(uint32_t family, TaskPtr&& task) QSL_EXCLUDES(mutex_) {
+        bool waited_for;
+        {
+            qsl::MutexLock lock(mutex_);
+            FamilyQueue* queue = Find(family);
+            if (!queue) [[unlikely]] {
+                lock.Unlock();
+                Drop(family, std::move(task));
+                return lock.Lock();
+            }
+            queue->queue.push_back(std::move(task));
+            waited_for = waiters_ > 0;
+            if (IsAnnounced()) Announce(*queue);
+        }
+        if (waited_for) Wake();
+    }
     /// Runs tasks of one family, or of all, until there are none, or, when blocking, until the channel quits
     /// or the flag is set.
     void Run(bool blocking, const std::atomic<uint32_t>* stop_flag, uint32_t family) QSL_EXCLUDES(mutex_);
     void Quit() QSL_EXCLUDES(mutex_);
     /// Tasks that are queued or running. A task that another one pushes counts before that one stops
     /// counting.
-    uint32_t GetPending() const { return pending_.load(std::memory_order_acquire); }
+    uint32_t GetPending() const QSL_EXCLUDES(mutex_);
 
   private:
     struct FamilyQueue {
@@ -62,11 +78,18 @@ class TaskChannel {
     void Take(FamilyQueue& queue, bool whole, RunFrame& frame) QSL_REQUIRES(mutex_);
     void GiveBack(RunFrame& frame) QSL_REQUIRES(mutex_);
     void GiveBackOnThisThread() QSL_REQUIRES(mutex_);
-    void Execute(TaskPtr task, uint32_t family) QSL_EXCLUDES(mutex_);
-    FamilyQueue* Find(uint32_t family) QSL_REQUIRES(mutex_);
+    void End(uint32_t family, TaskPtr task) QSL_EXCLUDES(mutex_);
+    uint32_t ExecuteTaken(RunFrame& frame, const std::atomic<uint32_t>* stop_flag) QSL_EXCLUDES(mutex_);
+    FamilyQueue* Find(uint32_t family) QSL_REQUIRES(mutex_) {
+        for (FamilyQueue& queue : families_)
+            if (queue.family == family) return &queue;
+        return nullptr;
+    }
     FamilyQueue* Choose(uint32_t family) QSL_REQUIRES(mutex_);
     void Register(uint32_t family, int change) QSL_REQUIRES(mutex_);
-    void CountPending(int32_t change) QSL_REQUIRES(mutex_);
+    void Announce(const FamilyQueue& queue) QSL_REQUIRES(mutex_);
+    void Wake() QSL_EXCLUDES(mutex_);
+    static void Drop(uint32_t family, TaskPtr task);
     bool HasWorkers(const FamilyQueue& queue) const QSL_REQUIRES(mutex_);
     void Leave(uint32_t family, bool stopped) QSL_REQUIRES(mutex_);
     void NoteFinished(uint32_t family, uint32_t count) QSL_REQUIRES(mutex_);
@@ -78,7 +101,7 @@ class TaskChannel {
     OnTaskFinished on_finished_;
     OnTaskPushed on_pushed_;
 
-    qsl::Mutex mutex_;
+    mutable qsl::Mutex mutex_;
     qsl::Condition work_;
     Vector<FamilyQueue, MemoryTag::Tasks> families_ QSL_GUARDED_BY(mutex_);
     uint32_t next_queue_ QSL_GUARDED_BY(mutex_) = 0;
@@ -89,7 +112,6 @@ class TaskChannel {
     std::atomic<bool> quit_{false};
     /// Not zero: who has taken tasks gives them back before beginning the next.
     std::atomic<uint32_t> interrupts_{0};
-    std::atomic<uint32_t> pending_{0};
 };
 
 }  // namespace qorvex

@@ -64,9 +64,15 @@ void TaskSystem::DestroyFamily(uint32_t family) {
 void TaskSystem::Push(uint32_t family, TaskChannels channel, TaskPtr task) {
     if (!task) return;
     // Before it is pushed only its creator touches a task, so one that waits for nothing needs no lock here.
-    if (task->dependency_count_ || task->child_count_.load(std::memory_order_acquire)) {
+    if (task->Waits()) [[unlikely]]
+        return PushWaiting(family, channel, std::move(task));
+    ChannelOf(channel).Put(family, std::move(task));
+}
+
+void TaskSystem::PushWaiting(uint32_t family, TaskChannels channel, TaskPtr task) {
+    {
         qsl::MutexLock lock(mutex_);
-        if (task->dependency_count_ || task->child_count_.load(std::memory_order_relaxed)) {
+        if (task->Waits()) {
             waiting_.push_back(Waiting{std::move(task), family, channel});
             return;
         }
@@ -77,14 +83,14 @@ void TaskSystem::Push(uint32_t family, TaskChannels channel, TaskPtr task) {
 void TaskSystem::AddDependent(Task& first, Task& second) {
     // The predecessor of `second` may already have been pushed and be ending on another thread.
     qsl::MutexLock lock(mutex_);
-    first.dependents_.push_back(&second);
-    ++second.dependency_count_;
+    first.Relations().dependents.push_back(&second);
+    ++second.Relations().dependency_count;
 }
 
 void TaskSystem::AddChild(Task& parent, Task& child) {
     qsl::MutexLock lock(mutex_);
-    child.parent_ = &parent;
-    parent.child_count_.fetch_add(1, std::memory_order_relaxed);
+    child.Relations().parent = &parent;
+    parent.Relations().child_count.fetch_add(1, std::memory_order_relaxed);
 }
 
 void TaskSystem::Run(TaskChannels channel, bool blocking, const std::atomic<uint32_t>* stop_flag,
@@ -124,7 +130,7 @@ void TaskSystem::FinishTask(TaskChannels channel, uint32_t family, TaskPtr& task
     TempVector<Waiting> ended;
     {
         qsl::MutexLock lock(mutex_);
-        if (task->child_count_.load(std::memory_order_relaxed)) {
+        if (task->HasChildren()) {
             waiting_for_children_.push_back(Waiting{std::move(task), family, channel});
             return;
         }
@@ -142,18 +148,19 @@ void TaskSystem::FinishTask(TaskChannels channel, uint32_t family, TaskPtr& task
 }
 
 void TaskSystem::Settle(Task& task) {
+    if (!task.relations_) return;
     task.ClearHandle();
-    for (Task* dependent : task.dependents_)
-        --dependent->dependency_count_;
-    task.dependents_.clear();
-    if (task.parent_) task.parent_->child_count_.fetch_sub(1, std::memory_order_release);
-    task.parent_ = nullptr;
+    TaskRelations& relations = *task.relations_;
+    for (Task* dependent : relations.dependents)
+        --dependent->relations_->dependency_count;
+    relations.dependents.clear();
+    if (relations.parent) relations.parent->relations_->child_count.fetch_sub(1, std::memory_order_release);
+    relations.parent = nullptr;
 }
 
 void TaskSystem::Collect(WaitingList& from, TempVector<Waiting>& to) {
     from.erase_if([&](Waiting& entry) {
-        if (entry.task->dependency_count_ || entry.task->child_count_.load(std::memory_order_relaxed))
-            return false;
+        if (entry.task->Waits()) return false;
         to.push_back(std::move(entry));
         return true;
     });

@@ -62,6 +62,7 @@ class TaskSystem {
     using WaitingList = Vector<Waiting, MemoryTag::Tasks>;
 
     TaskChannel& ChannelOf(TaskChannels channel) { return channels_[static_cast<uint32_t>(channel)]; }
+    void PushWaiting(uint32_t family, TaskChannels channel, TaskPtr task) QSL_EXCLUDES(mutex_);
     void FinishTask(TaskChannels channel, uint32_t family, TaskPtr& task) QSL_EXCLUDES(mutex_);
     void Settle(Task& task) QSL_REQUIRES(mutex_);
     static void Collect(WaitingList& from, TempVector<Waiting>& to);
