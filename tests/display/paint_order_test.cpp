@@ -118,8 +118,9 @@ TEST_F(PaintOrderTest, RunsHoldTheSameOrder) {
         // And styles that change later.
         page.Change(boxes[random() % boxes.size()], "position: static; opacity: 1; overflow: visible");
         for (const LayoutHandle* box : boxes) {
-            if (box == page.body || dsp::PaintsAsUnit(box->node()))
+            if (box == page.body || dsp::PaintsAsUnit(box->node())) {
                 ASSERT_EQ(Order(box), OrderOfRuns(box)) << i;
+            }
         }
     }
 }

@@ -56,7 +56,9 @@ TEST(Font, RefusesWhatIsNoFont) {
     }
     MemoryReader whole(bytes);
     EXPECT_EQ(service->LoadFace(&whole, 9, SdfMode::Never), kNoId);
-    if (!bytes.empty()) EXPECT_EQ(service->GetFaceCount(&whole), 1u);
+    if (!bytes.empty()) {
+        EXPECT_EQ(service->GetFaceCount(&whole), 1u);
+    }
 }
 
 namespace {
@@ -131,7 +133,9 @@ TEST(Font, TheNullLibraryMeasuresAndDrawsNothing) {
     EXPECT_EQ(std::strlen(library->GetBuildIdentifier()), 64u);
     MemoryReader reader(ReadFile(kSans));
     const FontId id = library->GetFontService()->LoadFace(&reader, 0, SdfMode::Never);
-    if (id != kNoId) EXPECT_LT(library->GetFontService()->GetFont(id)->GetMetrics(10).ascent, 0);
+    if (id != kNoId) {
+        EXPECT_LT(library->GetFontService()->GetFont(id)->GetMetrics(10).ascent, 0);
+    }
     IScene* scene = library->CreateScene({});
     CommandBuffer* b = Library::CreateBuffer(0, 0);
     b->FillRect({0, 0, 0, 1, 1}, Paint{});

@@ -60,9 +60,7 @@ double Expected(const Polygon& polygon, FillRule rule, int x, int y) {
 }
 
 void Add(Rasterizer& rasterizer, const Polygon& polygon) {
-    for (size_t i = 0, j = polygon.size() - 1; i < polygon.size(); j = i++) {
-        rasterizer.AddLine(polygon[j].x, polygon[j].y, polygon[i].x, polygon[i].y);
-    }
+    rasterizer.AddContour(polygon.data(), polygon.size());
 }
 
 Coverage Rasterize(const Polygon& polygon, FillRule rule, const IRect& bounds) {

@@ -176,7 +176,9 @@ TEST(Life, AViewThatGoesLeavesNoStringsBehind) {
                                     "console.log(getComputedStyle(p).width)")
                                        .c_str());
         client.DestroyView();
-        if (*letter > 'b') EXPECT_LT(client.allocator.blocks() - blocks, 40);
+        if (*letter > 'b') {
+            EXPECT_LT(client.allocator.blocks() - blocks, 40);
+        }
         blocks = client.allocator.blocks();
     }
     EXPECT_EQ(client.log.Count("77px"), 3u);

@@ -51,8 +51,9 @@ TEST(PublicHeaders, IncludeNoHeaderOfADependency) {
             if (entry.path().extension() != ".h") continue;
             std::ifstream file(entry.path());
             for (std::string line; std::getline(file, line);) {
-                if (line.rfind("#include", 0) == 0)
+                if (line.rfind("#include", 0) == 0) {
                     EXPECT_TRUE(std::regex_match(line, allowed)) << entry.path() << ": " << line;
+                }
             }
         }
     }

@@ -184,7 +184,9 @@ TEST_F(Engine, AFontThatArrivesReachesAllWhoShareTheStyle) {
         waiter->Receive(layout::DOMTaskKind::FontArrived, Arrived());
     Solve();
     for (const dom::Node* node = &Body(); node; node = node->GetNextInTree(&Body())) {
-        if (node->IsText()) EXPECT_EQ(node->GetLaidOutStyle().text->typefaces[0], 4u);
+        if (node->IsText()) {
+            EXPECT_EQ(node->GetLaidOutStyle().text->typefaces[0], 4u);
+        }
     }
     fonts.waiters.clear();
     Drop();

@@ -63,7 +63,9 @@ TEST_F(RuleIndexTest, FindsWhatAWalkOverAllRulesFinds) {
         for (int change = 0; change < 6; ++change) {
             const CssVector<uint64_t> ids = index.GetAllRuleIds();
             const uint64_t some = ids[static_cast<uint32_t>(Pick(ids.size()))];
-            if (change % 3 == 1) EXPECT_TRUE(index.RemoveRule(some));
+            if (change % 3 == 1) {
+                EXPECT_TRUE(index.RemoveRule(some));
+            }
             if (change % 3 == 2) {
                 const uint64_t other = ids[static_cast<uint32_t>(Pick(ids.size()))];
                 const IndexedRule* rule = index.FindRule(other);
