@@ -87,17 +87,15 @@ void OutlineBuilder::AddPolygon(const Vec2* points, size_t count, const Homograp
             area += points[j].x * points[i].y - points[i].x * points[j].y;
         reverse = area < 0;
     }
-    const auto line = [&](Vec2 a, Vec2 b) {
-        reverse ? out.AddLine(b.x, b.y, a.x, a.y) : out.AddLine(a.x, a.y, b.x, b.y);
+    const auto flush = [&] {
+        if (reverse) std::reverse(device_.begin(), device_.end());
+        out.AddContour(device_.data(), device_.size());
     };
     if (transform.IsAffine()) {
-        Vec2 previous = transform.Apply(points[count - 1].x, points[count - 1].y);
-        for (size_t i = 0; i < count; ++i) {
-            const Vec2 current = transform.Apply(points[i].x, points[i].y);
-            line(previous, current);
-            previous = current;
-        }
-        return;
+        device_.resize(count);
+        for (size_t i = 0; i < count; ++i)
+            device_[i] = transform.Apply(points[i].x, points[i].y);
+        return flush();
     }
     // Sutherland and Hodgman against w >= kNear, then the division.
     near_.clear();
@@ -114,10 +112,10 @@ void OutlineBuilder::AddPolygon(const Vec2* points, size_t count, const Homograp
         }
         if (b.w >= kNear) clipped_.push_back(b);
     }
-    for (size_t i = 0, j = clipped_.size() - 1; i < clipped_.size(); j = i++) {
-        const Vec3 a = clipped_[j], b = clipped_[i];
-        line({a.x / a.w, a.y / a.w}, {b.x / b.w, b.y / b.w});
-    }
+    device_.resize(clipped_.size());
+    for (size_t i = 0; i < clipped_.size(); ++i)
+        device_[i] = {clipped_[i].x / clipped_[i].w, clipped_[i].y / clipped_[i].w};
+    flush();
 }
 
 void OutlineBuilder::FlushFill(const Homography& transform, Rasterizer& out) {

@@ -53,7 +53,7 @@ class OutlineBuilder {
     struct Vec3 {
         double x, y, w;
     };
-    Vector<Vec2> contour_;
+    Vector<Vec2> contour_, device_;
     Vector<uint8_t> smooth_;  // per point of the contour: inside of a flattened curve
     Vector<Vec3> near_, clipped_;
     Vector<Vec2> piece_;

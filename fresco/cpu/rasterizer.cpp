@@ -2,31 +2,9 @@
 
 #include <bit>
 
+#include "fresco/cpu/edge_area.h"
+
 namespace fresco::cpu {
-namespace {
-
-constexpr int kShift = 16;
-constexpr int32_t kOne = 1 << kShift;
-// Beyond this the picture is far off any surface; holding points here keeps 48.16 arithmetic exact.
-constexpr double kFarthest = double(1 << 22);
-
-inline int32_t RoundPositive(double value) {
-    return int32_t(value + 0.5);
-}
-
-inline uint8_t ToCoverage(int32_t area, FillRule rule) {
-    int32_t value = area < 0 ? -area : area;
-    if (rule == kFillEvenOdd) {
-        value &= 2 * kOne - 1;
-        if (value > kOne) value = 2 * kOne - value;
-    } else if (value > kOne) {
-        value = kOne;
-    }
-    return uint8_t((value * 255 + kOne / 2) >> kShift);
-}
-
-}  // namespace
-
 void CoverageSink::Rows(int y, int rows, std::span<const Piece> pieces, const uint8_t* masks) {
     for (const int end = y + rows; y < end; ++y) {
         const uint8_t* mask = masks;
@@ -49,125 +27,41 @@ void Rasterizer::Begin(const IRect& bounds) {
     small_ = false;
 }
 
-void Rasterizer::BeginSmall(const IRect& bounds) {
-    Begin(bounds);
-    small_ = true;
-    const size_t cells = size_t(bounds.Width() + 1) * size_t(bounds.Height());
-    if (grid_.size() < cells) grid_.resize(cells);
-}
-
-// Where the edge crosses a height, from the left side of the bounds. All positions come from the edge's own
-// equation, never from the neighbouring row or cell, so that clipping cannot change them.
-inline double Rasterizer::PlaceAt(const Edge& edge, int64_t y) const {
-    return std::clamp(edge.x + (double(y) / kOne - edge.y) * edge.slope, edge.minX, edge.maxX) - bounds_.x0;
-}
-
-namespace {
-
-// Adds what an edge between two places covers of a row, `height` high, by add(cell, value).
 template <class Add>
-inline void Accumulate(double left, double right, int32_t height, int32_t winding, int width, Add add) {
-    if (left > right) std::swap(left, right);
-    if (left >= width) return;
-    if (right <= 0) return add(0, winding * height);
-    int cell = int(left);
-    if (left < cell) --cell;
-    if (right <= cell + 1) {
-        const int32_t beyond = RoundPositive(height * ((left + right) * 0.5 - cell));
-        add(cell, winding * (height - beyond));
-        add(cell + 1, winding * beyond);
-        return;
-    }
-    // The edge crosses several cells: the height it has gained at each cell boundary is rounded, and the
-    // cell's share is the difference, so that the shares add up to the whole.
-    const double perPixel = height / (right - left);
-    int32_t gained = 0;
-    double from = left;
-    if (cell < 0) {
-        gained = RoundPositive(-left * perPixel);
-        add(0, winding * gained);
-        cell = 0;
-        from = 0;
-    }
-    for (; cell < width; ++cell) {
-        const bool last = right <= cell + 1;
-        const double to = last ? right : cell + 1;
-        const int32_t reached = last ? height : std::min(height, RoundPositive((to - left) * perPixel));
-        const int32_t share = reached - gained;
-        const int32_t beyond = RoundPositive(share * ((from + to) * 0.5 - cell));
-        add(cell, winding * (share - beyond));
-        add(cell + 1, winding * beyond);
-        gained = reached;
-        from = to;
-        if (last) break;
-    }
-}
-
-}  // namespace
-
-void Rasterizer::AccumulateRow(const Edge& edge, int row) {
-    const int64_t rowTop = int64_t(row) << kShift;
+inline void Rasterizer::AccumulateRow(const Edge& edge, int row, Add add) const {
+    const int64_t rowTop = int64_t(row) << kShift, left = int64_t(bounds_.x0) << kShift;
     const int64_t y0 = std::max(edge.top, rowTop), y1 = std::min(edge.bottom, rowTop + kOne);
-    const double above = PlaceAt(edge, y0), below = edge.slope == 0 ? above : PlaceAt(edge, y1);
-    Accumulate(above, below, int32_t(y1 - y0), edge.winding, bounds_.Width(),
-               [this](int x, int32_t value) { AddCell(x, value); });
+    const int64_t above = edge.x + Across(y0 - edge.y, edge.slope);
+    const int64_t below = edge.slope == 0 ? above : edge.x + Across(y1 - edge.y, edge.slope);
+    Accumulate(above - left, below - left, int32_t(y1 - y0), edge.winding, bounds_.Width(), add);
 }
 
-inline void Rasterizer::AccumulateGrid(const Edge& edge) {
-    const int width = bounds_.Width();
-    int64_t y0 = edge.top;
-    int32_t* cells = grid_.data() + ((y0 >> kShift) - bounds_.y0) * (width + 1);
-    for (double above = PlaceAt(edge, y0); y0 < edge.bottom; cells += width + 1) {
-        const int64_t y1 = std::min(edge.bottom, ((y0 >> kShift) + 1) << kShift);
-        const double below = PlaceAt(edge, y1);
-        Accumulate(above, below, int32_t(y1 - y0), edge.winding, width,
-                   [cells](int x, int32_t value) { cells[x] += value; });
-        y0 = y1;
-        above = below;
-    }
+void Rasterizer::AddContour(const Vec2* points, size_t count) {
+    if (small_) return AddToGrid(points, count);
+    for (size_t i = 0, j = count - 1; i < count; j = i++)
+        AddLine(points[j], points[i]);
 }
 
-void Rasterizer::AddLine(double x0, double y0, double x1, double y1) {
+void Rasterizer::AddLine(Vec2 from, Vec2 to) {
+    int64_t top = ToFixed(from.y), bottom = ToFixed(to.y), x = ToFixed(from.x), lowerX = ToFixed(to.x);
+    if (top == bottom) return;
     int32_t winding = 1;
-    if (y0 > y1) {
-        std::swap(x0, x1);
-        std::swap(y0, y1);
+    if (top > bottom) {
+        std::swap(top, bottom);
+        std::swap(x, lowerX);
         winding = -1;
     }
-    x0 = std::clamp(x0, -kFarthest, kFarthest), x1 = std::clamp(x1, -kFarthest, kFarthest);
-    y0 = std::clamp(y0, -kFarthest, kFarthest), y1 = std::clamp(y1, -kFarthest, kFarthest);
-    const int64_t top = int64_t(std::llrint(y0 * kOne)), bottom = int64_t(std::llrint(y1 * kOne));
-    if (top == bottom) return;
     const int64_t clipTop = int64_t(bounds_.y0) << kShift, clipBottom = int64_t(bounds_.y1) << kShift;
     if (bottom <= clipTop || top >= clipBottom) return;
-    const double minX = std::min(x0, x1), maxX = std::max(x0, x1);
-    if (minX >= bounds_.x1) return;
+    if (std::min(x, lowerX) >= int64_t(bounds_.x1) << kShift) return;
     Edge edge;
-    edge.x = x0;
-    edge.y = double(top) / kOne;
-    edge.slope = (x1 - x0) / (double(bottom - top) / kOne);
-    edge.minX = minX, edge.maxX = maxX;
+    edge.x = x, edge.y = top;
+    edge.slope = double(lowerX - x) / double(bottom - top);
     edge.top = std::max(top, clipTop), edge.bottom = std::min(bottom, clipBottom);
-    edge.winding = winding;
-    edge.next = -1;
-    if (small_) return AccumulateGrid(edge);
+    edge.winding = winding, edge.next = -1;
     firstRow_ = std::min(firstRow_, int(edge.top >> kShift));
     lastRow_ = std::max(lastRow_, int((edge.bottom - 1) >> kShift));
     edges_.push_back(edge);
-}
-
-void Rasterizer::SweepInto(uint8_t* coverage) {
-    const int width = bounds_.Width();
-    int32_t* cells = grid_.data();
-    for (int y = bounds_.y0; y < bounds_.y1; ++y, cells += width + 1, coverage += width) {
-        // Two steps: the second one goes by whole registers.
-        int32_t sum = 0;
-        for (int x = 0; x < width; ++x)
-            cells[x] = sum += cells[x];
-        for (int x = 0; x < width; ++x)
-            coverage[x] = ToCoverage(cells[x], kFillNonZero);
-        std::fill_n(cells, width + 1, 0);
-    }
 }
 
 void Rasterizer::EmitRow(int y, FillRule rule, CoverageSink& sink) {
@@ -282,7 +176,7 @@ void Rasterizer::Sweep(FillRule rule, CoverageSink& sink) {
         const int64_t rowBottom = int64_t(y + equal + 1) << kShift;
         size_t kept = 0;
         for (const int32_t i : active_) {
-            AccumulateRow(edges_[size_t(i)], y);
+            AccumulateRow(edges_[size_t(i)], y, [this](int x, int32_t value) { AddCell(x, value); });
             if (edges_[size_t(i)].bottom > rowBottom) active_[kept++] = i;
         }
         active_.resize(kept);

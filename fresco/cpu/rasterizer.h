@@ -11,6 +11,7 @@
 
 #include <fresco/path.h>
 #include "fresco/cpu/pixels.h"
+#include "fresco/paths/matrix.h"
 
 namespace fresco::cpu {
 
@@ -37,14 +38,14 @@ class Rasterizer {
   public:
     // Only pixels inside of the bounds are emitted.
     void Begin(const IRect& bounds);
-    // An edge of a closed outline, in device pixels. Coordinates must be finite.
-    void AddLine(double x0, double y0, double x1, double y1);
+    // A closed outline, in device pixels. Coordinates must be finite.
+    void AddContour(const Vec2* points, size_t count);
     // Emits rows from top to bottom, spans from left to right.
     void Sweep(FillRule rule, CoverageSink& sink);
     bool HasEdges() const { return !edges_.empty(); }
 
     // The same for bounds of few pixels, without a sink: SweepInto writes one byte for each, row by row, by
-    // the non-zero rule.
+    // the non-zero rule (rasterizer_grid.cpp).
     static bool IsSmall(const IRect& bounds) {
         return int64_t(bounds.Width()) * bounds.Height() <= kSmallArea;
     }
@@ -54,16 +55,16 @@ class Rasterizer {
   private:
     static constexpr int64_t kSmallArea = 16 << 10;
     struct Edge {
-        double x, y;  // upper end
-        double slope, minX, maxX;
-        int64_t top, bottom;  // 48.16
+        int64_t x, y;  // upper end, 48.16 as all places here
+        double slope;
+        int64_t top, bottom;  // inside of the bounds
         int32_t winding;
         int32_t next;
     };
 
-    double PlaceAt(const Edge& edge, int64_t y) const;
-    void AccumulateRow(const Edge& edge, int row);
-    void AccumulateGrid(const Edge& edge);
+    void AddLine(Vec2 from, Vec2 to);
+    template <class Add>
+    void AccumulateRow(const Edge& edge, int row, Add add) const;
     void AddCell(int x, int32_t value) {
         cells_[size_t(x)] += value;
         touched_[size_t(x) >> 6] |= uint64_t(1) << (x & 63);
@@ -86,8 +87,14 @@ class Rasterizer {
     Vector<CoverageSink::Piece> pieces_;
     Vector<uint8_t> pieceMasks_;
 
+    struct GridPoint;
+    void AddToGrid(const Vec2* points, size_t count);
+    void AddClippedToGrid(const GridPoint& from, const GridPoint& to);
+    void AddInsideToGrid(const GridPoint& from, const GridPoint& to);
+
     bool small_ = false;
     Vector<int32_t> grid_;  // of small bounds: rows with one cell more; zero between shapes
+    Vector<uint8_t> gridCoverage_;
 };
 
 }  // namespace fresco::cpu
