@@ -33,17 +33,20 @@ class CountingAllocator final : public IAllocator {
 
   private:
     struct Counters {
-        std::atomic<std::uint64_t> blocks{0};
         std::atomic<std::uint64_t> bytes{0};
         std::atomic<std::uint64_t> allocations{0};
+        std::atomic<std::uint64_t> releases{0};
     };
     struct Header;
 
     void* Make(std::size_t size, std::size_t alignment, MemoryTag tag, bool aligned);
     void Release(void* ptr, MemoryTag tag, bool aligned);
+    void WarmHeap(const void* block);
 
     std::array<Counters, kMemoryTagLimit> counters_;
     std::atomic<std::uint64_t> mismatches_{0};
+    /// What lies below it in the C library's heap is in memory.
+    std::atomic<std::uintptr_t> heap_end_{0};
 };
 
 }  // namespace qorvex::host
