@@ -26,6 +26,8 @@ inline constexpr size_t kFamilyNameBytes = 1024;
 /// Seconds of processor time that one entry into script may take before it is stopped. A page that needs
 /// longer has frozen the game; a page that loads slowly under a debugger or a sanitizer stays well below.
 inline constexpr double kScriptTimeLimitSeconds = 10;
+/// While a page loads, the script engine's own timers have a turn in every one of so many frames.
+inline constexpr uint32_t kLoadingFramesWithoutPump = 30;
 
 /// Smallest block of the string pool.
 inline constexpr size_t kStringPoolBlockBytes = 512;

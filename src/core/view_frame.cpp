@@ -135,8 +135,17 @@ void ViewImpl::ExecuteTimersAndScripts() {
     timers_.Advance(time_);
     if (script_context_ && script_context_->window)
         script_context_->window->RunTimersAndFrameCallbacks(time_);
-    script::PumpScriptEngine();
+    PumpScriptEngine();
     LogTrace("Handling continuous gestures");
+}
+
+void ViewImpl::PumpScriptEngine() {
+    // The engine's own timers, collection above all, can wait until the page is there, but for no load that
+    // hangs.
+    const bool loads = document_ && !document_->IsLoadFired();
+    if (loads && ++loading_frames_ < limits::kLoadingFramesWithoutPump) return script::SettleScriptHeap();
+    loading_frames_ = 0;
+    script::PumpScriptEngine();
 }
 
 layout::LayoutWork ViewImpl::SolveFrame() {

@@ -167,6 +167,7 @@ class ViewImpl final : public View,
     void TakeTime(double time);
     void RunMainThreadResults();
     void ExecuteTimersAndScripts();
+    void PumpScriptEngine();
     void AdvanceDocument();
     layout::LayoutWork SolveFrame();
     TaskPtr MakePreloadTask();
@@ -243,6 +244,8 @@ class ViewImpl final : public View,
     // Frame
     double time_ = 0;
     double previous_time_ = 0;
+    /// Since the script engine's own timers last had their turn.
+    uint32_t loading_frames_ = 0;
     std::atomic<uint32_t> layout_unblocked_{1};
     uint32_t frame_id_ = 0;
     uint32_t open_frame_id_ = 0;

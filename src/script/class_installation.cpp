@@ -75,13 +75,22 @@ class ScriptName {
     ~ScriptName() {
         if (string_) JSStringRelease(string_);
     }
-    // Once.
-    void Set(const char* text) { string_ = JSStringCreateWithUTF8CString(text); }
+    // Once. By way of UTF-16, which the engine takes as it is: names are ASCII, and it would look for other
+    // characters, whose conversion takes two thirds of the whole.
+    void Set(const char* text) {
+        JSChar characters[kLongestName];
+        size_t length = 0;
+        for (; text[length] && length < kLongestName; ++length)
+            characters[length] = static_cast<unsigned char>(text[length]);
+        string_ = text[length] ? JSStringCreateWithUTF8CString(text)
+                               : JSStringCreateWithCharacters(characters, length);
+    }
     ScriptName(const ScriptName&) = delete;
     ScriptName& operator=(const ScriptName&) = delete;
     operator JSStringRef() const { return string_; }  // NOLINT: implicit by design
 
   private:
+    static constexpr size_t kLongestName = 64;
     JSStringRef string_ = nullptr;
 };
 

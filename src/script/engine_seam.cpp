@@ -114,11 +114,6 @@ void OnCollection(JSContextGroupRef, void* id) {
     if (found) found->OnCollected();
 }
 
-void SettleObservers() {
-    for (size_t i = 0; i < t_observers.size(); ++i)
-        t_observers[i]->Settle();
-}
-
 bool OnTimeLimit(JSContextRef, void*) {
     LogError("A script ran longer than its time limit and was stopped.");
     return true;
@@ -135,13 +130,18 @@ void StopScriptEngine() {}
 
 void PumpScriptEngine() {
     g_main_context_iteration(nullptr, FALSE);
-    SettleObservers();
+    SettleScriptHeap();
+}
+
+void SettleScriptHeap() {
+    for (size_t i = 0; i < t_observers.size(); ++i)
+        t_observers[i]->Settle();
 }
 
 void CollectGarbageNow(JSContextRef context) {
-    SettleObservers();
+    SettleScriptHeap();
     JSSynchronousGarbageCollectForDebugging(context);
-    SettleObservers();
+    SettleScriptHeap();
 }
 
 void AddHeapObserver(JSContextGroupRef group, IHeapObserver& observer) {

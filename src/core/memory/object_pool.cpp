@@ -1,5 +1,7 @@
 #include "core/memory/object_pool.h"
 
+#include <algorithm>
+
 #include "core/logging/log.h"
 
 namespace qorvex {
@@ -10,9 +12,12 @@ constinit std::atomic<ObjectPool*> g_pools{nullptr};
 constinit std::atomic<uint32_t> g_pool_count{ObjectPool::kFixedNumbers};
 constinit std::atomic<bool> g_pools_enabled{true};
 
-size_t AlignUp(size_t size, size_t alignment) {
+constexpr size_t AlignUp(size_t size, size_t alignment) {
     return (size + alignment - 1) & ~(alignment - 1);
 }
+
+/// A new chunk is linked piece by piece: what is not used yet is not written to.
+constexpr size_t kFreshBytes = 1024;
 
 }  // namespace
 
@@ -51,7 +56,7 @@ void ObjectPool::Enlist() {
 void* ObjectPool::TakeSlowly() {
     const uint32_t index = Index();
     if (!ArePoolsEnabled() || index == kUnregistered)
-        return GetAllocator()->AlignedAllocate(object_size_, alignment_, tag_);
+        return GetAllocator()->AlignedAllocate(stride_, alignment_, tag_);
     ThreadScope scope;
     PoolList& list = t_thread_record.pools->lists[index];
     return list.head || Refill(list) ? TakeFrom(list) : nullptr;
@@ -65,21 +70,21 @@ void ObjectPool::GiveSlowly(void* memory) {
 }
 
 bool ObjectPool::Refill(PoolList& list) {
-    FreeObject* objects = std::exchange(list.full, nullptr);
-    if (!objects) {
-        qsl::MutexLock lock(mutex_);
-        if (spare_) {
-            Batch* batch = std::exchange(spare_, spare_->below);
-            objects = &batch->head;
-        } else if (chunk_count_ < max_chunks_) {
-            objects = AddChunk();
-        } else {
-            return false;
-        }
-    }
-    list.head = objects;
+    list.head = std::exchange(list.full, nullptr);
     list.count = batch_;
-    return true;
+    if (list.head) return true;
+    qsl::MutexLock lock(mutex_);
+    if (spare_) {
+        list.head = &std::exchange(spare_, spare_->below)->head;
+        return true;
+    }
+    if (fresh_count_ == 0 && chunk_count_ < max_chunks_) AddChunk();
+    list.count = std::min(fresh_count_, std::max(1u, static_cast<uint32_t>(kFreshBytes / stride_)));
+    fresh_count_ -= list.count;
+    for (uint32_t i = list.count; i-- > 0;)
+        list.head = ::new (fresh_ + stride_ * i) FreeObject{list.head};
+    fresh_ += stride_ * list.count;
+    return list.head != nullptr;
 }
 
 void ObjectPool::PutAside(PoolList& list) {
@@ -90,19 +95,16 @@ void ObjectPool::PutAside(PoolList& list) {
     spare_ = ::new (static_cast<void*>(batch)) Batch{FreeObject{batch->next}, spare_};
 }
 
-FreeObject* ObjectPool::AddChunk() {
+void ObjectPool::AddChunk() {
     if (!enlisted_) Enlist();
-    const size_t stride = AlignUp(object_size_, alignment_);
     const size_t header = AlignUp(sizeof(Chunk), alignment_);
     auto* bytes =
-        static_cast<std::byte*>(GetAllocator()->AlignedAllocate(header + stride * batch_, alignment_, tag_));
+        static_cast<std::byte*>(GetAllocator()->AlignedAllocate(header + stride_ * batch_, alignment_, tag_));
     LogTrace("Allocated object pool memory chunk!");
     chunks_ = ::new (bytes) Chunk{chunks_};
     ++chunk_count_;
-    FreeObject* head = nullptr;
-    for (uint32_t i = batch_; i-- > 0;)
-        head = ::new (bytes + header + stride * i) FreeObject{head};
-    return head;
+    fresh_ = bytes + header;
+    fresh_count_ = batch_;
 }
 
 uint32_t ObjectPool::FreeChunks() {
@@ -111,6 +113,7 @@ uint32_t ObjectPool::FreeChunks() {
     for (; chunks_; ++freed)
         GetAllocator()->AlignedDeallocate(std::exchange(chunks_, chunks_->next), tag_);
     chunk_count_ = 0;
+    fresh_count_ = 0;
     spare_ = nullptr;
     return freed;
 }

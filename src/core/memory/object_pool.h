@@ -35,7 +35,7 @@ class ObjectPool {
     /// `number` is 0, for one of its own when it is first used, or a fixed one.
     constexpr ObjectPool(size_t object_size, size_t alignment, uint32_t batch, MemoryTag tag,
                          uint32_t max_chunks = kUnbounded, uint32_t number = 0)
-        : object_size_(object_size),
+        : stride_((object_size + alignment - 1) / alignment * alignment),
           alignment_(alignment),
           batch_(batch),
           max_chunks_(max_chunks),
@@ -92,10 +92,10 @@ class ObjectPool {
     void TakeNumber() QSL_REQUIRES(mutex_);
     void Enlist() QSL_REQUIRES(mutex_);
     bool Refill(PoolList& list) QSL_EXCLUDES(mutex_);
-    FreeObject* AddChunk() QSL_REQUIRES(mutex_);
+    void AddChunk() QSL_REQUIRES(mutex_);
     uint32_t FreeChunks() QSL_EXCLUDES(mutex_);
 
-    const size_t object_size_;
+    const size_t stride_;
     const size_t alignment_;
     const uint32_t batch_;
     const uint32_t max_chunks_;
@@ -107,6 +107,9 @@ class ObjectPool {
     qsl::Mutex mutex_;
     Chunk* chunks_ QSL_GUARDED_BY(mutex_) = nullptr;
     uint32_t chunk_count_ QSL_GUARDED_BY(mutex_) = 0;
+    uint32_t fresh_count_ QSL_GUARDED_BY(mutex_) = 0;
+    /// The objects of the newest chunk that were never taken.
+    std::byte* fresh_ QSL_GUARDED_BY(mutex_) = nullptr;
     Batch* spare_ QSL_GUARDED_BY(mutex_) = nullptr;
 };
 
