@@ -1,5 +1,5 @@
-// The area that an edge covers of the cells that it crosses, in fixed point: places are 48.16, areas 1 / 65536
-// of a pixel. The rasteriser's rows and its grid of small shapes share it, and so give the same sums.
+// The area that an edge covers of the cells that it crosses, in fixed point: places are 48.16, areas 1 /
+// 65536 of a pixel. The rasteriser's rows and its grid of small shapes share it, and so give the same sums.
 #pragma once
 #include <algorithm>
 #include <cmath>

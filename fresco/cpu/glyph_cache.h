@@ -76,7 +76,7 @@ class GlyphCache {
     HashMap<Key, GlyphBitmap, KeyHash> bitmaps_;
     HashMap<uint64_t, Texture> pictures_;
     // Never grown beyond what was reserved, so that glyphs stay in their place.
-    static constexpr size_t kBlockSize = 64 << 10;
+    static constexpr size_t kBlockSize = 16 << 10;
     Vector<Vector<uint8_t>> blocks_;
     size_t bytes_ = 0;
     Rasterizer rasterizer_;

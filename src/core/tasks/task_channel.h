@@ -17,7 +17,8 @@
 
 namespace qorvex {
 
-class TaskChannel {
+/// Each on cache lines of its own: different threads serve them.
+class alignas(64) TaskChannel {
   public:
     /// Told of each task that has run, with no lock held; may keep the task.
     using OnTaskFinished = Function<void(uint32_t family, TaskPtr& task), MemoryTag::Tasks>;

@@ -39,7 +39,7 @@ class TaskQueue {
     TaskPtr pop_front() {
         if (!size_) return TaskPtr();
         Task* oldest = first_;
-        first_ = std::exchange(oldest->next_, nullptr);
+        first_ = oldest->next_;
         --size_;
         return TaskPtr(oldest);
     }
@@ -60,8 +60,9 @@ class TaskQueue {
     }
 
   private:
+    // Of a queue that is not empty; the last task's link is anything.
     Task* first_ = nullptr;
-    Task* last_ = nullptr;  ///< Of a queue that is not empty.
+    Task* last_ = nullptr;
     uint32_t size_ = 0;
 };
 
