@@ -62,7 +62,7 @@ void CountingAllocator::Release(void* ptr, MemoryTag tag, bool aligned) {
     if (header.tag != static_cast<std::uint32_t>(tag) || header.aligned != aligned)
         mismatches_.fetch_add(1, std::memory_order_relaxed);
     Counters& counters = counters_[header.tag % kMemoryTagLimit];
-    counters.releases.fetch_add(1, std::memory_order_relaxed);
+    counters.releases.fetch_add(1, std::memory_order_release);
     counters.bytes.fetch_sub(header.size, std::memory_order_relaxed);
     std::free(static_cast<char*>(ptr) - header.offset);
 }

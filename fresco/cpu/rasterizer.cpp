@@ -27,13 +27,13 @@ void Rasterizer::Begin(const IRect& bounds) {
     small_ = false;
 }
 
-template <class Add>
-inline void Rasterizer::AccumulateRow(const Edge& edge, int row, Add add) const {
+void Rasterizer::AccumulateRow(const Edge& edge, int row) {
     const int64_t rowTop = int64_t(row) << kShift, left = int64_t(bounds_.x0) << kShift;
     const int64_t y0 = std::max(edge.top, rowTop), y1 = std::min(edge.bottom, rowTop + kOne);
     const int64_t above = edge.x + Across(y0 - edge.y, edge.slope);
     const int64_t below = edge.slope == 0 ? above : edge.x + Across(y1 - edge.y, edge.slope);
-    Accumulate(above - left, below - left, int32_t(y1 - y0), edge.winding, bounds_.Width(), add);
+    Accumulate(above - left, below - left, int32_t(y1 - y0), edge.winding, bounds_.Width(),
+               [this](int x, int32_t value) { AddCell(x, value); });
 }
 
 void Rasterizer::AddContour(const Vec2* points, size_t count) {
@@ -176,7 +176,7 @@ void Rasterizer::Sweep(FillRule rule, CoverageSink& sink) {
         const int64_t rowBottom = int64_t(y + equal + 1) << kShift;
         size_t kept = 0;
         for (const int32_t i : active_) {
-            AccumulateRow(edges_[size_t(i)], y, [this](int x, int32_t value) { AddCell(x, value); });
+            AccumulateRow(edges_[size_t(i)], y);
             if (edges_[size_t(i)].bottom > rowBottom) active_[kept++] = i;
         }
         active_.resize(kept);

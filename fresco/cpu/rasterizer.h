@@ -63,8 +63,7 @@ class Rasterizer {
     };
 
     void AddLine(Vec2 from, Vec2 to);
-    template <class Add>
-    void AccumulateRow(const Edge& edge, int row, Add add) const;
+    void AccumulateRow(const Edge& edge, int row);
     void AddCell(int x, int32_t value) {
         cells_[size_t(x)] += value;
         touched_[size_t(x) >> 6] |= uint64_t(1) << (x & 63);

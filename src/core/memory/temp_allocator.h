@@ -70,8 +70,7 @@ TempAllocator& CurrentTempAllocator();
 /// Gives back all temporary memory that was taken since it was made.
 class TempMark {
   public:
-    TempMark() : TempMark(CurrentTempAllocator()) {}
-    explicit TempMark(TempAllocator& allocator) : allocator_(allocator), mark_(allocator_.Mark()) {}
+    TempMark() : allocator_(CurrentTempAllocator()), mark_(allocator_.Mark()) {}
     ~TempMark() { allocator_.Release(mark_); }
     TempMark(const TempMark&) = delete;
     TempMark& operator=(const TempMark&) = delete;
