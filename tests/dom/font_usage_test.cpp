@@ -60,7 +60,7 @@ TEST_F(FontUsageTest, LettersAndShapedTextsGoOnceToTheFontThatHasThem) {
     const auto preload = [&](const char* text) {
         usage.Add(typefaces, text);
         const TaskPtr task = usage.TakeTask(service);
-        if (task) task->Execute({});
+        if (task) task->Execute(TaskFamilyHandle{});
         return task != nullptr;
     };
     EXPECT_TRUE(preload("abc"));

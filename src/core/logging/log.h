@@ -51,7 +51,8 @@ void WriteLogLine(Logging::Severity severity, std::span<const LogPiece> pieces);
 
 template <class... Pieces>
 void Log(Logging::Severity severity, const Pieces&... pieces) {
-    if (!IsLogged(severity)) return;
+    if (!IsLogged(severity)) [[likely]]
+        return;
     const LogPiece line[] = {LogPiece(pieces)...};
     WriteLogLine(severity, line);
 }

@@ -65,15 +65,31 @@ void Task::ClearHandle() {
     relations_->handle = nullptr;
 }
 
-template <uint8_t block>
-TaskMemory AllocateTask(size_t size) {
-    if constexpr (block != 0) {
-        PoolList* lists = t_thread_record.pool_lists;
-        if (lists && lists[block].head) [[likely]]
-            return {ObjectPool::TakeFrom(lists[block]), block};
+// What is rare stands in functions of its own: the rest then runs without a stack frame.
+[[gnu::cold, gnu::noinline]] static TaskMemory AllocateSlowly(size_t size, uint8_t block) {
+    if (block) {
         if (void* memory = g_pools[block - 1].TakeSlowly()) return {memory, block};
     }
     return {GetAllocator()->AlignedAllocate(size, kTaskAlignment, MemoryTag::Tasks), 0};
+}
+
+[[gnu::cold, gnu::noinline]] static void DeallocateSlowly(void* memory, uint8_t block) {
+    if (block)
+        g_pools[block - 1].GiveSlowly(memory);
+    else
+        GetAllocator()->AlignedDeallocate(memory, MemoryTag::Tasks);
+}
+
+[[gnu::noinline]] static void PutAside(PoolList& list, uint8_t block) {
+    g_pools[block - 1].PutAside(list);
+}
+
+template <uint8_t block>
+TaskMemory AllocateTask(size_t size) {
+    PoolList* lists = t_thread_record.pool_lists;
+    if (block && lists && lists[block].head) [[likely]]
+        return {ObjectPool::TakeFrom(lists[block]), block};
+    return AllocateSlowly(size, block);
 }
 template TaskMemory AllocateTask<0>(size_t);
 template TaskMemory AllocateTask<1>(size_t);
@@ -82,19 +98,22 @@ template TaskMemory AllocateTask<3>(size_t);
 
 void DeallocateTask(void* memory, uint8_t block) {
     PoolList* lists = t_thread_record.pool_lists;
-    if (block && lists) [[likely]] {
-        if (ObjectPool::Add(lists[block], memory) == kPoolBatch) [[unlikely]]
-            g_pools[block - 1].PutAside(lists[block]);
-    } else if (block) {
-        g_pools[block - 1].GiveSlowly(memory);
-    } else {
-        GetAllocator()->AlignedDeallocate(memory, MemoryTag::Tasks);
-    }
+    if (!block || !lists) [[unlikely]]
+        return DeallocateSlowly(memory, block);
+    PoolList& list = lists[block];
+    if (ObjectPool::Add(list, memory) == kPoolBatch) [[unlikely]]
+        PutAside(list, block);
 }
 
 void TaskDeleter::Destroy(Task* task) {
+    const uint8_t block = task->plain_block_;
+    if (!block || task->relations_) return DestroySlowly(task);
+    DeallocateTask(task, block);
+}
+
+void TaskDeleter::DestroySlowly(Task* task) {
     const uint8_t block = task->block_;
-    if (!task->holds_nothing_ || task->relations_) std::destroy_at(task);
+    if (!task->plain_block_ || task->relations_) std::destroy_at(task);
     DeallocateTask(task, block);
 }
 

@@ -25,6 +25,9 @@ class TaskSystem;
 struct TaskDeleter {
     void operator()(Task* task) const { Destroy(task); }
     static void Destroy(Task* task);
+
+  private:
+    static void DestroySlowly(Task* task);
 };
 using TaskPtr = std::unique_ptr<Task, TaskDeleter>;
 
@@ -72,7 +75,7 @@ class alignas(8) Task {
     Task(const Task&) = delete;
     Task& operator=(const Task&) = delete;
 
-    virtual void Execute(TaskFamilyHandle family) = 0;
+    virtual void Execute(const TaskFamilyHandle& family) = 0;
     virtual ~Task() {
         if (relations_) DropRelations();
     }
@@ -115,8 +118,9 @@ class alignas(8) Task {
     static constinit thread_local IdBlock t_ids_;
 
     const int32_t id_;
+    /// Of the memory; the second one only while an end without relations needs no destructor.
     uint8_t block_ = 0;
-    bool holds_nothing_ = false;
+    uint8_t plain_block_ = 0;
     const char* const name_;  ///< A literal.
     Task* next_ = nullptr;    ///< In the queue that owns this task.
     TaskRelations* relations_ = nullptr;
@@ -124,7 +128,7 @@ class alignas(8) Task {
 
 namespace detail {
 template <class F>
-void CallTaskFunction(F& function, TaskFamilyHandle family) {
+void CallTaskFunction(F& function, const TaskFamilyHandle& family) {
     if constexpr (std::is_invocable_v<F&, TaskFamilyHandle>)
         function(family);
     else
@@ -136,7 +140,7 @@ template <class F>
 class TaskFunc final : public Task {
   public:
     TaskFunc(const char* name, F function) : Task(name), function_(std::move(function)) {}
-    void Execute(TaskFamilyHandle family) override { detail::CallTaskFunction(function_, family); }
+    void Execute(const TaskFamilyHandle& family) override { detail::CallTaskFunction(function_, family); }
 
   private:
     template <class Made, class... Args>
@@ -153,7 +157,7 @@ class TaskFuncFinalizer final : public Task {
     TaskFuncFinalizer(const char* name, F function, G finalizer)
         : Task(name), function_(std::move(function)), finalizer_(std::move(finalizer)) {}
     ~TaskFuncFinalizer() override { finalizer_(); }
-    void Execute(TaskFamilyHandle family) override { detail::CallTaskFunction(function_, family); }
+    void Execute(const TaskFamilyHandle& family) override { detail::CallTaskFunction(function_, family); }
 
   private:
     F function_;
@@ -185,7 +189,7 @@ template <class Made, class... Args>
     // Task is the first base, so both have the same address.
     Task* task = qsl::ConstructAt<Made>(place.memory, std::forward<Args>(args)...);
     task->block_ = place.block;
-    task->holds_nothing_ = Made::kHoldsNothing;
+    task->plain_block_ = Made::kHoldsNothing ? place.block : 0;
     return TaskPtr(task);
 }
 

@@ -91,6 +91,25 @@ void TaskChannel::Close(uint32_t family) {
     // What a task owns may come back here when it goes, so the tasks go after the lock.
 }
 
+void TaskChannel::Put(uint32_t family, TaskPtr&& task) {
+    bool waited_for;
+    {
+        qsl::MutexLock lock(mutex_);
+        FamilyQueue* queue = Find(family);
+        if (!queue) [[unlikely]] {
+            lock.Unlock();
+            Drop(family, std::move(task));
+            return lock.Lock();
+        }
+        queue->queue.push_back(std::move(task));
+        waited_for = waiters_ > 0;
+        if (IsAnnounced()) [[unlikely]]
+            Announce(*queue);
+    }
+    if (waited_for) [[unlikely]]
+        Wake();
+}
+
 void TaskChannel::Announce(const FamilyQueue& queue) {
     if (!HasWorkers(queue) || number_ == TaskChannels::Resources) on_pushed_(queue.family);
 }
@@ -160,7 +179,7 @@ void TaskChannel::GiveBackOnThisThread() {
 }
 
 uint32_t TaskChannel::ExecuteTaken(RunFrame& frame, const std::atomic<uint32_t>* stop_flag) {
-    const uint32_t family = frame.family();
+    const TaskFamilyHandle family{frame.family(), system_};
     TempAllocator& temporary = CurrentTempAllocator();
     const size_t mark = temporary.Mark();
     const bool tells_end = static_cast<bool>(on_finished_);
@@ -169,12 +188,12 @@ uint32_t TaskChannel::ExecuteTaken(RunFrame& frame, const std::atomic<uint32_t>*
     do {
         TaskPtr task = frame.rest().pop_front();
         LogTrace("Executing task ", task->name());
-        task->Execute({family, system_});
+        task->Execute(family);
         // A task that nobody waits for, like most, ends without asking.
         if (task->StandsAlone() && tells_end) [[likely]]
             task.reset();
         else
-            End(family, std::move(task));
+            End(family.family, std::move(task));
         if (temporary.Mark() != mark) temporary.Release(mark);
         ++done;
     } while (!frame.rest().empty() && !IsStopped(stop_flag) && !interrupts_.load(std::memory_order_relaxed));

@@ -32,22 +32,7 @@ class alignas(64) TaskChannel {
     /// it.
     void Close(uint32_t family) QSL_EXCLUDES(mutex_);
     /// A task for a family that is not open is destroyed.
-    void Put(uint32_t family, TaskPtr&& task) QSL_EXCLUDES(mutex_) {
-        bool waited_for;
-        {
-            qsl::MutexLock lock(mutex_);
-            FamilyQueue* queue = Find(family);
-            if (!queue) [[unlikely]] {
-                lock.Unlock();
-                Drop(family, std::move(task));
-                return lock.Lock();
-            }
-            queue->queue.push_back(std::move(task));
-            waited_for = waiters_ > 0;
-            if (IsAnnounced()) Announce(*queue);
-        }
-        if (waited_for) Wake();
-    }
+    void Put(uint32_t family, TaskPtr&& task) QSL_EXCLUDES(mutex_);
     /// Runs tasks of one family, or of all, until there are none, or, when blocking, until the channel quits
     /// or the flag is set.
     void Run(bool blocking, const std::atomic<uint32_t>* stop_flag, uint32_t family) QSL_EXCLUDES(mutex_);
@@ -90,7 +75,7 @@ class alignas(64) TaskChannel {
     void Register(uint32_t family, int change) QSL_REQUIRES(mutex_);
     void Announce(const FamilyQueue& queue) QSL_REQUIRES(mutex_);
     void Wake() QSL_EXCLUDES(mutex_);
-    static void Drop(uint32_t family, TaskPtr task);
+    [[gnu::cold]] static void Drop(uint32_t family, TaskPtr task);
     bool HasWorkers(const FamilyQueue& queue) const QSL_REQUIRES(mutex_);
     void Leave(uint32_t family, bool stopped) QSL_REQUIRES(mutex_);
     void NoteFinished(uint32_t family, uint32_t count) QSL_REQUIRES(mutex_);
