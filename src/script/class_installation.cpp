@@ -72,6 +72,7 @@ class ScriptName {
   public:
     ScriptName() = default;
     explicit ScriptName(const char* text) { Set(text); }
+    ScriptName(const JSChar* text, size_t length) : string_(JSStringCreateWithCharacters(text, length)) {}
     ~ScriptName() {
         if (string_) JSStringRelease(string_);
     }
@@ -307,11 +308,12 @@ class Installer {
     void InstallNames() {
         auto& names = page_.class_names;
         names.reserve(2 * kScriptClassCount);  // they stay in their place
-        String json;
+        Vector<JSChar> json;                   // as for ScriptName
+        const auto append = [&](std::string_view text) { json.insert(json.end(), text.begin(), text.end()); };
         const auto add = [&](const char* name, ScriptClass script_class) {
-            json.append(json.empty() ? "[\"" : ",\"");
-            json.append(name);
-            json.append("\"");
+            append(json.empty() ? "[\"" : ",\"");
+            append(name);
+            append("\"");
             names.push_back({name, script_class});
         };
         for (size_t i = 0; i < kScriptClassCount; ++i) {
@@ -321,18 +323,18 @@ class Installer {
             add(kScriptClassRows[i].name, script_class);
             if (description && description->alias) add(description->alias, script_class);
         }
-        json.append("]");
-        DefineNames(json.c_str());
+        append("]");
+        DefineNames(ScriptName(json.data(), json.size()));
     }
 
     // A hundred names as one text, and objects that can be called: a string of the engine and a function for
     // each would take twice as long.
-    void DefineNames(const char* json) {
+    void DefineNames(JSStringRef json) {
         JSClassDefinition definition = kJSClassDefinitionEmpty;
         definition.attributes = kJSClassAttributeNoAutomaticPrototype;
         definition.callAsFunction = AccessName;
         JSClassRef accessor_class = JSClassCreate(&definition);
-        const JSObjectRef list = AsObject(context_, JSValueMakeFromJSONString(context_, ScriptName(json)));
+        const JSObjectRef list = AsObject(context_, JSValueMakeFromJSONString(context_, json));
         for (size_t i = 0; list && i < page_.class_names.size(); ++i) {
             const JSValueRef name =
                 JSObjectGetPropertyAtIndex(context_, list, static_cast<unsigned>(i), &exception_);
