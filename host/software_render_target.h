@@ -6,6 +6,8 @@
 #include <span>
 #include <vector>
 
+#include "host/pixel_memory.h"
+
 namespace qorvex::host {
 
 // A surface in memory for the CPU back end: premultiplied RGBA8, rows without a gap, top row first.
@@ -19,7 +21,7 @@ class SoftwareRenderTarget {
     void Resize(std::uint32_t width, std::uint32_t height) {
         width_ = width;
         height_ = height;
-        pixels_.assign(std::size_t{4} * width * height, 0);
+        pixels_ = PixelMemory(std::size_t{4} * width * height);
         surface_ = {pixels_.data(), width, height, width * 4};
     }
 
@@ -27,16 +29,17 @@ class SoftwareRenderTarget {
     [[nodiscard]] std::uint32_t Height() const { return height_; }
     // The colour target of ViewRenderer::SetRenderTarget; set it again after Resize.
     [[nodiscard]] void* Color() { return &surface_; }
-    [[nodiscard]] std::span<const std::uint8_t> Pixels() const { return pixels_; }
+    [[nodiscard]] std::span<const std::uint8_t> Pixels() const { return pixels_.View(); }
 
     // The pixels laid over an opaque grey level, three bytes each.
     [[nodiscard]] std::vector<std::uint8_t> Flatten(std::uint8_t level = 255) const {
         std::vector<std::uint8_t> out;
-        out.reserve(pixels_.size() / 4 * 3);
-        for (std::size_t i = 0; i < pixels_.size(); i += 4) {
-            const unsigned rest = 255u - pixels_[i + 3];
+        const std::span<const std::uint8_t> pixels = Pixels();
+        out.reserve(pixels.size() / 4 * 3);
+        for (std::size_t i = 0; i < pixels.size(); i += 4) {
+            const unsigned rest = 255u - pixels[i + 3];
             for (int channel = 0; channel < 3; ++channel) {
-                const unsigned sum = pixels_[i + channel] + (rest * level + 127) / 255;
+                const unsigned sum = pixels[i + channel] + (rest * level + 127) / 255;
                 out.push_back(static_cast<std::uint8_t>(sum > 255 ? 255 : sum));
             }
         }
@@ -46,7 +49,7 @@ class SoftwareRenderTarget {
   private:
     std::uint32_t width_ = 0;
     std::uint32_t height_ = 0;
-    std::vector<std::uint8_t> pixels_;
+    PixelMemory pixels_;
     fresco::CpuRenderTarget surface_;
 };
 
