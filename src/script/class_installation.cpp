@@ -10,6 +10,7 @@
 #include "script/engine_seam.h"
 #include "script/evaluate.h"
 #include "script/native_private.h"
+#include "script/script_name.h"
 
 namespace qorvex::script {
 
@@ -67,33 +68,6 @@ JSValueRef InvalidConstructor(JSContextRef context, JSObjectRef, JSObjectRef, si
 constexpr size_t kPrototypesAt = 0;
 constexpr size_t kConstructorsAt = kScriptClassCount;
 constexpr size_t kToolsAt = 2 * kScriptClassCount;
-
-class ScriptName {
-  public:
-    ScriptName() = default;
-    explicit ScriptName(const char* text) { Set(text); }
-    ScriptName(const JSChar* text, size_t length) : string_(JSStringCreateWithCharacters(text, length)) {}
-    ~ScriptName() {
-        if (string_) JSStringRelease(string_);
-    }
-    // Once. By way of UTF-16, which the engine takes as it is: names are ASCII, and it would look for other
-    // characters, whose conversion takes two thirds of the whole.
-    void Set(const char* text) {
-        JSChar characters[kLongestName];
-        size_t length = 0;
-        for (; text[length] && length < kLongestName; ++length)
-            characters[length] = static_cast<unsigned char>(text[length]);
-        string_ = text[length] ? JSStringCreateWithUTF8CString(text)
-                               : JSStringCreateWithCharacters(characters, length);
-    }
-    ScriptName(const ScriptName&) = delete;
-    ScriptName& operator=(const ScriptName&) = delete;
-    operator JSStringRef() const { return string_; }  // NOLINT: implicit by design
-
-  private:
-    static constexpr size_t kLongestName = 64;
-    JSStringRef string_ = nullptr;
-};
 
 // On the stack, where the collector sees what stands in it.
 constexpr size_t kBatch = 32;
