@@ -14,9 +14,9 @@
 
 namespace qorvex::host {
 
-// Zeroed memory of a picture, in large pages where the system has them: a screen spans a thousand small ones, and a
-// third of the time of a fill that finds the caches cold goes to their addresses. Takes up to 2 MB more than it is
-// asked for, but not for pictures smaller than that.
+// Zeroed memory of a picture, in large pages where the system has them: a screen spans a thousand small ones,
+// and a third of the time of a fill that finds the caches cold goes to their addresses. Takes up to 2 MB more
+// than it is asked for, but not for pictures smaller than that.
 class PixelMemory {
   public:
     PixelMemory() = default;
@@ -24,7 +24,8 @@ class PixelMemory {
         constexpr std::size_t kLargePage = std::size_t{2} << 20;
         const std::size_t alignment = size < kLargePage ? kSmallest : kLargePage;
         const std::size_t capacity = (size + alignment - 1) / alignment * alignment;
-        bytes_.reset(static_cast<std::uint8_t*>(std::aligned_alloc(alignment, capacity ? capacity : alignment)));
+        bytes_.reset(
+            static_cast<std::uint8_t*>(std::aligned_alloc(alignment, capacity ? capacity : alignment)));
         if (!bytes_) throw std::bad_alloc();
 #if defined(__linux__)
         // Advice: without it all is as before.
@@ -33,8 +34,12 @@ class PixelMemory {
         std::memset(bytes_.get(), 0, size);
     }
 
-    [[nodiscard]] std::uint8_t* data() { return bytes_.get(); }
-    [[nodiscard]] std::span<const std::uint8_t> View() const { return {bytes_.get(), size_}; }
+    [[nodiscard]] std::uint8_t* data() {
+        return bytes_.get();
+    }
+    [[nodiscard]] std::span<const std::uint8_t> View() const {
+        return {bytes_.get(), size_};
+    }
 
   private:
     static constexpr std::size_t kSmallest = 64;
