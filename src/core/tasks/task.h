@@ -118,8 +118,8 @@ class alignas(8) Task {
     static constinit thread_local IdBlock t_ids_;
 
     const int32_t id_;
-    /// Of the memory; the second one only while an end without relations needs no destructor.
     uint8_t block_ = 0;
+    /// The same, or 0 for a class that holds something: the task then needs its destructor in any case.
     uint8_t plain_block_ = 0;
     const char* const name_;  ///< A literal.
     Task* next_ = nullptr;    ///< In the queue that owns this task.
